@@ -21,7 +21,7 @@ using qx::bench::Ratios;
 #ifdef QX_PEER_FFTW3
 using qx::bench::FFTWPlan;
 
-// FFTW over as many blocks of data as ours.
+// FFTW on as many blocks of data as ours.
 class Peer {
 public:
     Peer(int32_t n, bool real, unsigned effort, std::size_t copies)
@@ -49,7 +49,7 @@ private:
 };
 #endif
 
-// Ours, with the data where the host's arrays have them: at 4 modulo 16.
+// Ours, with the data at the address of a host's array: 4 modulo 16.
 class Ours {
 public:
     Ours(int32_t n, bool real, std::size_t copies)
@@ -98,7 +98,7 @@ struct Totals {
     }
 };
 
-// One line per length. Data out of cache: as many copies as exceed every cache, used in turn.
+// One line per length. For data out of cache, enough copies to exceed every cache are used in turn.
 void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
     constexpr std::size_t coldBytes = std::size_t{1} << 27;
     const std::size_t copies = cold ? std::max<std::size_t>(2, coldBytes / (32 * n)) : 1;
@@ -182,7 +182,7 @@ void ReportPlans() {
     }
     const PlanReference held(1024);
     const auto hit = LeastTimes([] { const PlanReference again(1024); });
-    std::printf("cache hit, taken and given back: %.1f ns\n", hit[0] * 1e9);
+    std::printf("cache hit, acquired and released: %.1f ns\n", hit[0] * 1e9);
 }
 
 } // namespace
@@ -200,7 +200,7 @@ int main(int argc, char **argv) {
             std::fprintf(stderr, "bench_fft: there is no group %s\n", argv[i]);
             return 2;
         }
-    std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
+    std::printf("our time; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
     for (const Group &group : Groups()) {
         if (!wanted(group.name))
             continue;

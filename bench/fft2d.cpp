@@ -56,7 +56,7 @@ void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours,
 int main() {
     Totals complex{Ratios("complex, two dimensions"), Ratios("complex, two dimensions")};
     Totals real{Ratios("real, two dimensions"), Ratios("real, two dimensions")};
-    std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
+    std::printf("our time; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
     for (const auto &[rows, cols] : {std::pair{64, 64},
                                      {128, 128},
                                      {100, 120},

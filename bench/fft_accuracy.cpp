@@ -1,4 +1,4 @@
-// The error of the transforms, beside that of FFTW on the same data, as the table of
+// The errors of the transforms and of FFTW on the same data, for the table of
 // src/fft/README.md. The reference is a transform in long double, 11 bits more precise than double:
 // of mixed radix for small factors, by Bluestein's algorithm for large ones.
 
@@ -106,7 +106,7 @@ std::vector<double> Noise(std::size_t n) {
     return x;
 }
 
-// The root of the mean square of the error over that of the spectrum.
+// The root mean square of the error divided by that of the spectrum.
 double RelativeError(const Signal &expected, const std::function<Complex(std::size_t)> &found) {
     long double error = 0;
     long double size = 0;
@@ -161,7 +161,7 @@ bool KernelsOnly(int32_t n) {
                        [](int32_t kind) { return kind == qx::KernelFactor; });
 }
 
-// The worst of a set of lengths, as a row: largest errors, and largest over log2(n).
+// A row of the table for a set of lengths: the largest errors, and the largest errors over log2(n).
 class Row {
 public:
     explicit Row(std::string name) : name_(std::move(name)) {}

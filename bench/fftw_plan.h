@@ -8,17 +8,17 @@
 
 namespace qx::bench {
 
-// A plan of FFTW over memory of its own, aligned as it likes it. FFTW_MEASURE takes the best that
-// it finds in ten seconds, which is all it wants to try but for the longest transforms.
+// A plan of FFTW on its own memory, with the alignment that it prefers. FFTW_MEASURE uses the best plan that
+// it finds in ten seconds, in which it finishes its search except for the longest transforms.
 class FFTWPlan {
 public:
-    // make(in, out) gives the plan; both arrays have so many doubles.
+    // make(in, out) returns the plan; both arrays have `values` doubles.
     template <class Make>
     FFTWPlan(std::size_t values, const Make &make)
         : in_(fftw_alloc_real(values)), out_(fftw_alloc_real(values)) {
         fftw_set_timelimit(10);
         plan_ = make(in_, out_);
-        for (std::size_t i = 0; i < values; ++i) // planning has overwritten them
+        for (std::size_t i = 0; i < values; ++i) // planning overwrites them
             in_[i] = static_cast<double>(i * 7919 % 1024) / 512 - 1;
     }
     ~FFTWPlan() {

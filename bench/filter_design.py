@@ -1,6 +1,6 @@
 """Filter design against SciPy, in one process.
 
-Ours is the export through the binding. Theirs ends in the same form: second-order sections for IIR
+Ours is the export, called through the binding. SciPy's results have the same form: second-order sections for IIR
 filters, taps for FIR filters.
 """
 
@@ -31,7 +31,7 @@ def seconds(function, repeats):
 
 
 def compare(what, peer, cases):
-    """The least of interleaved rounds: what a busy machine disturbs least."""
+    """The minima of interleaved rounds, which a busy machine disturbs least."""
     ratios = []
     for name, ours, theirs in cases:
         repeats = max(1, int(0.01 / seconds(theirs, 1)))
@@ -74,8 +74,8 @@ def remez_cases():
 
 
 def narrow_cases():
-    """The whole signal through a bandpass of a hundredth of the rate: two stages against the
-    equiripple filter of the same ripples, through the same routine."""
+    """A signal filtered by a bandpass of a hundredth of the sampling rate: two stages against the
+    equiripple filter with the same ripples, by the same routine."""
     x = np.random.default_rng(1).normal(size=20000)
     for center in (0.07, 0.23, 0.4):
         staged = qx.call("FIRNarrowCoef_head", 1.0, 0.008, 0.014, center, 0.02, 50.0, 2, {})

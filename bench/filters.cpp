@@ -28,7 +28,7 @@ using qx::bench::Keep;
 using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
-// Multiplications and additions of registers alone, twelve sums at once.
+// Multiplications and additions in registers only, twelve sums at a time.
 template <int Bytes>
 __attribute__((always_inline)) inline void MultiplyAndAdd(int64_t products) {
     typedef double Vector __attribute__((vector_size(Bytes)));
@@ -179,7 +179,7 @@ void CascadeAgainstLiquid(Ratios &ratios) {
     }
 }
 
-// A block as the host has it, with room for its elements.
+// A block with the layout of the host and room for its elements.
 class Block {
 public:
     explicit Block(const std::vector<double> &values) : bytes_(8 * values.size() + 4) {

@@ -1,7 +1,7 @@
-// How many digits of the certified values the Levenberg-Marquardt iteration of the bounded fits and
-// the trust region of NonlinearFit2026 find on the nonlinear regression sets of NIST's Statistical
-// Reference Datasets, as the tables of docs/accuracy/fitting.md. The former has differences, and a
-// step counts down to the last bit of the cost; the latter has derivatives, and then differences.
+// The number of digits of the certified values that the Levenberg-Marquardt iteration of the bounded fits and
+// the trust region of NonlinearFit2026 find for the nonlinear regression sets of NIST's Statistical
+// Reference Datasets: the tables of docs/accuracy/fitting.md. The former uses differences and continues
+// while the cost changes at all; the latter uses derivatives, and then differences.
 //
 // bench_fit_accuracy FILE: nist_nonlinear.dat of src/fit/tests/data by default.
 

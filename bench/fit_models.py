@@ -1,9 +1,9 @@
 """Levenberg-Marquardt fits against scipy.optimize.curve_fit, in one process.
 
-The same samples, the same start and the same tolerance, 1e-8. Ours is the export through the
-binding; theirs takes the model as a function of NumPy arrays and forms its derivatives by
-differences, once with the bounds open and once with bounds that cut the answer off. Each line has the
-time of ours, the ratio ours/theirs and by how much our cost exceeds theirs.
+Both have the same samples, start and tolerance, 1e-8. Ours is the export, called through the
+binding; SciPy's takes the model as a function of NumPy arrays and approximates its derivatives by
+differences. Both run once without bounds and once with bounds that exclude the answer. Each line has
+our time, the ratio ours/theirs and the difference of the costs.
 """
 
 import sys
@@ -36,7 +36,7 @@ def gaussian(x, a, m, s, c):
     return a * np.exp(-0.5 * ((x - m) / s)**2) + c
 
 
-# Export, model, true parameters, start, and an upper bound of the first parameter that cuts it off.
+# Export, model, true parameters, start, and an upper bound that excludes the true first parameter.
 MODELS = [("BoundExpFit_head", exponential, [3.0, -0.8, 1.0], [2.0, -0.4, 0.5], 2.8),
           ("BoundPowerFit_head", power, [2.0, 1.3, 1.0], [1.0, 1.0, 0.0], 1.9),
           ("BoundGaussianFit_head", gaussian, [4.0, 2.5, 0.6, 1.0], [3.0, 2.0, 1.0, 0.5], 3.9)]
@@ -65,7 +65,7 @@ def peak(x, a, m, s):
 
 
 def revision_cases(n):
-    """Name, ours and theirs; the starts are those that curve_fit needs, and ours has none for peaks."""
+    """Name, ours and theirs; curve_fit needs a start, and ours has no start for peaks."""
     x = np.linspace(0.5, 5, n)
     noise = 0.1 * np.random.default_rng(n).normal(size=n)
     y = gaussian(x, 4.0, 2.5, 0.6, 1.0) + noise

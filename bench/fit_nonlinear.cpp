@@ -1,6 +1,6 @@
 // The trust region of NonlinearFit2026.
 //
-// Peer: GSL's gsl_multifit_nlinear with its defaults (Levenberg-Marquardt, scaling of More, QR), on the
+// Peer: GSL's gsl_multifit_nlinear with its defaults (Levenberg-Marquardt, More's scaling, QR), for the
 // same models with the same derivatives, start and tolerance, 1e-8.
 
 #include "bench/timing.h"
@@ -21,7 +21,7 @@ using qx::bench::Ratios;
 struct Problem {
     const char *name;
     std::vector<double> truth, start;
-    // The value, and its derivatives where there is place for them.
+    // Computes the value, and its derivatives if there is an array for them.
     double (*evaluate)(double x, const double *p, double *d);
 };
 

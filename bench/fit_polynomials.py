@@ -1,8 +1,8 @@
 """Polynomial fits against numpy.polyfit, in one process.
 
-Ours is the export, called through ctypes with its arrays at hand, by singular values; it gives the
-values of the fit and the MSE as well, theirs the coefficients alone, by singular values, on one
-thread. Each line has the time of ours and the ratio ours/theirs.
+Ours is the export, called through ctypes with existing arrays; it uses singular values and also returns the
+values of the fit and the MSE. NumPy's returns only the coefficients, by singular values, on one
+thread. Each line has our time and the ratio ours/theirs.
 """
 
 import ctypes
@@ -53,7 +53,7 @@ def main():
 
 
 def matrix_of(host, values):
-    """A host array of two dimensions, whose elements follow both sizes."""
+    """A two-dimensional host array, whose elements follow its two sizes."""
     handle = ctypes.c_void_p(host.QXHostNew2D(DBL, *values.shape))
     block = ctypes.cast(handle, ctypes.POINTER(ctypes.c_void_p))[0]
     ctypes.memmove(block + 8, np.ascontiguousarray(values).ctypes.data, values.nbytes)
@@ -61,7 +61,7 @@ def matrix_of(host, values):
 
 
 def revisions(host, module):
-    """PolyFit2026_head, and GenLSFit2026_head against numpy.linalg.lstsq."""
+    """PolyFit2026_head against numpy.polyfit, and GenLSFit2026_head against numpy.linalg.lstsq."""
     host.QXHostNew2D.restype = ctypes.c_void_p
     module.PolyFit2026_head.argtypes = ([ctypes.c_void_p] * 2 + [ctypes.c_int32, ctypes.c_void_p, ctypes.c_double]
                                         + [ctypes.c_void_p] * 5)

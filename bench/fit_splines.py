@@ -1,8 +1,8 @@
 """Smoothing splines and least-squares splines against SciPy, in one process.
 
-Ours is the export through the binding, which copies arrays that go in, and gives values and
-coefficients; SciPy's functions give the spline alone. SciPy has no search for a sum of squares, so
-searches for lambda are also held against one fit of SciPy's with lambda given.
+Ours is the export, called through the binding, which copies its inputs and returns values and
+coefficients; SciPy's functions return only the spline. SciPy has no search for a sum of squares, so
+searches for lambda are also compared with one fit by SciPy with lambda given.
 """
 
 import os

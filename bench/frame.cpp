@@ -1,6 +1,6 @@
-// The choice of width: a routine of the width in use against a direct call of the baseline's.
-// Scratch memory from the enabled workspace against malloc and free of the same sizes: request
-// and release in turn, and runs of eight requests released newest first, by one thread and four.
+// The choice of width: a routine for the width in use against a direct call of the baseline's routine.
+// Scratch memory from the enabled workspace against malloc and free for the same sizes: request
+// and release in turn, and runs of eight requests released newest first, by one thread and by four.
 
 #include "bench/own_host.h"
 #include "bench/timing.h"
@@ -25,8 +25,8 @@ using qx::bench::SecondsOf;
 
 constexpr int pairs = 20000;
 
-// A block that is not the last keeps its bytes until those above it are released, so threads that
-// never all stand still together can fill the region.
+// A block that is not the last one keeps its bytes until the blocks above it are released, so threads that
+// are never all idle at the same time can fill the region.
 std::atomic<int64_t> refused = 0;
 
 struct Workspace {
@@ -58,7 +58,7 @@ void RequestAndRelease(int32_t size) {
     }
 }
 
-// Seconds for one pair, as each of the threads sees it.
+// Seconds for one pair in each of the threads.
 template <class Source, int Depth>
 double SecondsPerPair(int threads, int32_t size) {
     std::vector<double> seconds(static_cast<std::size_t>(threads));
@@ -91,7 +91,7 @@ void Compare(int threads, Ratios &all) {
     }
 }
 
-// The same routine both times, so the difference is what the choice costs.
+// Both calls run the same routine, so the difference is the cost of the choice.
 void CompareCalls() {
     constexpr int calls = 1000;
     static volatile int32_t length = 5;

@@ -1,7 +1,7 @@
 """Noise, waves and small array work against NumPy, in one process.
 
-Ours is the export through the binding, which copies arrays that go in; theirs is what a user of NumPy
-writes, with a new array for the result.
+Ours is the export, called through the binding, which copies its inputs; theirs is the code that a user of NumPy
+would write, with a new array for the result.
 """
 
 import sys
@@ -126,7 +126,7 @@ def seconds(function, repeats):
 
 
 def best(ours, theirs, repeats, rounds=11):
-    """The best of interleaved rounds: the machine's other work only ever adds."""
+    """The minima of interleaved rounds: other work on the machine only adds to the times."""
     times = [(seconds(ours, repeats), seconds(theirs, repeats)) for _ in range(rounds)]
     return [min(column) for column in zip(*times)]
 

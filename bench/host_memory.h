@@ -8,7 +8,7 @@
 
 namespace qx::bench {
 
-// Values where a host has those of a 1-D array: at 4 modulo 8.
+// Values at the address of a host's 1-D array: 4 modulo 8.
 class HostMemory {
 public:
     explicit HostMemory(std::size_t count) : bytes_(new char[8 * count + 16]) {

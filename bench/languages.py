@@ -1,8 +1,8 @@
-"""What a call costs from each language: Mean_head on 10 values.
+"""The cost of a call from each language: Mean_head on 10 values.
 
-"kept" calls with an array that is there; "made" makes the array, calls, and gives it back, as the functions by
-topics of C++ and Python and the function of Octave do in any case. Each is the best of many rounds. The last
-column is the ratio to C in the same way. Languages that are not installed are named.
+"kept" calls with an existing array; "made" makes the array, calls, and releases it, as the topic functions of C++
+and Python and the function of Octave always do. Each is the best of many rounds. The last column is the ratio to
+C called in the same way. Languages that are not installed are listed.
 """
 
 import os

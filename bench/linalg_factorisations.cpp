@@ -47,7 +47,7 @@ std::vector<double> Symmetric(int32_t n, double shift) {
     return a;
 }
 
-// Minima of interleaved runs: what else runs on the machine only ever adds.
+// Minima of interleaved runs: other work on the machine only adds to the times.
 template <class Ours, class Peer>
 void Compare(Ratios &ratios, const char *name, int32_t n, const Ours &ours, const Peer &peer) {
     const std::size_t ourRepeats = RepeatsFor(1e-4, ours), peerRepeats = RepeatsFor(1e-4, peer);
@@ -63,7 +63,7 @@ void Compare(Ratios &ratios, const char *name, int32_t n, const Ours &ours, cons
     ratios.add(our / their, "n " + std::to_string(n));
 }
 
-// A driver of LAPACK with its work space, found by a query.
+// A driver of LAPACK with its work space, whose size comes from a query.
 template <class Driver>
 std::vector<double> WorkFor(const Driver &driver) {
     double size = 0.0;
@@ -108,31 +108,40 @@ void SingularValueDecomposition(bool withVectors, qx::SVDScaling scaling) {
     ratios.summary("dgesvd");
 }
 
-void SymmetricEigenproblem() {
+enum class Method { Elder, Revision };
+
+void SymmetricEigenproblem(Method method) {
     const auto dsyev = qx::bench::PeerRoutine<decltype(dsyev_)>("dsyev_");
-    Ratios ratios("symmetric eigenproblems");
+    const auto dsyevd = qx::bench::PeerRoutine<decltype(dsyevd_)>("dsyevd_");
+    const bool isRevision = method == Method::Revision;
+    const auto solve = isRevision ? qx::SymmetricEigenBlocked<Real> : qx::SymmetricEigen<Real>;
+    Ratios ratios(isRevision ? "symmetric eigenproblems, revision" : "symmetric eigenproblems");
     for (const int32_t n : orders) {
         const std::vector<double> a = Symmetric(n, 0.0);
         std::vector<double> w(n), v(a.size()), copy = a;
+        std::vector<int32_t> integers(3 + 5 * n);
+        const auto count = static_cast<int32_t>(integers.size());
         const auto driver = [&](double *work, int32_t length) {
             int32_t info;
-            dsyev("V", "L", &n, copy.data(), &n, w.data(), work, &length, &info, 1, 1);
+            if (isRevision)
+                dsyevd("V", "L", &n, copy.data(), &n, w.data(), work, &length, integers.data(),
+                       &count, &info, 1, 1);
+            else
+                dsyev("V", "L", &n, copy.data(), &n, w.data(), work, &length, &info, 1, 1);
         };
         std::vector<double> work = WorkFor(driver);
         Compare(
-            ratios, "symmetric", n,
+            ratios, isRevision ? "symmetric, revision" : "symmetric", n,
             [&] {
-                qx::SymmetricEigen<Real>({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
+                solve({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
             },
             [&] {
                 copy = a;
                 driver(work.data(), static_cast<int32_t>(work.size()));
             });
     }
-    ratios.summary("dsyev");
+    ratios.summary(isRevision ? "dsyevd" : "dsyev");
 }
-
-enum class Method { Elder, Revision };
 
 void GeneralEigenproblem(Method method) {
     const auto dgeev = qx::bench::PeerRoutine<decltype(dgeev_)>("dgeev_");
@@ -231,7 +240,8 @@ int main(int argc, char **argv) {
         {"values", [] { SingularValueDecomposition(false, qx::SVDScaling::LargeNorms); }},
         {"svd2026", [] { SingularValueDecomposition(true, qx::SVDScaling::Always); }},
         {"values2026", [] { SingularValueDecomposition(false, qx::SVDScaling::Always); }},
-        {"symmetric", SymmetricEigenproblem},
+        {"symmetric", [] { SymmetricEigenproblem(Method::Elder); }},
+        {"symmetric2026", [] { SymmetricEigenproblem(Method::Revision); }},
         {"general", [] { GeneralEigenproblem(Method::Elder); }},
         {"general2026", [] { GeneralEigenproblem(Method::Revision); }},
         {"qr", [] { QR(Method::Elder); }},

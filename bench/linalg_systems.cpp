@@ -1,5 +1,5 @@
-// Products, LU solves and inverses against OpenBLAS and its LAPACK (bench/peer_lapack.h). And what
-// an export adds to its inner routine.
+// Products, LU solves and inverses against OpenBLAS and its LAPACK (bench/peer_lapack.h). Also the time
+// that an export adds to its inner routine.
 //
 // bench_linalg_systems [GROUP...]: products, tiny, complexproducts, small, solve, complex, inverse,
 // sets, frame; all by default.
@@ -37,7 +37,7 @@ std::vector<double> Random(std::size_t count) {
     return x;
 }
 
-// Minima of interleaved runs: what else runs on the machine only ever adds.
+// Minima of interleaved runs: other work on the machine only adds to the times.
 template <class Ours, class Peer>
 std::pair<double, double> Times(const Ours &ours, const Peer &peer) {
     const std::size_t ourRepeats = RepeatsFor(1e-4, ours), peerRepeats = RepeatsFor(1e-4, peer);
@@ -157,7 +157,7 @@ void Inverse() {
     ratios.summary("LAPACK dgesv on the unit matrix");
 }
 
-// With an estimate of the condition, ten right sides.
+// With an estimate of the condition number, for ten right-hand sides.
 void SolveSets() {
     Ratios ratios("ten right sides with the condition");
     for (const int32_t n : {4, 8, 32, 100, 300, 1000}) {

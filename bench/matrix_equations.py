@@ -1,6 +1,6 @@
 """Sylvester and Lyapunov equations, functions and Schur forms of matrices against SciPy, in one process.
 
-Ours is the export through the binding. SciPy's speed depends on the BLAS that it finds; the first
+Ours is the export, called through the binding. SciPy's speed depends on the BLAS that it finds; the first
 line names it.
 """
 
@@ -32,7 +32,7 @@ def seconds(function, repeats):
 
 
 def compare(what, peer, cases):
-    """The least of interleaved rounds: what a busy machine disturbs least."""
+    """The minima of interleaved rounds, which a busy machine disturbs least."""
     ratios = []
     for name, ours, theirs in cases:
         repeats = max(1, int(0.01 / seconds(theirs, 1)))
@@ -68,7 +68,7 @@ def continuous_cases():
 
 
 def discrete_cases():
-    """SciPy's own choice of method: Kronecker products below order 10, else the bilinear map."""
+    """SciPy's default method: Kronecker products below order 10, otherwise the bilinear map."""
     for kind, export in (("real", "Lyapunov2011_head"), ("complex", "CxLyapunov2011_head")):
         for n in ORDERS:
             a, q = matrices(kind, n, 2)
@@ -84,7 +84,7 @@ def exponential_cases():
 
 
 def function_cases(export, peer, of_elder=None):
-    """Against the peer, or against the elder export where one is given."""
+    """Compares with the peer, or with the elder export if one is given."""
     for kind, prefix in (("real", ""), ("complex", "Cx")):
         for n in ORDERS:
             a, = matrices(kind, n, 1)
@@ -101,7 +101,7 @@ def power_cases():
 
 
 def schur_cases():
-    """Unordered, and with the eigenvalues of negative real part first against SciPy's sort of these."""
+    """Unordered, and with eigenvalues of negative real part first, compared with SciPy's sorted form."""
     for n in ORDERS:
         a, = matrices("real", n, 1)
         yield f"n {n}", lambda: qx.call("Schur2026_head", a, 1, 0), lambda: linalg.schur(a, output="real")

@@ -1,8 +1,8 @@
 // The window scan of the peak detector, the searches for crossings, triggers and tones.
 //
-// Peers: for the scan three plain dot products for each window, as the definition has them; for
-// crossings the time in which the same data are read and summed, and the plain loop over the
-// samples; for triggers the reading; for tones one transform of the padded record a tone.
+// Peers: for the scan, the three plain dot products per window of the definition; for
+// crossings, the time to read and sum the same data, and a plain loop over the
+// samples; for triggers, the reading; for tones, one transform of the padded record per tone.
 
 #include "bench/host_memory.h"
 #include "bench/timing.h"
@@ -36,7 +36,7 @@ double Noise(int32_t i) {
     return static_cast<double>(static_cast<uint32_t>(i) * 2654435761U % 1000003U) / 1000003.0;
 }
 
-// Three dot products, each kept, and nothing else.
+// Only the three dot products, with their results kept.
 void PlainScan(const DBL *fitMatrix, int32_t w, const DBL *x, int32_t n) {
     double sum = 0;
     for (int32_t i = 0; i + w <= n; ++i) {
@@ -100,7 +100,7 @@ int32_t PlainCrossings(const DBL *y, int32_t n, double mid, double h, qx::Crossi
     return count;
 }
 
-// What reading the data takes: sums side by side, so that no addition waits for another.
+// The cost of reading the data: independent sums, so that no addition waits for another.
 double SumInVectors(const DBL *x, int32_t n) {
     constexpr int together = 32;
     double sums[together] = {};
@@ -118,7 +118,7 @@ void Crossings() {
     for (const int32_t n : {10000, 1000000, 10000000}) {
         const HostMemory y(static_cast<std::size_t>(n));
         std::vector<qx::Crossing> list(static_cast<std::size_t>(n));
-        // One crossing in so many samples.
+        // The number of samples per crossing.
         for (const int32_t every : {20, 300, 10000}) {
             for (int32_t i = 0; i < n; ++i)
                 y.data()[i] = std::sin(std::numbers::pi * (i + 0.5) / every) + 1e-3 * Noise(i);

@@ -1,9 +1,9 @@
 """Peaks against scipy.signal.find_peaks, in one process.
 
-Ours is PeakD with windows of three samples, called through ctypes with its arrays at hand; it gives
-places between the samples, amplitudes and curvatures. Theirs gives sample numbers; in a second column
-it is followed by the same parabola through three samples, in NumPy. The recording is repeated up to
-the length.
+Ours is PeakD with windows of three samples, called through ctypes with existing arrays; it returns
+positions between the samples, amplitudes and curvatures. SciPy's returns sample indices; in the second column
+it is followed by the same parabola through three samples, in NumPy. The recording is repeated to
+the required length.
 """
 
 import ctypes
@@ -32,7 +32,7 @@ class Request(ctypes.Structure):
 
 
 def refined(x, height):
-    """The peaks of find_peaks as PeakD gives them."""
+    """The peaks of find_peaks in the form of PeakD's."""
     at = scipy.signal.find_peaks(x, height=height)[0]
     before, here, behind = x[at - 1], x[at], x[at + 1]
     curvature = before - 2 * here + behind

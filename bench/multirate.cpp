@@ -1,9 +1,9 @@
 // Streams at changed rates against liquid-dsp and libsamplerate, and moving sums against the bus.
 //
 // bench_multirate [GROUP...]: rates, sums; both by default. Ours is the inner routine on a block in
-// the midst of a stream, in single precision where the peers are. Of liquid-dsp the fastest of its
-// objects for the ratio counts, with as many taps for each output. libsamplerate has a filter of
-// its own; against its shortest, about 38 taps an output where the rate rises, ours has 39.
+// the middle of a stream, in single precision if the peer is. The time of liquid-dsp is that of its
+// fastest object for the ratio, with as many taps per output. libsamplerate has its own
+// filters; its shortest has about 38 taps per output if the rate rises, and ours has 39.
 
 #include "bench/host_memory.h"
 #include "bench/timing.h"
@@ -39,7 +39,7 @@ struct Ratio {
 const Ratio ratios[] = {
     {"2/1", 2, 1}, {"1/2", 1, 2}, {"3/2", 3, 2}, {"160/147", 160, 147}, {"147/160", 147, 160}};
 
-// Whole multiples of M, so that each block has the same count of outputs.
+// Multiples of M, so that each block has the same number of outputs.
 int32_t InputsOf(const Ratio &ratio, int32_t n) { return std::max(1, n / ratio.M) * ratio.M; }
 
 // Input, taps and output of one kind of sample.
@@ -83,7 +83,7 @@ struct Filtering {
 };
 
 #ifdef QX_PEER_LIQUID
-// The seconds of the fastest of its objects, interleaved with ours.
+// The seconds of the fastest liquid-dsp object, interleaved with ours.
 std::array<double, 2> AgainstLiquid(Filtering<ElementType::SGL> &ours, int32_t terms) {
     const std::vector<float> x(ours.x, ours.x + ours.n);
     std::vector<float> h(ours.h, ours.h + ours.taps);
@@ -196,7 +196,7 @@ void Rates() {
     complexData.summary("ours, real data");
 }
 
-// A moving sum adds twice to a running value for each sample, in an order that holds; the limit is
+// A moving sum adds twice to a running value for each sample, in a fixed order; the limit is
 // the latency of these two additions.
 void Chain(int32_t n, double term) {
     double sum = 0;

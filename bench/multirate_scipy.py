@@ -1,7 +1,7 @@
 """Rational rates against scipy.signal.upfirdn, in one process.
 
-Ours is the export, called through ctypes with its arrays at hand, on one block of double precision;
-theirs makes its output array. Each line has the time of ours and the ratio ours/theirs.
+Ours is the export, called through ctypes with existing arrays, on one block in double precision;
+SciPy's allocates its output. Each line has our time and the ratio ours/theirs.
 """
 
 import ctypes

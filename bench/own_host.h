@@ -3,8 +3,8 @@
 
 #include <cstdint>
 
-// The benchmark as the module's host: arrays never change their size, and nothing is swept. One
-// source of a program includes this.
+// The benchmark as the module's host: arrays never change their size, and clean-up procedures are never
+// called. One source of a program includes this header.
 
 extern "C" {
 __attribute__((visibility("default"))) extern const int32_t gQXRTVersion;

@@ -7,9 +7,9 @@
 
 namespace qx::bench {
 
-// OpenBLAS, with its LAPACK, as a peer: loaded and not linked, so that none of its names meets
-// those of the module. One thread; OPENBLAS_CORETYPE=Haswell and the like choose its kernels, and
-// QX_OPENBLAS names another file than the one that Debian's packages install
+// OpenBLAS, with its LAPACK, as a peer: loaded and not linked, so that its names do not clash with
+// those of the module. It uses one thread; OPENBLAS_CORETYPE=Haswell and the like select its kernels, and
+// QX_OPENBLAS can name another file than the one that Debian's packages install
 // (tools/setup/native bench installs them).
 inline void *PeerLibrary() {
     static void *const library = [] {
@@ -22,7 +22,7 @@ inline void *PeerLibrary() {
     return library;
 }
 
-// A function of the peer by its Fortran name; ends the program where there is none.
+// A function of the peer by its Fortran name; ends the program if there is no such function.
 template <class Function>
 Function *PeerRoutine(const char *name) {
     void *const library = PeerLibrary();

@@ -1,9 +1,9 @@
 """One-dimensional transforms against SciPy's pocketfft, in one process.
 
-Ours is the export itself, called through ctypes with its arrays and plan at hand; theirs is
-scipy.fft with one worker, which makes its output array. The cost of one call from Python, about a
-microsecond for ours and several for theirs, stands in both, so short lengths tell little. Ours gives
-the whole spectrum of real data, theirs the half.
+Ours is the export itself, called through ctypes with existing arrays and plan; theirs is
+scipy.fft with one worker, which allocates its output. Both include the cost of a call from Python, about a
+microsecond for ours and several for theirs, so short lengths say little. For real data, ours returns
+the whole spectrum and theirs half of it.
 """
 
 import ctypes
@@ -35,7 +35,7 @@ def load():
 
 
 def block_of(host, code, values):
-    """A host array with the values, which follow its count directly."""
+    """A host array with the values, which directly follow its size."""
     handle = ctypes.c_void_p(host.QXHostNew1D(code, len(values)))
     block = ctypes.cast(handle, ctypes.POINTER(ctypes.c_void_p))[0]
     ctypes.memmove(block + 4, values.ctypes.data, values.nbytes)

@@ -87,7 +87,7 @@ int main() {
     for (const Kind &kind : kinds) {
         for (const int32_t degree : {3, 6, 12, 24, 48, 96}) {
             if (degree > 24 && std::string(kind.name) != "random")
-                continue; // coefficients in double tell no roots there
+                continue; // double-precision coefficients do not determine the roots there
             const std::vector<double> a = kind.coefficients(degree);
             const auto n = static_cast<int32_t>(a.size());
             std::vector<CDB> coefficients, roots(a.size()), simple(a.size());

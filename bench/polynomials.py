@@ -1,7 +1,7 @@
 """Arithmetic of polynomials against NumPy and SciPy, in one process.
 
-Ours is the export through the binding, which copies arrays that go in. PolyEv has the result of
-twice the working precision, polyval that of Horner's rule. The common divisor has no peer there.
+Ours is the export, called through the binding, which copies its inputs. PolyEv is as accurate as if computed in
+twice the working precision, polyval uses plain Horner's rule. The common divisor has no peer.
 """
 
 import os

@@ -1,7 +1,7 @@
-"""What a call costs from Python, in one process.
+"""The cost of a call from Python, in one process.
 
-Ours are functions of the package on few values, where the way to the export and back is nearly all of
-the time; theirs is NumPy's function for the same. Each line has the time of ours and the ratio
+Ours are functions of the package on a few values, where the overhead of the call is nearly all of
+the time; theirs are the corresponding functions of NumPy. Each line has our time and the ratio
 ours/theirs; below 1 is faster.
 """
 
@@ -18,7 +18,7 @@ from summary import print_summary  # noqa: E402
 
 
 def seconds(function, repeats=200, rounds=300):
-    """The best of many short rounds: the machine's other work only ever adds."""
+    """The minimum of many short rounds: other work on the machine only adds to the times."""
     best = math.inf
     for _ in range(rounds):
         start = time.perf_counter()

@@ -1,9 +1,9 @@
-"""What the topics cost from Python beside NumPy and SciPy, in one process.
+"""The cost of the topics from Python compared with NumPy and SciPy, in one process.
 
-Three groups: functions of 10 values, where the way to the export and back is nearly all of the time; a
-topic's call beside that of its export; and 16 channels of 10^6 samples, and 10^6 values of special functions,
-where the processors and the memory decide. Each line has the time of ours and the ratio ours/theirs; below 1
-is faster. Ours and theirs take turns, so that the machine's other work meets both.
+There are three groups: functions of 10 values, where the overhead of the call is nearly all of the time; calls of
+topics compared with calls of their exports; and 16 channels of 10^6 samples, and 10^6 values of special functions,
+where processors and memory decide. Each line has our time and the ratio ours/theirs; below 1
+is faster. Ours and theirs take turns, so that other work on the machine affects both.
 """
 
 import math
@@ -23,7 +23,7 @@ from summary import print_summary  # noqa: E402
 
 
 def times(functions, repeats, rounds):
-    """The best of many rounds for each of the functions, which take turns: other work only ever adds."""
+    """The minimum of many rounds for each function; they take turns, and other work only adds to the times."""
     best = [math.inf] * len(functions)
     for _ in range(rounds):
         for which, function in enumerate(functions):
@@ -82,7 +82,7 @@ def small():
 
 
 def topical():
-    """A topic's call and its export's."""
+    """A call of a topic and of its export."""
     x, e = np.random.default_rng(1).normal(size=10), qx.exports
     f = qx.filters.butterworth(4, 0.1)
     m = np.random.default_rng(2).normal(size=(3, 3))

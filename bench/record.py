@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""record.py LOG FOLDER COMMIT: writes what a benchmark has printed (LOG) as figures, FOLDER/FAMILY-TIME.json,
+"""record.py LOG FOLDER COMMIT: writes the output of a benchmark (LOG) as figures to FOLDER/FAMILY-TIME.json,
 with the machine, the width and the state of the sources."""
 
 import datetime
@@ -12,7 +12,7 @@ from pathlib import Path
 
 
 def machine():
-    """What the figures are measured on, by names that do not change from run to run."""
+    """The machine of the measurement, described by names that do not change from run to run."""
     shown = subprocess.run(["lscpu"], capture_output=True, text=True, check=True).stdout
     facts = dict(line.split(":", 1) for line in shown.splitlines() if ":" in line)
     caches = ", ".join(f"{name} {facts[name + ' cache'].strip()}" for name in ("L1d", "L2", "L3")
@@ -23,7 +23,7 @@ def machine():
 
 
 def read(text):
-    """The figures of a printed run: rows, peers that are missing, and where it was stopped."""
+    """The figures of a run: rows, missing peers, and where it was stopped."""
     rows, missing, stopped, builds = [], [], None, set()
     for line in text.splitlines():
         if line.startswith("missing peer: "):

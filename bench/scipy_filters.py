@@ -1,8 +1,8 @@
 """Convolution and filters against NumPy and SciPy, in one process.
 
-Ours are the exports, called through ctypes with their arrays at hand; theirs make their output
-arrays. The cost of a call from Python, about a microsecond for ours and several for some of theirs,
-stands in both.
+Ours are the exports, called through ctypes with existing arrays; theirs allocate their
+output. Both include the cost of a call from Python, about a microsecond for ours and several for some of
+theirs.
 """
 
 import ctypes
@@ -21,7 +21,7 @@ from summary import print_summary
 
 
 def interleaved(ours, theirs):
-    """Seconds of both, as medians of interleaved rounds."""
+    """The seconds of both, as medians of interleaved rounds."""
     repeats = max(1, int(0.01 / max(seconds(theirs, 1), 1e-6)))
     rounds = [(seconds(ours, repeats), seconds(theirs, repeats)) for _ in range(7)]
     return [sorted(column)[3] for column in zip(*rounds)]
@@ -82,7 +82,7 @@ class Bench:
                 lambda: scipy.signal.sosfilt(sos, x))
 
     def medians(self, theirs):
-        # Ours works in place, so that each call is given a copy.
+        # Ours works in place, so each call gets a copy.
         x = self.noise.normal(size=1000000)
         signal = self.array(x)
         block = ctypes.cast(signal, ctypes.POINTER(ctypes.c_void_p))[0]

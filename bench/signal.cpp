@@ -1,5 +1,5 @@
 // Random numbers and waves against the limits of their recurrences: the sine's chain of products
-// and sums, the table's running sum, and a copy of the array for waves that know no chain.
+// and sums, the table's running sum, and a copy of the array for waves without a chain.
 // bench/generators.py compares with NumPy.
 
 #include "bench/timing.h"
@@ -20,8 +20,8 @@ using qx::bench::Ratios;
 
 constexpr int32_t n = 10000;
 
-// The chain that a sample of the sine depends on: a product and a sum each, of the cosine before
-// and of the sine after it, two samples in all.
+// The chain on which a sample of the sine depends: a product and a sum each for the cosine and then
+// for the sine, two samples in all.
 void SineChain(double k) {
     double sine = 0.0;
     double cosine = 1.0;

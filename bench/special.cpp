@@ -35,7 +35,7 @@ Arguments Draw(const SpecialRow &row) {
     return arguments;
 }
 
-// Nanoseconds per call, the least of a few runs, each peer interleaved with ours.
+// Nanoseconds per call: the minimum of a few runs, each peer interleaved with ours.
 std::vector<double> Times(const std::vector<SpecialRow::Function> &functions, const Arguments &at) {
     std::vector<double> best(functions.size(), 1e300);
     for (int round = 0; round < 7; ++round) {

@@ -1,7 +1,7 @@
 #!/usr/bin/python3
-"""Times of the complex Bessel and Airy functions over arrays from Python beside SciPy's: scaled values
-at 5000 random points of each region of the plane, in processor time of the calling thread, the best of
-interleaved rounds. SciPy's four Airy functions come from one call and are compared with all four of
+"""Times of the complex Bessel and Airy functions for arrays from Python, compared with SciPy's: scaled values
+at 5000 random points of each region of the plane, in processor time of the calling thread, minima of
+interleaved rounds. SciPy's four Airy functions come from one call, which is compared with all four of
 ours.
 """
 
@@ -26,8 +26,8 @@ BESSEL = (("J", special.jve), ("Y", special.yve), ("I", special.ive), ("K", spec
           ("H1", special.hankel1e), ("H2", special.hankel2e))
 AIRY = ("QX_CxAiryAi", "QX_CxAiryAiP", "QX_CxAiryBi", "QX_CxAiryBiP")
 REGIONS = ((0, 0, 0.01, 1), (0, 3, 0.1, 3), (0, 5, 2, 20), (0, 5, 25, 100), (5, 40, 10, 60),
-           (90, 300, 100, 600), (100, 500, 500, 1000))  # orders from, to, moduli from, to
-TURNING = ((10, 22), (22, 60), (60, 200), (200, 1000))  # orders from, to
+           (90, 300, 100, 600), (100, 500, 500, 1000))  # range of orders, range of moduli
+TURNING = ((10, 22), (22, 60), (60, 200), (200, 1000))  # range of orders
 AIRY_REGIONS = ((0.1, 1.5), (1.5, 9), (10, 100))
 
 
@@ -58,7 +58,7 @@ def turning_points(random, order):
 
 
 def bessel_cases(random):
-    """What a case is called, its orders and its arguments, those of I and K apart."""
+    """The name of a case, its orders and its arguments; I and K have separate arguments."""
     for low, high, near, far in REGIONS:
         z = on_rays(random, random.uniform(near, far, COUNT))
         yield f"order {low} to {high}, |z| {near} to {far}", random.uniform(low, high, COUNT), z, z

@@ -25,7 +25,7 @@ namespace qx::bench {
 
 namespace {
 
-// The result of a routine that gives it through a pointer.
+// The result of a routine that returns it through a pointer.
 template <class Routine, class... Arguments>
 double From(Routine routine, Arguments... arguments) {
     double value = 0;
@@ -39,8 +39,8 @@ int32_t Int(double x) { return static_cast<int32_t>(x); }
 
 } // namespace
 
-// The quantiles by bisection and the normal distribution by low-order formulas answer another
-// question than their peers do, so they have none; their revisions come last.
+// The quantiles by bisection and the normal distribution by low-order formulas are much less accurate than
+// other libraries' functions, so they have no peers; their revisions come last.
 std::vector<SpecialRow> SpecialGammaRows() {
     return {
         {"gamma, x to 33", 0.1, 33, 0, 0, QX_CALL(GammaFunction(a)),

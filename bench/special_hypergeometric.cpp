@@ -19,7 +19,7 @@ namespace {
 
 typedef std::vector<std::pair<const char *, SpecialRow::Function>> Peers;
 
-// x and b vary, a and c or the second parameter are fixed.
+// x and b vary; a and c, or the second parameter, are fixed.
 Peers GaussPeers() {
     Peers peers;
 #ifdef QX_PEER_GSL

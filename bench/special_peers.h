@@ -3,8 +3,8 @@
 
 #include "bench/special_rows.h"
 
-// How a row names its peers: QX_CALL(expression of a and b) for what is always there, QX_GSL and
-// QX_BOOST for what may not be installed. A file that uses one of these includes the peer's header
+// How a row names its peers: QX_CALL(expression of a and b) for libraries that are always there, QX_GSL and
+// QX_BOOST for those that may not be installed. A file that uses one of these includes the peer's header
 // under QX_PEER_GSL or QX_PEER_BOOST.
 
 #ifdef QX_PEER_GSL
@@ -32,7 +32,7 @@ namespace qx::bench {
 
 typedef std::vector<std::pair<const char *, SpecialRow::Function>> Peers;
 
-// The peers in the order GSL, C++ library, Boost; null where one lacks the function.
+// The peers in the order GSL, C++ library, Boost; null for a peer without the function.
 inline Peers Of(SpecialRow::Function gsl, SpecialRow::Function standard,
                 SpecialRow::Function boost) {
     Peers peers;

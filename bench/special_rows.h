@@ -7,20 +7,20 @@
 
 namespace qx::bench {
 
-// One function of the comparison: time per call over random arguments of its ordinary range.
+// One function of the comparison, timed on random arguments in its usual range.
 struct SpecialRow {
     typedef double (*Function)(double, double);
 
     std::string name;
     double firstLow, firstHigh;   // first argument, uniform
-    double secondLow, secondHigh; // second argument; equal where there is none
+    double secondLow, secondHigh; // second argument; equal if there is none
     Function ours;
     std::vector<std::pair<const char *, Function>> peers;
     bool firstIsInteger = false;
     bool secondIsInteger = false;
 };
 
-// Each file of rows offers one of these; special.cpp runs all of them.
+// Each file of rows defines one of these functions; special.cpp runs all of them.
 std::vector<SpecialRow> SpecialBesselRows();
 std::vector<SpecialRow> SpecialGammaRows();
 std::vector<SpecialRow> SpecialHypergeometricRows();

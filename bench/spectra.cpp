@@ -1,4 +1,4 @@
-// The power spectrum, with everything that the export does beside its frame, against the bare
+// The power spectrum, with everything that the export does except its frame, against the bare
 // real transform of the same length.
 
 #include "bench/host_memory.h"
@@ -16,9 +16,9 @@ using qx::bench::Keep;
 using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
-// The spectrum works in place, so each call gets the signal anew, at the same cost on both sides;
-// the time of the copy is taken off again. (A call on the result of the one before would read
-// what the processor is still storing.)
+// The spectrum works in place, so the signal is copied for each call, at the same cost on both sides,
+// and the time of the copy is subtracted. (A call on the previous result would read
+// data that the processor is still storing.)
 void Compare(int32_t n, Ratios &ratios) {
     const HostMemory signal(n);
     const HostMemory in(n);

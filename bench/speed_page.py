@@ -1,11 +1,11 @@
 #!/usr/bin/python3
-"""speed_page.py FOLDER PAGE: writes the page of speeds, and its figures beside it (PAGE with .json), from the
-runs that bench/record.py has written into FOLDER.
+"""speed_page.py FOLDER PAGE: writes the page of speeds, and its figures next to it (PAGE with .json), from the
+runs that bench/record.py has written to FOLDER.
 
-Of each family and width the two latest runs on one machine with one compiler and one state of the sources
-count. A row is their geometric mean; it is marked where they differ by more than 3 %, where there is but
-one, and where the mean has moved by more than 5 % since the page before on the same machine. A family that
-has not been run keeps the figures of the page before.
+For each family and width, the page uses the two latest runs on the same machine with the same compiler and state
+of the sources. A row is their geometric mean; it is marked if they differ by more than 3 %, if there is only
+one, or if the mean has changed by more than 5 % since the previous page on the same machine. A family without
+new runs keeps the figures of the previous page.
 """
 
 import itertools
@@ -17,20 +17,20 @@ from pathlib import Path
 AGREE, MOVED = 0.03, 0.05
 HEAD = """# Speed
 
-Written by `bench/run --all`, and not by hand. Each row is a geometric mean of the ratios time of ours / time of
-the peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer. Times are
-the shortest of interleaved runs; on a machine with a load of its own (below) single worst cases say little, and
-FFTW_MEASURE, which plans by timing and for ten seconds at most, chooses badly for the longest transforms.
+Written by `bench/run --all`, not by hand. Each row is a geometric mean of the ratios of our time to that of the
+peer, with one thread, and with plans and the like made outside the timed loop; below 1 is faster than the peer.
+Times are the minima of interleaved runs. On a loaded machine (see below), single worst cases say little, and
+FFTW_MEASURE, which plans by timing for at most ten seconds, chooses badly for the longest transforms.
 
-"Runs": empty where two runs of the benchmark agree within 3 %, else by how much they differ, or that there was
-one run alone; Mean is the geometric mean of the two, Worst the greater. "Before": the mean on the page before
-this one, where it has moved by more than 5 % on the same machine and width.
+"Runs" is empty if two runs of the benchmark agree within 3 %, and otherwise gives their difference, or says that
+there was only one run. "Mean" is the geometric mean of the two, "Worst" the larger. "Before" is the mean on the
+previous version of this page, if it has changed by more than 5 % on the same machine and width.
 """
 SAME = ("machine", "width", "compiler", "commit")
 
 
 def latest(folder):
-    """The runs that count: {(family, width): [the latest, and the one before it if it is of the same kind]}."""
+    """The runs to use: {(family, width): [the latest, and the one before it if that is comparable]}."""
     runs = {}
     for path in sorted(Path(folder).glob("*.json")):
         run = json.loads(path.read_text("utf-8"))
@@ -43,7 +43,7 @@ def latest(folder):
 
 
 def merged(runs):
-    """One family's figures from its runs."""
+    """The figures of a family from its runs."""
     first = runs[0]
     rows = {}
     for row in itertools.chain(*(run["rows"] for run in reversed(runs))):
@@ -61,7 +61,7 @@ def merged(runs):
 
 
 def compared(now, before):
-    """The figures with the mean of the page before in each row that has moved."""
+    """The figures, with the mean of the previous page in each row that has changed."""
     old = {}
     if before and before["machine"] == now["machine"]:
         old = {(row["what"], row["peer"]): row["mean"] for row in before["rows"]}
@@ -115,7 +115,7 @@ def main(folder, target):
     before = {(one["family"], one["width"]): one
               for one in (json.loads(kept.read_text("utf-8")) if kept.exists() else [])}
     now = {key: compared(merged(runs), before.get(key)) for key, runs in latest(folder).items()}
-    # Written again without a new run, the page compares with what it compared with before.
+    # If there is no new run, the page keeps its earlier comparison.
     for key, one in now.items():
         if key in before and before[key]["time"] == one["time"]:
             now[key] = before[key]

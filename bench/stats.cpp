@@ -1,8 +1,8 @@
 // Sorting, selection, the strictly sequential sums, and analysis of variance.
 //
 // bench_stats [GROUP...]: sort, median, sums, anova; all by default. Peers: std::sort and
-// std::nth_element on a copy, for the sums the latency limit of their order of summation, and for
-// the analysis of variance the same sums in doubles where the cells are known.
+// std::nth_element on a copy; for the sums, the latency limit of their order of summation; for
+// the analysis of variance, the same sums in doubles with known cells.
 
 #include "bench/timing.h"
 #include "stats/basic.h"
@@ -20,8 +20,8 @@ using qx::bench::Keep;
 using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
-// Different arrays of one kind and length, taken in turn, so that the branch predictor does not
-// learn a short one by heart.
+// Different arrays of the same kind and length, used in turn, so that the branch predictor cannot
+// learn a short one.
 class Pool {
 public:
     Pool(int32_t n, double (*value)(std::mt19937_64 &, int32_t i, int32_t n))
@@ -108,7 +108,7 @@ void Sort() {
         });
 }
 
-// The peer does what a median needs and no more: a copy of its own, but no look for NaN.
+// The peer does only what a median needs: it makes a copy but does not check for NaN.
 void Median() {
     CompareOnAllKinds(
         "median", "std::nth_element on a copy",
@@ -129,8 +129,8 @@ void Median() {
         });
 }
 
-// A sum in one accumulator from the first term to the last takes no less than one addition's
-// latency per term. The limit is measured as such a chain whose term stands in a register.
+// A sum in one accumulator from the first term to the last takes at least the latency of one addition
+// per term. The limit is measured by such a chain whose term is in a register.
 void AdditionChain(int32_t n, double term) {
     double sum = 0.0;
     for (int32_t i = 0; i < n; ++i) {
@@ -171,8 +171,8 @@ void Sums() {
     ratios.summary("latency of as many additions");
 }
 
-// Sums of squares of error and total by deviations from the means of known cells: two passes in
-// doubles, no labels, no checks.
+// The sums of squares of error and total from deviations from the means of known cells: two passes in
+// doubles, without labels and checks.
 double PlainSquares(const double *y, const int32_t *cellOf, int32_t n, std::vector<double> &means) {
     std::fill(means.begin(), means.end(), 0.0);
     double mean = 0.0;

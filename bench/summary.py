@@ -1,4 +1,4 @@
-"""The closing line of a benchmark in Python, as bench/timing.h prints it for those in C++."""
+"""The summary line of a benchmark in Python, in the form that bench/timing.h prints for those in C++."""
 
 import math
 import os
@@ -17,7 +17,7 @@ def width():
 
 
 def compiler():
-    """As the module itself tells."""
+    """The compiler that the module itself names."""
     module = Path(os.environ.get("QX_LIBRARY_DIR", "build/release")) / "libqxanalysis.so"
     comment = subprocess.run(["readelf", "-p", ".comment", module], capture_output=True, text=True)
     found = re.search(r"(GCC|clang).*?(\d+\.\d+\.\d+)", comment.stdout)
@@ -25,7 +25,7 @@ def compiler():
 
 
 def print_summary(what, peer, ratios):
-    """`ratios`: pairs of ours/peer and the name of the case."""
+    """Prints the summary of `ratios`, pairs of ours/peer and the name of the case."""
     mean = math.exp(sum(math.log(ratio) for ratio, _ in ratios) / len(ratios))
     worst, case = max(ratios)
     print(f"summary | {what} | {peer} | {mean:.4g} | {worst:.4g} | {case} | {len(ratios)} | "

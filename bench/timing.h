@@ -13,23 +13,22 @@
 #include <string>
 #include <vector>
 
-// What every benchmark uses.
+// Shared by all benchmarks.
 //
-// LeastTimes times contestants by their shortest of interleaved runs: each runs once in each round,
-// so that what disturbs the machine disturbs all of them alike, and what is left out are
-// disturbances.
+// LeastTimes times contestants by the shortest of interleaved runs: each runs once in each round, so that
+// disturbances of the machine affect all of them alike, and the minimum leaves the disturbances out.
 //
 // Ratios collects ours/peer over the cases of a group, each with its name:
 //
 //     Ratios over("DCT, even lengths");
 //     over.add(ours / theirs, "n 1024");
-//     over.print();                      // a line for the reader of the run
-//     over.summary("FFTW, estimate");    // the family's closing line, against whom
+//     over.print();                      // a readable line
+//     over.summary("FFTW, estimate");    // a line of the summary, with the name of the peer
 //
 // A program prints one summary for each peer (or kind of task), at its end. bench/run --all
-// collects them in docs/speed.md, whose rows are named by the group and the peer. A peer that is not installed is told by the summary of empty
-// Ratios, so call it in any case; bench/run names the package. A cell without a peer is printed by
-// Cell.
+// collects them in docs/speed.md, whose rows are named by the group and the peer. The summary of empty
+// Ratios reports a peer that is not installed, so always print it; bench/run names the package.
+// Cell formats a ratio, or its absence.
 
 namespace qx::bench {
 
@@ -46,7 +45,7 @@ double SecondsOf(std::size_t repeats, const Work &work) {
     return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
 }
 
-// So many repeats that a run takes about `seconds`; the work is warm afterwards.
+// The number of repeats for which a run takes about `seconds`; caches are warm afterwards.
 template <class Work>
 std::size_t RepeatsFor(double seconds, const Work &work) {
     for (std::size_t repeats = 1;; repeats *= 2) {
@@ -61,7 +60,7 @@ template <class... Work>
 std::array<double, sizeof...(Work)> LeastTimes(const Work &...contestants) {
     constexpr double runSeconds = 1e-4;
     constexpr int rounds = 25;
-    constexpr double longEnough = 1.0; // long work is content with three rounds
+    constexpr double longEnough = 1.0; // for long work, three rounds are enough
     const std::array<std::size_t, sizeof...(Work)> repeats = {
         RepeatsFor(runSeconds, contestants)...};
     std::array<double, sizeof...(Work)> least;
@@ -94,14 +93,14 @@ inline constexpr char compiler[] = "clang++ " __clang_version__;
 inline constexpr char compiler[] = "g++ " __VERSION__;
 #endif
 
-// A ratio in a table; there is none (0) where the peer is missing.
+// A ratio as a cell of a table; 0 means that the peer is missing.
 inline std::string Cell(double ratio) {
     char text[16];
     std::snprintf(text, sizeof text, "%5.2f", ratio);
     return ratio > 0 ? text : "    -";
 }
 
-// The ratios ours/peer of one group of cases, with their geometric mean and the worst of them.
+// The ratios ours/peer of a group of cases, with their geometric mean and the worst ratio.
 class Ratios {
 public:
     explicit Ratios(std::string name) : name_(std::move(name)) {}
@@ -137,7 +136,7 @@ private:
     int count_ = 0;
 };
 
-// Keeps a result, so that the compiler cannot drop the work that made it.
+// Keeps a result, so that the compiler cannot remove the work that produced it.
 template <class T>
 void Keep(const T &value) {
     asm volatile("" : : "r"(&value) : "memory");

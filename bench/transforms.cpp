@@ -76,7 +76,7 @@ int main(int argc, char **argv) {
         lengths.clear();
     for (int i = 1; i < argc; ++i)
         lengths.push_back(std::atoi(argv[i]));
-    std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
+    std::printf("our time; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
     for (const int32_t n : lengths)
         Compare(n, totals);
     totals.forwardEstimate.summary("FFTW, FFTW_ESTIMATE");

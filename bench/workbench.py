@@ -1,7 +1,7 @@
 """Windows through the Python package against SciPy, in one process.
 
-Ours is qx.call, copy into the host's block included; theirs is the generation of the window and the
-multiplication, which is what one writes without this library. Each line has the time of ours and the
+Ours is qx.call, including the copy into the host's block; theirs generates the window and
+multiplies, the code that one would write without this library. Each line has our time and the
 ratio ours/theirs; below 1 is faster.
 """
 
@@ -29,7 +29,7 @@ CASES = [("Hanning", 1, NAN, windows.hann, ()), ("Hamming", 2, NAN, windows.hamm
 
 
 def seconds(function, repeats, rounds):
-    """The best of some rounds: the machine's other work only ever adds."""
+    """The minimum of several rounds: other work on the machine only adds to the times."""
     best = math.inf
     for _ in range(rounds):
         start = time.perf_counter()

@@ -1,12 +1,12 @@
 # The public headers are the catalogue of the exports. From them come catalogue.json, which the
 # Python package, the reference pages and the conformance tests read, and the list of names that
-# the module shows. An export that cannot be read fails the build.
+# the module exports. An export that cannot be read fails the build.
 find_program(QX_PYTHON NAMES python3 PATHS /usr/bin NO_DEFAULT_PATH)
 if(NOT QX_PYTHON)
     find_program(QX_PYTHON NAMES python3 REQUIRED)
 endif()
 file(GLOB QX_HEADERS CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/include/qx/*.h)
-# The header that includes all others is written, too, and found beside them.
+# The build also writes the header that includes all others, and makes it available with them.
 set(QX_UMBRELLA ${PROJECT_BINARY_DIR}/include/qx/qx.h)
 set(QX_CATALOGUE ${PROJECT_BINARY_DIR}/catalogue.json)
 add_custom_command(OUTPUT ${QX_CATALOGUE} ${PROJECT_BINARY_DIR}/exports.map
@@ -20,7 +20,7 @@ add_custom_target(catalogue ALL
     DEPENDS ${QX_CATALOGUE} ${PROJECT_BINARY_DIR}/exports.map ${PROJECT_BINARY_DIR}/exports.def
         ${PROJECT_BINARY_DIR}/exports.codes ${QX_UMBRELLA})
 
-# The functions of the topics for C++, from the catalogue and the table that the Python topics call by.
+# The functions of the topics for C++, from the catalogue and the table of the Python topics.
 set(QX_CPP_TOPICS ${PROJECT_BINARY_DIR}/include/qx/qx.hpp)
 add_custom_command(OUTPUT ${QX_CPP_TOPICS}
     COMMAND ${QX_PYTHON} ${PROJECT_SOURCE_DIR}/tools/cpp_topics.py ${QX_CATALOGUE} ${QX_CPP_TOPICS}
@@ -30,7 +30,7 @@ add_custom_command(OUTPUT ${QX_CPP_TOPICS}
 add_custom_target(cpp_topics ALL DEPENDS ${QX_CPP_TOPICS})
 add_dependencies(cpp_topics catalogue)
 
-# Windows shows what is marked for export and nothing else; elsewhere the linker is told.
+# On Windows only functions marked for export are visible; elsewhere the linker gets a list.
 function(qx_show_exports_only target)
     add_dependencies(${target} catalogue)
     if(NOT WIN32)

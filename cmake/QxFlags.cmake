@@ -3,11 +3,11 @@
 add_library(qxflags INTERFACE)
 target_compile_options(qxflags INTERFACE -ffp-contract=off -fno-math-errno -fvisibility=hidden
     $<$<COMPILE_LANGUAGE:CXX>:-fvisibility-inlines-hidden> -Wall -Wextra -Wshadow)
-# Warnings of what is meant: element types lose their byte alignment as template arguments, and
-# vectors wider than the registers pass between functions of one build only.
+# Warnings about intended code: element types lose their byte alignment as template arguments, and
+# vectors wider than the registers are passed only between functions of the same build.
 target_compile_options(qxflags INTERFACE $<$<COMPILE_LANGUAGE:CXX>:-Wno-ignored-attributes> -Wno-psabi)
 
-# A constant argument must meet the module's own mathematics library, not the compiler's.
+# Functions of constants must be computed by the module's own mathematics library, not by the compiler.
 foreach(function IN ITEMS sin cos tan asin acos atan atan2 sinh cosh tanh exp exp2 expm1 log log2
         log10 log1p pow cbrt hypot fmod)
     target_compile_options(qxflags INTERFACE -fno-builtin-${function})
@@ -27,20 +27,20 @@ if(QX_SANITIZE)
     target_compile_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE} -fno-omit-frame-pointer
         -fno-sanitize-recover=all)
     target_link_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE})
-    # A straight-line transform has thousands of accesses: checked by calls, it compiles in a third
+    # A straight-line transform has thousands of accesses: with calls for the checks, it compiles in a third
     # of the time (gcc's own limit is 7000).
     if(QX_SANITIZE MATCHES address AND CMAKE_CXX_COMPILER_ID STREQUAL GNU)
         target_compile_options(qxflags INTERFACE
             $<$<COMPILE_LANGUAGE:CXX>:--param=asan-instrumentation-with-call-threshold=500>)
     endif()
 endif()
-# Where an inner routine's expectations are checked (frame/expects.h).
+# The builds that check the preconditions of inner routines (frame/expects.h).
 if(QX_SANITIZE)
     target_compile_definitions(qxflags INTERFACE QX_CHECKED)
 else()
     target_compile_definitions(qxflags INTERFACE $<$<CONFIG:Debug>:QX_CHECKED>)
 endif()
-# A number that no integer holds stops a debug build where it is converted.
+# In a debug build, converting a number that is out of the range of the integer type ends the program.
 if(NOT QX_SANITIZE)
     target_compile_options(qxflags INTERFACE
         $<$<CONFIG:Debug>:-fsanitize=float-cast-overflow -fsanitize-undefined-trap-on-error>)

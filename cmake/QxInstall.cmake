@@ -1,10 +1,10 @@
-# How other projects get the libraries: installed, by find_package(qxanalysis) or pkg-config, or as a
-# folder of theirs, by add_subdirectory. The targets have the same names either way:
+# How other projects use the libraries: installed, by find_package(qxanalysis) or pkg-config, or as a
+# subfolder, by add_subdirectory. The targets have the same names either way:
 # qxanalysis::qxanalysis is the module, qxanalysis::qxrt the stand-in host.
 include(GNUInstallDirs)
 include(CMakePackageConfigHelpers)
 
-# The headers as the users of a library see them. qx/qx.h is found in the build.
+# The include folders for users of the libraries. qx/qx.h is in the build folder.
 function(qx_public_headers target)
     target_include_directories(${target} SYSTEM INTERFACE
         "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include;${PROJECT_BINARY_DIR}/include>"

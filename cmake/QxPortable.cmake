@@ -1,18 +1,18 @@
-# The libraries as they are given to others: linked anew from the same objects, with the language's run-time
-# inside and with nothing of the C library that is newer than it has to be. In portable/, with all that a
-# wheel takes.
+# The libraries for other machines: linked again from the same objects, with the language's run-time linked
+# in and with the oldest possible versions of C library functions. They are in portable/, with everything that a
+# wheel needs.
 set(QX_PORTABLE ${PROJECT_BINARY_DIR}/portable)
 
 add_library(qxportable OBJECT EXCLUDE_FROM_ALL ${PROJECT_SOURCE_DIR}/src/frame/portable_linux.cpp)
 target_link_libraries(qxportable PRIVATE qxflags)
-# Parts of the C library since 2.34; with an elder one they have to be named.
+# Parts of the C library since 2.34; for an older one they must be named.
 foreach(library IN ITEMS libdl.so.2 libpthread.so.0)
     execute_process(COMMAND ${CMAKE_C_COMPILER} -print-file-name=${library}
         OUTPUT_VARIABLE found OUTPUT_STRIP_TRAILING_WHITESPACE)
     list(APPEND QX_ELDER_LIBRARIES ${found})
 endforeach()
 
-# qx_portable(NAME TARGET...): a second link of TARGET, after which it is called.
+# qx_portable(NAME TARGET...): links TARGET a second time, under the same name.
 function(qx_portable name)
     target_sources(${name} PRIVATE $<TARGET_OBJECTS:qxportable>)
     target_link_options(${name} PRIVATE -static-libstdc++ -static-libgcc
@@ -36,7 +36,8 @@ target_link_options(qxrt_portable PRIVATE -Wl,--exclude-libs,ALL)
 qx_portable(qxrt_portable)
 target_compile_options(qxportable PRIVATE -fvisibility=hidden)
 
-# The program behind `python3 -m qx verify`. A program starts by the C library that it is linked with: 2.34.
+# The program behind `python3 -m qx verify`. The start-up code of a program needs the version of the C library with
+# which it is linked: 2.34.
 add_executable(print_hashes_portable EXCLUDE_FROM_ALL ${PROJECT_SOURCE_DIR}/tests/conformance/print_hashes.cpp)
 set_target_properties(print_hashes_portable PROPERTIES OUTPUT_NAME print_hashes ENABLE_EXPORTS ON)
 target_link_libraries(print_hashes_portable PRIVATE qxanalysis_portable qxtestsupport qxrecipes)

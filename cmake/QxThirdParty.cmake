@@ -1,7 +1,7 @@
 # The libraries that the module carries: the mathematics library, and LAPACK with its BLAS. ./setup builds them
 # from pinned sources with one compiler and one set of flags for every configuration of a target, so
-# that every export gives the same bits in all of them; here they are only looked for.
-if(NOT DEFINED QX_SETUP_TARGET) # which the files for other targets set
+# that every export gives the same bits in all of them; this file only looks for them.
+if(NOT DEFINED QX_SETUP_TARGET) # the files for other targets set it
     set(QX_SETUP_TARGET linux)
 endif()
 set(setup ./setup)
@@ -11,7 +11,7 @@ foreach(pair IN ITEMS "i686-mingw win32" "x86_64-mingw win64" "arm64 arm64")
         set(setup "./setup ${CMAKE_MATCH_2}")
     endif()
 endforeach()
-# What is looked for depends on all of these.
+# The libraries depend on all of these.
 file(GLOB recipes CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/tools/setup/*
     ${PROJECT_SOURCE_DIR}/tools/setup/patches/*/*.patch ${PROJECT_SOURCE_DIR}/src/mathlib/*.c ${PROJECT_SOURCE_DIR}/src/mathlib/pair.h)
 list(FILTER recipes EXCLUDE REGEX "/patches$")
@@ -20,7 +20,7 @@ set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${recipes})
 set(QX_SETUP_TARGET_libm ${QX_SETUP_TARGET})
 set(QX_SETUP_TARGET_lapack ${QX_SETUP_TARGET})
 if(QX_SANITIZE MATCHES address)
-    set(QX_SETUP_TARGET_lapack linux-asan) # so that compiled Fortran is watched, too
+    set(QX_SETUP_TARGET_lapack linux-asan) # so that compiled Fortran is checked, too
     set(setup "./setup all")
 endif()
 foreach(library IN ITEMS libm lapack)
@@ -35,12 +35,12 @@ foreach(library IN ITEMS libm lapack)
     set_target_properties(qx${library} PROPERTIES IMPORTED_LOCATION ${archive})
     set(QX_FOLDER_${library} ${folder})
 endforeach()
-# Of LAPACK. One source includes it: no other compilation depends on where it is.
+# A header of LAPACK. Only one source includes it, so no other compilation depends on its path.
 set(QX_LAPACK_HEADERS ${QX_FOLDER_lapack}/include)
-# The core has what compiled Fortran asks for, and the routines of BLAS that are ours.
+# The core provides the run-time functions that compiled Fortran calls, and our own routines of BLAS.
 target_link_libraries(qxlapack INTERFACE qxcore qxlibm)
 
-# Their licences, which are installed with the module (NOTICE.md): the name says of what.
+# Their licences, which are installed with the module (NOTICE.md), under the name of the library.
 set(QX_LICENCES ${PROJECT_BINARY_DIR}/licences)
 file(REMOVE_RECURSE ${QX_LICENCES})
 foreach(pair IN ITEMS libm:musl lapack:lapack)

@@ -1,5 +1,5 @@
-# Windows on the processor CMAKE_SYSTEM_PROCESSOR. The tests need std::thread, so the compiler is the one
-# with POSIX threads; the module is linked with the run-time of the other one and so can hold no trace of
+# Windows on the processor CMAKE_SYSTEM_PROCESSOR. The tests need std::thread, so the compiler is the variant
+# with POSIX threads; the module is linked with the run-time of the other variant and so cannot contain any part of
 # them.
 set(CMAKE_SYSTEM_NAME Windows)
 set(QX_TRIPLE ${CMAKE_SYSTEM_PROCESSOR}-w64-mingw32)
@@ -12,6 +12,6 @@ set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
 set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
 set(CMAKE_CROSSCOMPILING_EMULATOR ${CMAKE_CURRENT_LIST_DIR}/../tools/wine-run)
-# No run-time of the compiler or the language as a DLL.
+# Do not link any run-time of the compiler or the language as a DLL.
 set(CMAKE_EXE_LINKER_FLAGS_INIT -static)
 set(CMAKE_SHARED_LINKER_FLAGS_INIT -static)

@@ -1,5 +1,5 @@
-/* The whole road of a call: make an array, call an export, read the result, and show the text of
-   a failure. The module finds the stand-in host by itself, because this program is linked to it.
+/* All the steps of a call: create an array, call an export, read the result, and print the text of a
+   failure. The module finds the stand-in host because this program is linked to it.
 
        cc -std=c11 -Iinclude -Ibuild/release/include examples/first_call.c -Lbuild/release -lqxrt -lqxanalysis */
 
@@ -30,7 +30,7 @@ int main(void) {
     printf("mean      %g\n", mean);
     printf("variance  %g\n", moment(x, 2));
 
-    /* An output is an array too; the export gives it the size it needs. */
+    /* An output is also an array; the export resizes it as needed. */
     err = ModeH(x, 0, modes);
     printf("modes    ");
     for (int32_t i = 0; i < (*modes)->dimSize; ++i)

@@ -1,4 +1,4 @@
-// The same road as first_call.c with the C++ layer: arrays clean up after themselves and a
+// The same steps as in first_call.c with the C++ layer: arrays release their memory and a
 // failure is an exception.
 
 #include "qx/host.hpp"

@@ -1,5 +1,5 @@
-// Ten tasks of engineers with the functions by topics. Each prints how far its result is from the truth, and
-// the program fails where that is more than it may be.
+// Ten engineering tasks with the functions by topics. Each task prints the error of its result, and the program
+// fails if an error exceeds its limit.
 //
 //     c++ -std=c++20 -Iinclude -Ibuild/release/include examples/ten_tasks.cpp -Lbuild/release -lqxanalysis -lqxrt
 
@@ -26,7 +26,7 @@ Samples Made(std::size_t n, const std::function<double(double)> &value) {
     return x;
 }
 
-// The largest difference, without some values at both ends.
+// The largest difference, ignoring some values at both ends.
 double Apart(std::span<const double> x, std::span<const double> y, std::size_t ends = 0) {
     double most = x.size() == y.size() ? 0 : INFINITY;
     for (std::size_t i = ends; i + ends < std::min(x.size(), y.size()); ++i)
@@ -34,7 +34,7 @@ double Apart(std::span<const double> x, std::span<const double> y, std::size_t e
     return most;
 }
 
-// A lowpass without delay: a slow wave stays, a disturbance at 200 Hz goes.
+// A lowpass without delay: keeps a slow wave and removes a disturbance at 200 Hz.
 double DesignAndApply() {
     const Samples truth = Made(4001, [](double i) { return std::sin(2 * pi * 2 * i / fs); });
     Samples x = truth;
@@ -44,7 +44,7 @@ double DesignAndApply() {
     return Apart(qx::filters::zero_phase(x, a, b), truth, 100);
 }
 
-// A tone at 48 kHz to 44.1 kHz, through a windowed lowpass.
+// Converts a tone from 48 kHz to 44.1 kHz through a windowed lowpass.
 double ResampleAudio() {
     const Samples x = Made(48000, [](double i) { return std::sin(2 * pi * 5000 * i / 48000); });
     const int32_t taps = 2 * 10 * 160 + 1;
@@ -59,7 +59,7 @@ double ResampleAudio() {
     return Apart(found, due, 2000);
 }
 
-// The places of pulses, between the samples.
+// Locates pulses to a fraction of a sample.
 double FindPeaks() {
     Samples places(12);
     for (std::size_t i = 0; i < 12; ++i)
@@ -74,7 +74,7 @@ double FindPeaks() {
     return Apart(finder.last(x).locations, places);
 }
 
-// A decay with a rate that is known to be at least 1.
+// Fits a decay whose rate is known to be at least 1.
 double BoundedExponential() {
     const Samples t = Made(4000, [](double i) { return i / fs; });
     const Samples y = Made(4000, [](double i) { return 3 * std::exp(-1.5 * i / fs) + 0.2; });
@@ -91,7 +91,7 @@ qx::Matrix<double> Hilbertlike(std::size_t n) {
     return a;
 }
 
-// A system of 100 equations.
+// Solves a system of 100 equations.
 double Solve() {
     const auto a = Hilbertlike(100);
     const Samples x = Made(100, [](double i) { return std::sin(i); });
@@ -116,7 +116,7 @@ double Eigenvalues() {
     return Apart(found, Made(20, [](double i) { return 2 * std::sin(pi * (i + 1) / 42); }));
 }
 
-// The amplitude of a tone between two lines.
+// The amplitude of a tone between two lines of the spectrum.
 double WindowedSpectrum() {
     const Samples x = Made(4000, [](double i) { return 2 * std::sin(2 * pi * 100.1 * i / fs); });
     const Samples window = qx::windows::apply(Samples(4000, 1.0), qx::windows::Selector::flat_top);
@@ -129,7 +129,7 @@ double WindowedSpectrum() {
     return std::abs(2 * most / std::accumulate(window.begin(), window.end(), 0.0) / 2 - 1);
 }
 
-// From an acceleration with an offset to the displacement of what swings up and comes to rest.
+// From an acceleration with an offset to the displacement of a motion that swings up and comes to rest.
 double Displacement() {
     const double w = 2 * pi * 5, v = pi / 4;
     const auto swing = [&](double t) { return std::sin(w * t); };
@@ -150,7 +150,7 @@ double Displacement() {
     return Apart(motion, truth);
 }
 
-// The delay of two records of noise, to a sample.
+// The delay between two records of noise, to the nearest sample.
 double Delay() {
     const Samples noise = qx::noise::gaussian(5000, 7);
     const std::span<const double> x(noise.data() + 100, 4000), y(noise.data() + 93, 4000);
@@ -159,7 +159,7 @@ double Delay() {
     return std::abs(static_cast<double>(best) - (4000 - 1) - 7);
 }
 
-// Blocks as they come, with the bits of the whole.
+// Filters blocks of any size; the results have the bits of the whole signal.
 double StreamingFilter() {
     const auto [a, b, zeros, poles, gain] = qx::filters::elliptic(100, 0.1, 60, 5, fs);
     const Samples x = qx::noise::gaussian(4000, 3);

@@ -10,12 +10,12 @@
 
 namespace {
 
-// A block of memory, front to back: what malloc gave, unused bytes, this, the dimension fields,
-// and the elements at a multiple of `elementAlignment`.
+// A block of memory, from the start: the address that malloc returned, unused bytes, this record,
+// the dimension fields, and the elements at a multiple of `elementAlignment`.
 struct Front {
     void *memory;
     std::size_t capacity; // bytes from the first dimension field on
-    bool reserved;        // none of them are given back before the array is
+    bool reserved;        // no bytes are freed before the array is
 };
 
 constexpr std::size_t elementAlignment = 64;
@@ -56,12 +56,12 @@ Front FrontOf(const void *block) {
     return front;
 }
 
-// Large blocks are promised only where the machine has the memory: otherwise the system gives out
-// more than there is, and ends some program, or stands still, when it is touched. What was promised
-// and is not yet touched still counts as available there, so the sum of the large blocks counts as
-// well.
+// Large blocks are granted only if the machine has the memory: otherwise the system grants more
+// than there is, and ends some program, or stalls, when the memory is touched. Memory that was
+// granted but is not yet touched still counts as available to the system, so the sum of the large
+// blocks is limited as well.
 constexpr std::size_t largeFrom = std::size_t{256} << 20;
-constexpr uint64_t partKept = 16; // of the memory, for the work of the call and for others
+constexpr uint64_t partKept = 16; // share left for the work of the call and for others
 std::atomic<std::size_t> largeBlocks{0};
 
 bool TakeLarge(std::size_t size) {
@@ -76,7 +76,7 @@ bool TakeLarge(std::size_t size) {
 
 void GiveLarge(std::size_t size) { largeBlocks.fetch_sub(size, std::memory_order_relaxed); }
 
-// The address of the dimension fields of a block for so many elements, or null.
+// The address of the dimension fields of a block of `count` elements, or null.
 void *NewBlock(int32_t numDims, uint64_t count, std::size_t elementSize, bool cleared) {
     const std::size_t fields = FieldsSize(numDims);
     const std::size_t overhead = sizeof(Front) + fields + elementAlignment;
@@ -142,7 +142,7 @@ Array2DHandle New2D(std::size_t elementSize, int32_t rows, int32_t cols, const v
     return static_cast<Array2DHandle>(NewArray(2, elementSize, sizes, elements));
 }
 
-// Of the dimension fields and the elements that they count.
+// The size of the dimension fields and of the elements that they count.
 std::size_t UsedBytes(const void *block, int32_t numDims, std::size_t elementSize) {
     int32_t sizes[2] = {1, 1};
     std::memcpy(sizes, block, FieldsSize(numDims));

@@ -8,10 +8,10 @@ namespace qx::host {
 // The machine's memory, or that of the container in which the process runs.
 struct Memory {
     uint64_t total;
-    uint64_t available; // without taking from other programs what they use
+    uint64_t available; // without memory that other programs use
 };
 
-// All that can be counted where nothing is known.
+// The largest possible numbers if nothing is known.
 Memory PhysicalMemory();
 
 } // namespace qx::host

@@ -11,7 +11,8 @@
 namespace qx::host {
 namespace {
 
-// The text of a small file of the kernel, empty where there is none. No stdio, which takes memory.
+// The text of a small file of the kernel, empty if there is no such file. Does not use stdio, which
+// allocates memory.
 struct Text {
     explicit Text(const char *path) {
         const int file = open(path, O_RDONLY | O_CLOEXEC);
@@ -23,7 +24,7 @@ struct Text {
     char bytes[4096];
 };
 
-// The number behind a label, or `unknown`.
+// The number after a label, or `unknown`.
 uint64_t NumberAfter(const char *text, const char *label, uint64_t unit, uint64_t unknown) {
     const char *const found = std::strstr(text, label);
     if (found == nullptr)
@@ -43,7 +44,7 @@ Memory PhysicalMemory() {
     if (limit == UINT64_MAX)
         return memory;
     const uint64_t used = NumberAfter(Text("/sys/fs/cgroup/memory.current").bytes, "", 1, 0);
-    // Copies of files, which the kernel drops when it needs the place.
+    // Cached copies of files, which the kernel drops when it needs the memory.
     const uint64_t files = NumberAfter(Text("/sys/fs/cgroup/memory.stat").bytes, "\nfile ", 1, 0);
     memory.total = std::min(memory.total, limit);
     memory.available =

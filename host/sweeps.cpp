@@ -15,12 +15,12 @@ struct Sweep {
     QXHostSweep procedure;
     void *argument;
     int32_t mode;
-    uint64_t round; // the last run that has called it, or during which it was registered
+    uint64_t round; // the last run that called it, or in which it was registered
 };
 
-// The registered sweeps, by their numbers in the order of registration. A sweep is called with the
-// lock released, because it may register or withdraw others; a run therefore looks each time for
-// the next number that it has not called yet.
+// The registered sweeps, numbered in the order of registration. A sweep is called with the lock
+// released, because it may register or withdraw others; therefore a run searches each time for the
+// next number that it has not called yet.
 class Registry {
 public:
     int32_t change(QXHostSweep procedure, void *argument, int32_t mode) {
@@ -41,7 +41,7 @@ public:
         return QXHostDone;
     }
 
-    // Calls every sweep once, and forgets those for objects.
+    // Calls every sweep once, and removes those that belong to objects.
     int32_t runAll() {
         const uint64_t round = nextRound();
         uint64_t number = 0;
@@ -51,7 +51,7 @@ public:
         return called;
     }
 
-    // The same for those of one object.
+    // The same for the sweeps of one object.
     int32_t runFor(void *object) {
         const uint64_t round = nextRound();
         int32_t called = 0;
@@ -97,7 +97,8 @@ private:
         return ++round_;
     }
 
-    // The first from `number` on that this run has not called; `number` moves behind it.
+    // Takes the first sweep from `number` on that this run has not called; sets `number` to the one
+    // after it.
     bool takeFrom(uint64_t &number, uint64_t round, Sweep &taken) {
         const Hold hold(lock_);
         for (auto at = sweeps_.lower_bound(number); at != sweeps_.end(); ++at) {
@@ -138,7 +139,7 @@ private:
     uint64_t round_ = 0;
 };
 
-// Never destroyed: what cleans up at exit may still withdraw its sweep.
+// Never destroyed: destructors that run at exit may still withdraw their sweeps.
 Registry &Sweeps() {
     static Registry *registry = new Registry;
     return *registry;

@@ -89,7 +89,7 @@ class CSharp(Language):
 class Julia(Language):
     DUE = ["mean 5.0", "modes [4.0] (code 0)", "order 0: ErrOrderNotPositive"]
 
-    @unittest.skipUnless(installed("julia"), "there is no julia; Debian 12 has none")
+    @unittest.skipUnless(installed("julia"), "julia is not installed; Debian 12 has no package")
     def test_first_call(self):
         self.assertEqual(self.run_in("julia", "--project=julia", "julia/first_call.jl"), self.DUE)
 
@@ -97,7 +97,7 @@ class Julia(Language):
     def test_first_call_with_the_julia_of_debian_11(self):
         made = subprocess.run([SOURCE / "tools/setup/other-root", "bullseye"], stdout=subprocess.PIPE, text=True)
         if made.returncode:
-            self.skipTest("a root of bullseye cannot be made here")
+            self.skipTest("a bullseye root cannot be made here")
         root = Path(made.stdout.strip())
         subprocess.run(["cmake", "--build", BUILD, "--target", "portable"], check=True, stdout=subprocess.DEVNULL)
         for source, name in ((self.folder, "bindings"), (BUILD / "portable", "libraries")):
@@ -106,7 +106,7 @@ class Julia(Language):
         inside = """which julia >/dev/null || { apt-get update -qq && apt-get install -y -qq --no-install-recommends julia
             } >/tmp/julia.log 2>&1
             cd /opt/bindings && HOME=/tmp QX_LIBRARY_DIR=/opt/libraries julia --project=julia julia/first_call.jl"""
-        # Julia needs /proc; what is mounted in a namespace of its own is gone with it.
+        # Julia needs /proc. What is mounted in a separate namespace disappears with it.
         shown = self.run_in("unshare", "--mount", "--propagation", "private", "sh", "-ec", f"""
             mount -t proc proc {root}/proc && mount --bind /dev {root}/dev
             DEBIAN_FRONTEND=noninteractive exec env -u LD_LIBRARY_PATH chroot {root} sh -ec '{inside}'""")
@@ -120,7 +120,8 @@ class Octave(Language):
         self.run_in("mkoctfile", "-std=c++20", "-O0", "octave/qx.cc", f"-I{SOURCE}/include", f"-I{BUILD}/include",
                     f"-L{BUILD}", "-lqxanalysis", "-lqxrt")
         found = self.run_in("octave-cli", "--path", self.folder, "octave/first_call.m")
-        self.assertEqual(found, [*DUE, "Moment_head: The order must be at least 1. (ErrOrderNotPositive)", "residual 0"])
+        self.assertEqual(found, [*DUE, "Moment_head: The order, degree or number of taps is out of range; it must be "
+                                 "at least 1. (ErrOrderNotPositive)", "residual 0"])
         refused = subprocess.run(["octave-cli", "--path", self.folder, "--eval", 'qx ("Mean_head", 1, 2)'],
                                  env=ENVIRONMENT, capture_output=True, text=True)
         self.assertIn("Mean_head: 1 inputs are needed", refused.stderr)

@@ -1,4 +1,4 @@
-"""The reader of the public headers: what it makes of good ones and where it refuses bad ones."""
+"""The reader of the public headers: what it extracts from good headers and which bad headers it rejects."""
 
 import json
 import re
@@ -14,7 +14,7 @@ import catalogue  # noqa: E402
 
 SHAPES = """#ifndef GUARD
 #define GUARD
-/* Shapes of all kinds: QX_API in a comment is none.
+/* Shapes of all kinds: QX_API in a comment does not count.
      Indented. */
 #include "qx/types.h"
 QX_BEGIN_DECLS
@@ -112,7 +112,7 @@ class Reading(unittest.TestCase):
             "values": [[0, ""], [4, "that one, the first"], [5, "the other"]]}})
         self.assertEqual(result["families"], [{
             "name": "shapes", "header": "qx/shapes.h",
-            "introduction": "Shapes of all kinds: QX_API in a comment is none.\nIndented."}])
+            "introduction": "Shapes of all kinds: QX_API in a comment does not count.\nIndented."}])
         self.assertEqual(result["codes"]["ErrOutOfMemory"], -20001)
 
     def test_files_written(self):
@@ -157,7 +157,7 @@ class TakingOver(unittest.TestCase):
 
 
 class NaN(unittest.TestCase):
-    def test_is_read_and_taken_over_where_the_argument_is(self):
+    def test_is_read_and_inherited_with_the_argument(self):
         text = """/** As x is NaN: 0.
     NaN: x, in.level refused with ErrEmptyInput or
     in no result; in in some results. More. */ QX_API void first(double x, double in);

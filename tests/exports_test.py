@@ -1,5 +1,5 @@
-"""The boundary of the module file: it shows what its headers declare, no name more and no name
-less, and takes from outside only what every process of its platform has."""
+"""The boundary of the module file: it exports exactly the names that its headers declare, and imports only what
+every process of its platform has."""
 
 import json
 import re
@@ -12,7 +12,7 @@ ON_WINDOWS = LIBRARY.endswith(".dll")
 MATHEMATICS = """sin cos sincos tan asin acos atan atan2 sinh cosh tanh exp exp2 expm1 log log2
     log10 log1p pow cbrt hypot fmod floor ceil trunc round rint tgamma lgamma erf erfc
     __powidf2 __muldc3 __divdc3 __multf3 __divtf3""".split()
-# A product and a sum with one rounding, of x86 and of ARM, by the names of the disassembler.
+# Fused multiply-add instructions of x86 and of ARM, by the names of the disassembler.
 FUSED = re.compile(r"^ +[0-9a-f]+:\t(vfn?m(?:add|sub)\w*|fn?m(?:add|sub)|fml[as]\w*|fcmla)\s", re.MULTILINE)
 
 
@@ -62,10 +62,10 @@ class Boundary(unittest.TestCase):
         self.assertEqual(sorted(self.taken & set(MATHEMATICS)), [])
 
     def test_fuses_no_product_with_a_sum(self):
-        """Bits would depend on the compiler, and a processor may have no such instruction. What has been
-        linked into the module counts as well."""
+        """Bits would depend on the compiler, and a processor may lack such instructions. Libraries linked into the
+        module are checked as well."""
         if self.taken & {"__asan_init", "__tsan_init"}:
-            self.skipTest("an instrumented module is three times as long, and the flags are the same")
+            self.skipTest("an instrumented module is three times as large, and the flags are the same")
         code = output(OBJDUMP, "-d", "--no-show-raw-insn", LIBRARY)
         self.assertGreater(len(re.findall(r"\tv?(?:mulpd|fmul)\s", code)), 100, "not disassembled")
         self.assertEqual(sorted(set(FUSED.findall(code))), [])

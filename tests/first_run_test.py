@@ -1,10 +1,10 @@
-"""What a new user sees of the set-up and the first build: what is missing, how far it is, why it fails,
-that it ends when it is told to, and that it builds from the pinned sources and no others.
+"""The set-up and the first build as a new user sees them: they report what is missing, how far they are and why
+they fail, end when they are interrupted, and build from the pinned sources only.
 
     first_run_test.py SOURCE [TEST...]
 
-The tests named Terminal need a pseudo-terminal; where there is none they end with 77, which is the
-mark of a test that has not run.
+The tests named Terminal need a pseudo-terminal; without one they end with status 77, which marks a test as not
+run.
 """
 
 import contextlib
@@ -26,7 +26,7 @@ from pathlib import Path
 
 SOURCE = Path(sys.argv.pop(1)).resolve()
 SKIPPED = 77
-# The promise is a second; other tests run at the same time.
+# The documented limit is a second; other tests run at the same time.
 PROMPT = 2.0
 
 
@@ -40,19 +40,19 @@ SOURCES = Path(os.environ.get("QX_SOURCES", machine_cache() / "sources"))
 
 
 def processes_with(text):
-    """The processes that have the text in their environment."""
+    """The processes whose environment contains the text."""
     found = []
     for entry in Path("/proc").glob("[0-9]*"):
         with contextlib.suppress(OSError):
             if text.encode() in (entry / "environ").read_bytes():
                 command = (entry / "cmdline").read_bytes().replace(b"\0", b" ").decode(errors="replace")
-                if command:  # a process that has ended is still listed, without one
+                if command:  # a process that has ended is still listed, with an empty command line
                     found.append(f"{entry.name}: {command[:100]}")
     return found
 
 
 class Terminal:
-    """A command on a terminal of its own."""
+    """A command on its own pseudo-terminal."""
 
     def __init__(self, *command, **more):
         self.master, slave = pty.openpty()
@@ -99,13 +99,13 @@ class Case(unittest.TestCase):
             self.environment.pop(name, None)
 
     def program(self, name, text):
-        """A program of this name that is found before the machine's."""
+        """Makes a program of this name that precedes the machine's on the path."""
         path = self.programs / name
         path.write_text(f"#!/bin/bash\n{text}\n", "utf-8")
         path.chmod(path.stat().st_mode | stat.S_IXUSR)
 
     def take_from_cache(self, *names):
-        """What the machine has of these is there from the start."""
+        """Links these parts of the machine's cache into the test's cache."""
         self.cache.mkdir(exist_ok=True)
         for name in names:
             (self.cache / name).symlink_to(SOURCES if name == "sources" else machine_cache() / name)
@@ -117,7 +117,7 @@ class Case(unittest.TestCase):
         return copy
 
     def copied_setup(self):
-        """What the scripts of the set-up consist of."""
+        """A copy of the set-up scripts and of what they use."""
         copy = self.folder / "copy"
         for part in ("tools/setup", "src/mathlib"):
             shutil.copytree(SOURCE / part, copy / part)
@@ -181,7 +181,7 @@ class Failing(Case):
             ran = self.run_script(SOURCE / "tools/setup" / script, "linux")
             self.assertEqual(ran.returncode, 1)
             self.assertIn("\nx:1:1: Error: made up\n", ran.stderr)
-            self.assertRegex(self.last_line(ran), rf"failed: all of it is in .*{script}-linux\.log")
+            self.assertRegex(self.last_line(ran), rf"failed: the whole output is in .*{script}-linux\.log")
             self.assertEqual(list(self.cache.glob(f"{script}/*/*.a")), [])
 
     def test_the_first_run_shows_them_too(self):
@@ -193,7 +193,7 @@ class Failing(Case):
         self.assertRegex(self.last_line(ran), r"\[run\] setting up failed: .*build/setup\.log")
 
 
-class Telling(Case):
+class Reporting(Case):
     def test_nothing_is_silent_without_a_terminal(self):
         script = f'told=$((SECONDS - 9)); watched work "{self.folder}/log" '
         slow = "bash -c 'echo [1/3]; echo [2/3]; sleep 0.5; exit 3'"
@@ -203,19 +203,18 @@ class Telling(Case):
         ran = self.run_script(*self.watched(f'watched work "{self.folder}/log" true'))
         self.assertEqual((ran.returncode, ran.stdout, ran.stderr), (0, "", ""))
 
-    def test_waiting_for_another_script_is_told(self):
+    def test_waiting_for_another_script_is_reported(self):
         first = subprocess.Popen(self.watched("lock_cache thing; echo; sleep 1"), env=self.environment,
                                  stdout=subprocess.PIPE)
         first.stdout.readline()
         ran = self.run_script(*self.watched("lock_cache thing"))
-        self.assertRegex(ran.stderr, r"waiting for another script, which has .*thing\.lock")
+        self.assertRegex(ran.stderr, r"waiting for another script, which holds .*thing\.lock")
         first.communicate()
 
 
 class Stopping(Case):
     def stopped(self, wait_for, stop, *command):
-        """Starts a command, stops it when the pattern is in a log or a message, and returns what it
-        wrote."""
+        """Starts a command, stops it when the pattern appears in a log or a message, and returns its output."""
         output = self.folder / "output"
         with output.open("w") as file:
             process = subprocess.Popen(list(map(str, command)), env=self.environment, stdout=file,
@@ -243,7 +242,7 @@ class Stopping(Case):
             self.assertEqual(list(self.cache.glob("lapack/*/*.a")), [])
             log.unlink()
 
-    def test_a_command_that_will_not_end_is_ended(self):
+    def test_a_command_that_ignores_signals_is_killed(self):
         started = self.folder / "started"
         program = f'trap "" TERM INT; touch "{started}"; while :; do sleep 9; done'
         deaf = f"watched deaf '{self.folder}/log' bash -c '{program}'"
@@ -251,7 +250,7 @@ class Stopping(Case):
         self.assertEqual(status, -signal.SIGTERM)
         self.nothing_runs()
 
-    def test_what_is_half_fetched_is_fetched_again(self):
+    def test_a_partial_download_is_fetched_again(self):
         half = "touch half; sleep 60"
         self.program("apt-get", f'case "$*" in *download-only*musl=*) {half} ;; esac')
         fetched = self.cache / "sources.work/half"
@@ -266,7 +265,7 @@ class Stopping(Case):
 
 
 class Pinned(Case):
-    """Only the pinned sources, with patches that apply, become libraries, and cmake makes none."""
+    """Libraries are built only from the pinned sources, with patches that apply, and never by cmake."""
 
     def setUp(self):
         super().setUp()
@@ -298,8 +297,8 @@ class Pinned(Case):
         self.refused(self.run_script(*libm), f"not the pinned file: {archive}", refused)
         archive.unlink()
         self.refused(self.run_script(*libm), f"missing: {archive}", refused)
-        self.assertFalse(self.called.exists(), "the folder stands for the network")
-        # Fetched ones, too; what was fetched does not stay.
+        self.assertFalse(self.called.exists(), "the folder replaces the network")
+        # Fetched sources are refused, too, and deleted.
         archive.write_bytes(whole[:-1])
         del self.environment["QX_SOURCES"]
         self.program("apt-get", f'case "$*" in *download-only*) cp "{offline}"/* . ;; esac')
@@ -317,14 +316,14 @@ class Pinned(Case):
         setup = self.copied_setup()
         self.take_from_cache("sources")
         (setup / "patches/musl").mkdir(parents=True)
-        # The first line is another one in the source: patch would allow for it.
+        # The first line differs from the source; patch alone would tolerate that.
         (setup / "patches/musl/made-up.patch").write_text(
             "--- a/src/math/fmax.c\n+++ b/src/math/fmax.c\n@@ -1,3 +1,3 @@\n #include <maths.h>\n \n"
             "-double fmax(double x, double y)\n+double fmax(double y, double x)\n", "utf-8")
         self.refused(self.run_script(setup / "libm", "linux"), "FAILED",
                      "made-up.patch does not apply to musl")
 
-    def test_two_at_once_build_once_from_a_folder(self):
+    def test_two_concurrent_runs_build_once_from_a_folder(self):
         self.offline()
         command = [SOURCE / "tools/setup/libm", "linux"]
         self.assertEqual(self.run_script(*command, "find").returncode, 1)
@@ -342,7 +341,7 @@ class Pinned(Case):
         self.assertEqual(archive.read_bytes(), built.read_bytes(), "the machine's own")
         self.assertIn("Permission is hereby granted", (archive.parent / "licences/COPYRIGHT").read_text())
 
-    def test_whatever_the_bits_rest_on_is_in_the_name(self):
+    def test_the_name_depends_on_all_that_affects_the_bits(self):
         self.take_from_cache("libm")
         setup = self.copied_setup()
 
@@ -376,10 +375,10 @@ class Pinned(Case):
 
 
 class Machine(Case):
-    """Faults of the machine: one clear line, and nothing half-made is taken for whole."""
+    """Faults of the machine: they are reported in one clear line, and nothing incomplete is used as if complete."""
 
     def fake_build(self):
-        """A copy whose build is a program that notes when it begins and ends."""
+        """A copy whose build is a program that records when it begins and ends."""
         self.take_from_cache("libm", "lapack")
         log = self.folder / "log"
         self.program("cmake", f'echo begin >>"{log}"; sleep 0.3; echo end >>"{log}"')
@@ -402,7 +401,7 @@ class Machine(Case):
             self.environment["QX_CACHE"] = f"{name}/cache"
             ran = self.run_script(SOURCE / "tools/setup/libm", "linux")
             self.assertEqual((ran.returncode, ran.stderr.count("\n")), (1, 1), ran.stderr)
-            self.assertRegex(ran.stderr, rf"there is no cache \(.*{name}.*{reason}\): QX_CACHE names another folder")
+            self.assertRegex(ran.stderr, rf"there is no cache \(.*{name}.*{reason}\): set QX_CACHE to another folder")
 
     def test_a_build_that_was_killed_is_made_anew(self):
         self.take_from_cache("sources")
@@ -432,10 +431,10 @@ class Machine(Case):
         both = [subprocess.Popen([run], env=self.environment, stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True)
                 for _ in range(2)]
         told = "".join(process.communicate()[1] for process in both)
-        self.assertRegex(told, r"\[run\] waiting for another script, which has .*/build/release.lock")
+        self.assertRegex(told, r"\[run\] waiting for another script, which holds .*/build/release.lock")
         self.assertEqual(log.read_text(), 4 * "begin\nend\n", told)
 
-    def test_files_from_the_future_are_told(self):
+    def test_files_from_the_future_are_reported(self):
         run, log = self.fake_build()
         ahead = time.time() + 7200
         (run.parent / "build/release").mkdir(parents=True)
@@ -451,7 +450,7 @@ class Machine(Case):
 
 
 class OnATerminal(Case):
-    def test_progress_and_the_end_of_a_command_are_told(self):
+    def test_progress_and_the_end_of_a_command_are_reported(self):
         slow = "bash -c 'echo [1/3]; sleep 1.2; echo [2/3]; exit 3'"
         terminal = Terminal(*self.watched(f'watched work "{self.folder}/log" {slow}'),
                             env=self.environment)
@@ -461,7 +460,7 @@ class OnATerminal(Case):
         self.assertRegex(shown, r"work: failed in \d s")
 
     def ended_by_ctrl_c(self, terminal, reached, stage):
-        """Ends the first run where the pattern is shown."""
+        """Interrupts the first run when the pattern is shown."""
         self.assertRegex(terminal.read(until=reached), reached)
         time.sleep(1)
         self.assertNotEqual(processes_with(f"QX_CACHE={self.cache}"), [])

@@ -1,5 +1,5 @@
-"""The public C headers for compilers without attributes: they are read without one, and give the records
-that they have with them; and the C++ headers, which give no warning.
+"""The public C headers compile without GNU attributes, and their records have the same layout as with them; the
+C++ headers compile without warnings.
 
     headers_test.py SOURCE BUILD
 """
@@ -17,13 +17,13 @@ del sys.argv[1:3]
 sys.path.insert(0, str(SOURCE / "tools"))
 import catalogue  # noqa: E402
 
-# What such a compiler makes of a GNU attribute is a fault.
+# Makes any GNU attribute a syntax error.
 NO_ATTRIBUTES = ("-D__attribute__(x)=@", "-U__GNUC__")
 PROCESSORS = ("x86_64", "i686")
 
 
 def compiled(target, sources, *options):
-    """The output of clang for a target, of each source alone, without headers of a system."""
+    """The output of clang for a target, each source compiled alone, without system headers."""
     ran = subprocess.run(["clang", f"--target={target}", "-std=c11", "-ffreestanding", "-Wall", "-Wextra", "-Werror",
                           "-Wno-unused-function", "-I", SOURCE / "include", *options, *sources],
                          capture_output=True, text=True)
@@ -33,7 +33,7 @@ def compiled(target, sources, *options):
 
 
 def probe():
-    """A source with the size, the alignment and the places of the fields of every record."""
+    """A source with the size, the alignment and the field offsets of every record."""
     records = catalogue.read_headers(SOURCE / "include")["records"]
     includes = "".join(f'#include "qx/{path.name}"\n' for path in sorted((SOURCE / "include/qx").glob("*.h")))
     lines = []
@@ -67,7 +67,7 @@ class WithoutAttributes(unittest.TestCase):
 
 class Cpp(unittest.TestCase):
     def test_no_compiler_warns(self):
-        """Of everything in qx/qx.hpp, with exceptions and without."""
+        """Compiles everything in qx/qx.hpp, with and without exceptions."""
         for compiler in ("g++", "clang++", "i686-w64-mingw32-g++-posix"):
             with self.subTest(compiler):
                 if not shutil.which(compiler):

@@ -1,4 +1,4 @@
-"""What holds for every source of the tree and no compiler says."""
+"""Rules for every source of the tree that no compiler checks."""
 
 import re
 import sys
@@ -11,7 +11,7 @@ SOURCES = sorted(path for folder in ("bench", "examples", "host", "include", "sr
 
 
 def lines_that(pattern, paths):
-    """The places of the lines in which the pattern is found outside a comment."""
+    """The locations of the lines in which the pattern occurs outside a comment."""
     return [f"{path.relative_to(ROOT)}:{number}" for path in paths
             for number, line in enumerate(path.read_text("utf-8").split("\n"), 1)
             if re.search(pattern, line.split("//")[0])]
@@ -19,7 +19,7 @@ def lines_that(pattern, paths):
 
 class House(unittest.TestCase):
     def test_no_source_opens_a_whole_namespace(self):
-        self.assertIn("src/frame/export.h:4", lines_that(r"^#include", SOURCES), "a rule finds")
+        self.assertIn("src/frame/export.h:4", lines_that(r"^#include", SOURCES), "the search works")
         self.assertEqual(lines_that(r"\busing\s+namespace\b", SOURCES), [])
 
     def test_no_guard_serves_two_headers(self):

@@ -1,4 +1,4 @@
-"""What tests of commands share: a folder of their own, and a command that must succeed."""
+"""Shared by tests of commands: a temporary folder, and running a command that must succeed."""
 
 import subprocess
 import tempfile
@@ -7,7 +7,7 @@ from pathlib import Path
 
 
 def run(*command, **more):
-    """The output of a command; a failure shows all of it."""
+    """Returns the output of a command; a failure shows all of it."""
     ran = subprocess.run([str(part) for part in command], text=True, stdout=subprocess.PIPE,
                          stderr=subprocess.STDOUT, **more)
     if ran.returncode:

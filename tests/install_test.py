@@ -55,7 +55,7 @@ class Installed(Using):
         catalogue = json.loads((self.prefix / "share/qxanalysis/catalogue.json").read_text("utf-8"))
         self.assertEqual(version, catalogue["version"])
 
-    def test_programs_ask_for_the_module_by_the_first_number_of_its_version(self):
+    def test_programs_require_the_module_by_its_major_version(self):
         library = next(self.prefix.rglob("libqxanalysis.so"))
         catalogue = json.loads((self.prefix / "share/qxanalysis/catalogue.json").read_text("utf-8"))
         first = f"libqxanalysis.so.{catalogue['version'].split('.')[0]}"
@@ -94,7 +94,7 @@ class Installed(Using):
 @unittest.skipUnless("QX_TEST_ALL" in os.environ, "builds the whole library once more: ./test --all")
 class AsFolder(Using):
     def test_add_subdirectory(self):
-        # At the lowest cost, and kept for the next run.
+        # With the cheapest options; the build is kept for the next run.
         self.built(BUILD / "as_folder", f"-DQX_SOURCE={SOURCE}", "-DCMAKE_BUILD_TYPE=Debug",
                    "-DCMAKE_CXX_FLAGS_DEBUG=-O0")
 
@@ -105,11 +105,11 @@ class Readme(Using):
     TEXT = (SOURCE / "README.md").read_text("utf-8")
 
     def block(self, language):
-        """The blocks of a language, which go on where the one before has ended."""
+        """The blocks of a language, each of which continues the previous one."""
         return "".join(re.findall(rf"```{language}\n(.*?)```", self.TEXT, re.DOTALL))
 
     def compiled(self, start):
-        """Runs the compile line that begins so, with this build; gives the program's output."""
+        """Runs the compile line that begins with `start`, with this build; returns the program's output."""
         line = re.search(rf"^    ({re.escape(start)} .*)$", self.TEXT, re.MULTILINE)[1]
         line = re.sub(r"(\$PWD/)?build/release", str(BUILD), line)
         line = line.replace("-Iinclude", f"-I{SOURCE}/include")

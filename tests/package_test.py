@@ -1,9 +1,12 @@
-"""What tools/package makes, as those use it who get it.
+"""The packages that tools/package makes, used as their recipients use them.
 
     package_test.py SOURCE [TEST...]
 """
 
+import base64
+import csv
 import functools
+import hashlib
 import os
 import re
 import shutil
@@ -20,7 +23,7 @@ SOURCE = Path(sys.argv.pop(1)).resolve()
 PACKAGES = SOURCE / "build/package"
 ALL = "QX_TEST_ALL" in os.environ
 
-# Compiled as by Visual C++, without its run-time library: what it returns is what its process ends with.
+# Compiled as by Visual C++, without its run-time library: the return value is the exit status of the process.
 WITHOUT_RUN_TIME = r"""
 #include "qx/basic_statistics.h"
 #include "qx/frame.h"
@@ -48,13 +51,33 @@ int start(void) {
 """
 
 
+LOADS = r"""
+#include "qx/types.h"
+#include <stdio.h>
+#include <windows.h>
+int main(void) {
+    HMODULE host = LoadLibraryA("site\\qx\\qxrt.dll"), module = LoadLibraryA("site\\qx\\qxanalysis.dll");
+    if (host == NULL || module == NULL)
+        return 1;
+    DBL1D (*copy)(int32_t, int32_t, const void *) = (void *)GetProcAddress(host, "QXHostCopy1D");
+    ErrorCode (*mean)(DBL1D, double *, ErrorCode *) = (void *)GetProcAddress(module, "Mean_head");
+    const double samples[] = {1, 2, 6};
+    double found = 0;
+    ErrorCode err = 1;
+    mean(copy(10, 3, samples), &found, &err);
+    printf("%g %d\n", found, (int)err);
+    return 0;
+}
+"""
+
+
 @functools.cache
 def make_windows_packages():
     run(SOURCE / "tools/package", "windows")
 
 
 class Windows:
-    """The zip and the wheel for one of the two."""
+    """The zip and the wheel for one of the two Windows targets."""
 
     @classmethod
     def setUpClass(cls):
@@ -91,11 +114,32 @@ class Windows:
             "lib/qxanalysis.lib", "lib/qxrt.lib", "/out:start.exe", cwd=self.place)
         self.assertEqual(self.in_wine("start.exe").returncode, 42)
 
-    def test_wheel_has_the_libraries(self):
-        with zipfile.ZipFile(next(PACKAGES.glob(f"*-py3-none-{self.platform}.whl"))) as wheel:
-            names = set(wheel.namelist())
-        self.assertLessEqual({"qx/qxanalysis.dll", "qx/qxrt.dll", "qx/catalogue.json", "qx/exports.pyi"}, names)
-        self.assertFalse([name for name in names if name.endswith(".so")])
+    def test_wheel(self):
+        wheel = next(PACKAGES.glob(f"*-py3-none-{self.platform}.whl"))
+        with zipfile.ZipFile(wheel) as archive:
+            files = {name: archive.read(name) for name in archive.namelist()}
+        information = next(name for name in files if name.endswith(".dist-info/WHEEL")).rpartition("/")[0]
+        self.assertIn(f"Tag: py3-none-{self.platform}\n", files[f"{information}/WHEEL"].decode())
+        self.assertIn("Root-Is-Purelib: false\n", files[f"{information}/WHEEL"].decode())
+        self.assertIn("Name: qxanalysis\n", files[f"{information}/METADATA"].decode())
+        recorded = {name: digest for name, digest, _ in csv.reader(files[f"{information}/RECORD"].decode().splitlines())}
+        self.assertEqual(recorded.pop(f"{information}/RECORD"), "")
+        self.assertEqual(recorded, {name: f"sha256={base64.urlsafe_b64encode(hashlib.sha256(content).digest()).decode()}"
+                                    .rstrip("=") for name, content in files.items() if not name.endswith("/RECORD")})
+        self.assertLessEqual({"qx/qxanalysis.dll", "qx/qxrt.dll", "qx/catalogue.json", "qx/exports.pyi"}, set(files))
+        self.assertFalse([name for name in files if name.endswith(".so")])
+
+    def test_libraries_of_the_wheel(self):
+        """Loaded by their paths, as the Python package loads them, without their folder on the search path."""
+        with zipfile.ZipFile(next(PACKAGES.glob(f"*-py3-none-{self.platform}.whl"))) as archive:
+            archive.extractall(self.place / "site")
+        for name in ("qxanalysis.dll", "qxrt.dll"):
+            needed = re.findall(r"DLL Name: (\S+)", run("objdump", "-p", self.place / "site/qx" / name))
+            self.assertLessEqual({one.lower() for one in needed}, {"kernel32.dll", "msvcrt.dll", "user32.dll"}, name)
+            (self.place / name).unlink()
+        (self.place / "load.c").write_text(LOADS, "utf-8")
+        run(f"{self.processor}-w64-mingw32-gcc", "-std=c11", "-Iinclude", "load.c", "-o", "load.exe", cwd=self.place)
+        self.assertEqual(self.in_wine("load.exe").stdout.split(), ["3", "0"])
 
 
 @unittest.skipUnless(ALL, "builds for Windows: ./test --all")
@@ -129,7 +173,7 @@ print(mean.value, err.value)
 
 
 def unpacked(wheel, folder):
-    """As pip does it, with the marks of what can be run."""
+    """Unpacks a wheel as pip does, with the permissions of executable files."""
     with zipfile.ZipFile(wheel) as archive:
         for entry in archive.infolist():
             path = Path(archive.extract(entry, folder))
@@ -156,7 +200,7 @@ class Wheel(InAFolder):
         shown = run("/usr/bin/python3", "-m", "qx", "verify", env=environment, cwd="/")
         published = (SOURCE / "tests/conformance/hashes.txt").read_text("utf-8").splitlines()
         self.assertIn(f"{len(published)} of {len(published)} exports give the published bits", shown)
-        # A bit that differs is told.
+        # A differing bit is reported.
         hashes = self.folder / "qx/hashes.txt"
         hashes.write_text(hashes.read_text("utf-8").replace("Mean_head ", "Mean_head 0", 1), "utf-8")
         ran = subprocess.run(["/usr/bin/python3", "-m", "qx", "verify"], env=environment, capture_output=True, text=True)
@@ -176,7 +220,7 @@ class Wheel(InAFolder):
 
 @unittest.skipUnless("QX_TEST_OTHER_DEBIAN" in os.environ, "needs a network and minutes: QX_TEST_OTHER_DEBIAN=1")
 class OtherDebian(InAFolder):
-    """The wheel where nothing but Python and NumPy is installed, and the Debian package."""
+    """The wheel on a system with only Python and NumPy installed, and the Debian package."""
 
     def root_of(self, release):
         made = subprocess.run([SOURCE / "tools/setup/other-root", release], stdout=subprocess.PIPE, text=True)
@@ -202,24 +246,36 @@ class OtherDebian(InAFolder):
         self.assertRegex(shown, r"^2\.0 \[0\.8 1\.4\]\n(\d+) of \1 exports give the published bits")
 
     def test_libraries_on_the_release_before(self):
-        # Its NumPy is older than the package needs: the libraries alone.
+        # Its NumPy is too old for the package, so only the libraries are tested.
         root = self.root_of("bullseye")
         self.with_wheel(root)
         self.assertEqual(self.inside(root, f"python3 -c '{MEAN}'"), "3.0 0\n")
 
-    def test_debian_package(self):
+    def debian_package_on(self, release):
         run(SOURCE / "tools/package", "deb")
-        root = self.root_of("trixie")
+        root = self.root_of(release)
         package = next(PACKAGES.glob("qxanalysis_*.deb"))
         shutil.copy(package, root / "opt")
         shutil.copy("/etc/resolv.conf", root / "etc/resolv.conf")
-        self.inside(root, f"DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends /opt/{package.name}")
         self.addCleanup(self.inside, root, "dpkg -P qxanalysis")
+        self.inside(root, f"""export DEBIAN_FRONTEND=noninteractive; apt-get update -qq
+            apt-get install -y --no-install-recommends /opt/{package.name}
+            dpkg --verify qxanalysis; dpkg -L qxanalysis >/tmp/listed""")
         shown = self.inside(root, """cd / && python3 -c 'import qx; print(qx.stats.mean([1.0, 3.0]), qx.__version__)'
             ls /usr/include/qx/qx.hpp /usr/include/qx/qx.h /usr/lib/*/pkgconfig/qxanalysis.pc
             ls /usr/share/doc/qxanalysis/licences/NOTICE.md /usr/share/doc/qxanalysis/README.md""")
         self.assertRegex(shown, r"^2\.0 \d")
         self.assertRegex(self.inside(root, "cd / && python3 -m qx verify"), r"^(\d+) of \1 exports give the published bits")
+        left = self.inside(root, """DEBIAN_FRONTEND=noninteractive apt-get remove -y qxanalysis >/dev/null 2>&1
+            find / -xdev -name '*qxanalysis*' ! -path '/opt/*' ! -path '/var/*' ! -path '/proc/*'
+            ls -d /usr/include/qx /usr/lib/python3/dist-packages/qx /usr/lib/*/libqx* 2>/dev/null || true""")
+        self.assertEqual(left, "")
+
+    def test_debian_package_on_its_release(self):
+        self.debian_package_on("bookworm")
+
+    def test_debian_package_on_the_next_release(self):
+        self.debian_package_on("trixie")
 
 
 @unittest.skipUnless(ALL, "builds from the archive: ./test --all")

@@ -1,12 +1,12 @@
-"""Every command of the README, in its order, in a fresh copy of the sources.
+"""Runs every command of the README, in order, in a fresh copy of the sources.
 
     readme_test.py SOURCE BUILD            on this machine, with the libraries of BUILD
     readme_test.py SOURCE BUILD --bare     on a Debian with nothing installed (tools/setup/bare-root):
-                                           what ./run installs there must do for all that follows
+                                           what ./run installs there must suffice for all that follows
     readme_test.py SOURCE BUILD --windows  the commands for 64-bit Windows, with the build of win64
 
-All indented lines of the README and its blocks in C and Python are run, but for those named here with
-a reason. Exit code 77 says that nothing has run.
+All indented lines of the README and its C and Python blocks are run, except those listed here with a reason. The
+exit status is 77 if nothing was run.
 """
 
 import fcntl
@@ -29,13 +29,13 @@ LEFT_OUT = {
     "tools/site": "site_test builds it",
 }
 SHORTENED = {
-    # It measures for minutes: a first row is enough.
+    # The benchmark takes minutes; the first row is enough.
     "bench/run fft": "(bench/run fft || true) | grep -m 1 ' complex '",
-    # The build that is taken was configured so.
+    # The given build was configured in this way.
     "cmake --preset win64": "[ -f build/win64/build.ninja ]",
 }
 
-# What the placeholders of the README stand for.
+# The files that the placeholders of the README refer to.
 FILES = r"""
 import numpy as np, pathlib, soundfile
 t = np.arange(4000) / 1000
@@ -49,14 +49,14 @@ soundfile.write("IN.wav", 0.5 * np.sin(0.05 * np.arange(48000)), 48000)
 """
 NAMES = {"peaks FILE": "peaks measurement.csv", "pulse FILE": "pulse measurement.csv",
          "tones FILE": "tones measurement.csv",
-         "view FILE": "view measurement.csv >view.log & "  # which serves until it is ended
+         "view FILE": "view measurement.csv >view.log & "  # serves until it is ended
                       "while kill -0 $! && ! grep -q http view.log; do sleep 0.1; done; "
                       "python3 -c 'import urllib.request as r; "
                       "assert b\"<h1>measurement.csv\" in r.urlopen(open(\"view.log\").read().strip()).read()'; "
                       "kill $!",
          "fit FILE": "fit decay.csv"}
 
-# What must hold after a command that begins so, as a command of its own.
+# Commands that must succeed after a command that begins with the given text.
 AFTERWARDS = {
     "./run": "[ -s out/report.html ]",
     "./run recordings/": "[ -s out/index.html ]",
@@ -81,7 +81,7 @@ def commands(readme):
             if language == "c":
                 lines.append("cat >first.c <<'END'\n" + "\n".join(block) + "\nEND")
             elif language == "python":
-                # A block goes on where the one before ended; a last line may show how a failure is raised.
+                # A block continues the previous one; the last line may show how a failure is raised.
                 python += block
                 run = "{ python3 - 2>&1 || true; } <<'END' | grep 'Error: Mean_head.*ErrEmptyInput'\n" \
                     if "raises" in block[-1] else "python3 - <<'END'\n"
@@ -90,13 +90,13 @@ def commands(readme):
         elif language is not None:
             block.append(line)
         elif line.startswith("    ") and line.strip():
-            # What is said of a command stands behind blanks.
+            # A remark on a command follows it after several blanks.
             lines.append(re.sub(r"(\S)  +[^#\s].*", r"\1", line.strip()))
     return lines
 
 
 def script(readme, windows):
-    """All commands as a script that ends at the first one that fails, and says which it is at."""
+    """All commands as a script that stops at the first failing command and prints each one before it runs."""
     text = ["set -euo pipefail"]
     prepared = False
     for line in commands(readme):
@@ -121,7 +121,7 @@ def quoted(text):
 
 
 def copied(source, target):
-    """The files that a clone would have, with what is not committed yet."""
+    """Copies the files that a clone would have, including uncommitted ones."""
     if (source / ".git").exists():
         names = subprocess.run(["git", "-C", source, "ls-files", "-co", "--exclude-standard", "-z"],
                                capture_output=True, text=True, check=True).stdout.split("\0")
@@ -157,8 +157,8 @@ def on_this_machine(source, build, windows):
         return ran.returncode
 
 
-# Before all else: an installation that is ended while packages are being unpacked, for the first ./run
-# to put right.
+# Runs first: an installation that is interrupted while packages are being unpacked, which the first ./run
+# must repair.
 INTERRUPTED = """
 tools/setup/native & native=$!
 until ls /var/lib/dpkg/info/libc6-dev*.list >/dev/null 2>&1 || ! kill -0 $native; do sleep 0.1; done
@@ -166,7 +166,7 @@ kill -TERM $native && ! wait $native
 [ ! -e /proc/$native ] && echo "== interrupted: $(dpkg --audit | wc -l) lines of dpkg --audit"
 """
 
-# Mounts what a system has beside its files, in a namespace of its own, and goes in.
+# Mounts the virtual file systems in a separate mount namespace, and enters the root.
 ENTER = """
 set -e
 mount -t proc proc "$1/proc"
@@ -186,7 +186,7 @@ def on_a_bare_root(source):
         return skipped("nothing can be mounted")
     cache = machine_cache(source)
     root = cache / "bare-root.used"
-    lock = (cache / "bare-root.used.lock").open("w")  # until this program ends
+    lock = (cache / "bare-root.used.lock").open("w")  # held until this program ends
     fcntl.flock(lock, fcntl.LOCK_EX)
     shutil.rmtree(root, ignore_errors=True)
     subprocess.run(["cp", "-a", made.stdout.strip(), root], check=True)
@@ -196,7 +196,8 @@ def on_a_bare_root(source):
         copied(source, copy)
         (copy / ".readme").write_text(
             INTERRUPTED + script((source / "README.md").read_text("utf-8"), False), "utf-8")
-        # How the machine reaches Debian, and what has been compiled of others; the sources are fetched.
+        # Copies the machine's way to reach Debian, and the third-party libraries compiled so far; the sources
+        # are fetched.
         for file in ("resolv.conf", "hosts"):
             shutil.copy(f"/etc/{file}", root / "etc" / file)
         ways = subprocess.run(["apt-config", "dump"], capture_output=True, text=True).stdout

@@ -1,4 +1,4 @@
-"""What scripts write is the same whatever the order of a Python set, which changes from run to run.
+"""The output of scripts does not depend on the iteration order of Python sets, which changes from run to run.
 
     repeatable_test.py SOURCE BUILD [TEST...]
 """
@@ -29,7 +29,7 @@ def output(seed, *command):
 
 class Case(unittest.TestCase):
     def same(self, make, seeds=SEEDS):
-        """What is made, which is the same for all seeds; `make` has a seed and a folder."""
+        """Checks that `make(seed, folder)` gives the same result for all seeds, and returns it."""
         made = []
         for seed in seeds:
             with tempfile.TemporaryDirectory() as name:
@@ -47,7 +47,7 @@ class Case(unittest.TestCase):
 
 
 class OrderOfFortran(Case):
-    # Names that mislead: by name, users come before what they use.
+    # Misleading names: in alphabetical order, users precede what they use.
     FILES = {
         "top.f": "      SUBROUTINE TOP\n      CALL A_USER\n*     CALL UNUSED\n      END\n",
         "a_user.f90": "subroutine a_user\n use, intrinsic :: ieee_arithmetic\n"

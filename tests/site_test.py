@@ -1,5 +1,5 @@
-"""The documentation: it builds without a warning, its links and images lead somewhere within it, it loads nothing
-from elsewhere, it has every export and every function of the topics, and its code runs.
+"""The documentation builds without a warning, its links and images lead to existing places within it, it loads
+nothing from elsewhere, it covers every export and every function of the topics, and its code runs.
 
     site_test.py SOURCE BUILD_DIR
 """
@@ -81,7 +81,7 @@ class Site(unittest.TestCase):
                 if not target.is_file() or target.stat().st_size == 0:
                     wrong.append(f"{path.relative_to(SITE)}: {link} has no file")
                 elif anchor and target in self.pages and anchor not in self.pages[target].anchors:
-                    wrong.append(f"{path.relative_to(SITE)}: {link} has no such place")
+                    wrong.append(f"{path.relative_to(SITE)}: {link} has no such anchor")
             wrong += [f"{path.relative_to(SITE)}: image {source} has no text" for source, text in page.images
                       if text is None]
         self.assertEqual(wrong, [])
@@ -89,7 +89,7 @@ class Site(unittest.TestCase):
     def test_everything_is_there(self):
         exports = pages.library().entries
         for name, entry in exports.items():
-            # The id of a heading is in small letters; the label is kept beside it.
+            # The id of a heading is in lower case; the label is kept as well.
             self.assertIn(f"export-{name}".lower().replace("_", "-"),
                           self.pages[SITE / f"exports/{entry['family']}.html"].anchors)
         for topic in TOPICS:

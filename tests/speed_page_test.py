@@ -1,4 +1,4 @@
-"""The page of speeds says what was measured: two runs that agree, what has moved, on which machine.
+"""The page of speeds shows what was measured: two runs that agree, what has changed, and on which machine.
 
     speed_page_test.py SOURCE [TEST...]
 """
@@ -68,13 +68,13 @@ class Page(unittest.TestCase):
                                        ("fft", "b"): ("1.02", "4 % apart", "", "2.08"),
                                        ("fft", "c"): ("1.00", "one run", "", "2.00")})
 
-    def test_runs_of_different_states_are_not_put_together(self):
+    def test_runs_of_different_states_are_not_combined(self):
         for name in ("commit", "machine", "compiler"):
             self.run_of({"a": 1.0})
             self.run_of({"a": 2.0}, **{name: "other"})
             self.assertEqual(self.rows()["fft", "a"][:2], ("2.00", "one run"), name)
 
-    def test_what_has_moved_is_marked_against_the_page_before(self):
+    def test_changes_since_the_previous_page_are_marked(self):
         def twice(mean, **more):
             self.run_of({"a": mean, "b": 1.0}, **more)
             self.run_of({"a": mean, "b": 1.04}, **more)

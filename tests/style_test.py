@@ -1,9 +1,8 @@
-"""Layout and common faults, as the machine finds them: clang-format over C and C++, flake8 and mypy over
-Python.
+"""Layout and common faults that tools find: clang-format for C and C++, flake8 and mypy for Python.
 
     style_test.py SOURCE BUILD [TEST...]
 
-What is left out, and why, is said in the .clang-format beside it, in .flake8 and in pyproject.toml.
+The exclusions and their reasons are in the .clang-format files, in .flake8 and in pyproject.toml.
 """
 
 import subprocess
@@ -13,11 +12,11 @@ from pathlib import Path
 
 SOURCE, BUILD = (Path(name).resolve() for name in sys.argv[1:3])
 del sys.argv[1:3]
-VERSION = 14  # of clang-format: others lay out otherwise
+VERSION = 14  # of clang-format: other versions format differently
 
 
 def sources(*endings):
-    """What is tracked, and what will be; without a repository, all but what a build writes."""
+    """Tracked files and new ones that are not ignored; without a repository, all files except build output."""
     if (SOURCE / ".git").exists():
         names = subprocess.run(["git", "-C", SOURCE, "ls-files", "-co", "--exclude-standard", "-z"],
                                capture_output=True, text=True, check=True).stdout.split("\0")
@@ -28,7 +27,7 @@ def sources(*endings):
 
 
 def scripts():
-    """Python without an ending."""
+    """Python scripts without a file extension."""
     return [str(path.relative_to(SOURCE)) for path in sorted((SOURCE / "tools").iterdir())
             if path.is_file() and "python3" in path.read_text("utf-8").split("\n")[0] and not path.suffix]
 
@@ -45,7 +44,7 @@ class Layout(unittest.TestCase):
         files = sources(".c", ".cpp", ".h", ".hpp")
         self.assertIn("src/frame/export.h", files)
         status, found = findings("clang-format", "--dry-run", "-Werror", *files)
-        self.assertEqual((status, found), (0, ""), "clang-format -i lays them out")
+        self.assertEqual((status, found), (0, ""), "run clang-format -i on them")
 
 
 class Python(unittest.TestCase):

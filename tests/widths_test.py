@@ -1,10 +1,10 @@
 #!/usr/bin/python3
 """widths_test.py NM OBJDUMP MODULE --baseline OBJECT... --avx2 OBJECT... --avx512 OBJECT...: the objects
 of a wider build define no function that the linker could take for another build of the same function: every
-global or weak one has its width in its name. No object has an instruction above its width, and the module
-none that fuses a multiplication with an addition. On 64-bit Windows, where the stack is aligned to 16 bytes
-only, no object expects a better alignment of a vector of 32. Without OBJDUMP (a dash) only names are looked
-at."""
+global or weak one has its width in its name. No object has an instruction above its width, and the
+module has none that fuses a multiplication with an addition. On 64-bit Windows, where the stack is aligned to 16
+bytes only, no object assumes a larger alignment of a 32-byte vector. Without OBJDUMP (a dash) only names are
+checked."""
 
 import re
 import subprocess
@@ -13,13 +13,13 @@ import unittest
 
 NM = OBJDUMP = MODULE = None
 OBJECTS = {}
-# The namespaces, as names are mangled.
+# The namespaces as they appear in mangled names.
 NAMES = {"avx2": ("4avx2", "6lanes4"), "avx512": ("6avx512", "6lanes8")}
 ALIGNED = re.compile(r"^vmov(?:ap[sd]|dqa|ntp[sd]|ntdqa?)\s+(?=.*\().*%ymm")
 INSTRUCTION = re.compile(r" *[0-9a-f]+:\s+(.*)")
-PLACED_BY_LINKER = set("TWi")  # functions that are global, weak or chosen at run time
+PLACED_BY_LINKER = set("TWi")  # functions that are global, weak or selected at run time
 FUSED = re.compile(r"^v?f?n?m(add|sub|addsub|subadd)[1-3]*[ps][sdh]$|^vf(n?m(add|sub)|maddsub|msubadd)|^vfc?maddc")
-# Of a line of a disassembly: what only a wider processor has.
+# Matches a disassembly line with an instruction or register that only a wider processor has.
 ABOVE = {"baseline": re.compile(r"^v(?!err|erw)[a-z]|%ymm|%zmm|%k[0-7]"),
          "avx2": re.compile(r"%zmm|%[xy]mm(1[6-9]|2\d|3[01])|%k[0-7]"),
          "avx512": re.compile(r"^v4|^vp2intersect|^vpdp|^vpopcnt|^vpshld|^vaes|%tmm")}
@@ -27,14 +27,14 @@ X87 = re.compile(r"^f(?!ence|xsave|xrstor|emms)[a-z]")
 
 
 def shared_functions(listing, width):
-    """The functions of one object, as `nm -P` lists them, that may be taken for another's."""
+    """The functions of one object, as listed by `nm -P`, that the linker may replace by another object's."""
     rows = [line.split() for line in listing.splitlines()]
     return [name for name, kind, *_ in rows
             if kind in PLACED_BY_LINKER and not any(part in name for part in NAMES[width])]
 
 
 def instructions(path):
-    """Each instruction of an object or a library, from its mnemonic on."""
+    """The instructions of an object or a library, each from its mnemonic on."""
     listing = subprocess.run([OBJDUMP, "-d", "--no-show-raw-insn", path], check=True, capture_output=True,
                              text=True).stdout
     return [match[1] for match in map(INSTRUCTION.match, listing.splitlines()) if match]
@@ -76,7 +76,7 @@ class Widths(unittest.TestCase):
         self.assertGreater(len(lines), 100000)
         self.assertEqual(found(FUSED, lines), [])
         if MODULE.endswith(".dll"):
-            self.skipTest("on 32-bit processors results are handed back through x87")
+            self.skipTest("on 32-bit processors results are returned through x87")
         self.assertEqual(found(X87, lines), [])
 
     def test_know_the_instructions(self):
@@ -107,7 +107,7 @@ class Widths(unittest.TestCase):
 
 
 def lists(words):
-    """What follows each option."""
+    """The arguments of each option."""
     by_width = {width: [] for width in ABOVE}
     for word in words:
         if word.startswith("--"):

@@ -1,10 +1,9 @@
 #!/usr/bin/python3
-"""Writes the declarations of all exports for other languages, from the catalogue, into the packages of
-bindings/, which it copies.
+"""Copies the packages of bindings/ to OUTPUT and adds the declarations of all exports, from the catalogue.
 
     bindings.py CATALOGUE.json OUTPUT
 
-OUTPUT gets the folders rust, csharp, julia and octave.
+Creates the folders rust, csharp, julia and octave in OUTPUT.
 """
 
 import json
@@ -15,9 +14,9 @@ from pathlib import Path
 
 ROOT = Path(__file__).resolve().parent.parent
 PACKAGES = ROOT / "bindings"
-WARNING = "Written by tools/bindings.py from the headers; see there for what is by hand."
+WARNING = "Written by tools/bindings.py from the headers. Do not edit."
 
-# Records whose elements begin at any byte.
+# Element types that need not be aligned.
 UNALIGNED = {"DBL", "SGL", "I32", "U32", "CDB", "CSG"}
 
 KEYWORDS = {language: set(words.split()) for language, words in {
@@ -35,7 +34,7 @@ KEYWORDS = {language: set(words.split()) for language, words in {
 
 
 def is_unaligned(record):
-    """Whether a record lies without gaps and at any byte: marked so, or of elements alone."""
+    """Whether a record has no padding and no alignment: it is marked as packed, or has only elements."""
     return record["packed"] or all(field["type"] in UNALIGNED for field in record["fields"])
 
 
@@ -44,7 +43,7 @@ def safe(language, name):
 
 
 def fields_of(record):
-    """Name, type and number of the fields, the type as the catalogue has it."""
+    """Name, type (as in the catalogue) and number of elements of each field."""
     return [(field["name"], field["type"].replace("const ", ""), int(field.get("count", 1))) for field in record["fields"]]
 
 
@@ -71,8 +70,8 @@ def rust(catalogue):
         yield f"pub const {code}: ErrorCode = {number};\n"
     arrays, opaque = handles_of(catalogue), opaque_of(catalogue)
     for name, (dimensions, element) in arrays.items():
-        yield f"\n/// The head of a block: {'its size' if dimensions == 1 else 'its sizes'}, behind which the elements" \
-              f" lie.\n#[repr(C)]\npub struct Block_{name} {{\n    pub sizes: [i32; {dimensions}],\n}}\n" \
+        yield f"\n/// The head of a block: {'its size' if dimensions == 1 else 'its sizes'}, which the elements" \
+              f" follow.\n#[repr(C)]\npub struct Block_{name} {{\n    pub sizes: [i32; {dimensions}],\n}}\n" \
               f"/// An array of {element}, {dimensions}-dimensional.\npub type {name} = *mut *mut Block_{name};\n"
     for name in opaque:
         yield f"pub type {name} = *mut std::os::raw::c_void;\n"
@@ -110,7 +109,7 @@ def handles_of(catalogue):
 
 
 def opaque_of(catalogue):
-    """Words that the caller keeps, and pointers that an export gives."""
+    """Opaque types: words that the caller keeps, and pointers that an export returns."""
     known = {*RUST, "void", *catalogue["records"], *handles_of(catalogue)}
     types = [one["type"] for export in catalogue["exports"] for one in export["arguments"]]
     types += [export["returns"] for export in catalogue["exports"]]
@@ -163,7 +162,7 @@ def csharp(catalogue):
             for i in range(count):
                 yield f"        public {base} {safe('csharp', field)}{i if count > 1 else ''};\n"
         yield "    }\n\n"
-    yield "    /// <summary>The exports. Arrays are handles, made by Host.</summary>\n" \
+    yield "    /// <summary>The exports. Arrays are handles, created by Host.</summary>\n" \
           "    public static class Exports\n    {\n"
     for export in catalogue["exports"]:
         lines = ["<summary>", *xml(export["documentation"]).split("\n"), "</summary>"]
@@ -212,7 +211,7 @@ OCTAVE = {"DBL": "double", "CDB": "std::complex<double>", "I32": "int32_t", "U32
 
 
 def octave_wrapper(export):
-    """A function from the values of the inputs to those of the outputs; None where an argument has none."""
+    """A function from the values of the inputs to those of the outputs; None if an argument is not a value."""
     lines, handed, outputs, count = [], [], [], 0
     for one in export["arguments"]:
         name, kind, element = one["name"] + "_", one["kind"], OCTAVE.get(one.get("element"))

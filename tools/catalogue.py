@@ -4,41 +4,41 @@
     catalogue.py INCLUDE_DIR --json FILE      names, arguments, documentation
     catalogue.py INCLUDE_DIR --map FILE       linker version script of exactly the exports
     catalogue.py INCLUDE_DIR --def FILE       module definition file of exactly the exports
-    catalogue.py INCLUDE_DIR --codes FILE     an export with a status a line, and its codes
+    catalogue.py INCLUDE_DIR --codes FILE     a line for each export with a status: its name and codes
     catalogue.py INCLUDE_DIR --umbrella FILE  qx/qx.h, which includes all headers
 
-The headers are the one place where an export is declared. A declaration that cannot be read, an
-export without documentation, a name declared twice, an export with a status but without codes and
-an unknown code end the run with file, line and reason, and so fail the build.
+Exports are declared only in the headers. A declaration that cannot be read, an export without
+documentation, a name declared twice, an export with a status but without codes, or an unknown code
+ends the run with file, line and reason, and so fails the build.
 
-What a comment says of codes has one form, the sentence "Codes:", which ends at its full stop. Each
-code stands by its name, in the order in which it is raised, with the reason in brackets:
+Codes are documented in one form, the sentence "Codes:", which ends at its full stop. It lists the codes
+by name, in the order in which they are raised, with the reason in brackets:
 
     Codes: ErrEmptyInput (x is empty), the host's status (it refuses the output), those of SortH,
-    WarnSingular (a pivot is 0). A sentence that belongs to it no more.
+    WarnSingular (a pivot is 0). This sentence is no longer part of it.
     Codes: none.
 
-What a NaN does in an input that may have one stands in the sentence "NaN:", by arguments and fields of
-records, in these words; tests/codes holds the recipes of the export to it:
+The sentence "NaN:" states the effect of a NaN in each input that can hold one, by arguments and fields
+of records, in these words; tests/codes checks it with the recipes of the export:
 
     NaN: x, w refused with ErrNonFiniteInput; y in all results; z.level in some results or in no result.
 
-"In all results" means in every number of the outputs that may be one. "In no result" are those that are
-compared, skipped or not read.
+"In all results" means in every number of the outputs that can be NaN. "In no result" applies to inputs
+that are compared, skipped or not read.
 
-Which values an argument takes that chooses among few stands in a sentence that begins with its name
-and a colon, or in an indented table behind such a colon. The values ascend in a sentence, with a
-semicolon between them; a range has one text:
+The values of an argument that selects one of a few choices are listed in a sentence that begins with its
+name and a colon, or in an indented table after such a colon. In a sentence the values ascend, separated
+by semicolons; a range has one text:
 
     type: 0 lowpass; 1 highpass, with its cut-off fl; 2 to 5 reserved.
     from, to: 0 Cartesian; 1 spherical.
     form: as IIR_Filter2.
 
-In the introduction of a header it holds for all exports there that have such an argument; a value
-without a text has that of the introduction.
+In the introduction of a header, such a list applies to all exports of the header that have the argument;
+a value without a text takes the text of the introduction.
 
-A comment that begins "As NAME, ..." or "As NAME." takes over the text of that export, and its
-codes and what it says of NaN where it has no such sentence of its own.
+A comment that begins "As NAME, ..." or "As NAME." inherits the text of that export, and its "Codes:" and
+"NaN:" sentences unless it has its own.
 """
 
 import argparse
@@ -79,8 +79,8 @@ class Token:
 
 
 class Statement:
-    """The tokens of one declaration up to its semicolon, the comment right before it, and those inside,
-    each behind a number of tokens."""
+    """The tokens of one declaration up to its semicolon, the comment right before it, and the comments inside
+    it, each with the number of tokens before it."""
 
     def __init__(self, tokens, comment, inside):
         self.tokens, self.comment, self.inside = tokens, comment, inside
@@ -88,7 +88,7 @@ class Statement:
         self.line = tokens[0].line
 
     def remarks(self):
-        """What comments behind a field or a value of an enumeration, in its line, say of it, by names."""
+        """The comments that follow a field or a value of an enumeration on its line, by its name."""
         is_enumeration, found = self.words[0] == "enum", {}
         for count, comment in self.inside:
             names = [token.text for i, token in enumerate(self.tokens[:count])
@@ -132,7 +132,7 @@ def statements_of(path, text):
 
 
 def split(words, separator=","):
-    """Splits at the separators that stand outside brackets."""
+    """Splits at the separators outside brackets."""
     parts, depth = [[]], 0
     for word in words:
         depth += (word in ("(", "{", "[")) - (word in (")", "}", "]"))
@@ -152,7 +152,7 @@ def spelled(words):
 
 
 class Types:
-    """What the headers say about their own types."""
+    """The types that the headers define."""
 
     def __init__(self):
         self.records = {}  # name -> {"packed": bool, "fields": [...]}
@@ -243,7 +243,7 @@ def documentation_of(comment):
 
 
 def argument_of(words, types):
-    """One argument as a dictionary; a ValueError says why it cannot be read."""
+    """One argument as a dictionary; raises ValueError with the reason if it cannot be read."""
     text = spelled(words)
     direction = DIRECTIONS.get(words[0])
     words = words[1:] if direction else words
@@ -251,7 +251,7 @@ def argument_of(words, types):
     if words[:2] == ["QX_LENGTH", "("] and words[3:4] == [")"]:
         length, words = words[2], words[4:]
     if any(word in DIRECTIONS for word in words):
-        raise ValueError(f"argument '{text}': a direction mark stands first and once")
+        raise ValueError(f"argument '{text}': a direction mark must come first and only once")
     if len(words) < 2 or not re.fullmatch(r"[A-Za-z_]\w*", words[-1]):
         raise ValueError(f"argument '{text}': a type and a name are needed")
     name, kind_words = words[-1], words[:-1]
@@ -313,20 +313,20 @@ HOST_STATUS = "the host's status"
 
 
 def unknown_code(documentation, codes):
-    """What a text says of codes that cannot be: a name that errors.h does not have, or a number."""
+    """A fault in the codes of a text: a name that errors.h does not have, or a number; otherwise None."""
     for name in re.findall(r"\b(?:Err|Warn)[A-Z]\w*", documentation):
         if name not in codes and name != "ErrorCode":
             return f"names {name}, which errors.h does not have"
     numbers = {str(number) for number in codes.values()}
     for word in re.findall(r"(?<![\w.])[-+]?2[0-4]\d{3}(?!\w|\.\d)", documentation):
         if word[0] == "-" or word.lstrip("+") in numbers:
-            return f"tells a code by its number, {word}: its name and 'Codes:' are needed"
+            return f"gives a code by its number, {word}: its name and 'Codes:' are needed"
     return None
 
 
 def codes_sentence(text):
-    """What stands between "Codes:" and the full stop that ends it, brackets left out of the search
-    for it; None where nothing of that kind is said."""
+    """The text between "Codes:" and the full stop that ends it, not counting full stops in brackets;
+    None if there is no such sentence."""
     match = re.search(r"\bCodes:", text)
     if not match:
         return None
@@ -339,7 +339,7 @@ def codes_sentence(text):
 
 
 def raised_by(documentation):
-    """The items of the sentence "Codes:", each a pair of a kind and a name: ("code", "ErrX"),
+    """The items of the sentence "Codes:" as pairs of a kind and a name: ("code", "ErrX"),
     ("host", ""), ("those of", "NAME")."""
     sentence = codes_sentence(documentation)
     if sentence is None or sentence == "none":
@@ -363,7 +363,7 @@ NAN_WORD = re.compile(r"refused with (Err\w+)|in (?:all results|some results|no 
 
 
 def nan_of(documentation):
-    """What the sentence "NaN:" says: places and their words; None where there is no such sentence."""
+    """The places in the sentence "NaN:" with the words for their effect; None if there is no such sentence."""
     match = re.search(r"(?:^|\.\s+)NaN: ((?:[^.]|\.(?=\w))*)\.(?:\s|$)", documentation)
     if not match:
         return None
@@ -372,7 +372,7 @@ def nan_of(documentation):
         parts = re.fullmatch(r"([\w.]+(?:, [\w.]+)*) ((?:refused|in) .+)", item)
         words = parts[2].split(" or ") if parts else []
         if not parts or not all(NAN_WORD.fullmatch(word) for word in words):
-            raise ValueError(f"'{item}' under 'NaN:' is not places with what becomes of a NaN there")
+            raise ValueError(f"'{item}' under 'NaN:' does not list places with the effect of a NaN there")
         found.update((place, words) for place in parts[1].split(", "))
     return found
 
@@ -382,13 +382,13 @@ VALUE = re.compile(r"(\d+)(?: to (\d+))?(?:\s+(\S.*))?", re.DOTALL)
 
 
 def add_value(values, item, name):
-    """Puts what an item says, "2 bandpass" or "3 to 5", into a dictionary of texts by values."""
+    """Adds an item such as "2 bandpass" or "3 to 5" to a dictionary of texts by values."""
     match = VALUE.fullmatch(item.strip())
     if not match:
         raise ValueError(f"'{item.strip()}' under '{name}:' does not begin with a value")
     first, last, text = int(match[1]), int(match[2] or match[1]), " ".join((match[3] or "").split())
     if last < first or any(value in values for value in range(first, last + 1)):
-        raise ValueError(f"the values under '{name}:' do not ascend or stand twice, at {match[1]}")
+        raise ValueError(f"the values under '{name}:' do not ascend or occur twice, at {match[1]}")
     values.update(dict.fromkeys(range(first, last + 1), text))
 
 
@@ -401,8 +401,8 @@ def values_in_table(table, name):
 
 
 def values_of(documentation, name):
-    """The values that a text tells of an argument, with their texts; the name of the export whose
-    they are; or None."""
+    """The values that a text lists for an argument, with their texts; or the name of the export whose
+    text lists them; or None."""
     if match := re.search(rf"\b{name}:\n\n((?: {{3,}}\S.*\n?)+)", documentation):
         return values_in_table(match[1], name)
     text = " ".join(documentation.split())
@@ -432,7 +432,7 @@ def values_of(documentation, name):
 
 
 def find_values(export, by_name, introductions):
-    """Puts "values", pairs of a value and its text, into the arguments of which they are told."""
+    """Adds "values", pairs of a value and its text, to the arguments for which they are listed."""
     def found(export, name, path=()):
         if export["name"] in path or all(a["name"] != name for a in export["arguments"]):
             raise ValueError(f"has no values for {name}: {' from '.join(path) or export['name']}")
@@ -459,9 +459,9 @@ def find_values(export, by_name, introductions):
 
 
 def resolve(export, by_name, path=()):
-    """Puts into an export what it takes over from others: "inherited", the names from which it has
-    text, nearest first, "codes", "checks" (the codes in the order in which they are raised, one that
-    is raised in several places several times) and "hostStatus"."""
+    """Adds to an export the entries that depend on other exports: "inherited", the names from which it takes
+    text, nearest first, "codes", "checks" (the codes in the order in which they are raised, repeated if
+    raised in several places) and "hostStatus"."""
     if "codes" in export:
         return
     if export["name"] in path:
@@ -492,7 +492,7 @@ def resolve(export, by_name, path=()):
     own = export["nan"]
     for place in own or {}:
         if place.split(".")[0] not in names:
-            raise ValueError(f"says of {place} what a NaN does there, which is no argument")
+            raise ValueError(f"states the effect of a NaN in {place}, which is no argument")
     if own is None:
         inherited = like["nan"] if like else {}
         names -= {a["name"] for a in export["arguments"] if a.get("element") in WHOLE}
@@ -549,7 +549,7 @@ def export_of(path, statement, types, codes):
         "arguments": arguments, "documentation": documentation,
         "hasStatus": spelled(returns) == "ErrorCode" or any(
             a["kind"] == "error" or a.get("element") == "WorkspaceStatus" for a in arguments),
-        # What resolve() makes an end of.
+        # Completed by resolve().
         "as": like[1] if (like := re.match(r"As (\w+)[,.]", documentation)) else None,
         "raised": raised, "saysNone": raised == [], "nan": nan,
     }
@@ -561,7 +561,7 @@ def codes_of(path):
 
 
 def read_headers(include):
-    """The whole catalogue; `include` is the folder that holds qx/."""
+    """The whole catalogue; `include` is the folder that contains qx/."""
     folder = Path(include) / "qx"
     codes = codes_of(folder / "errors.h")
     types, exports, seen = Types(), [], {}
@@ -614,14 +614,14 @@ def definition_file(catalogue):
 
 
 def code_list(catalogue):
-    """For the conformance tests: name, "host" where the host's status may come, codes."""
+    """For the conformance tests: name, "host" if the export can return the host's status, codes."""
     return "".join(" ".join([export["name"], *["host"] * export["hostStatus"],
                              *(str(catalogue["codes"][code]) for code in export["codes"])]) + "\n"
                    for export in catalogue["exports"] if export["hasStatus"])
 
 
 def umbrella(catalogue):
-    """qx/qx.h, which includes them all."""
+    """qx/qx.h, which includes all headers."""
     headers = sorted(["qx/errors.h", "qx/types.h", *(f["header"] for f in catalogue["families"])])
     includes = "".join(f'#include "{header}"\n' for header in headers)
     return ("#ifndef QX_QX_H\n#define QX_QX_H\n\n/* Every export of the module. Written by the build. */"
@@ -629,7 +629,7 @@ def umbrella(catalogue):
 
 
 def write_if_changed(path, text):
-    """An unchanged file keeps its time, so that nothing is linked anew for it."""
+    """Leaves an unchanged file alone, so that it keeps its time and nothing is linked again."""
     path = Path(path)
     if not path.exists() or path.read_text("utf-8") != text:
         path.parent.mkdir(parents=True, exist_ok=True)
@@ -638,7 +638,7 @@ def write_if_changed(path, text):
 
 def main(arguments=None):
     parser = argparse.ArgumentParser(description=__doc__.split("\n")[0])
-    parser.add_argument("include", help="the folder that holds qx/")
+    parser.add_argument("include", help="the folder that contains qx/")
     parser.add_argument("--json", metavar="FILE")
     parser.add_argument("--map", metavar="FILE")
     parser.add_argument("--def", metavar="FILE", dest="definition")

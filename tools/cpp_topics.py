@@ -1,11 +1,11 @@
 #!/usr/bin/python3
 """Writes qx/qx.hpp: the functions of the topics for C++, from the catalogue and the table of exports that
-serve the topics of Python.
+the Python topics call.
 
     cpp_topics.py CATALOGUE.json OUTPUT
 
-A key of the table is a function; its endings _complex and _single become overloads. What an export needs of
-words, plans, states and lengths is not seen by the caller.
+A key of the table is a function; keys that end in _complex and _single become overloads. The plans, states and
+lengths that an export needs are hidden from the caller.
 """
 
 import ast
@@ -17,7 +17,7 @@ from pathlib import Path
 ROOT = Path(__file__).resolve().parent.parent
 TABLE = ROOT / "python/qx/topical/newest.py"
 
-# What the topics of Python do in several calls, or under another name: in one call here.
+# Functions that the Python topics build from several calls, or have under another name, and that are one call here.
 INSTEAD = {
     "linalg": {"solve": "EqsByLUDri_head", "solve_complex": "CxEqsByLUDri_head", "lu_solve": "LULinEqs_head",
                "lu_solve_complex": "CxLULinEqs_head", "inv": "InvMatrixLUDri_head", "inv_complex": "CxInvMatrixLUDri_head",
@@ -36,8 +36,8 @@ INSTEAD = {
 }
 ENDINGS = ("_complex_single", "_complex", "_single")
 
-# What stands in an argument of a call, and is no argument here: of single calls, and of the first and the
-# later calls of a stream. Arrays and numbers that are kept from call to call are behind them.
+# Streams: the name of the class; hidden arguments, with their values in the first and in later calls (the plain
+# function makes a first call); arrays and numbers that are kept from call to call.
 STREAMS = {
     "Filter_cascade": ("CascadeStream", {"keepState": (0, 1)}, ("state",)),
     "Filter_direct": ("DirectStream", {"keepState": (0, 1)}, ("xState", "yState")),
@@ -53,7 +53,7 @@ STREAMS = {
     "zero_phase": (None, {"keepState": (0, 0)}, ("stateForward", "stateBackward")),
 }
 
-# What of an export is another function: arguments with the one value that they have there.
+# Functions that are a special case of an export: the arguments with fixed values.
 FIXED = {
     "special.gamma": {"x": 0, "selector": 1}, "special.gammainc": {"selector": 0},
     "special.beta": {"x": 0, "selector": 1}, "special.betainc": {"selector": 0},
@@ -61,8 +61,8 @@ FIXED = {
     "special.ellipe": {"phi": 0, "selector": 1}, "special.ellipeinc": {"selector": 0},
 }
 
-# Defaults by topic and argument, or by function and argument. An argument that has one stands behind those
-# that have none.
+# Defaults by topic and argument, or by function and argument: the values that the Python topics pass by
+# default. Arguments with a default come after those without one.
 DEFAULTS = {
     "filters": {"fs": "1.0", "fh": "0.0", "type": 0, "form": 0, "weights": "{}"},
     "filters.windowed": {"type": "0"},
@@ -70,39 +70,43 @@ DEFAULTS = {
     "filters.savgol_coefficients": {"wantDifferentiators": "1"},
     "fft": {"offset": "0", "shift": "0", "rowStart": "0", "colStart": "0", "rows": "0", "cols": "0", "size": "0",
             "method": 1, "start": "0"},
+    "fft.dzt": {"size": None},
     "windows": {"param": "NAN", "scaled": "0", "symmetric": "0"},
     "signals": {"amp": "1.0", "phase": "0.0", "duty": "50.0", "interpolate": "1", "delay": "0", "dt": "1.0",
                 "algorithm": 1, "normalization": 0, "outputSize": 0, "mode": 0, "correlate": "0", "excludeEnd": "0",
                 "scale": 0, "dBReference": "6.0"},
-    "noise": {"state": "{}", "spare": "{}", "cache": "{}", "unbiased": "1", "amplitude": "1.0", "sigma": "1.0",
-              "stream": "0", "position": "0.0"},
+    "noise": {"state": "{}", "amplitude": "1.0", "sigma": "1.0", "stream": "0", "position": "0.0"},
     "multirate": {"mode": 3, "gain": "1", "removeDelay": "0", "average": "0", "alternate": "0", "differentialDelay": "1",
                   "sampleRate": "1.0"},
-    "linalg": {"matrixType": 0, "output": 1, "tolerance": "-1.0", "normType": 0, "p": "2.0", "relative": "1",
-               "hermitian": "1", "fullSize": "0", "economy": 1, "pivoting": "0", "wantVectors": "1", "order": 0,
+    "linalg.is_symmetric": {"tolerance": "0.0"}, "linalg.norm": {"normType": 2},
+    "linalg": {"matrixType": 0, "output": 1, "tolerance": "-1.0", "normType": 0, "p": "2.0", "relative": "0",
+               "hermitian": "1", "fullSize": "1", "economy": 1, "pivoting": "0", "wantVectors": "1", "order": 0,
                "job": 3, "useUpper": "0", "triangle": 0, "y": "{}"},
-    "poly": {"order": "1", "constant": "0.0", "tolerance": "0.0", "mode": 0, "refine": "1"},
+    "poly": {"order": "1", "constant": "0.0", "tolerance": "1e-10", "mode": 1, "refine": "1"},
     "special": {"scaled": "0"},
     "fit": {"w": "{}", "lower": "{}", "upper": "{}", "guess": "{}", "fixedOrders": "{}", "fixedValues": "{}",
-            "tolerance": "1e-8", "iterations": "500", "method": 0, "algorithm": 0, "wantCovariance": "1",
+            "tolerance": "1e-12", "iterations": "2000", "floor": "0.0", "method": 0, "wantCovariance": "1",
             "confidence": "0.95", "deviations": "{}", "parameter": "0.0", "interiorKnots": "{}", "base": "2.71828"},
     "fit.linear": {"tolerance": "-1.0"}, "fit.polynomial": {"tolerance": "-1.0"},
-    "fit.Fit_covariance": {"tolerance": "-1.0"},
     "interpolate": {"firstSlope": "1e30", "lastSlope": "1e30"},
-    "calculus": {"dt": "1.0", "rule": 1, "initial": "{}", "final": "{}"},
+    "calculus": {"dt": "1.0", "rule": 1}, "calculus.integrate": {"rule": 3},
     "calculus.derivative": {"rule": 0},
     "stats.mode": {"intervals": "0"},
     "stats": {"alpha": "0.05", "significance": "0.05", "what": 0, "tail": 0},
-    "measure": {"t0": "0.0", "dt": "1.0", "limit": 1, "bins": "256", "method": 0, "hist": "{0, 256}", "order": 0,
-                "centre": "-1.0", "halfWidth": "0.0", "hysteresis": "0.0", "slope": 0, "start": "0", "holdoff": "0",
-                "state": "{}", "polarity": 1, "partial": "0", "fundamental": "0.0", "fullScale": "0.0"},
-    "coordinates": {"sequence": 9},
+    "measure": {"t0": "0.0", "dt": "1.0", "limit": 0, "bins": "256", "method": 2, "hist": "{2, 100}", "order": 0,
+                "ref": "{90, 50, 10, 1}", "centre": "0.0", "halfWidth": "0.0", "hysteresis": "0.0", "slope": 0,
+                "start": "0", "holdoff": "0", "state": "{}", "polarity": 1, "partial": "0",
+                "fundamental": "0.0", "fullScale": "0.0"},
+    "coordinates": {"sequence": 10},
 }
+
+# Sizes whose default, 0, means the size of the input.
+SIZES = {"fft.fft2": {"rows": "in.rows", "cols": "in.cols"}, "fft.fft2_real": {"rows": "in.rows", "cols": "in.cols"}}
 
 TYPES = {"DBL": "double", "CDB": "std::complex<double>", "I32": "int32_t", "U32": "uint32_t", "SGL": "float",
          "CSG": "std::complex<float>", "U8": "uint8_t", "I16": "int16_t", "U16": "uint16_t"}
 KEYWORDS = {"and", "or", "not", "xor", "default", "double", "float", "new", "delete", "auto", "union", "this", "void"}
-# Names for choices whose text is none, by how it begins.
+# Enumerators for choices whose text does not yield a name, by the beginning of the text.
 NAMES = {
     "second-order sections": "second_order", "sections of second order": "second_order",
     "fourth-order sections": "fourth_order", "sections of fourth order": "fourth_order",
@@ -113,19 +117,20 @@ NAMES = {
     "the full result": "full", "the size of x": "size_of_x", "the part where y": "valid",
     "L times the rate": "interpolate", "every M-th output of mode 0": "decimate", "every M-th output of mode 1": "rational",
     "does nothing": "none", "permutes rows": "permute", "multiplies rows": "scale", "does both": "both",
-    "right eigenvectors": "right", "left ones": "left",
+    "right eigenvectors": "right", "left eigenvectors": "left",
     "the largest singular value": "two", "the largest column sum": "one", "the root of the sum": "frobenius",
     "the largest row sum": "infinity", "the quotient of the largest": "two",
-    "vectors of unit length": "vectors", "no vectors": "values_only", "a stays": "values_only", "a becomes": "vectors",
-    "a general matrix": "general", "a Hermitian one": "hermitian",
-    "q of m by m": "full", "q of m by k": "economy", "r of k by n": "r_only",
+    "vectors of unit length": "vectors", "no vectors": "values_only", "a is unchanged": "values_only",
+    "a becomes": "vectors",
+    "a general matrix": "general", "a Hermitian matrix": "hermitian",
+    "q is m by m": "full", "q is m by k": "economy", "r is k by n": "r_only", "unsorted": "as_they_come",
     "with ascending real": "ascending_real", "with descending real": "descending_real",
     "with ascending mod": "ascending_modulus", "with descending mod": "descending_modulus",
     "a x + x b = c": "sylvester", "a x - x b = c": "difference", "a x b - x = c": "stein",
     "a x + x a'": "continuous", "a x a' - x": "discrete",
     "identity of": "identity", "diagonal with": "diagonal", "Toeplitz with": "toeplitz", "companion of": "companion",
     "y[i][j] =": "elements", "y = p[0] I": "matrix",
-    "LU factorisation": "lu", "Cholesky factorisation": "cholesky", "singular values without": "rank_revealing",
+    "LU factorisation": "lu", "Cholesky factorisation": "cholesky", "singular values, of": "rank_revealing",
     "lambda by": "cross_validation", "lambda is": "given_lambda", "the smoothest": "given_residual",
     "(x[i+1] - x[i-1])": "central2", "(x[i-2] - 8": "central4", "(x[i+1] - x[i]) /": "forward",
     "(x[i] - x[i-1]) /": "backward",
@@ -133,7 +138,7 @@ NAMES = {
     "the logarithm of the survival": "logsf", "the density": "pdf",
     "the automatic method takes": "both_or_neither", "by falling amp": "amplitude", "by rising freq": "frequency",
 }
-# Of choices that their header names elsewhere.
+# Enumerators of choices that the header describes elsewhere.
 NUMBERED = {
     "rule": ["trapezoid", "simpson", "simpson38", "bode", "left_rectangles", "right_rectangles"],
     ("measure", "method"): ["histogram", "peak", "automatic"],
@@ -161,13 +166,13 @@ def enumerator(topic, argument, value, text):
 
 
 class Topic:
-    """What is written of a topic: enumerations first, then functions and streams."""
+    """The text of a topic: enumerations first, then functions and streams."""
 
     def __init__(self, name):
         self.name, self.enumerations, self.signatures = name, {}, {}
 
     def enumeration(self, function, argument):
-        """The name of the type of an argument that chooses, the same for the same choices."""
+        """The name of the enumeration of an argument; equal choices share an enumeration."""
         kind, values, enumerators = TYPES[argument["element"]], argument["values"], []
         for value, text in values:
             one = enumerator(self.name, argument["name"], value, text)
@@ -191,7 +196,7 @@ class Topic:
 
 
 class Argument:
-    """What an argument of an export is here: its type among the parameters and how it is handed over."""
+    """An argument of an export in C++: the type of its parameter and how it is passed on."""
 
     def __init__(self, topic, function, argument):
         self.raw, self.name, self.kind = argument, argument["name"], argument["kind"]
@@ -222,7 +227,7 @@ class Argument:
 
     @property
     def owner(self):
-        """The type of the array of the host."""
+        """The type that owns the array of the host."""
         if self.is_records:
             return f"detail::Records<{self.element}, {self.raw['type']}>"
         return {1: f"detail::Array1<{self.type}>", 2: f"detail::Array2<{self.type}>",
@@ -234,7 +239,7 @@ class Argument:
         return {1: f"std::vector<{self.type}>", 2: f"Matrix<{self.type}>"}.get(self.dimensions, self.type)
 
     def declared(self, value):
-        """A local variable that is handed to the export, before the call."""
+        """The declaration of the local variable that is passed to the export."""
         name = self.name
         if self.is_array:
             inside = f', "{name}", {value}' if value is not None else ""
@@ -249,7 +254,7 @@ class Argument:
 
     @property
     def handed(self):
-        """What stands in the call of the export."""
+        """The argument in the call of the export."""
         if self.is_array:
             return f"{self.name}_.handle()"
         if self.kind == "slot":
@@ -258,12 +263,12 @@ class Argument:
 
     @property
     def found(self):
-        """The value behind the call, of what is no array."""
+        """The value after the call, of an argument that is not an array."""
         return f"detail::FromC({self.name}_)" if self.element == "CDB" else f"{self.name}_"
 
 
 def blames(export, names):
-    """Pairs of a code and the argument that its reason names first."""
+    """Pairs of a code and the first argument that its reason names."""
     sentence = re.search(r"\bCodes:(.*)", " ".join(export["text"].split()))
     found = {}
     for code, reason in re.findall(r"((?:Err|Warn)\w+) \(((?:[^()]|\([^()]*\))*)\)", sentence[1] if sentence else ""):
@@ -279,10 +284,10 @@ def blames(export, names):
 
 class Function:
     def __init__(self, topic, key, base, export):
-        self.topic, self.key, self.export, self.name = topic, key, export, snake(base)
+        self.topic, self.key, self.base, self.export, self.name = topic, key, base, export, snake(base)
         stream = STREAMS.get(base)
         self.stream, begins, kept = stream if stream else (None, {}, ())
-        # Overloads: of the same name, but where their arguments are the same.
+        # Overloads have the same name, unless their arguments are the same.
         self.ending = camel(key[len(base):]) if key != base else ""
         if self.stream:
             self.stream = self.stream.replace("Stream", f"{self.ending}Stream")
@@ -317,7 +322,7 @@ class Function:
             return None
         return value if value != "{}" or argument.is_array or argument.kind == "record" else None
 
-    # The pieces of the text.
+    # Pieces of the text.
 
     def parameters(self, defaults=True, of=None):
         return ", ".join(f"{one.parameter}{'' if one.parameter.endswith('&') else ' '}{one.name}"
@@ -340,7 +345,7 @@ class Function:
         call = f"::{self.export['name']}({', '.join(arguments)})"
         has_error = any(one["kind"] == "error" for one in self.export["arguments"])
         if has_error:
-            # What the function itself returns is the host's status, where it is not 0.
+            # The function itself returns the host's status, if that is not 0.
             return f"ErrorCode code = QXSuccess;\n    const int32_t status = {call};\n" \
                    "    code = code == QXSuccess ? status : code;\n"
         if self.export["returns"] == "ErrorCode" or self.export["hasStatus"]:
@@ -360,7 +365,8 @@ class Function:
             if one.name in self.begins:
                 value = str(self.begins[one.name][0])
             elif one in self.inputs:
-                value = one.name
+                size = SIZES.get(f"{self.topic.name}.{self.name}", {}).get(one.name)
+                value = f"{one.name} == 0 ? static_cast<int32_t>({size}) : {one.name}" if size else one.name
             else:
                 value = None
             lines.append(one.declared(value))
@@ -451,9 +457,10 @@ class Function:
         room = "" if y is x else "        y_.reserve(call, block.size());\n"
         member_lines = "".join(f"    {one}\n" for one in members)
         place = f"{self.topic.name}::{self.stream}"
-        return f"""// {self.name} for blocks of any size: all blocks together give the bits of one. A block that is no longer
-// than the longest before it, or than `longest`, takes no memory but for the scratch memory of the export, which
-// comes from the workspace where that is on (qx/frame.h). One stream serves one thread at a time.
+        return f"""// {self.name} for blocks of any size; the results do not depend on the division into blocks, to the bit.
+// A block that is not longer than the longest before it, or than `longest`, allocates no memory except the scratch
+// memory of the export, which is taken from the workspace if that is enabled (qx/frame.h). A stream may be used by
+// only one thread at a time.
 class {self.stream} {{
 public:
     explicit {self.stream}({parameters}{', ' if parameters else ''}std::size_t longest = 0) {{
@@ -462,7 +469,7 @@ public:
 {''.join(reserving)}        made_ = call.status();
     }}
 
-    // The next block, and the part of `out` that it fills. `out` may be the block itself.
+    // Processes the next block and returns the part of `out` that is filled. `out` may be the block itself.
     Returned<std::span<{y.type}>> operator()(Returning, std::span<const {x.type}> block, std::span<{y.type}> out) {{
         const Returned<std::span<const {y.type}>> found = step(block);
         detail::Call call("{place}");
@@ -479,7 +486,7 @@ public:
         const std::span<const {y.type}> found = step(block).value();
         return std::vector<{y.type}>(found.begin(), found.end());
     }}
-    // Begins anew.
+    // Restarts the stream.
     void reset() {{
         begun_ = false;
 {reset}    }}
@@ -525,7 +532,7 @@ RECORDS = {}
 def text(catalogue):
     RECORDS.update(catalogue["records"])
     by_name = {export["name"]: export for export in catalogue["exports"]}
-    for export in by_name.values():  # with the codes of what it is like
+    for export in by_name.values():  # with the codes of the export that it is documented as
         export["text"] = export["documentation"]
         if "Codes:" not in export["text"] and export["as"]:
             export["text"] += " " + by_name[export["as"]]["documentation"]
@@ -544,7 +551,7 @@ def text(catalogue):
                 left_out.append(f"//   {name}.{key}, {export}: {error}\n")
         enumerations = "\n".join(map(topic.enumeration_text, topic.enumerations))
         bodies.append(f"namespace {name} {{\n\n{enumerations}\n" + "\n".join(written) + f"\n}} // namespace {name}\n")
-    return HEAD + "// Not here, since they need more than one call:\n" + "".join(left_out) + \
+    return HEAD + "// Not included, because they need more than one call:\n" + "".join(left_out) + \
         "\nnamespace qx {\n\n" + "\n".join(bodies) + "\n} // namespace qx\n\n#endif\n"
 
 
@@ -556,15 +563,15 @@ HEAD = """#ifndef QX_QX_HPP
 //     std::vector<double> x = ...;
 //     double mean = qx::stats::mean(x);                           // a failure is thrown, qx::Error
 //     auto mean = qx::stats::mean(qx::returned, x);               // a failure is returned: if (!mean) ...
-//     qx::fft::fft(qx::into(spectrum), x);                        // into memory of the caller's
+//     qx::fft::fft(qx::into(spectrum), x);                        // into memory of the caller
 //     qx::filters::CascadeStream stream(a, b);                    // stream(block, out), block by block
 //
-// Arrays go in as spans of anything that lies in one piece, matrices as MatrixView row after row; both are
-// copied once, into an array of the host. What an export changes in place comes back as a result. Several
-// results are a record with the names of the export's arguments. Numbers that choose are enumerations.
-// Warnings, positive codes, are in the status of what is returned and throw nothing.
+// Arrays are passed as spans of contiguous elements, matrices as MatrixView, stored row by row; both are copied
+// once, into an array of the host. An array that an export changes in place is returned as a result. Several
+// results are returned as a record with the names of the export's arguments. Selectors are enumerations.
+// Warnings (positive codes) are in the returned status and do not throw.
 //
-// Everything may be called from any thread. Plans of transforms are kept for each function and thread.
+// All functions may be called from any thread. Plans of transforms are kept for each function and thread.
 
 #include "qx/calls.hpp"
 #include "qx/peak_finder.hpp"

@@ -1,9 +1,9 @@
 #!/usr/bin/python3
-"""Writes docs/topics.md: each export with the function of a topic that serves it, or why there is none.
+"""Writes docs/topics.md: each export with the topic functions that call it, or the reason why none does.
 
     topics_table.py [--check]
 
-With --check nothing is written, and the status tells whether the page is up to date.
+With --check, nothing is written, and the exit status is 0 if the page is up to date.
 """
 
 import fnmatch
@@ -17,8 +17,8 @@ from qx.topical.newest import NEWEST, TOPICS, function_of  # noqa: E402
 
 PAGE = ROOT / "docs/topics.md"
 ELDER, TWIN, HOST = "elder, for comparison", "for hosts: plan in instance data", "for hosts"
-# What the table of topical/newest.py does not name, by patterns in order: the functions that do the same by
-# another export, and a remark.
+# Exports that the table of topical/newest.py does not name: patterns, tried in order, with the function that does
+# the same through another export, or a remark.
 OTHERS = (
     ("*_IDP", TWIN), ("*UnreserveProc measurements_* *AnalysisWorkspaceH SetQXRTModule *_oxfft_table", HOST),
     ("InitialMatrixH CxInitialMatrixH *Aligned*", HOST),
@@ -46,7 +46,7 @@ OTHERS = (
      "linalg.solve"),
     ("*GenLinEqs*", "linalg.lstsq"), ("*InvMatrix* PreallocInv*", "linalg.inv"),
     ("Cholesky_head CxCholesky_head", "linalg.cholesky"), ("*qrd_head *QRDecH", "linalg.qr"),
-    ("*EigenValueVector_head", "linalg.eig"),
+    ("*EigenValueVector_head", "linalg.eig"), ("SymEvectorEvalue_head", "linalg.eigh"),
     ("*SVD_head *SVDEx_head", "linalg.svd"),
     ("*SVDS_head", "linalg.svdvals"), ("*MatrixExp_head", "linalg.expm"), ("*PseudoInverse_head", "linalg.pinv"),
     ("Norm_head CxNorm_head", "linalg.norm"),
@@ -81,7 +81,7 @@ OTHERS = (
 
 
 def served():
-    """The functions that call each export."""
+    """The topic functions that call each export."""
     found = {}
     for topic in TOPICS:
         for key, export in NEWEST.get(topic, {}).items():
@@ -96,14 +96,14 @@ def remark(name):
         if any(fnmatch.fnmatchcase(name, pattern) for pattern in patterns.split()):
             return text if text in (TWIN, HOST) else f"{text} ({ELDER})" if "." in text and "NumPy" not in text \
                 else text
-    raise LookupError(f"nothing serves {name}: name it in topical/newest.py or in {Path(__file__).name}")
+    raise LookupError(f"no topic function calls {name}: add it to topical/newest.py or to {Path(__file__).name}")
 
 
 def page():
     functions = served()
     lines = ["# Exports and topics", "",
-             "Each export with the functions of the Python topics that call it. Another revision or form of what a",
-             "topic calls is an elder, kept for comparison; `qx.exports` has all of them. Written by",
+             'Each export, with the functions of the Python topics that call it. Exports marked "elder, for comparison" are',
+             "other revisions or forms of those that the topics call; `qx.exports` has all exports. Written by",
              "`tools/topics_table.py` from `python/qx/topical/newest.py`.", ""]
     for family in library().catalogue["families"]:
         names = [name for name, entry in library().entries.items() if entry["family"] == family["name"]]

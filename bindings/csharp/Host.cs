@@ -3,7 +3,7 @@ using System.Runtime.InteropServices;
 
 namespace QX
 {
-    /// <summary>The stand-in host: it makes the arrays of the exports and has the texts of the codes.</summary>
+    /// <summary>The stand-in host: it creates the arrays of the exports and provides the texts of the codes.</summary>
     public static class Host
     {
         public const int I32 = 3, U8 = 5, U32 = 7, SGL = 9, DBL = 10, CSG = 12, CDB = 13;
@@ -28,7 +28,7 @@ namespace QX
         public static string ErrorName(int code) { return Marshal.PtrToStringAnsi(QXHostErrorName(code)); }
         public static string ErrorText(int code) { return Marshal.PtrToStringAnsi(QXHostErrorText(code)); }
 
-        /// <summary>An array of numbers, given back by QXHostFree.</summary>
+        /// <summary>An array of numbers, to be freed by QXHostFree.</summary>
         public static IntPtr Array(params double[] values)
         {
             IntPtr handle = QXHostCopy1D(DBL, values.Length, values);
@@ -37,7 +37,7 @@ namespace QX
             return handle;
         }
 
-        /// <summary>The elements of an array of numbers of one dimension.</summary>
+        /// <summary>The elements of a one-dimensional array of numbers.</summary>
         public static double[] Elements(IntPtr handle)
         {
             IntPtr block = Marshal.ReadIntPtr(handle);

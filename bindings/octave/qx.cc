@@ -1,4 +1,4 @@
-// qx ("NAME", INPUT...): calls an export with its inputs in their order and returns its outputs in theirs.
+// qx ("NAME", INPUT...): calls an export with its inputs in order and returns its outputs in order.
 //
 //     mean = qx ("Mean_head", [1 2 4]);
 //     [values, vectors] = qx ("EigenValueVector_head", [2 1; 1 3], 1);
@@ -17,7 +17,7 @@ namespace {
 
 [[noreturn]] void wrong(const std::string &what) {
     error("%s", what.c_str());
-    throw std::logic_error(what); // which error does not come back from
+    throw std::logic_error(what); // error does not return
 }
 
 // The inputs of a call.
@@ -65,7 +65,7 @@ private:
             wrong("qx: no memory");
         return made;
     }
-    // As they lie there, or row after row.
+    // In the order of Octave's matrix, or row by row.
     template <class T>
     std::vector<T> elements(int i, bool byRows) const {
         std::vector<T> all;

@@ -1,17 +1,15 @@
-"""What arguments are that the texts of the headers do not name, by family and name."""
+"""Descriptions of arguments that the texts of the headers do not name, by family and name."""
 
 TEXTS = {
     "anova": {
         "chiSquare": "The statistic.",
-        "critical": "The values that f exceeds with probability significance, one to a source.",
-        "fCritical": "The value that f exceeds with probability alpha.",
         "denominatorDegrees": "The degrees of freedom of the denominator of each f.",
         "labelsC": "The level of each observation in the third factor.",
         "levelsC": "The number of levels of the third factor.",
         "sumsOfSquares": "The sum of squares of each source.", "meanSquares": "The mean square of each source.",
         "ssBetween": "The sum of squares between levels.", "msBetween": "The mean square between levels.",
         "ssError": "The sum of squares within levels.", "msError": "The mean square within levels.",
-        "ssTotal": "The sum of squares about the mean of all."},
+        "ssTotal": "The sum of squares about the overall mean."},
     "bounded_fits": {"a": "The first parameter of the model.",
                      "meanAbsResidual": "The mean of the absolute residuals."},
     "coordinates": {
@@ -21,7 +19,7 @@ TEXTS = {
            for word in ("First", "Second", "Third")},
         **{f"new{axis}": f"The {axis.lower()} coordinates of the rotated points." for axis in "XYZ"}},
     "dct_dst": {"cols": "The number of columns.", "out": "The transformed matrix."},
-    "decimation": {"alternate": "Not 0 for unit gain at half the sampling rate in place of 0.", "y": "The result."},
+    "decimation": {"alternate": "Not 0 for unit gain at half the sampling rate, not at 0.", "y": "The result."},
     "eigenproblems": {"values": "The eigenvalues."},
     "fft": {"out": "The transform."},
     "fft2d": {"out": "The transform."},
@@ -39,15 +37,13 @@ TEXTS = {
         "a": "The matrix of the system.", "lower": "The diagonal below the main one, of the factors.",
         "upper": "The diagonal above the main one, of the factors.",
         "upper2": "The second diagonal above the main one, of the factors.",
-        "tolerance": "Singular values up to this part of the largest one count as 0.", "x": "The solution."},
+        "tolerance": "Singular values up to this fraction of the largest one count as 0.", "x": "The solution."},
     "matrix_factorisations": {"a": "The packed triangle."},
-    "matrix_properties": {"isSemiDefinite": "1 if the matrix is positive semidefinite, else 0."},
     "model_fits": {
-        "a": "The factor of the model.", "deviations": "The standard deviations of the samples.",
-        "method": "0 for the method of the export without a number in its name; any other goes on from there.",
+        "a": "The factor of the model.",
         "mse": "The mean squared error.",
         "w": "The weights of the samples."},
-    "noise": {"cache": "What is kept from call to call; all 0 before the first.", "x": "The numbers."},
+    "noise": {"cache": "What is kept between calls; all 0 before the first.", "x": "The numbers."},
     "peaks": {"request": "The block, what to look for, and what is found."},
     "polynomial_roots": {
         "bairstowMaxIterations": "The limit of Bairstow's iterations.",
@@ -57,7 +53,7 @@ TEXTS = {
         "realGuesses": "Starting values of real roots.", "complexGuesses": "Starting values of complex roots."},
     "pulses": {
         "high": "The upper state.", "highRef": "The upper reference level.", "midRef": "The middle reference level.",
-        "lowRef": "The lower reference level.", "hist": "How the states are found from a histogram.",
+        "lowRef": "The lower reference level.", "hist": "The method for the levels of the states, and the bins.",
         "ref": "The reference levels, as numbers or in percent of the amplitude.",
         "preUndershoot": "The undershoot before the transition.", "preOvershoot": "The overshoot before the transition.",
         "postUndershoot": "The undershoot after the transition.",
@@ -68,12 +64,10 @@ TEXTS = {
     "special_bessel": {"ai": "Ai(x).", "aip": "Ai'(x).", "bi": "Bi(x).", "bip": "Bi'(x)."},
     "special_integrals": {"c": "The cosine integral C(x)."},
     "special_matrices": {"a": "The packed matrix."},
-    "tones": {"amplitudes": "The amplitudes of the tones.", "phases": "The phases of the tones."},
     "waveforms": {"amp": "The amplitude."},
     "window_constants": {"param": "The parameter of the windows that have one."},
     "windows": {"param": "The parameter of the windows that have one."},
     "zero_phase": {
-        "a": "The coefficients of the feedback.",
         **{f"{kind}{way}": f"The state of the {what} of the pass {to}."
            for kind, what in (("state", "sections"), ("xState", "input"), ("yState", "output"))
            for way, to in (("Forward", "forwards"), ("Backward", "backwards"))}},

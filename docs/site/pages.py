@@ -30,7 +30,7 @@ ELEMENTS = {"DBL": "double", "SGL": "float", "CDB": "complex double", "CSG": "co
 DIRECTIONS = {"in": "input", "out": "output", "inout": "changed in place"}
 # What arguments of these kinds are, whatever their name.
 KINDS = {"error": "The code of the call.",
-         "slot": "Where the call site keeps its plan from call to call; null before the first.",
+         "slot": "Where the call site keeps its plan between calls; null before the first.",
          "instance": "Instance data of the call site, null before the first call."}
 
 
@@ -97,7 +97,7 @@ def without_codes(text):
 
 
 def reasons(entry):
-    """Why each code is raised, as the text says it, those that are taken over from others included."""
+    """Why each code is raised, as the text says it, including codes inherited from other exports."""
     entries = library().entries
     found = {}
     sentence = without_codes(entry["documentation"])[1]
@@ -155,7 +155,7 @@ def texts_of(entry):
 
 
 def meaning(entry, argument):
-    """What the texts say of an argument: its values, or the sentence in which it is first named."""
+    """What the texts say about an argument: its values, or the sentence in which it is first named."""
     if values := argument.get("values"):
         return "; ".join(f"{value}: {text}" if text else f"{value}" for value, text in values) + "."
     if argument["kind"] in KINDS:
@@ -229,7 +229,7 @@ def functions_linked(functions):
 
 
 def revisions():
-    """Pairs of elders and revisions of docs/revisions.md that this build has both of."""
+    """Pairs of elders and revisions of docs/revisions.md of which this build has both."""
     known = library().entries
     pairs = []
     for line in (ROOT / "docs/revisions.md").read_text("utf-8").split("\n"):
@@ -241,7 +241,7 @@ def revisions():
 
 
 def standing(entry, served, pairs):
-    """Who uses the export, or what has taken its place."""
+    """What calls the export, or what has replaced it."""
     name, out = entry["name"], []
     if name in served:
         out.append(f"In Python: {functions_linked(served[name])}.")

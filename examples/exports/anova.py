@@ -39,8 +39,8 @@ for name, squares, degrees, _, f, p, _, critical in zip(["material", "temperatur
 # Three factors, of which two are random
 # --------------------------------------
 
-# Four machines of the plant are compared; operators and days are drawn from many. A machine is tested by a
-# combination of mean squares with degrees of freedom of its own.
+# Four machines of a plant are compared; operators and days are random samples. The machines are tested against a
+# combination of mean squares, which has its own degrees of freedom.
 rng = np.random.default_rng(1)
 machine, operator, day, _ = (index.ravel() for index in np.indices((4, 5, 3, 2), dtype=np.int32))
 y = 0.8 * machine + rng.normal(0, 0.5, (4, 5))[machine, operator] + rng.normal(0, 0.5, (4, 3))[machine, day] \

@@ -25,8 +25,8 @@ y, z = np.meshgrid(np.linspace(0, 1, 9), np.linspace(0, 2, 9), indexing="ij")
 print(qx.NumerIntegration2D_head(y * z**2, [0.25, 0.125], 1), "for", 0.5 * 8 / 3)
 
 # %%
-# There and back
-# --------------
+# Integral and derivative
+# -----------------------
 
 import matplotlib.pyplot as plt
 t = np.linspace(0, 2, 201)

@@ -7,16 +7,16 @@ import numpy as np
 import qx
 
 # %%
-# Direct sums and transforms give the same, to rounding
-# -----------------------------------------------------
+# Direct sums and transforms agree to rounding error
+# --------------------------------------------------
 
 x, y = np.array([1.0, 2, 3, 4]), np.array([1.0, -1])
 print(qx.Convolution(x, y, 0))
 print(qx.Convolution(x, y, 1).round(12))
 
 # %%
-# Where an echo is
-# ----------------
+# Finding an echo
+# ---------------
 
 import matplotlib.pyplot as plt
 noise = np.random.default_rng(5)
@@ -33,8 +33,8 @@ top.set(ylabel="Received")
 bottom.set(xlabel="Lag (samples)", ylabel="Correlation")
 
 # %%
-# A convolution undone
-# --------------------
+# Deconvolution
+# -------------
 
 blurred = qx.Convolution(x, [4.0, 2, 1], 0)
 print(qx.Deconvolution(blurred, [4.0, 2, 1]).round(12))

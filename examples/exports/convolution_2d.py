@@ -23,8 +23,8 @@ for axis in axes:
     axis.set_axis_off()
 
 # %%
-# Where a pattern lies
-# --------------------
+# Locating a pattern
+# ------------------
 
 noise = np.random.default_rng(3)
 field = noise.normal(size=(60, 80))

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# A point seen from a turned system
-# ---------------------------------
+# A point in a rotated coordinate system
+# --------------------------------------
 
 # Yaw, pitch and roll of a camera, in radians; the point is two metres ahead and one to the left.
 x, y, z = qx.CoordRotationEuler_head([2.0], [1.0], [0.0], 0.3, -0.1, 0.0)

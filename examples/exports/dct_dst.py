@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# Few cosines carry a smooth signal
-# ---------------------------------
+# A few cosines represent a smooth signal
+# ---------------------------------------
 
 x = np.exp(-np.linspace(-2, 2, 200)**2)
 coefficients = qx.DCT_1DH(x, 0)

@@ -7,16 +7,16 @@ import numpy as np
 import qx
 
 # %%
-# A block: picks and means
-# ------------------------
+# A block: every n-th sample, or means of groups
+# ----------------------------------------------
 
 x = np.arange(10.0)
 print(qx.DecimateCIN(x, 3, 0))
 print(qx.DecimateCIN(x, 3, 1))
 
 # %%
-# A stream: what is left of a group goes into the next block
-# ----------------------------------------------------------
+# A stream: an incomplete group continues in the next block
+# ---------------------------------------------------------
 
 start = count = total = 0
 for block in (x[:4], x[4:5], x[5:]):
@@ -33,7 +33,7 @@ impulse[0] = 1
 frequency = np.arange(257) / 512
 figure, axes = plt.subplots(figsize=(8, 2.6))
 for stages in (1, 2, 4):
-    # Every phase of the decimated impulse response, put together again.
+    # The phases of the decimated impulse response, interleaved again.
     response = np.zeros(512)
     for phase in range(8):
         y, *_ = qx.CICDecimatorByMovH(impulse, [], stages, 8, 1, 0, 1, phase)

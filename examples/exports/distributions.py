@@ -16,16 +16,16 @@ print("quantile of that probability      ", qx.InvTdist_head(qx.TDist_head(2.5, 
 print("chi-square, 95 % point, 4 degrees ", qx.InvChiSquare_head(0.95, 4))
 
 # %%
-# Student's distribution nears the normal one
-# -------------------------------------------
+# Student's distribution approaches the normal distribution
+# ---------------------------------------------------------
 
 t = np.linspace(-4, 4, 200)
 curves(t, {**{f"dof {dof}": qx.TDist_head(t, dof) for dof in (1, 3, 10)},
            "normal": qx.NormDist_head(t)}, xlabel="t")
 
 # %%
-# Chi-square and Fisher's distribution
-# ------------------------------------
+# Chi-square and F distributions
+# ------------------------------
 
 x = np.linspace(0, 20, 300)
 curves(x, {f"dof {dof}": qx.ChiSquare_head(x, dof) for dof in (1, 2, 5, 10)},

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# A narrow band of a long spectrum, without the rest of it
-# --------------------------------------------------------
+# A narrow band of a long spectrum, without computing the rest
+# ------------------------------------------------------------
 
 x = np.cos(2 * np.pi * 1000.25 * np.arange(4096) / 4096)
 _, band = qx.ReDZTH(x, 4, 4096, 4 * 1000 - 4, 9)

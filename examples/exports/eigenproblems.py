@@ -32,8 +32,8 @@ for mode in range(3):
 axes.legend()
 
 # %%
-# Schur form with eigenvalues of falling modulus
-# ----------------------------------------------
+# Schur form with eigenvalues in order of decreasing modulus
+# ----------------------------------------------------------
 
 a = np.array([[1.0, 2, 0], [-3, 1, 1], [0, 1, 5]])
 t, u, w = qx.Schur80_head(a, 1, 4)

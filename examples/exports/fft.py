@@ -16,16 +16,16 @@ spectrum = qx.ReOXFFTH80(x, 0, n, 0)
 print("amplitude", 2 * abs(spectrum[50]) / n, " phase", np.angle(spectrum[50]))
 
 # %%
-# There and back, with the zero frequency in the middle
-# -----------------------------------------------------
+# Forward and inverse, with the zero frequency in the middle
+# ----------------------------------------------------------
 
 spectrum = qx.ReOXFFTH80(x, 0, n, 1)
 again = qx.InvReOXFFTH80(spectrum, 1)
 print("greatest difference", np.abs(again - x).max())
 
 # %%
-# A window of the input, padded with zeros
-# ----------------------------------------
+# A section of the input, padded with zeros
+# -----------------------------------------
 
 import matplotlib.pyplot as plt
 spectrum = qx.ReOXFFTH80(x, 900, 1024, 0)

@@ -17,8 +17,8 @@ spectrum = qx.ReFFT2D_H(image, 0, 0, rows, cols, 0)
 print("mean", spectrum[0, 0].real / image.size, " amplitude", 2 * abs(spectrum[2, 5]) / image.size)
 
 # %%
-# There and back
-# --------------
+# Forward and inverse
+# -------------------
 
 again = qx.ReInvFFT2D_H(spectrum, 0)
 print("greatest difference", np.abs(again - image).max())

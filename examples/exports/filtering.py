@@ -15,8 +15,8 @@ print(qx.IIR_Filter(x, [], [1/3, 1/3, 1/3], [], [], 0)[0])
 print(qx.IIR_Filter(x, [1, -0.5], [0.5], [], [], 0)[0])
 
 # %%
-# A stream in pieces: the state goes from call to call
-# ----------------------------------------------------
+# A stream in blocks: the state is passed from call to call
+# ---------------------------------------------------------
 
 whole = qx.IIR_Filter_OneState(x, [1, -0.5], [0.5], [], 0)[0]
 first, state = qx.IIR_Filter_OneState(x[:3], [1, -0.5], [0.5], [], 0)

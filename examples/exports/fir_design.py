@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# An ideal lowpass cut off, under a window of the caller's choice
-# ---------------------------------------------------------------
+# A truncated ideal lowpass, with a window that the caller chooses
+# ----------------------------------------------------------------
 
 h, _ = qx.FIRCoefs(1.0, 0.2, 0.0, 31, 0)
 windowed = qx.AllWinH(h, 2, np.nan, 0, 0)
@@ -36,8 +36,8 @@ slope = np.convolve(t**2, h, "valid") * 10
 print("within one percent:", np.allclose(slope, 2 * t[10:-9] - 0.1, rtol=0.011))
 
 # %%
-# A narrow bandpass: few taps do the work of many
-# -----------------------------------------------
+# A narrow bandpass: a few taps replace many
+# ------------------------------------------
 
 design = qx.FIRNarrowCoef_head(8000, 60, 110, 1000, 0.01, 60, 2, {})
 model, interpolator = design["model"], design["interpolator"]

@@ -8,8 +8,8 @@ import numpy as np
 import qx
 
 # %%
-# Where the line through the data may run, and where the next observations fall
-# -----------------------------------------------------------------------------
+# Confidence bounds of a fitted line, and prediction bounds of the next observations
+# ----------------------------------------------------------------------------------
 
 noise = np.random.default_rng(5).normal(size=30)
 x = np.linspace(0, 10, 30)
@@ -28,8 +28,8 @@ axes.plot(x, slope * x + intercept, color="#2f6db3")
 axes.legend(frameon=False)
 
 # %%
-# Bounds elsewhere: samples of weight 0 have bounds and change nothing
-# --------------------------------------------------------------------
+# Bounds at other points: samples of weight 0 have bounds and do not change the fit
+# ---------------------------------------------------------------------------------
 
 w = np.append(np.ones(30), 0)
 low, high = qx.PredBndLinear_head(np.append(x, 15), np.append(y, 0), w, line, 0.95)
@@ -54,8 +54,8 @@ for name, curve, c, base in models:
           f"curve {high[10] - low[10]:.4f}, observation {next_high[10] - next_low[10]:.4f}")
 
 # %%
-# Polynomials and any terms
-# -------------------------
+# Polynomials and arbitrary terms
+# -------------------------------
 
 data = 1 - 2 * x + 0.6 * x**2 + noise
 _, c, _ = qx.PolyFit_head(x, data, 2, 1)

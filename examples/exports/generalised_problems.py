@@ -7,7 +7,7 @@ import numpy as np
 import qx
 
 # %%
-# Frequencies of masses on springs: stiffness v = square of frequency mass v
+# Frequencies of masses on springs: stiffness v = (frequency squared) mass v
 # --------------------------------------------------------------------------
 
 stiffness = np.array([[3.0, -1, 0], [-1, 2, -1], [0, -1, 1]])

@@ -22,8 +22,8 @@ axes.legend(frameon=False)
 axes.set(xlabel="Time (s)", ylabel="Amplitude")
 
 # %%
-# The Hartley transform is its own inverse but for 1/n
-# ----------------------------------------------------
+# The Hartley transform is its own inverse, up to the factor 1/n
+# --------------------------------------------------------------
 
 x = np.arange(5.0)
 print(qx.InvFHTH(qx.FHTH(x)))

@@ -19,8 +19,8 @@ axes.bar(centres, counts, width=0.9 * (centres[1] - centres[0]), color="#2f6db3"
 axes.set(title="2000 gamma variates of shape 3", xlabel="Value", ylabel="Count")
 
 # %%
-# Intervals of one's own
-# ----------------------
+# Intervals chosen by the caller
+# ------------------------------
 
 intervals = [(0.0, 1.0, 0), (1.0, 2.0, 0), (2.0, 100.0, 2)]
 counts, summary = qx.GenHistH(samples, intervals)

@@ -52,8 +52,8 @@ y2, _ = qx.IIR_Filter2(noise, 0, a2, b2, [], 0)
 print(len(a4) // 4, "and", len(a2) // 2, "sections, equal within 1e-10:", np.allclose(y4, y2, atol=1e-10))
 
 # %%
-# A narrow bandpass by poles and zeros
-# ------------------------------------
+# A narrow bandpass from poles and zeros
+# --------------------------------------
 
 a, b, zeros, poles, factor = qx.BWCoefs2026(1000.0, 1.0, 1.01, 6, 2)
 print(len(a) // 2, "sections; the greatest pole has modulus", abs(poles).max().round(9))

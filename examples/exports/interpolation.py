@@ -22,8 +22,8 @@ print(f"spline     {qx.SpInterp_head(y, x, bends, 0.1):.6f}")
 print(f"function   {1 / 1.25:.6f}")
 
 # %%
-# A polynomial through many points swings, a spline does not
-# ----------------------------------------------------------
+# A polynomial through many points oscillates, a spline does not
+# --------------------------------------------------------------
 
 t = np.linspace(-1, 1, 301)
 polynomial = [qx.PolyInterp_head(y, x, at)[0] for at in t]

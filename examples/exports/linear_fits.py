@@ -22,8 +22,8 @@ _, slope, intercept, _ = qx.LinFit_head(y, x, 1 / (1 + x))
 print(f"weighted: slope {slope:.4f}, intercept {intercept:.4f}")
 
 # %%
-# A polynomial, and one whose value at 0 is known
-# -----------------------------------------------
+# A polynomial, free and with a given value at 0
+# ----------------------------------------------
 
 z = 1 - 2 * x + 0.6 * x**2 + 0.4 * noise
 curve, c, mse = qx.PolyFit_head(x, z, 2, 0)
@@ -37,8 +37,8 @@ axes.plot(x, fixed, "--", color="#c8553d", label="c[0] = 1")
 axes.legend(frameon=False)
 
 # %%
-# Any terms: a constant and a sine of known frequency, with deviations of the coefficients
-# ----------------------------------------------------------------------------------------
+# Arbitrary terms: a constant and a sine of known frequency, with standard errors
+# -------------------------------------------------------------------------------
 
 H = np.column_stack([np.ones(40), np.sin(2 * x), np.cos(2 * x)])
 data = H @ [0.5, 2.0, -1.0] + 0.2 * noise

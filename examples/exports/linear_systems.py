@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# One right side
-# --------------
+# One right-hand side
+# -------------------
 
 a = np.array([[4.0, -2, 1], [-2, 4, -2], [1, -2, 4]])
 b = np.array([11.0, -16, 17])
@@ -44,14 +44,14 @@ axes.legend()
 axes.set(xlabel="t", ylabel="y")
 
 # %%
-# Without full rank: the shortest of all solutions
-# ------------------------------------------------
+# A rank-deficient system: the solution of minimum norm
+# -----------------------------------------------------
 
 print(qx.GenLinEqs_head(np.ones((2, 2)), np.array([2.0, 2])))
 
 # %%
-# A positive definite matrix, several right sides
-# -----------------------------------------------
+# A positive definite matrix with several right-hand sides
+# --------------------------------------------------------
 
 gram = a.T @ a
 print(qx.EqsSetByCholeskyDri_head(gram, 1, np.eye(3)))

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# Singular values of a picture, and what the first few of them keep
-# -----------------------------------------------------------------
+# Singular values of an image, and how much the first few retain
+# --------------------------------------------------------------
 
 import matplotlib.pyplot as plt
 x, y = np.meshgrid(np.linspace(-3, 3, 120), np.linspace(-2, 2, 80))
@@ -32,8 +32,8 @@ permutation, q, r = qx.QRDecH(a, 1, 1)
 print(np.round(r, 3), " a P - q r:", np.abs(a @ permutation - q @ r).max())
 
 # %%
-# Cholesky factor, with zeros above
-# ---------------------------------
+# Cholesky factor, with zeros above the diagonal
+# ----------------------------------------------
 
 print(qx.FullCholesky_head(a.T @ a))
 

@@ -21,7 +21,7 @@ axes.plot(np.arange(151) * 0.1, np.array(states)[:, 0], color="#2f6db3")
 axes.set(xlabel="time", ylabel="position")
 
 # %%
-# Back from the step to the matrix
+# From the step back to the matrix
 # --------------------------------
 
 print(np.round(qx.MatrixLn_head(step) / 0.1, 9))

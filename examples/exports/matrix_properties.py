@@ -27,8 +27,8 @@ v = np.array([[1.0], [2], [3]])
 print("semi-definite, rank", qx.CheckPosSemiDef_head(v @ v.T, -1.0))
 
 # %%
-# The condition number of Hilbert's matrix
-# ----------------------------------------
+# The condition numbers of Hilbert matrices
+# -----------------------------------------
 
 import matplotlib.pyplot as plt
 orders = np.arange(2, 12)
@@ -38,15 +38,15 @@ axes.semilogy(orders, conditions, "o-", color="#2f6db3")
 axes.set(xlabel="order", ylabel="condition number")
 
 # %%
-# Vector norms, and a vector of unit length
-# -----------------------------------------
+# Vector norms and unit vectors
+# -----------------------------
 
 x = np.array([3.0, -4, 12])
 print([qx.vectorNormH(x, p) for p in (1.0, 2.0, np.inf)])
 print(qx.unitVector_head(x))
 
 # %%
-# The characteristic polynomial, ascending
-# ----------------------------------------
+# The characteristic polynomial, coefficients in ascending order
+# --------------------------------------------------------------
 
 print(qx.MatrixCharacteristicPoly_head(a))

@@ -8,8 +8,8 @@ import numpy as np
 import qx
 
 # %%
-# An exponential: through the logarithms, then refined
-# ----------------------------------------------------
+# An exponential: fitted to the logarithms, then refined
+# ------------------------------------------------------
 
 x = np.linspace(0, 4, 60)
 noise = np.random.default_rng(7).normal(size=60)

@@ -13,13 +13,13 @@ import qx
 
 state = {"s1": 0, "s2": 0, "s3": 0}
 x, state = qx.white(5, 1.0, 42, state)       # seed 42 restarts the stream
-y, state = qx.white(5, 1.0, -1, state)       # -1 goes on with it
+y, state = qx.white(5, 1.0, -1, state)       # -1 continues it
 both, _ = qx.white(10, 1.0, 42, state)
 print(np.array_equal(np.concatenate([x, y]), both))
 
 # %%
-# Every noise with its histogram
-# ------------------------------
+# Histograms of all kinds of noise
+# --------------------------------
 
 n, seed, nothing = 20000, 7, {}
 noises = {
@@ -41,15 +41,15 @@ for name, x in noises.items():
     print(f"{name:34} mean {x.mean():7.4f}  variance {x.var():7.4f}")
 
 # %%
-# Periodic noise is flat in frequency
-# -----------------------------------
+# Periodic noise has a flat spectrum
+# ----------------------------------
 
 x, state = qx.PeriodNoise(64, 1.0, seed, state)
 print(np.round(np.abs(np.fft.rfft(x)) / 32, 12))
 
 # %%
-# Noise of 2026: any place at once, and streams of one key
-# --------------------------------------------------------
+# Noise of 2026: direct access to any position, and several streams of one key
+# ----------------------------------------------------------------------------
 
 key, stream = 42, 0
 whole = qx.Gauss2026(1000, 1.0, key, stream, 0.0)

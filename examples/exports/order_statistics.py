@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# The middle of the data, and what occurs most often
-# --------------------------------------------------
+# Median and mode
+# ---------------
 
 x = np.array([2.0, 4, 4, 4, 5, 5, 7, 90])
 print("median", qx.Median_head(x), " mean", qx.Mean_head(x))

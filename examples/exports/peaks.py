@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# The peaks of a whole record
-# ---------------------------
+# Peaks of a whole record
+# -----------------------
 
 t = np.arange(400)
 x = np.sin(0.0005 * t**2) + 0.05 * np.random.default_rng(1).normal(size=t.size)
@@ -22,8 +22,8 @@ axes.set(xlabel="Sample")
 print(found["count"], "peaks, the first at", found["locations"][0])
 
 # %%
-# A stream in blocks, with the state handed on
-# --------------------------------------------
+# A stream in blocks; the state is passed from call to call
+# ---------------------------------------------------------
 
 state, buffer, locations = {}, [], []
 for i, block in enumerate(np.split(x, [130, 260])):

@@ -50,8 +50,8 @@ axes.legend(frameon=False)
 print(values[0], (x[0] - 1) ** 7)
 
 # %%
-# A polynomial of a matrix, by Cayley and Hamilton's theorem 0
-# ------------------------------------------------------------
+# A polynomial of a matrix; zero by the Cayley-Hamilton theorem
+# -------------------------------------------------------------
 
 a = np.array([[1.0, 2.0], [3.0, 4.0]])
 print(qx.EvPoly2D([-2.0, -5.0, 1.0], a, 1))

@@ -14,8 +14,8 @@ roots = qx.CxPolyRoots_head(np.array([-1, 0, 0, 0, 0, 1], complex), 100)
 print(np.sort_complex(roots.round(6)))
 
 # %%
-# Roots known roughly, improved: real ones one by one, others in pairs
-# --------------------------------------------------------------------
+# Refining approximate roots: real roots one by one, complex roots in pairs
+# -------------------------------------------------------------------------
 
 coefficients = np.polynomial.polynomial.polyfromroots([1, 2, -0.5 + 1j, -0.5 - 1j]).real
 print(qx.PolyRootsNtBst_head(coefficients, [0.8, 2.3], 50, 1e-14,

@@ -24,8 +24,8 @@ for block in np.split(x, [1, 10, 500]):
 print("rate 3/2:", once.size, "outputs; equal in blocks:", np.array_equal(np.concatenate(blocks), once))
 
 # %%
-# The four rates of one sine
-# --------------------------
+# A sine at four rates
+# --------------------
 
 import matplotlib.pyplot as plt
 n = np.arange(40)

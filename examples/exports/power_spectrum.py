@@ -17,8 +17,8 @@ print("at 0:", power[0], " at 12 and -12:", power[12], power[n - 12])
 print("sum", power.sum(), " mean square", np.mean(x**2))
 
 # %%
-# A delay shows as a phase in the cross spectrum
-# ----------------------------------------------
+# A delay appears as a phase in the cross spectrum
+# ------------------------------------------------
 
 rng = np.random.default_rng(2)
 noise = rng.normal(size=n)

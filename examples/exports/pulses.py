@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# A step that rings
-# -----------------
+# A step with ringing
+# -------------------
 
 t = np.arange(400)
 decay = np.exp(-(t - 120) / 30.0)

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# A shuffle tells where its elements came from
-# --------------------------------------------
+# A shuffle also returns the original index of each element
+# ---------------------------------------------------------
 
 x = np.array([1.5, 2.5, 3.5, 4.5, 5.5])
 state = {"s1": 1, "s2": 2, "s3": 3}
@@ -17,8 +17,8 @@ print(shuffled, indices)
 print(np.array_equal(shuffled, x[indices]))
 
 # %%
-# A random order of numbers
-# -------------------------
+# A random permutation of numbers
+# -------------------------------
 
 order, state = qx.RiffleIntNum2012_head(8, -1, state, 1)
 print(order)

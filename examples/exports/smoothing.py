@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# A fitted polynomial keeps the height of a peak, a median removes what stands alone
-# ----------------------------------------------------------------------------------
+# A fitted polynomial preserves the height of a peak, a median removes outliers
+# -----------------------------------------------------------------------------
 
 import matplotlib.pyplot as plt
 t = np.arange(240)

@@ -8,8 +8,8 @@ import numpy as np
 import qx
 
 # %%
-# A curve through noise, its roughness found by cross validation
-# --------------------------------------------------------------
+# A curve through noisy data, with lambda chosen by cross validation
+# ------------------------------------------------------------------
 
 x = np.linspace(0, 10, 80)
 clean = np.sin(x) + 0.1 * x
@@ -19,8 +19,8 @@ print(f"lambda {lam:.4g}, effective parameters {effective:.2f}")
 print(f"deviation from the clean curve {np.std(values - clean):.3f}, of the data {np.std(y - clean):.3f}")
 
 # %%
-# The same with a known deviation of the noise: the smoothest curve that explains the data
-# ----------------------------------------------------------------------------------------
+# The same with a known standard deviation of the noise: the smoothest curve consistent with the data
+# ---------------------------------------------------------------------------------------------------
 
 known = np.full(80, 0.2)
 _, _, _, lam, effective = qx.CubicSplineFit_head(x, y, known, 2, 80.0)

@@ -1,6 +1,6 @@
 """
-Special bessel
-==============
+Bessel functions
+================
 """
 
 import numpy as np

@@ -1,6 +1,6 @@
 """
-Special complex
-===============
+Bessel and Airy functions of complex argument
+=============================================
 """
 
 import numpy as np

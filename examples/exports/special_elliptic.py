@@ -1,6 +1,6 @@
 """
-Special elliptic
-================
+Elliptic integrals and functions
+================================
 """
 
 import numpy as np

@@ -1,6 +1,6 @@
 """
-Special gamma
-=============
+Gamma and beta functions
+========================
 """
 
 import numpy as np

@@ -1,6 +1,6 @@
 """
-Special hypergeometric
-======================
+Hypergeometric functions
+========================
 """
 
 import numpy as np

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# Matrices of a kind: Toeplitz, Vandermonde, companion
-# ----------------------------------------------------
+# Structured matrices: Toeplitz, Vandermonde, companion
+# -----------------------------------------------------
 
 x, y = np.array([1.0, 2, 3]), np.array([0.0, 7, 8])
 for kind in (2, 3, 4):

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# Tones, less than two bins apart, in noise
-# -----------------------------------------
+# Tones less than two bins apart, in noise
+# ----------------------------------------
 
 rng = np.random.default_rng(1)
 t = np.arange(1000) / 1000
@@ -17,18 +17,18 @@ y = (np.cos(2 * np.pi * 50.2 * t) + 0.3 * np.cos(2 * np.pi * 51.7 * t + 1)
 frequencies, amplitudes, phases, rms = qx.MultipleToneMeasurements(y, dt=1e-3, count=10, order=1)
 for tone in zip(frequencies, amplitudes, phases):
     print("%.3f Hz, amplitude %.4f, phase %.3f" % tone)
-print(f"left: {rms:.4f}")
+print(f"residual: {rms:.4f}")
 
 # %%
-# The tone of a band
-# ------------------
+# The tone in a frequency band
+# ----------------------------
 
 frequency, amplitude, phase, offset, rms = qx.SingleToneMeasurement(y, 1e-3, 125, 10)
 print(f"{frequency:.3f} Hz, amplitude {amplitude:.4f}")
 
 # %%
-# A converter of 12 bits that distorts
-# ------------------------------------
+# A 12-bit converter with distortion
+# ----------------------------------
 
 x = np.cos(2 * np.pi * 0.0123456 * np.arange(8192))
 y = np.round((0.98 * x + 2e-4 * x**3) * 2**11) / 2**11

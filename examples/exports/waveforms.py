@@ -17,7 +17,7 @@ for _ in range(4):
     x, phase = qx.SineWaveCIN(25, 1.0, 0.0123, phase)
     blocks.append(x)
 whole, _ = qx.SineWaveCIN(100, 1.0, 0.0123, 0.0)
-print("phase behind the last block", phase)
+print("phase after the last block", phase)
 print("largest difference from one block of 100:", np.abs(np.concatenate(blocks) - whole).max())
 
 # %%

@@ -7,16 +7,16 @@ import numpy as np
 import qx
 
 # %%
-# A bare window: multiply ones
-# ----------------------------
+# The window itself: apply it to ones
+# -----------------------------------
 
 window = qx.AllWinH(np.ones(8), 1, np.nan, 0, 0)
 print("Hanning, periodic: ", window)
 print("Hanning, symmetric:", qx.AllWinH(np.ones(8), 1, np.nan, 0, 1))
 
 # %%
-# What windows do to leakage
-# --------------------------
+# Windows and spectral leakage
+# ----------------------------
 
 import matplotlib.pyplot as plt
 n = 256

@@ -7,8 +7,8 @@ import numpy as np
 import qx
 
 # %%
-# The same filter, with and without its delay
-# -------------------------------------------
+# The same filter, with and without delay
+# ---------------------------------------
 
 import matplotlib.pyplot as plt
 t = np.arange(300)

@@ -2,8 +2,8 @@
 Filter a signal without delay
 =============================
 
-A slow wave on a drifting base line is disturbed at 200 Hz. A Butterworth lowpass takes the disturbance away;
-run forwards and backwards it does not delay the wave.
+A slow wave on a drifting baseline is disturbed at 200 Hz. A Butterworth lowpass removes the disturbance; run
+forwards and backwards, it does not delay the wave.
 """
 
 import matplotlib.pyplot as plt
@@ -16,13 +16,13 @@ wave = 5 + 0.3 * t + np.sin(2 * np.pi * 2 * t)
 x = wave + 0.5 * np.sin(2 * np.pi * 200 * t)
 
 # %%
-# A filter is an object: it is designed once and applied to any signal.
+# A filter is an object: design it once, and apply it to any signal.
 
 lowpass = qx.filters.butterworth(4, 40, fs=fs)
 lowpass
 
 # %%
-# Its response shows what passes. At the cutoff the gain is 3 dB down.
+# Its response shows which frequencies pass. At the cutoff, the gain is 3 dB down.
 
 response = lowpass.response(512)
 figure, axes = plt.subplots(figsize=(8, 3))
@@ -31,7 +31,7 @@ axes.axvline(40, color="0.6", linestyle=":")
 axes.set(xlabel="Frequency (Hz)", ylabel="Gain (dB)", ylim=(-120, 5))
 
 # %%
-# Called like a function the filter runs forwards and delays the wave; ``zero_phase`` does not.
+# Called like a function, the filter runs forwards and delays the wave; ``zero_phase`` adds no delay.
 
 delayed = lowpass(x)
 y = lowpass.zero_phase(x)
@@ -39,7 +39,7 @@ print(f"largest error with delay    {np.abs(delayed - wave)[500:].max():.3f}")
 print(f"largest error without delay {np.abs(y - wave).max():.1e}")
 
 # %%
-# The offset and the ramp are kept, at the ends of the signal too.
+# The offset and the ramp are preserved, even at the ends of the signal.
 
 figure, axes = plt.subplots(figsize=(8, 3))
 axes.plot(t, x, color="0.8", label="measured")

@@ -2,8 +2,8 @@
 Find the beats of a pulse train
 ===============================
 
-Twelve pulses at irregular times, with noise. The signal is smoothed by local polynomials, and the peaks are
-located between the samples.
+A signal consists of twelve pulses at irregular times, with noise. It is smoothed with local polynomials, and the
+peaks are located to a fraction of a sample.
 """
 
 import matplotlib.pyplot as plt
@@ -17,14 +17,14 @@ places = np.sort(np.arange(0.2, 3.8, 0.3) + 0.02 * random.random(12))
 x = np.exp(-((t[:, None] - places) / 0.02) ** 2).sum(1) + 0.01 * random.normal(size=len(t))
 
 # %%
-# A Savitzky-Golay filter keeps the height and the width of a peak.
+# A Savitzky-Golay filter preserves the height and the width of a peak.
 
 smooth = qx.filters.savgol(x, 21, 2)
 peaks = qx.measure.peaks(smooth, fs)
 peaks
 
 # %%
-# The positions are times, because the sampling rate was given.
+# The positions are in seconds, because the sampling rate was given.
 
 print(f"{len(peaks.positions)} peaks, largest error {1e3 * np.abs(peaks.positions - places).max():.2f} ms")
 figure, axes = plt.subplots(figsize=(8, 3))

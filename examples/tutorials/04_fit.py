@@ -18,13 +18,13 @@ fit = qx.fit.exponential(t, y, bounds={"b": (-10, -1)})
 fit
 
 # %%
-# The parameters have names, and so have their standard errors.
+# Parameters and standard errors are looked up by name.
 
 for name, value in fit.parameters.items():
     print(f"{name} = {value:.4f} +- {fit.errors[name]:.4f}")
 
 # %%
-# ``predict`` gives the fitted curve; the residuals show whether the model holds.
+# ``predict`` returns the fitted curve; the residuals show whether the model fits.
 
 figure, (above, below) = plt.subplots(2, 1, figsize=(8, 5), sharex=True, height_ratios=[3, 1])
 above.plot(t, y, ".", color="0.7", markersize=4)

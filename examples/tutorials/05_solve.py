@@ -2,8 +2,8 @@
 Solve a system of equations
 ===========================
 
-A hundred equations with as many unknowns, what the condition number says of the result, and what happens
-when a matrix is singular.
+A system of a hundred equations with as many unknowns, what its condition number says about the accuracy of the
+solution, and what happens when a matrix is singular.
 """
 
 import matplotlib.pyplot as plt
@@ -18,12 +18,12 @@ found = qx.linalg.solve(a, b)
 print(f"largest error {np.abs(found - x).max():.1e}")
 
 # %%
-# The condition number is the factor by which relative errors of the data may grow.
+# The condition number bounds the factor by which relative errors of the data can grow.
 
 print(f"condition number {qx.linalg.cond(a):.0f}")
 
 # %%
-# A singular matrix raises NumPy's own exception, with the argument and the rule in the message.
+# A singular matrix raises NumPy's ``LinAlgError``; the message names the argument and the rule.
 
 try:
     qx.linalg.solve([[1, 2], [2, 4]], [1, 2])
@@ -31,14 +31,15 @@ except np.linalg.LinAlgError as error:
     print(type(error).__name__, "-", error)
 
 # %%
-# Where there are more equations than unknowns, the least squares solution is found.
+# For more equations than unknowns, ``lstsq`` returns the least-squares solution.
 
 tall = random.normal(size=(200, 3))
 measured = tall @ [1.0, -2.0, 0.5] + 0.01 * random.normal(size=200)
 qx.linalg.lstsq(tall, measured)
 
 # %%
-# The errors of the solution grow with the condition number. Here for Hilbert's matrices, which are known for it.
+# The errors of the solution grow with the condition number, as Hilbert matrices, which are notoriously
+# ill-conditioned, show.
 
 orders = np.arange(2, 9)
 matrices = [1 / (np.arange(1, n + 1)[:, None] + np.arange(n)) for n in orders]

@@ -2,8 +2,8 @@
 The frequencies of a chain of masses
 ====================================
 
-Twenty equal masses between springs. The squares of the frequencies are the eigenvalues of the stiffness
-matrix, the eigenvectors are the shapes in which the chain swings.
+Twenty equal masses are connected by springs. The squares of the frequencies are the eigenvalues of the stiffness
+matrix, and its eigenvectors are the mode shapes of the chain.
 """
 
 import matplotlib.pyplot as plt
@@ -19,7 +19,7 @@ print(frequencies[:5])
 print(f"largest error {np.abs(frequencies - exact).max():.1e}")
 
 # %%
-# The first three shapes.
+# The first three mode shapes.
 
 values, vectors = qx.linalg.eigh(k)
 figure, axes = plt.subplots(figsize=(8, 3))

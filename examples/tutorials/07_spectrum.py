@@ -2,7 +2,7 @@
 Measure amplitudes in a spectrum
 ================================
 
-A tone that lies between two lines of the spectrum, and another one that is 60 dB weaker. The window decides
+One tone lies between two lines of the spectrum, and another is 60 dB weaker. The choice of window decides
 whether both amplitudes can be read.
 """
 
@@ -21,7 +21,7 @@ def amplitudes(window):
 
 
 # %%
-# With the flat top window both are right to 0.3 percent; without a window the weak tone is lost.
+# With the flat-top window, both are correct to 0.3 percent; without a window, the weak tone is lost.
 
 figure, axes = plt.subplots(figsize=(8, 3))
 for window in ("boxcar", "hann", "flattop"):
@@ -33,6 +33,6 @@ axes.set(xlabel="Frequency (Hz)", ylabel="Amplitude", xlim=(80, 150), ylim=(1e-6
 axes.legend()
 
 # %%
-# The tones themselves can be asked for as well; no window has to be chosen then.
+# ``qx.measure.tone`` measures a tone directly, and no window has to be chosen.
 
 qx.measure.tone(x, fs)

@@ -2,8 +2,8 @@
 From acceleration to displacement
 =================================
 
-An accelerometer has an offset. Integrated twice it becomes a parabola that hides the movement;
-`qx.calculus.displacement` takes it away.
+An accelerometer has an offset. Integrated twice, the offset becomes a parabola that hides the motion;
+`qx.calculus.displacement` removes it.
 """
 
 import matplotlib.pyplot as plt
@@ -16,7 +16,7 @@ moved = 0.01 * np.sin(2 * np.pi * 5 * t)
 acceleration = -(2 * np.pi * 5) ** 2 * moved + 0.1
 
 # %%
-# The plain integral, taken twice, runs away.
+# Plain integration, applied twice, drifts away.
 
 velocity = qx.calculus.cumulative(acceleration, dx=1 / fs)
 plain = qx.calculus.cumulative(velocity, dx=1 / fs)
@@ -25,7 +25,7 @@ print(f"error of the plain integral {np.abs(plain - moved).max():.3f} m")
 print(f"error of displacement       {np.abs(found - moved).max():.1e} m")
 
 # %%
-# The movement has an amplitude of 10 mm.
+# The motion has an amplitude of 10 mm.
 
 figure, axes = plt.subplots(figsize=(8, 3))
 axes.plot(t, 1e3 * plain, color="0.7", label="integrated twice")

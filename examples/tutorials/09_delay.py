@@ -2,8 +2,8 @@
 The delay between two sensors
 =============================
 
-Two records of the same noise, one 7.3 samples behind the other. The maximum of the correlation is known to
-a sample; `qx.measure.delay` finds the place between the samples.
+Two sensors record the same noise, one 7.3 samples later than the other. The maximum of the correlation gives the
+delay to the nearest sample; `qx.measure.delay` finds it to a fraction of a sample.
 """
 
 import matplotlib.pyplot as plt
@@ -18,7 +18,7 @@ x, y = source[2000:4000], moved[2000:4000]
 print(f"delay {qx.measure.delay(x, y):.4f} samples")
 
 # %%
-# With a sampling rate it is a time.
+# If the sampling rate is given, the delay is in seconds.
 
 print(f"delay {1e3 * qx.measure.delay(x, y, fs=48000):.5f} ms")
 

@@ -2,8 +2,8 @@
 Filter a signal that never ends
 ===============================
 
-Samples come in blocks of any size. A stream keeps the memory of the filter from block to block, and the
-results are those of the whole signal, to the bit.
+Samples arrive in blocks of any size. A stream keeps the state of the filter from block to block, and the results
+are bit for bit those of the whole signal.
 """
 
 import matplotlib.pyplot as plt
@@ -28,7 +28,7 @@ for edge in (10, 1000, 3500):
 axes.set(xlabel="Sample", xlim=(0, 4000))
 
 # %%
-# Several channels run through one stream.
+# One stream can filter several channels.
 
 channels = random.normal(size=(8, 4000))
 stream = bandlimit.stream(channels=8)
@@ -36,16 +36,16 @@ parts = [stream(channels[:, start:start + 256]) for start in range(0, 4000, 256)
 print("the same bits:", bool(np.array_equal(np.hstack(parts), bandlimit(channels))))
 
 # %%
-# A copy of a stream goes on by itself; ``reset`` begins anew.
+# A copy of a stream continues independently; ``reset`` returns to the initial state.
 
 other = stream.copy()
 stream.reset()
 first = channels[:, :256]
-print("begun anew:", np.array_equal(stream(first), parts[0]))
-print("gone on:", not np.array_equal(other(first), parts[0]))
+print("after the reset:", np.array_equal(stream(first), parts[0]))
+print("the copy continued:", not np.array_equal(other(first), parts[0]))
 
 # %%
-# Running statistics have the same protocol.
+# Running statistics work in the same way.
 
 running = qx.stats.Running()
 for block in blocks:

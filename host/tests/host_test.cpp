@@ -106,7 +106,7 @@ TEST(Blocks, GiveMemoryBackWhereItIsWorthAMove) {
     EXPECT_TRUE(stays(10000)) << "the capacity was kept";
     EXPECT_FALSE(stays(4000)) << "less than half";
     EXPECT_FALSE(stays(400));
-    EXPECT_TRUE(stays(4)) << "a small block is not worth a move";
+    EXPECT_TRUE(stays(4)) << "a small block is not moved";
     QXHostFree(array);
 }
 

@@ -3,19 +3,18 @@
 
 /* Integrals and derivatives of samples at a constant step dt.
 
-   Definite integrals become one number, by composite Newton-Cotes rules:
+   Definite integrals are one number, computed by composite Newton-Cotes rules:
 
-       0 trapezoid, 1 Simpson, 2 Simpson 3/8, 3 Bode (Boole), which take 2, 3, 4, 5 samples a panel,
-       4 left and 5 right rectangles (only where said)
+       0 trapezoid, 1 Simpson, 2 Simpson 3/8, 3 Bode (Boole), with 2, 3, 4 and 5 samples per panel,
+       4 left and 5 right rectangles (only where stated)
 
-   Running integrals and derivatives become an array of the samples' length, in place. Those that
-   look beyond the ends of the data take the samples there from `initial` and `final`. Of a longer
-   array the first elements count: where one initial value is needed, initial[0] is x[-1], where two
-   are, initial[0] is x[-2] and initial[1] is x[-1]; final[0] is x[n] and final[1] is x[n+1].
-   M. Abramowitz and I. A. Stegun, "Handbook of mathematical functions", 1964, chapter 25, has the
-   rules.
+   Running integrals and derivatives replace the samples in place. Where a formula needs samples
+   beyond the ends of the data, they are taken from the first elements of `initial` and `final`: if
+   one initial value is needed, initial[0] is x[-1]; if two are, initial[0] is x[-2] and initial[1]
+   is x[-1]; final[0] is x[n] and final[1] is x[n+1]. The rules are in M. Abramowitz and I. A.
+   Stegun, "Handbook of mathematical functions", 1964, chapter 25.
 
-   Overflow is not looked for: sums of samples near the end of the range, and quotients by a step
+   Overflow is not checked for: sums of samples near the largest double, and quotients by a step
    near 0, become infinite or NaN, with the code 0. */
 
 #include "qx/types.h"
@@ -34,29 +33,29 @@ typedef Array3DBlock **Array3DHandle;
     } * *
 typedef QX_ARRAY_3D(DBL) DBL3D;
 
-/** Definite integral of x. rule: 0 to 3. The sign of *dt does not count. Samples left over behind
-    the last whole panel are closed by a rule of lower order at the end of the data, so that the
-    result is exact only for the polynomials of that. The code stands in *err, and a failure makes
-    the result NaN.
-    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (the rule is another), ErrSizesDisagree (x
-    has fewer samples than a panel).
+/** Definite integral of x. rule: 0 to 3. The sign of *dt does not count. Samples left over after
+    the last whole panel are integrated by a rule of lower order, so that the result is exact only
+    for polynomials of that lower order. The code is in *err, and a failure sets the result to NaN.
+    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (any other rule), ErrSizesDisagree (x has
+    fewer samples than a panel).
     NaN: x, dt in all results. */
 QX_API int32_t NumerIntegration_head(QX_IN DBL1D x, QX_IN const double *dt,
                                      QX_IN const int32_t *rule, QX_OUT double *result,
                                      QX_OUT ErrorCode *err);
 
-/** As NumerIntegration_head. rule: 0 to 5. Samples left over are taken at the start of the data,
-    by a one-sided formula of the rule's own order. The code is the function result.
+/** As NumerIntegration_head. rule: 0 to 5. Samples left over are those at the start of the data and
+    are integrated by a one-sided formula of the same order as the rule. The code is the function
+    result.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (x has fewer than rule + 2 samples, or than
-   2 for rules 4 and 5), ErrInvalidSelector (the rule is another).
+    2 for rules 4 and 5), ErrInvalidSelector (any other rule).
     NaN: x in all results or in no result; dt in all results. */
 QX_API ErrorCode NumerIntegration_2017_head(QX_IN DBL1D x, QX_IN const double *dt,
                                             QX_IN const int32_t *rule, QX_OUT double *result);
 
-/** Definite integral over both dimensions. rule: as NumerIntegration_head. Each row has
-   the step dts[0], and the rows' integrals have dts[1]. A failure makes the result NaN. Codes:
-   ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanTwo (fewer than
-   two steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch memory).
+/** Definite integral of x over both dimensions. rule: as NumerIntegration_head. dts[0] is the step
+    within a row, and dts[1] the step between rows. A failure sets the result to NaN.
+    Codes: ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanTwo (fewer
+    than two steps), ErrInvalidSelector (any other rule), ErrOutOfMemory (no scratch memory).
     NaN: x in all results; dts in all results or in no result. */
 QX_API ErrorCode NumerIntegration2D_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_t rule,
                                          QX_OUT double *result);
@@ -65,12 +64,12 @@ QX_API ErrorCode NumerIntegration2D_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_
 QX_API ErrorCode NumerIntegration2D_2017_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_t rule,
                                               QX_OUT double *result);
 
-/** Definite integral over three dimensions d0, d1, d2. The elements are taken as d2 planes, one
-    behind the other, of d0 rows of d1 elements, whatever the order in the block: each plane is
-    integrated as by NumerIntegration2D_head with dts[0] and dts[1], the planes with dts[2].
+/** Definite integral of x over three dimensions d0, d1, d2. The elements of the block, in their
+    order in memory, are taken as d2 planes of d0 rows of d1 elements. Each plane is integrated as
+    by NumerIntegration2D_head with dts[0] and dts[1], and the integrals of the planes with dts[2].
     rule: as NumerIntegration_head.
     Codes: ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanThree
-    (fewer than three steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch
+    (fewer than three steps), ErrInvalidSelector (any other rule), ErrOutOfMemory (no scratch
     memory).
     NaN: dts in all results or in no result. */
 QX_API ErrorCode NumerIntegration3D_head(QX_IN DBL3D x, QX_IN DBL1D dts, uint16_t rule,
@@ -81,9 +80,8 @@ QX_API ErrorCode NumerIntegration3D_2017_head(QX_IN DBL3D x, QX_IN DBL1D dts, ui
                                               QX_OUT double *result);
 
 /** Running integral by Simpson's rule around each sample,
-    y[i] = y[i-1] + (x[i-1] + 4 x[i] + x[i+1]) dt/6, with *initial before and *final behind the
-   data. Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or
-   below).
+    y[i] = y[i-1] + (x[i-1] + 4 x[i] + x[i+1]) dt/6, with *initial before and *final after the data.
+    Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below).
     NaN: x in all results or in some results; initial, dt in all results; final in some results. */
 QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
                         QX_IN const double *dt, QX_OUT ErrorCode *err);
@@ -98,22 +96,22 @@ QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN con
         5  x[i] dt, from y[0] = 0                                      none
 
     Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty),
-    ErrInvalidSelector (the rule is another), ErrEmptyInput (one value is missing), ErrFewerThanTwo
-    (one of two values is missing).
+    ErrInvalidSelector (any other rule), ErrEmptyInput (one value is missing), ErrFewerThanTwo (one
+    of two values is missing).
     NaN: x in all results or in some results or in no result; initial in all results or in no
     result; final in some results or in no result; dt in all results or in some results. */
 QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final, double dt,
                             int32_t rule);
 
-/** Running integral from y[0] = 0 without values beyond the data: the first ones by one-sided
-    formulas, each other by a whole panel from the one a panel before. rule: 0 to 5.
+/** Running integral from y[0] = 0 without values beyond the data: the first values by one-sided
+    formulas, each later value by a whole panel from the value one panel before. rule: 0 to 5.
     Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty), ErrSizesDisagree
-   (x has fewer than rule + 2 samples, or than 2 for rules 4 and 5), ErrInvalidSelector (the rule is
-    another).
+    (x has fewer than rule + 2 samples, or than 2 for rules 4 and 5), ErrInvalidSelector (any other
+    rule).
     NaN: x in some results or in no result; dt in some results. */
 QX_API ErrorCode Integral_2017(QX_INOUT DBL1D x, double dt, int32_t rule);
 
-/** Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final behind the data.
+/** Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final after the data.
     Codes: ErrSamplingNotPositive (*dt is not above 0), ErrEmptyInput (x is empty).
     NaN: x, initial, final in some results; dt refused with ErrSamplingNotPositive. */
 QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
@@ -127,7 +125,7 @@ QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN c
         3  (x[i] - x[i-1]) / dt                                        one initial
 
     Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below),
-    ErrInvalidSelector (the rule is another), ErrEmptyInput (rules 0, 2 and 3: a value is missing),
+    ErrInvalidSelector (any other rule), ErrEmptyInput (rules 0, 2 and 3: a value is missing),
     ErrFewerThanTwo (rule 1: one of two values is missing).
     NaN: x in some results; initial, final in some results or in no result; dt in all results. */
 QX_API ErrorCode Derivative85(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final,

@@ -1,8 +1,8 @@
 #ifndef QX_CALLS_HPP
 #define QX_CALLS_HPP
 
-// What qx/qx.hpp is made of: failures, results, matrices, and the arrays of a call. C++20, with or
-// without exceptions.
+// The common parts of qx/qx.hpp: failures, results, matrices, and the arrays of a call. C++20, with
+// or without exceptions.
 
 #include "qx/elements.hpp"
 #include "qx/errors.h"
@@ -30,8 +30,8 @@
 
 namespace qx {
 
-// What a call has come to: 0, a warning, which is positive, or a failure with the argument to which its
-// code belongs; the argument is empty where the code belongs to several or to none.
+// The outcome of a call: 0, a warning (positive), or a failure with the argument that its code
+// refers to; the argument is empty if the code refers to several or to none.
 struct Status {
     const char *function = "";
     const char *argument = "";
@@ -44,7 +44,8 @@ struct Status {
 };
 
 #if QX_EXCEPTIONS
-// A failure as an exception: "stats::moment, order: The order must be at least 1. (ErrOrderNotPositive)".
+// A failure as an exception, for example "stats::moment, order: The order, degree or number of taps
+// is out of range; it must be at least 1. (ErrOrderNotPositive)".
 class Error : public std::runtime_error {
 public:
     explicit Error(const Status &status)
@@ -61,12 +62,14 @@ private:
 };
 #endif
 
-// As the first argument of a function or a stream: it returns a Returned<T> and throws nothing.
+// Passed as the first argument of a function or a stream: it then returns a Returned<T> and does
+// not throw.
 struct Returning {};
 inline constexpr Returning returned{};
 
-// As the first argument of a function that has one array as its result: it goes into these elements, and
-// what is returned is the part of them that it fills. Too few are ErrSizeMismatch of the argument "into".
+// Passed as the first argument of a function whose result is one array: the result is written to
+// these elements, and the part of them that it fills is returned. Too few elements are
+// ErrSizeMismatch of the argument "into".
 template <class T>
 struct Into {
     std::span<T> elements;
@@ -91,7 +94,7 @@ public:
     T *operator->() { return &value_; }
     const T *operator->() const { return &value_; }
 
-    // The value; a failure is thrown, and without exceptions ends the program.
+    // The value. A failure is thrown; without exceptions it ends the program.
     T value() && {
         if (status_.failed()) {
 #if QX_EXCEPTIONS
@@ -108,7 +111,7 @@ private:
     Status status_;
 };
 
-// A matrix row after row: of the caller's memory, or its own.
+// A matrix stored row by row: in memory of the caller, or its own.
 template <class T>
 struct MatrixView {
     const T *data = nullptr;
@@ -126,7 +129,7 @@ struct Matrix {
 
     T &operator()(std::size_t row, std::size_t col) { return values[row * cols + col]; }
     const T &operator()(std::size_t row, std::size_t col) const { return values[row * cols + col]; }
-    // A matrix whose values are not rows times cols is an empty one.
+    // A matrix that does not have rows times cols values is empty.
     operator MatrixView<T>() const {
         return values.size() == rows * cols ? MatrixView<T>{values.data(), rows, cols}
                                             : MatrixView<T>{};
@@ -141,7 +144,7 @@ struct CubeView {
 
 namespace detail {
 
-// The argument to which a code of a function belongs.
+// The argument that a code of a function refers to.
 struct Blame {
     ErrorCode code;
     const char *argument;
@@ -179,7 +182,7 @@ private:
     Status status_;
 };
 
-// An array of the host for one call, or for the life of a stream.
+// An array of the host for one call, or for the lifetime of a stream.
 template <class T>
 class Array1 {
     typedef typename host::Element<T>::Handle1D Handle;
@@ -209,13 +212,13 @@ public:
         return {static_cast<const T *>(QXHostElements1D(handle_)),
                 static_cast<std::size_t>((*handle_)->dimSize)};
     }
-    // From now on no resize up to so many elements asks for memory.
+    // From now on no resize up to `count` elements allocates memory.
     void reserve(Call &call, std::size_t count) {
         if (count > INT32_MAX ||
             QXHostReserve1D(handle_, host::Element<T>::typeCode, static_cast<int32_t>(count)) != 0)
             call.refuse(ErrOutOfMemory, "longest");
     }
-    // Other elements; memory is asked for where there are more than before.
+    // Replaces the elements; memory is allocated only if there are more than before.
     void assign(Call &call, const char *argument, std::span<const T> values) {
         void *handle = handle_;
         if (values.size() > INT32_MAX ||
@@ -268,7 +271,7 @@ private:
     Handle handle_ = nullptr;
 };
 
-// An array of three dimensions, which only goes in.
+// An array of three dimensions, for input only.
 template <class T, class Handle>
 class Array3 {
 public:
@@ -291,7 +294,7 @@ private:
     Handle handle_;
 };
 
-// An array of records, which only goes in.
+// An array of records, for input only.
 template <class Record, class Handle>
 class Records {
 public:
@@ -312,7 +315,7 @@ private:
     Handle handle_;
 };
 
-// The plan of a place in the program and a thread.
+// The plan of one call site in one thread.
 class Plan {
 public:
     Plan() = default;
@@ -345,7 +348,7 @@ Matrix<T> Taken(const Array2<T> &array) {
     return MatrixOf(array.view());
 }
 
-// What an output becomes: memory of the caller's or a container of its own. A failure leaves it empty.
+// Copies an output to a container. After a failure the container stays empty.
 template <class To, class From>
 void Take(Call &call, To &to, const From &from) {
     if (!call.ready())

@@ -3,19 +3,19 @@
 
 /* Cosine and sine transforms of vectors and matrices.
 
-   Plans are kept in slots or, by the _IDP twins, in the host's instance data, as qx/fft.h tells.
-   A status of the host that refuses an output is returned as it is. */
+   Plans are kept in slots or, by the _IDP twins, in the host's instance data, as described in
+   qx/fft.h. If the host refuses an output, its status is returned. */
 
 #include "qx/fft.h"
 
 QX_BEGIN_DECLS
 
-/** Cosine transform, type II, orthonormal, of `size` values (those of the input if below 1; more
-    are zeros, fewer are the first ones): X[k] = c(k) sqrt(2/n) sum over j of x[j] cos(pi k (2j+1) /
-    (2n)), c(0) = 1/sqrt(2), else 1. J. Makhoul, "A fast cosine transform in one and two
-    dimensions", 1980.
+/** Cosine transform, type II, orthonormal, of `size` values: the first ones of the input,
+    zero-padded if it is shorter, or the whole input if `size` is below 1. X[k] = c(k) sqrt(2/n) sum
+    over j of x[j] cos(pi k (2j+1) / (2n)), c(0) = 1/sqrt(2), else 1. J. Makhoul, "A fast cosine
+    transform in one and two dimensions", 1980.
     Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
-    else than a plan), ErrOutOfMemory (no memory). Every failure empties out.
+    other than a plan), ErrOutOfMemory (no memory). Every failure empties out.
     NaN: in in all results. */
 QX_API ErrorCode DCT_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
 /** As DCT_1DH, with its plan in the host's instance data. */
@@ -25,7 +25,7 @@ QX_API ErrorCode DCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
 /** Sine transform, type I, unscaled, of `size` values (as in DCT_1DH): X[k] = sum over j of x[j]
     sin(pi (j+1) (k+1) / (n+1)).
     Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
-    else than a plan), ErrOutOfMemory (no memory). Every failure empties out.
+    other than a plan), ErrOutOfMemory (no memory). Every failure empties out.
     NaN: in in all results or in some results. */
 QX_API ErrorCode DST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
 /** As DST_1DH, with its plan in the host's instance data.
@@ -35,8 +35,8 @@ QX_API ErrorCode DST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
 
 /** The inverse of DCT_1DH: type III, orthonormal, of the whole input.
     Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
-    else than a plan), ErrOutOfMemory (no memory for the plan). Every failure empties out. Without
-    work memory the result is 0 and out, of full size, is not written.
+    other than a plan), ErrOutOfMemory (no memory for the plan). Every failure empties out. If there
+    is no working memory, the code is 0 and out has its full size but is not written.
     NaN: in in all results. */
 QX_API ErrorCode InvDCT_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 /** As InvDCT_1DH, with its plan in the host's instance data. */
@@ -44,18 +44,18 @@ QX_API ErrorCode InvDCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT Insta
 
 /** The inverse of DST_1DH: x[j] = 2/(n+1) sum over k of X[k] sin(pi (j+1) (k+1) / (n+1)).
     Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
-    else than a plan), ErrOutOfMemory (no memory). Every failure empties out.
+    other than a plan), ErrOutOfMemory (no memory). Every failure empties out.
     NaN: in in all results. */
 QX_API ErrorCode InvDST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 /** As InvDST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode InvDST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
 
-/** As DCT_1DH, of all rows, then of all columns, of the upper left rows by cols values (those of
-    the input where below 1; zeros beyond it). slotA keeps the plan of the columns, slotB that of
-    the rows. Memory is as large as rows and cols say, however small `in` is; a rows cols above 2^31
-    - 1 is refused before any is taken.
-    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something else than a plan),
-   ErrOutOfMemory (no memory), the host's status. Every failure empties out.
+/** As DCT_1DH, of all rows, then of all columns, of the upper left rows by cols values, zero-padded
+    beyond the input; a value of rows or cols below 1 means that of the input. slotA keeps the plan
+    of the columns, slotB that of the rows. The memory is determined by rows and cols, however small
+    `in` is; a product rows cols above 2^31 - 1 is refused before any memory is allocated.
+    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something other than a plan),
+    ErrOutOfMemory (no memory), the host's status. Every failure empties out.
     NaN: in in all results or in no result. */
 QX_API ErrorCode DCT_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                          QX_INOUT PlanSlot *slotA, QX_INOUT PlanSlot *slotB);
@@ -65,7 +65,7 @@ QX_API ErrorCode DCT_2DH_IDP(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int
                              QX_INOUT InstanceWord *instance);
 
 /** As DST_1DH, of all rows, then of all columns; sizes and slots as in DCT_2DH.
-    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something else than a plan),
+    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something other than a plan),
     ErrOutOfMemory (no memory), the host's status. Every failure empties out.
     NaN: in in all results or in no result. */
 QX_API ErrorCode DST_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,

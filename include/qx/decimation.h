@@ -4,19 +4,19 @@
 /* Decimation, FIR decimators and interpolators, cascaded integrator-comb filters, moving sums and
    modulators, all for streams in blocks.
 
-   What a stream keeps between blocks (`state`, `delay`, `start` and so on) belongs to the caller,
-   who hands it back unchanged; blocks of any size then give to the bit what one block would give,
-   but for the modulators, whose rotation begins anew with each block. A failure empties the arrays
-   that are outputs, and state arrays with them; `delay` and other numbers of a stream stay. The
-   state of a FIR or CIC stream is sized and cleared by `reset`. */
+   The data that a stream keeps between blocks (`state`, `delay`, `start` and so on) belong to the
+   caller, who passes them back unchanged. Blocks of any size then give to the bit the results of a
+   single block, except in the modulators, whose rotation is restarted with each block. A failure
+   empties the output arrays and the state arrays; `delay` and other numbers of a stream are
+   unchanged. `reset` sizes and clears the state of a FIR or CIC stream. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** Keeps every *factor-th value of x, from the first on, or with *average the means of *factor
-    neighbours; values behind the last whole group are dropped. The function result is 0, or the
-    host's own status where it refused the resize.
+/** Keeps every *factor-th value of x, starting with the first, or with *average the means of
+    *factor neighbours; values after the last whole group are dropped. The function result is 0, or
+    the host's own status if it refused the resize.
     Codes: ErrEmptyInput (x is empty), ErrDecimationOutOfRange (*factor is below 1 or above the size
     of x), ErrOutOfMemory (no memory).
     NaN: x in some results or in no result. */
@@ -26,10 +26,10 @@ QX_API int32_t DecimateCIN(QX_INOUT DBL1D x, QX_IN const int32_t *factor,
 QX_API ErrorCode CxDecimate_H(QX_INOUT CDB1D x, int32_t factor, int32_t average);
 
 /** Decimates a stream: x becomes every factor-th sample, after *start samples that are skipped, or
-    with `average` the means of groups of factor samples. A group that the block leaves unfinished
-    goes on in *partialCount and *partialSum, which `reset` clears; *start then tells how many
-    samples it needs.
-    Codes: ErrNotStrictlyPositive (factor below 1), ErrNegativeSetting (*start is negative),
+    with `average` the means of groups of factor samples. A group that is incomplete at the end of
+    the block is kept in *partialCount and *partialSum, which `reset` clears; *start is then the
+    number of samples that it still needs.
+    Codes: ErrNotStrictlyPositive (factor is below 1), ErrNegativeSetting (*start is negative),
     ErrOutOfMemory (no memory).
     NaN: x, partialSum in some results or in no result. */
 QX_API ErrorCode DecimateContinuous_H(QX_INOUT DBL1D x, int32_t factor, int32_t average,
@@ -41,12 +41,11 @@ QX_API ErrorCode CxDecimateContinuous_H(QX_INOUT CDB1D x, int32_t factor, int32_
                                         QX_INOUT int32_t *start, int32_t reset,
                                         QX_INOUT int32_t *partialCount, QX_INOUT CDB *partialSum);
 
-/** Filters a stream with taps that stand L samples apart: y[i] = gain sum over k of h[k] x[i - k
-    L]. state has (size of h - 1) L elements, however short x is. The first *delay outputs are
-    dropped.
-    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L below 1),
-    ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
-    state), ErrOutOfMemory (no memory).
+/** Filters a stream with taps that are L samples apart: y[i] = gain sum over k of h[k] x[i - k L].
+    state has (size of h - 1) L elements, however short x is. The first *delay outputs are dropped.
+    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L is below 1),
+    ErrMultirateStateSize (state has the wrong size and there is no reset), the host's status (it
+    refuses the state), ErrOutOfMemory (no memory).
     NaN: x, gain, h in some results; state in some results or in no result. */
 QX_API ErrorCode InterpolatedFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, int32_t L, double gain,
                                   QX_IN DBL1D h, QX_INOUT DBL1D state, uint8_t reset,
@@ -54,51 +53,54 @@ QX_API ErrorCode InterpolatedFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, int32_t L, doub
 
 /** Interpolates a stream by L: y[i L + p] = gain L sum over k of h[p + k L] x[i - k]. state has
     ceil(size of h / L) elements. The first *delay outputs are dropped.
-    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L below 1),
-    ErrMultirateStateSize (state has another size, without reset), ErrOutOfMemory (no memory).
+    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L is below 1),
+    ErrMultirateStateSize (state has the wrong size and there is no reset), ErrOutOfMemory (no
+    memory).
     NaN: x, gain, h in some results; state in no result. */
 QX_API ErrorCode InterpolatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32_t L,
                                   QX_IN DBL1D h, QX_INOUT DBL1D state, uint8_t reset,
                                   QX_INOUT int32_t *delay);
 
 /** Decimates a stream by M: y[m] = sum over k of h[k] x[firstPhase + m M - k]. The gain is not
-    applied: scale the taps instead. state has ceil(size of h / M) + 1 elements: outputs under way,
-    and the phase. The first *delay outputs are dropped.
-    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (M below 1),
-    ErrMultirateStateSize (state has another size, without reset), ErrOutOfMemory (no memory).
+    applied: scale the taps instead. state has ceil(size of h / M) + 1 elements: outputs that are
+    not yet complete, and the phase. The first *delay outputs are dropped.
+    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (M is below 1),
+    ErrMultirateStateSize (state has the wrong size and there is no reset), ErrOutOfMemory (no
+    memory).
     NaN: x in some results; gain, state in no result; h in some results or in no result. */
 QX_API ErrorCode DecimatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32_t M, QX_IN DBL1D h,
                                QX_INOUT DBL1D state, uint8_t reset, int32_t firstPhase,
                                QX_INOUT int32_t *delay);
 
-/** Decimates a stream by `factor` behind a cascade of `stages` moving averages over w = factor
-    differentialDelay samples, which equals a cascaded integrator-comb filter of unit gain at zero
-    frequency, or with `alternate` at half the sampling rate, where a stage is (the running value v
-    becoming) x[i] - v - x[i - w] for even and x[i] - v + x[i - w] for odd w. Running values are
-    plain sums: of data that are not whole numbers they gather rounding errors. state has (w + 1)
-    stages + 1 elements, up to 2^31 - 1, which are cleared by a reset and passed over by every call,
-    however short x is. The first output is that of input *delay.
-    Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay below 1),
-    ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
-    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty).
+/** Decimates a stream by `factor` after a cascade of `stages` moving averages over w = factor
+    differentialDelay samples. This equals a cascaded integrator-comb filter with unit gain at zero
+    frequency or, with `alternate`, at half the sampling rate; a stage then replaces its running
+    value v by x[i] - v - x[i - w] for even w and by x[i] - v + x[i - w] for odd w. Running values
+    are plain sums, which accumulate rounding errors unless the data are integers. state has (w + 1)
+    stages + 1 elements, up to 2^31 - 1. A reset clears them and every call traverses them, however
+    short x is. The first output is that of input *delay.
+    Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay is below 1),
+    ErrMultirateStateSize (state has the wrong size and there is no reset), the host's status (it
+    refuses the state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty).
     NaN: x in some results; state in some results or in no result. */
 QX_API ErrorCode CICDecimatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                     int32_t stages, int32_t factor, int32_t differentialDelay,
                                     int16_t alternate, uint8_t reset, QX_INOUT int32_t *delay);
-/** Interpolates a stream by `factor`: the input, times factor and with factor - 1 zeros after each
-    sample, runs through the cascade of CICDecimatorByMovH. state has (w + 1) stages elements, with
-    the same cost. The first *delay outputs are dropped.
-    Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay below 1),
-    ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
-    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty).
+/** Interpolates a stream by `factor`: the input, multiplied by factor and with factor - 1 zeros
+    after each sample, is filtered by the cascade of CICDecimatorByMovH. state has (w + 1) stages
+    elements, with the same cost. The first *delay outputs are dropped.
+    Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay is below 1),
+    ErrMultirateStateSize (state has the wrong size and there is no reset), the host's status (it
+    refuses the state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty).
     NaN: x, state in some results. */
 QX_API ErrorCode CICInterpolatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                        int32_t stages, int32_t factor, int32_t differentialDelay,
                                        int16_t alternate, uint8_t reset, QX_INOUT int32_t *delay);
 
 /** Sums of groups of `factor` samples of a stream, in the first *outCount elements of x, which
-   keeps its size. They are sums and not means: scale them by 1 / factor. The group under way stands
-   in *sum and *count. A factor below 2 leaves x as it is. Codes: none.
+    keeps its size. They are sums, not means: scale them by 1 / factor. The incomplete group is kept
+    in *sum and *count. A factor below 2 leaves x unchanged.
+    Codes: none.
     NaN: x, sum in some results. */
 QX_API ErrorCode ReDecimatedMovingAverageH(QX_INOUT DBL1D x, int32_t factor, QX_INOUT double *sum,
                                            QX_INOUT int32_t *count, int32_t reset,
@@ -110,12 +112,12 @@ QX_API ErrorCode CxDecimatedMovingAverageH(QX_INOUT CDB1D x, int32_t factor, QX_
                                            QX_INOUT int32_t *count, int32_t reset,
                                            QX_OUT int32_t *outCount);
 
-/** Runs x through a cascade of moving sums over `width` samples: v + x[i] - x[i - width], without
-    scale. The running values stand in sums, the latest inputs of the stages in the rows of buffers,
-    the oldest at *position. Where these do not fit the arguments, they are sized and cleared as by
-    reset. They have `stages` and stages by width elements, whatever x has; time grows as the
-    elements of x times stages. Nothing happens for stages below 1, and without reset for a width
-    below 2.
+/** Filters x by a cascade of moving sums over `width` samples, v + x[i] - x[i - width], without
+    scaling. The running values are in sums, and the latest inputs of each stage in a row of
+    buffers, the oldest at *position. If their sizes do not match the arguments, they are resized
+    and cleared as by reset. sums has `stages` elements and buffers stages by width, whatever the
+    size of x; the time is proportional to the size of x times stages. The call is a no-op for
+    stages below 1, and without reset also for a width below 2.
     Codes: ErrOutOfMemory (no memory).
     NaN: x in some results; sums, buffers in some results or in no result. */
 QX_API ErrorCode ReCascadedMovingAverageH(QX_INOUT DBL1D x, int32_t stages, int32_t width,
@@ -127,16 +129,16 @@ QX_API ErrorCode CxCascadedMovingAverageH(QX_INOUT CDB1D x, int32_t stages, int3
                                           QX_INOUT int32_t *position, int32_t reset);
 
 /** Shifts a stream in frequency: x[i] becomes x[i] exp(i (*phase + 2 pi i frequency / sampleRate)),
-    and *phase, in radians, that of the next sample, in 0 to 2 pi. A ratio of frequency to rate that
-    is exactly 0 changes neither x nor *phase. A rate of 0, or one so small that the ratio times 2
-    pi is not finite, makes *phase and all outputs but the first NaN with code 0, and so every later
-    block of the stream. The rotation from sample to sample loses about one rounding error a sample;
-    a ratio far above 1 loses the digits of its fraction.
+    and *phase, in radians, becomes the phase of the next sample, in 0 to 2 pi. If the ratio of
+    frequency to rate is exactly 0, neither x nor *phase changes. With a rate of 0, or one so small
+    that the ratio times 2 pi is not finite, *phase and all outputs but the first become NaN with
+    code 0, and so does every later block of the stream. The rotation accumulates about one rounding
+    error per sample; a ratio far above 1 loses the digits of its fractional part.
     Codes: none.
     NaN: x, frequency, sampleRate in some results; phase in all results. */
 QX_API ErrorCode CxComplexModulatorH(QX_INOUT CDB1D x, double frequency, double sampleRate,
                                      QX_INOUT double *phase);
-/** As CxComplexModulatorH, for real data, with the result in y. An empty x leaves y as it is.
+/** As CxComplexModulatorH, for real data, with the result in y. An empty x leaves y unchanged.
     Codes: ErrOutOfMemory (no memory). */
 QX_API ErrorCode ReComplexModulatorH(QX_IN DBL1D x, double frequency, double sampleRate,
                                      QX_INOUT double *phase, QX_OUT CDB1D y);

@@ -3,25 +3,26 @@
 
 /* Histograms: samples counted in bins and in intervals.
 
-   Unless noted the function result is 0 and the code stands in *err; a failure sets a numeric
-   result to NaN and empties arrays. Input arrays are never changed. */
+   Unless noted otherwise, the function result is 0 and the code is in *err; a failure sets a
+   numeric result to NaN and empties arrays. Input arrays are never changed. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
 /** Histogram of x over its own range in *bins bins of equal width, with their centres. The maximum
-    counts in the last bin; NaN counts nowhere. A constant array stands in the last bin, and every
-    centre equals its value. Where the host refuses a resize its status is the function result.
-    Memory and time grow with the number of bins, 12 bytes each, however few the samples are.
+    counts in the last bin; NaN is not counted. The samples of a constant array all count in the
+    last bin, and every centre equals their value. If the host refuses a resize, its status is the
+    function result. Memory and time grow with the number of bins (12 bytes each), however few the
+    samples are.
     Codes: ErrEmptyInput (x is empty or there are no bins), ErrOutOfMemory (the host refused a
     resize).
     NaN: x in no result. */
 QX_API int32_t histgran_head(QX_IN DBL1D x, QX_IN const int32_t *bins, QX_OUT I32_1D counts,
                              QX_OUT DBL1D centres, QX_OUT ErrorCode *err);
 
-/* An interval of GenHistH. `closure` tells which ends belong to it: 0 the lower, 1 the upper,
-   2 both, 3 none; above 3 every x lies inside. */
+/* An interval of GenHistH. `closure` selects the ends that belong to it: 0 the lower end, 1 the
+   upper end, 2 both, 3 neither; above 3 every x lies inside. */
 typedef struct HistInterval {
     double lower;
     double upper;
@@ -37,8 +38,8 @@ typedef struct HistSummary {
     int32_t above;   /* of these, above the last interval */
 } HistSummary;
 
-/** Counts the samples of x in each of the caller's intervals, which are expected in ascending
-    order. A sample counts in every interval that it lies in. After a failure the summary is 0.
+/** Counts the samples of x in each of the given intervals, which are expected in ascending order. A
+    sample counts in every interval that contains it. After a failure the summary is 0.
     Codes: ErrSizesDisagree (the number of intervals is negative), ErrOutOfMemory (no memory),
     ErrEmptyInput (x is empty).
     NaN: x in no result. */

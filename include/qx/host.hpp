@@ -22,7 +22,7 @@
 
 namespace qx::host {
 
-// A negative code of an export as an exception. Warnings do not throw.
+// A failure of an export as an exception. Warnings do not throw.
 class Error : public std::runtime_error {
 public:
     explicit Error(ErrorCode code) : std::runtime_error(QXHostErrorText(code)), code_(code) {}
@@ -39,8 +39,8 @@ inline ErrorCode check(ErrorCode code) {
     return code;
 }
 
-// An array of one dimension. The handle stays the same for the array's life, while pointers,
-// spans and references to elements hold until the next call that has the array as an output.
+// An array of one dimension. The handle stays the same for the lifetime of the array; pointers,
+// spans and references to elements are valid until the next call that has the array as an output.
 template <class T>
 class Array1D {
     static constexpr int32_t code = Element<T>::typeCode;
@@ -78,7 +78,7 @@ private:
     Handle handle_;
 };
 
-// An array of two dimensions, row after row.
+// An array of two dimensions, stored row by row.
 template <class T>
 class Array2D {
     static constexpr int32_t code = Element<T>::typeCode;
@@ -87,7 +87,7 @@ class Array2D {
 public:
     explicit Array2D(int32_t rows = 0, int32_t cols = 0)
         : handle_(owned(QXHostNew2D(code, rows, cols))) {}
-    // The values row after row; their number must be rows times cols.
+    // Takes the values row by row; their number must be rows times cols.
     Array2D(int32_t rows, int32_t cols, std::span<const T> values)
         : handle_(owned(int64_t{rows} * cols == static_cast<int64_t>(values.size())
                             ? QXHostCopy2D(code, rows, cols, values.data())

@@ -1,22 +1,22 @@
 #ifndef QX_MATRIX_EQUATIONS_H
 #define QX_MATRIX_EQUATIONS_H
 
-/* Linear equations for a matrix: those of Sylvester and of Lyapunov.
+/* Linear matrix equations: Sylvester and Lyapunov equations.
 
-   Matrices stand row after row; a' is the transpose, of complex matrices the conjugate transpose. x
-   is an array of its own. Any matrices are accepted on the right side, symmetric or not. The
+   Matrices are stored row by row; a' is the transpose, for complex matrices the conjugate
+   transpose. x is a separate array. The right-hand side may be any matrix, symmetric or not. The
    equations are solved through the Schur forms of a and b and back substitution by blocks (R. H.
    Bartels and G. W. Stewart, "Solution of the matrix equation AX + XB = C", 1972; for products J.
    D. Gardiner, A. J. Laub, J. J. Amato and C. B. Moler, "Solution of the Sylvester matrix equation
    AXB' + CXD' = E", 1992), in a number of operations that grows as the cube of the order.
 
    The residual, in the Frobenius norm, is below 30 eps (|a| + |b|) |x|, for products below 30 eps
-   (|a| |b| + 1) |x| (eps 2.2e-16), for orders up to 200. How far that is from the x sought is a
-   matter of the condition: where l + m (l - m, l m - 1) is small for eigenvalues l of a and m of b,
-   x is large and its relative error is as well. The test for singular equations goes by the
-   norms of the whole matrices: with strongly graded ones, whose small eigenvalues are within
-   rounding errors of the norm, an equation is refused although its x may exist. Elements of any
-   size are accepted: nothing overflows but x itself. */
+   (|a| |b| + 1) |x| (eps 2.2e-16), for orders up to 200. The error of x depends on the condition of
+   the equation: if l + m (l - m, l m - 1) is small for eigenvalues l of a and m of b, both x and
+   its relative error are large. The test for singular equations uses the norms of the whole
+   matrices. With strongly graded matrices, whose small eigenvalues are within rounding errors of
+   the norm, an equation may be refused although x exists. Elements of any magnitude are accepted:
+   nothing overflows but x itself. */
 
 #include "qx/types.h"
 
@@ -42,9 +42,9 @@ QX_API ErrorCode Sylvester_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_IN DBL2D c, QX_
 QX_API ErrorCode CxSylvester_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_IN CDB2D c, QX_OUT CDB2D x);
 
 /** Solves for x, all matrices n by n. equation: 0 a x + x a' = q (continuous time); 1
-    a x a' - x + q = 0 (discrete time). Mind the sign of q, which differs: for a stable a and a
+    a x a' - x + q = 0 (discrete time). Note that the sign of q differs: for a stable a and a
     positive definite q, x is negative definite under equation 0 and positive definite under
-    equation 1. Where q is symmetric (Hermitian) to the bit, x is so too; any other q is accepted.
+    equation 1. If q is symmetric (Hermitian) to the bit, so is x; q may also be any other matrix.
     Codes: ErrEmptyInput (a matrix is empty), ErrNotSquare (a or q), ErrSizesDisagree (a and q
     differ in order), ErrInvalidSelector (equation), ErrNonFiniteInput (an element of a or q),
     ErrIterationLimit (the iteration for the Schur form does not converge), ErrSingularMatrix (for

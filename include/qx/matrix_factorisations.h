@@ -4,17 +4,17 @@
 /* Factorisations of matrices: LU, Cholesky, QR, singular values, Schur and Hessenberg forms,
    balancing, and inverses from factors.
 
-   Matrices stand row after row. Exports with an `err` have the function result 0; the others return
-   their code. Every failure empties all outputs. */
+   Matrices are stored row by row. Exports with an `err` have the function result 0; the others
+   return their code. Every failure empties all outputs. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** P a = L U in place of the m by n matrix a, by Crout's method with the largest pivot of each
-    column: L, with a unit diagonal that is not stored, below the diagonal, and U on and above it.
-    pivots, of m elements, are row numbers: in step k row k was exchanged with row pivots[k].
-    *parity is 1 for an odd number of exchanges, else 0. A singular matrix keeps its factors.
+/** Factors the m by n matrix a in place, P a = L U, by Crout's method with partial pivoting: L,
+    whose unit diagonal is not stored, is below the diagonal, and U on and above it. pivots holds m
+    row numbers, counted from 0: in step k row k was exchanged with row pivots[k]. *parity is 1 for
+    an odd number of exchanges, else 0. The factors of a singular matrix are returned, too.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), WarnSingular (U has a zero on its
     diagonal).
     NaN: a in some results. */
@@ -24,18 +24,18 @@ QX_API int32_t LU_head(QX_INOUT DBL2D a, QX_OUT I32_1D pivots, QX_OUT int32_t *p
 QX_API int32_t CxLU_head(QX_INOUT CDB2D a, QX_OUT I32_1D pivots, QX_OUT int32_t *parity,
                          QX_OUT ErrorCode *err);
 
-/** Cholesky factor L of the symmetric positive definite a = L L^T, in place of its lower triangle
-    in packed storage: column after column, column j with rows j to n-1. Near singularity counts as
-    failure, too: a diagonal element of L below 1.5e-8 of the largest element of L.
-    Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is no n(n+1)/2),
+/** Cholesky factor L of the symmetric positive definite a = L L^T; it replaces the lower triangle
+    of a in packed storage: column by column, column j with rows j to n-1. Near singularity is a
+    failure, too: a diagonal element of L below 1.5e-8 times the largest element of L.
+    Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is not of the form n(n+1)/2),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
     NaN: packed refused with ErrNotPositiveDefinite. */
 QX_API int32_t Cholesky_head(QX_INOUT DBL1D packed, QX_OUT ErrorCode *err);
-/** As Cholesky_head, for a Hermitian a = L L^H, of whose diagonal the real parts count. */
+/** As Cholesky_head, for a Hermitian a = L L^H; only the real parts of its diagonal are used. */
 QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
 
-/** The factor of Cholesky_head in place of a square matrix: read from the lower triangle, and
-    written there with zeros above.
+/** Replaces a square matrix by its Cholesky factor (Cholesky_head): the lower triangle is read and
+    overwritten by L, and the upper triangle is set to 0.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
     NaN: a refused with ErrNotPositiveDefinite. */
@@ -43,16 +43,17 @@ QX_API int32_t FullCholesky_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As FullCholesky_head, for a Hermitian matrix. */
 QX_API int32_t CxFullCholesky_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
-/** The inverse of L L^T, as a packed lower triangle in place of the factor of Cholesky_head.
-    Codes: ErrEmptyInput (packedFactor is empty), ErrNotSquare (the length is no n(n+1)/2),
-    ErrSingularMatrix (a diagonal element is 0).
+/** Replaces the packed factor of Cholesky_head by the packed lower triangle of the inverse of L
+    L^T.
+    Codes: ErrEmptyInput (packedFactor is empty), ErrNotSquare (the length is not of the form
+    n(n+1)/2), ErrSingularMatrix (a diagonal element is 0).
     NaN: packedFactor in all results or in some results. */
 QX_API int32_t Cholesky_InvMatrix_head(QX_INOUT DBL1D packedFactor, QX_OUT ErrorCode *err);
 /** As Cholesky_InvMatrix_head, for L L^H. */
 QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT ErrorCode *err);
 
-/** The inverse of a symmetric positive definite matrix in its place. Only the lower triangle is
-    read; both are written.
+/** Replaces a symmetric positive definite matrix by its inverse. Only the lower triangle is read;
+    both are written.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
     NaN: a refused with ErrNotPositiveDefinite. */
@@ -60,16 +61,16 @@ QX_API int32_t InvMatrixChoDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixChoDri_head, for a Hermitian matrix. */
 QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
-/** As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2
-    elements, is the work space. It is neither resized nor emptied.
+/** As InvMatrixChoDri_head, without allocating memory: packedWork, of at least n(n+1)/2 elements,
+    is the working memory. It is neither resized nor emptied.
     Codes: ErrSizeMismatch (packedWork is too short), ErrNotSquare (a is not square), ErrEmptyInput
     (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
     NaN: a refused with ErrNotPositiveDefinite; packedWork in no result. */
 QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
                                          QX_OUT ErrorCode *err);
 
-/* A triangle in packed storage, column after column: `triangle` 0 lower, column j with rows j to
-   n-1; 1 upper, column j with rows 0 to j. */
+/* A triangle in packed storage, column by column: `triangle` 0 lower, column j with rows j to n-1;
+   1 upper, column j with rows 0 to j. */
 typedef struct PackedTriangle {
     DBL1D packed;
     int32_t triangle;
@@ -79,21 +80,22 @@ typedef struct CxPackedTriangle {
     int32_t triangle;
 } CxPackedTriangle;
 
-/** The inverse of a packed triangle, in its place.
+/** Replaces a packed triangle by its inverse.
     Codes: ErrInvalidSelector (triangle is not 0 or 1), ErrEmptyInput (packed is empty),
-    ErrNotSquare (the length is no n(n+1)/2), ErrNonFiniteInput (an element is not finite),
-    ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
-    value).
+    ErrNotSquare (the length is not of the form n(n+1)/2), ErrNonFiniteInput (an element is not
+    finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 times the largest element in
+    absolute value).
     NaN: a.packed refused with ErrNonFiniteInput. */
 QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *err);
 /** As Tri_InvMatrix_head, for complex elements. */
 QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCode *err);
 
-/** The inverse of a triangular matrix, in its place. triangle: 0 lower; 1 upper. The other triangle
-   is not read; it becomes 0. Codes: ErrInvalidSelector (*triangle is not 0 or 1), ErrNotSquare
-   (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an
-   element is not finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest
-   element in absolute value).
+/** Replaces a triangular matrix by its inverse. triangle: 0 lower; 1 upper. The other triangle is
+    not read; it becomes 0.
+    Codes: ErrInvalidSelector (*triangle is not 0 or 1), ErrNotSquare (a is not square),
+    ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not
+    finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 times the largest element in
+    absolute value).
     NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
                                     QX_OUT ErrorCode *err);
@@ -101,15 +103,16 @@ QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *trian
 QX_API int32_t CxInvMatrixTriDri_head(QX_INOUT CDB2D a, QX_IN const int32_t *triangle,
                                       QX_OUT ErrorCode *err);
 
-/** a = q r with q of m by m unitary and r of m by n upper triangular, for a of m by n. algorithm: 0
-    Householder reflections; 1 modified Gram-Schmidt orthogonalisation; 2 the classical one. By
-    reflections the diagonal of r has either sign. Orthogonalisation makes each projection twice;
-   the diagonal of r is then not negative, and 0 for a column that depends on those before it within
-   m eps, where q goes on with another vector orthogonal to them. All three leave q unitary and a -
-   q r small to a few m eps, however ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On
-   the loss of orthogonality in the Gram-Schmidt orthogonalization process", 2005. Codes:
-   ErrInvalidSelector (*algorithm is not 0, 1 or 2), ErrEmptyInput (a is empty), ErrOutOfMemory (no
-   memory), ErrNonFiniteInput (an element is not finite).
+/** a = q r with q (m by m) unitary and r (m by n) upper triangular, for an m by n matrix a.
+    algorithm: 0 Householder reflections; 1 modified Gram-Schmidt orthogonalisation; 2 classical
+    Gram-Schmidt orthogonalisation. With reflections the diagonal of r has either sign.
+    Orthogonalisation computes each projection twice; the diagonal of r is then not negative, and 0
+    for a column that depends on the previous ones within m eps, for which q has another vector
+    orthogonal to them. All three keep q unitary and a - q r small to a few m eps, however
+    ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On the loss of orthogonality in the
+    Gram-Schmidt orthogonalization process", 2005.
+    Codes: ErrInvalidSelector (*algorithm is not 0, 1 or 2), ErrEmptyInput (a is empty),
+    ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite).
     NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t qrd_head(QX_IN DBL2D a, QX_IN const int32_t *algorithm, QX_OUT DBL2D q,
                         QX_OUT DBL2D r, QX_OUT ErrorCode *err);
@@ -117,12 +120,12 @@ QX_API int32_t qrd_head(QX_IN DBL2D a, QX_IN const int32_t *algorithm, QX_OUT DB
 QX_API int32_t Cxqrd_head(QX_IN CDB2D a, QX_IN const int32_t *algorithm, QX_OUT CDB2D q,
                           QX_OUT CDB2D r, QX_OUT ErrorCode *err);
 
-/** QR factors by Householder reflections of the m by n matrix a, k = min(m, n). economy: 0 q of m
-   by m and r of m by n; 1 q of m by k and r of k by n; 2 r of k by n only, and q is empty. With
-    pivoting 0 a = q r, and permutation is empty. Otherwise a permutation = q r, where permutation
-   is n by n with a single 1 in each row and column, and each step takes the longest remaining
-   column, so that the diagonal of r falls in absolute value (P. Businger and G. H. Golub, 1965).
-   With q it takes twice as long as LAPACK at order 500; QRDec2026H works by blocks.
+/** QR factors by Householder reflections of the m by n matrix a, k = min(m, n). economy: 0 q is m
+    by m and r is m by n; 1 q is m by k and r is k by n; 2 r is k by n and q is empty. If pivoting
+    is 0, a = q r, and permutation is empty. Otherwise a permutation = q r, where permutation is n
+    by n with a single 1 in each row and column; each step takes the longest remaining column, so
+    that the diagonal of r decreases in absolute value (P. Businger and G. H. Golub, 1965). With q
+    it takes twice as long as LAPACK at order 500; QRDec2026H works on blocks and is faster.
     Codes: ErrEmptyInput (a is empty), ErrInvalidSelector (economy is not 0, 1 or 2), ErrOutOfMemory
     (no memory), ErrNonFiniteInput (an element is not finite).
     NaN: a refused with ErrNonFiniteInput. */
@@ -132,10 +135,10 @@ QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT
 QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
                           QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
 
-/** As QRDecH, by blocks of reflections where min(m, n) is at least 160: with q, in half the time at
-    order 500, complex ones in 0.8 of it. Below that with the bits of QRDecH. R. Schreiber and C. F.
-    Van Loan, "A storage-efficient WY representation for products of Householder transformations",
-    1989. */
+/** As QRDecH, with blocks of reflections if min(m, n) is at least 160: with q in half the time at
+    order 500, and for complex elements in 0.8 of it. For smaller matrices the results are to the
+    bit those of QRDecH. R. Schreiber and C. F. Van Loan, "A storage-efficient WY representation for
+    products of Householder transformations", 1989. */
 QX_API ErrorCode QRDec2026H(QX_IN DBL2D a, int32_t pivoting, int32_t economy,
                             QX_OUT I32_2D permutation, QX_OUT DBL2D q, QX_OUT DBL2D r);
 /** As QRDec2026H, for complex elements; the diagonal of r is real. */
@@ -143,14 +146,14 @@ QX_API ErrorCode CxQRDec2026H(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
                               QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
 
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes
-    u of m by k, s has k falling values, and v is n by k. G. H. Golub and C. Reinsch, "Singular
-    value decomposition and least squares solutions", 1970. For norms from 1 on, u diag(s) v^T is
-    off by a few n eps times the norm. What is below 2.2e-16 counts as zero whatever the norm, so
-    below 1 it is off by up to 2.2e-16: relative to the norm 2e-10 at a norm of 1e-6, 2e-4 at 1e-12,
-    and no digit is right below 1e-15 (measured). Values lose digits later, relative to the largest
-    one 1e-14 at 1e-8, 1e-6 at 1e-12 and 1e-2 at 1e-14. A matrix of a norm below 1 should be scaled
-    up first, and so for every export that stands on this decomposition; SVD2026_head does that by
-    itself. A value that overflows is infinite.
+    u (m by k), s has k values in descending order, and v is n by k. G. H. Golub and C. Reinsch,
+    "Singular value decomposition and least squares solutions", 1970. For norms from 1 on, the error
+    of u diag(s) v^T is a few n eps times the norm. Values below 2.2e-16 count as zero whatever the
+    norm, so for norms below 1 the error is up to 2.2e-16: relative to the norm it was measured as
+    2e-10 at a norm of 1e-6 and 2e-4 at 1e-12, and no digit is correct below 1e-15. Singular values
+    lose digits more slowly: relative to the largest one 1e-14 at a norm of 1e-8, 1e-6 at 1e-12 and
+    1e-2 at 1e-14. Scale a matrix with a norm below 1 up first, also for the other exports that use
+    this decomposition; SVD2026_head scales by itself. A value that overflows is infinite.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
     not finite), ErrIterationLimit (100 iterations were not enough for a value).
     NaN: a refused with ErrNonFiniteInput. */
@@ -158,28 +161,27 @@ QX_API int32_t SVD_head(QX_INOUT DBL2D a, QX_OUT DBL1D s, QX_OUT DBL2D v, QX_OUT
 /** As SVD_head, for complex elements: a = u diag(s) v^H. */
 QX_API int32_t CxSVD_head(QX_INOUT CDB2D a, QX_OUT DBL1D s, QX_OUT CDB2D v, QX_OUT ErrorCode *err);
 
-/** As SVD_head, but u is an output of its own and the code is the function result; with fullSize
-    other than 0 u is m by m and v is n by n. */
+/** As SVD_head, but u is a separate output and the code is the function result; if fullSize is not
+    0, u is m by m and v is n by n. */
 QX_API ErrorCode SVDEx_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, QX_OUT DBL1D s,
                             QX_OUT DBL2D v);
 /** As SVDEx_head, for complex elements: a = u diag(s) v^H. */
 QX_API ErrorCode CxSVDEx_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
                               QX_OUT CDB2D v);
 
-/** As SVD_head, the values alone: the same to the bit as with the vectors. */
+/** As SVD_head, the values only: the same to the bit as with the vectors. */
 QX_API int32_t SVDS_head(QX_IN DBL2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 /** As SVDS_head, for complex elements. */
 QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n), of any
-    norm: u is m by k, s has k falling values, and v is n by k; with fullSize other than 0 u is m by
-    m and v is n by n. The matrix is scaled by a power of two, decomposed as SVD_head does, and the
-    values are scaled back; 2^j a has the same u and v, to the bit. |a - u diag(s) v^T| is up to 4
-    max(m, n) eps |a|, u and v are orthogonal within 8 max(m, n) eps, and the values are within max(m,
-    n) eps s[0] of LAPACK's, from 1e-300 to 1e300 (docs/accuracy/matrix_revisions.md). Values
-    much smaller than s[0] have that absolute error and no better one. A value that overflows is
-    infinite. G. H. Golub and C. Reinsch, "Singular value decomposition and least squares solutions",
-    1970.
+    norm: u is m by k, s has k values in descending order, and v is n by k; if fullSize is not 0, u
+    is m by m and v is n by n. The matrix is scaled by a power of two, decomposed as SVD_head does,
+    and the values are scaled back; 2^j a has the same u and v, to the bit. |a - u diag(s) v^T| is
+    up to 4 max(m, n) eps |a|, u and v are orthogonal within 8 max(m, n) eps, and the values are
+    within max(m, n) eps s[0] of LAPACK's, from 1e-300 to 1e300 (docs/accuracy/matrix_revisions.md).
+    Values much smaller than s[0] have the same absolute error. A value that overflows is infinite.
+    G. H. Golub and C. Reinsch, "Singular value decomposition and least squares solutions", 1970.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or the host refuses a resize),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (100 iterations were not enough
     for a value).
@@ -190,16 +192,16 @@ QX_API ErrorCode SVD2026_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, Q
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxSVD2026_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
                                 QX_OUT CDB2D v);
-/** As SVD2026_head, the values alone: the same to the bit as with the vectors.
+/** As SVD2026_head, the values only: the same to the bit as with the vectors.
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode SVDS2026_head(QX_IN DBL2D a, QX_OUT DBL1D s);
 /** As SVDS2026_head, for complex elements.
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxSVDS2026_head(QX_IN CDB2D a, QX_OUT DBL1D s);
 
-/** Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections:
-    zero below the first subdiagonal. Rows and columns low to high, counted from 1 as
-    MatrixBalance_head gives them, are reduced; a must be upper triangular outside of them.
+/** Replaces the square matrix a by its Hessenberg form h = q^T a q, which is zero below the first
+    subdiagonal, by Householder reflections. Rows and columns low to high, counted from 1 and as
+    returned by MatrixBalance_head, are reduced; a must be upper triangular outside of them.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrIndexOutOfRange (not 1 <=
     low <= high <= n), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite).
     NaN: a refused with ErrNonFiniteInput. */
@@ -207,29 +209,31 @@ QX_API ErrorCode Hessenberg_head(QX_INOUT DBL2D a, int32_t low, int32_t high, QX
 /** As Hessenberg_head, for complex elements: h = q^H a q. */
 QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, QX_OUT CDB2D q);
 
-/** Balances the square matrix a in its place. job: 0 does nothing; 1 permutes rows and columns so
-   that eigenvalues are isolated in the corners; 2 multiplies rows and columns by powers of two so
-   that their sums of absolute values become alike, but none whose sums or factor lie outside 2^-970
-   to 2^970; 3 does both. Rows and columns *low to *high, counted from 1, are the block between the
-    corners. scale[i] is the factor of row and column i of the block; outside it is the number, from
-   1, of the row with which row i was exchanged, the last ones first, from n down to high + 1, then
-   those from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation of
-   eigenvalues and eigenvectors", 1969. Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not
-   square), ErrInvalidSelector (job is not 0 to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput
-   (an element is not finite).
+/** Balances the square matrix a in place. job: 0 does nothing; 1 permutes rows and columns so that
+    eigenvalues are isolated in the corners; 2 multiplies rows and columns by powers of two so that
+    their sums of absolute values become similar, except those whose sums or factor are outside
+    2^-970 to 2^970; 3 does both. Rows and columns *low to *high, counted from 1, are the block
+    between the corners. scale[i] is the factor of row and column i within the block; outside the
+    block it is the number, counted from 1, of the row with which row i was exchanged. The exchanges
+    were made from row n down to high + 1, then from row 1 to low - 1. B. N. Parlett and C. Reinsch,
+    "Balancing a matrix for calculation of eigenvalues and eigenvectors", 1969.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (job is
+    not 0 to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite).
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode MatrixBalance_head(QX_INOUT DBL2D a, int32_t job, QX_OUT int32_t *low,
                                     QX_OUT int32_t *high, QX_OUT DBL1D scale);
-/** As MatrixBalance_head, for complex elements, whose size is taken as |re| + |im|. */
+/** As MatrixBalance_head, for complex elements, whose magnitude is taken as |re| + |im|. */
 QX_API ErrorCode CxMatrixBalance_head(QX_INOUT CDB2D a, int32_t job, QX_OUT int32_t *low,
                                       QX_OUT int32_t *high, QX_OUT DBL1D scale);
 
-/** Turns eigenvectors of a matrix that MatrixBalance_head has balanced, the columns of v, into
-   those of the original matrix; job, low, high and scale are those of that call. job: as
-    MatrixBalance_head. side: 0 right eigenvectors; 1 left ones. The vectors are not scaled to unit
-   length. Codes: ErrEmptyInput (v or scale is empty), ErrInvalidSelector (job is not 0 to 3, or
-   side not 0 or 1), ErrSizeMismatch (scale has another length than v has rows), ErrIndexOutOfRange
-   (not 1 <= low <= high <= n, or an exchange is with no row of v), ErrOutOfMemory (no memory).
+/** Transforms eigenvectors of a matrix balanced by MatrixBalance_head, the columns of v, into those
+    of the original matrix; job, low, high and scale are those of that call. job: as
+    MatrixBalance_head. side: 0 right eigenvectors; 1 left eigenvectors. The vectors are not scaled
+    to unit length.
+    Codes: ErrEmptyInput (v or scale is empty), ErrInvalidSelector (job is not 0 to 3, or side is
+    not 0 or 1), ErrSizeMismatch (scale does not have as many elements as v has rows),
+    ErrIndexOutOfRange (not 1 <= low <= high <= n, or an exchange is not with a row of v),
+    ErrOutOfMemory (no memory).
     NaN: scale refused with ErrIndexOutOfRange or in some results; v in some results. */
 QX_API ErrorCode EigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high,
                                  QX_IN DBL1D scale, QX_INOUT DBL2D v);

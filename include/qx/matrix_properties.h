@@ -1,24 +1,24 @@
 #ifndef QX_MATRIX_PROPERTIES_H
 #define QX_MATRIX_PROPERTIES_H
 
-/* Numbers that describe matrices and vectors, and tests of matrices.
+/* Scalar properties of matrices and vectors, and tests of matrices.
 
-   The exports with *err have the function result 0; the others return the code. A failure sets a
-   numeric result to NaN, an integer to 0 and empties arrays, unless noted. */
+   The exports with *err have the function result 0; the others return the code. Unless noted
+   otherwise, a failure sets a numeric result to NaN and an integer to 0 and empties arrays. */
 
 #include "qx/matrix_factorisations.h"
 
 QX_BEGIN_DECLS
 
-/** Determinant of a square matrix. matrixType: 0 general (LU); 1 positive definite (Cholesky, of
-    which the lower triangle is read); 2 lower triangular; 3 upper triangular (the product of the
-    diagonal). One of order 2 is computed by the formula whatever the type. That of a singular
-    matrix is 0 where the elimination meets an exact zero. Products that overflow make it infinite
-    or NaN.
+/** Determinant of a square matrix. matrixType: 0 general (LU); 1 positive definite (Cholesky; only
+    the lower triangle is read); 2 lower triangular; 3 upper triangular (the product of the
+    diagonal). A determinant of order 2 is computed by the formula whatever the type. The
+    determinant of a singular matrix is 0 if the elimination reaches an exact zero. If products
+    overflow, it is infinite or NaN.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrInvalidSelector
     (*matrixType is not 0 to 3), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory (no
     memory), ErrNotPositiveDefinite (*matrixType is 1, the order is not 2, and a is not positive
-    definite, or nearly not).
+    definite, or nearly singular).
     NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t Determinant_head(QX_IN DBL2D a, QX_IN const int32_t *matrixType, QX_OUT DBL *det,
                                 QX_OUT ErrorCode *err);
@@ -26,11 +26,12 @@ QX_API int32_t Determinant_head(QX_IN DBL2D a, QX_IN const int32_t *matrixType, 
 QX_API int32_t CxDeterminant_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType, QX_OUT CDB *det,
                                   QX_OUT ErrorCode *err);
 
-/** Numerical rank: the number of singular values above *tolerance, which is max(m, n) times the
-    largest one times 2.2e-16 if negative. Where the norm of a is below 1, values that should vanish
-    are up to 2.2e-16 (SVD_head), which the default takes for rank: of 500 matrices of order 8 and
-    rank 4 it counts wrong in 41 at a norm of 0.01, 208 at 1e-6 and 463 at 1e-12 (measured);
-    Rank2026_head does not. A largest value that overflows gives rank 0 then. A failure leaves -1.
+/** Numerical rank: the number of singular values above *tolerance. A negative tolerance means
+    max(m, n) times the largest singular value times 2.2e-16. Where the norm of a is below 1,
+    singular values that should be 0 are up to 2.2e-16 (SVD_head), which the default tolerance
+    counts: of 500 matrices of order 8 and rank 4 the rank was wrong in 41 cases at a norm of 0.01,
+    208 at 1e-6 and 463 at 1e-12; Rank2026_head does not have this error. With the default tolerance
+    a largest value that overflows gives rank 0. A failure sets the rank to -1.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
     (no memory), ErrIterationLimit (the singular values do not converge).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
@@ -41,13 +42,13 @@ QX_API int32_t CxRank_head(QX_IN CDB2D a, QX_IN const double *tolerance, QX_OUT 
                            QX_OUT ErrorCode *err);
 
 /** Condition number. normType: 0 the quotient of the largest and the smallest singular value, of
-    any matrix; 1 to 3 the norm of a square matrix (as in Norm_head) times that of its inverse.
-    Infinity for a singular matrix, which is no failure, and where the number overflows. Type 0
-    loses digits where the norm of a is far below 1 (SVD_head): for a condition number of 1000 it is
-    off by 6e-9 at a norm of 1e-8, 5e-4 at 1e-10 and 8e-2 at 1e-12 (measured); CondNumber2026_head
-    keeps them.
+    any matrix; 1 to 3 the norm of a square matrix (as in Norm_head) times that of its inverse. The
+    result is infinite for a singular matrix, which is not an error, and if it overflows. Type 0
+    loses digits if the norm of a is far below 1 (SVD_head): for a condition number of 1000 the
+    relative error was 6e-9 at a norm of 1e-8, 5e-4 at 1e-10 and 8e-2 at 1e-12; CondNumber2026_head
+    does not lose them.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
-    ErrInvalidSelector (*normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
+    ErrInvalidSelector (*normType is not 0 to 3), ErrNotSquare (a is not square, for types 1 to 3),
     ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge).
     NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t CondNumber_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_OUT DBL *cond,
@@ -58,9 +59,10 @@ QX_API int32_t CxCondNumber_head(QX_IN CDB2D a, QX_IN const int32_t *normType, Q
 
 /** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
     the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. Sums that overflow
-    give infinity, those of squares from elements of about 1e154 on; squares of elements below
-    1e-162 vanish. Type 0 loses digits where the norm is far below 1 (SVD_head): 7e-10 of it at
-    1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14 (measured). Norm2026_head has neither fault.
+    give infinity; sums of squares do so for elements from about 1e154 on, and squares of elements
+    below 1e-162 underflow to 0. Type 0 loses digits if the norm is far below 1 (SVD_head): the
+    relative error was 7e-10 at a norm of 1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14. Norm2026_head has
+    neither limitation.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
     singular values do not converge).
@@ -71,9 +73,9 @@ QX_API int32_t Norm_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_OUT DB
 QX_API int32_t CxNorm_head(QX_IN CDB2D a, QX_IN const int32_t *normType, QX_OUT DBL *norm,
                            QX_OUT ErrorCode *err);
 
-/** Numerical rank of a matrix of any norm: the number of singular values above the tolerance, which
-    is max(m, n) times the largest one times 2.2e-16 if negative or NaN. The values are those of
-    SVDS2026_head; one that overflows is above any tolerance.
+/** Numerical rank of a matrix of any norm: the number of singular values above the tolerance. A
+    tolerance that is negative or NaN means max(m, n) times the largest singular value times
+    2.2e-16. The values are those of SVDS2026_head; a value that overflows is above any tolerance.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
     (no memory), ErrIterationLimit (the singular values do not converge).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
@@ -85,11 +87,11 @@ QX_API ErrorCode CxRank2026_head(QX_IN CDB2D a, double tolerance, QX_OUT int32_t
 /** Condition number of a matrix of any norm. normType: 0 the quotient of the largest and the
     smallest singular value, of any matrix; 1 the largest column sum of moduli of a square matrix
     times that of its inverse; 2 the same with the Frobenius norm; 3 the same with the largest row
-    sum. The matrix is scaled by a power of two first, which changes no condition number. Infinity
-    for a singular matrix, which is no failure, and where the number overflows. The relative error
-    is about the number itself times 2.2e-16.
+    sum. The matrix is first scaled by a power of two, which does not change the condition number.
+    The result is infinite for a singular matrix, which is not an error, and if it overflows. The
+    relative error is about the condition number times 2.2e-16.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
-    ErrInvalidSelector (normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
+    ErrInvalidSelector (normType is not 0 to 3), ErrNotSquare (a is not square, for types 1 to 3),
     ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge).
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CondNumber2026_head(QX_IN DBL2D a, int32_t normType, QX_OUT DBL *cond);
@@ -98,8 +100,8 @@ QX_API ErrorCode CondNumber2026_head(QX_IN DBL2D a, int32_t normType, QX_OUT DBL
 QX_API ErrorCode CxCondNumber2026_head(QX_IN CDB2D a, int32_t normType, QX_OUT DBL *cond);
 
 /** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
-    the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. The matrix is
-    scaled by a power of two first, so that only a norm that overflows itself is infinite. The
+    the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. The matrix is first
+    scaled by a power of two, so that the result is infinite only if the norm itself overflows. The
     relative error is a few times max(m, n) eps.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
@@ -126,15 +128,17 @@ QX_API int32_t DotProduct_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL *dot,
 QX_API int32_t DotprodCx(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB *dot, QX_OUT ErrorCode *err);
 
 /** p-norm (sum of |x[i]|^p)^(1/p), also for negative p; the largest |x[i]| for p = +infinity, the
-    smallest for p = -infinity. NaN if x holds NaN, whatever p. Sums and powers that overflow give
-    infinity, squares from elements of about 1e154 on; squares of elements below 1e-162 vanish.
+    smallest for p = -infinity. NaN if x holds NaN, whatever p is. Sums and powers that overflow
+    give infinity, squares for elements from about 1e154 on; squares of elements below 1e-162
+    underflow to 0.
     Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0).
     NaN: x in all results; p refused with ErrNonFiniteInput. */
 QX_API ErrorCode vectorNormH(QX_IN DBL1D x, double p, QX_OUT DBL *norm);
 /** As vectorNormH, for complex data. */
 QX_API ErrorCode CxVectorNormH(QX_IN CDB1D x, double p, QX_OUT DBL *norm);
 
-/** Scales x to the 2-norm 1 and gives its former norm. A norm of 0 or infinity leaves x as it is.
+/** Scales x to a 2-norm of 1 and returns its previous norm. If the norm is 0 or infinite, x is
+    unchanged.
     Codes: ErrEmptyInput (x is empty).
     NaN: x in some results. */
 QX_API int32_t unitVector_head(QX_INOUT DBL1D x, QX_OUT DBL *norm, QX_OUT ErrorCode *err);
@@ -150,22 +154,22 @@ QX_API int32_t unitVector80_head(QX_INOUT DBL1D x, double p, QX_OUT DBL *norm,
 QX_API int32_t CxUnitVector80_head(QX_INOUT CDB1D x, double p, QX_OUT DBL *norm,
                                    QX_OUT ErrorCode *err);
 
-/** Whether |a[i][j] - a[j][i]| is nowhere above a limit: the tolerance, or 0 if that is negative;
-    with `relative` not 0 the order of a times the tolerance times the largest |a[i][j]|, with
-    2.2e-16 for a negative tolerance.
+/** Tests whether a is symmetric: no |a[i][j] - a[j][i]| is above a limit. If `relative` is 0, the
+    limit is the tolerance, or 0 if that is negative; otherwise it is the order of a times the
+    tolerance times the largest |a[i][j]|, with 2.2e-16 for a negative tolerance.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrNonFiniteInput (a holds
     NaN or infinity).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CheckSym_head(QX_IN DBL2D a, double tolerance, int32_t relative,
                                QX_OUT int32_t *isSymmetric);
 
-/** As CheckSym_head, for complex data; with `hermitian` not 0 elements are compared with the
-    conjugate of their mirror image, those of the diagonal with their own. */
+/** As CheckSym_head, for complex data. If `hermitian` is not 0, elements are compared with the
+    conjugate of their mirror image, and diagonal elements with their own conjugate. */
 QX_API ErrorCode CxCheckSym_head(QX_IN CDB2D a, double tolerance, int32_t relative,
                                  int32_t hermitian, QX_OUT int32_t *isSymmetric);
 
-/** Whether a is positive definite: exactly symmetric, with all eigenvalues above 2.2e-16 times the
-    largest modulus of them.
+/** Tests whether a is positive definite: exactly symmetric, with all eigenvalues above 2.2e-16
+    times their largest modulus.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrNonFiniteInput (a is
     symmetric and holds infinity), ErrOutOfMemory (no memory), ErrIterationLimit (the eigenvalues do
     not converge).
@@ -177,11 +181,11 @@ QX_API int32_t CheckPosdef_head(QX_IN DBL2D a, QX_OUT int32_t *isPositiveDefinit
 QX_API int32_t CxCheckPosdef_head(QX_IN CDB2D a, QX_OUT int32_t *isPositiveDefinite,
                                   QX_OUT ErrorCode *err);
 
-/** Whether a is positive semi-definite, and its rank, by symmetric elimination that takes the
-    largest diagonal element first. With t the tolerance (2.2e-16 times the order of a if negative)
-    times the largest diagonal element: a must be symmetric within t, no diagonal element that is
-    left may be below -t, and once none is above t all that is left must vanish within t. rank is
-    -1 where the answer is 0, and after a failure.
+/** Sets *isSemiDefinite to 1 if a is positive semi-definite, otherwise to 0, and *rank to its rank,
+    by symmetric elimination with diagonal pivoting. With t the tolerance (2.2e-16 times the order
+    of a if negative) times the largest diagonal element: a must be symmetric within t, no remaining
+    diagonal element may be below -t, and once none is above t all remaining elements must be 0
+    within t. *rank is -1 if *isSemiDefinite is 0, and after a failure.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrNonFiniteInput (a holds
     NaN or infinity), ErrOutOfMemory (no memory).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
@@ -191,8 +195,9 @@ QX_API ErrorCode CheckPosSemiDef_head(QX_IN DBL2D a, double tolerance,
 QX_API ErrorCode CxCheckPosSemiDef_head(QX_IN CDB2D a, double tolerance,
                                         QX_OUT int32_t *isSemiDefinite, QX_OUT int32_t *rank);
 
-/** Coefficients of det(t - a), ascending: poly has one element more than a has rows, the last one
-    is 1. They are multiplied up from the eigenvalues.
+/** Coefficients of the characteristic polynomial det(t I - a), in ascending powers: poly has one
+    element more than a has rows, and the last one is 1. They are computed by multiplying out the
+    factors of the eigenvalues.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or
     the host refused the resize), ErrNonFiniteInput (a holds NaN or infinity), ErrIterationLimit
     (the eigenvalues do not converge), ErrOverflow (a coefficient overflows).

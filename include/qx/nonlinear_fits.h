@@ -1,67 +1,67 @@
 #ifndef QX_NONLINEAR_FITS_H
 #define QX_NONLINEAR_FITS_H
 
-/* Fits of a model that the caller gives as a procedure. */
+/* Fits of a model that the caller defines by a procedure. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/* A model, or its derivatives, at all samples. p holds its `count` parameters, x what the caller
-   gave to the fit, `n` is the number of samples. A model writes n values to out; a procedure of
-   derivatives n rows of `count`: the derivative of value i by p[j] goes to out[i * count + j]. The
-   result is 0, or any other number to end the fit. It is called on the thread of the fit, may call
-   exports, and must neither throw nor touch the arrays of the fit. */
+/* Computes a model, or its derivatives, at all samples. p holds the `count` parameters, x the array
+   that was passed to the fit, and `n` is the number of samples. A model writes n values to out; a
+   procedure for derivatives writes n rows of `count` values: the derivative of value i by p[j] goes
+   to out[i * count + j]. The function result is 0, or any other number to end the fit. It is called
+   on the thread of the fit, may call exports, and must neither throw nor touch the arrays of the
+   fit. */
 typedef int32_t (*FitProcedure)(void *context, const DBL *x, int32_t xCount, const DBL *p,
                                 int32_t count, DBL *out, int32_t n);
 
-/** The parameters p of a model f(x, p) with the least
+/** Finds the parameters p of a model f(x, p) with the smallest
 
         cost = 1/2 sum over i of scale^2 rho(|w[i]| r[i]^2 / scale^2),  r = y - f,
 
     within bounds, by a trust region with the scaling of J. J. More, "The Levenberg-Marquardt
-    algorithm: implementation and theory", 1978, on QR factors of the derivatives, and at the end
-    by steps of Gauss and Newton, which find the digits that the cost does not show.
+    algorithm: implementation and theory", 1978, on QR factors of the derivatives. Final
+    Gauss-Newton steps determine the digits that the cost does not resolve.
 
         loss: 0 linear, rho(z) = z, which is least squares and has no scale; 1 soft, 2 (sqrt(1 + z)
         - 1); 2 Huber's, z up to 1 and 2 sqrt(z) - 1 beyond; 3 Cauchy's, ln(1 + z); 4 arctan z.
 
-    x is handed on to the procedures and not looked at, NaN included: one number for each sample,
-    or as many as the model wants of each, or none. w holds a weight per sample, such as 1 / sd^2,
-    or is empty. model gives the values, jacobian the derivatives or null: they are then central
-    differences of the second order, near the end of the fourth, one-sided at bounds. context is
-    for the procedures. guess holds the start, lower and upper a bound for each parameter, infinite
-    where there is none, or nothing; equal ones fix it. The model is asked for values within the
-    bounds alone.
+    x is passed on to the procedures without being examined, NaN included: it has one number for
+    each sample, or several, as the model requires, or it is empty. w holds a weight per sample,
+    such as 1 / sd^2, or is empty. model computes the values and jacobian the derivatives; if
+    jacobian is null, the derivatives are central differences of second order, near the end of
+    fourth order, and one-sided at bounds. context is passed to the procedures. guess holds the
+    start values. lower and upper hold a bound for each parameter (infinite for none) or are empty;
+    equal bounds fix a parameter. The model is evaluated only within the bounds.
 
-    tolerance is the part of itself by which a parameter may still move at the end; with 0 or below
-    the fit goes on as long as rounding errors allow. *iterations is the limit, 2000 where it is 0
-    or below, and becomes the number of steps tried.
+    tolerance is the relative change of a parameter at which the fit ends; with 0 or below the fit
+    continues as long as rounding errors allow. *iterations is the limit, 2000 if it is 0 or below,
+    and receives the number of steps tried.
 
-    p has the parameters, residuals has y - f at each sample. covariance is that of the parameters,
-    to first order: the inverse of J^T J, where J are the derivatives times the root of the
-    weights, as the loss counts them (B. Triggs and others, "Bundle adjustment - a modern
-    synthesis", 2000), times 2 cost / (samples - free parameters). It is 0 for fixed parameters,
-    and infinite where the others are not determined or there are no more samples than free
+    p receives the parameters and residuals y - f at each sample. covariance is that of the
+    parameters, to first order: the inverse of J^T J, where J holds the derivatives times the square
+    root of the weights as modified by the loss (B. Triggs and others, "Bundle adjustment - a modern
+    synthesis", 2000), times 2 cost / (samples - free parameters). It is 0 for fixed parameters, and
+    infinite if the free parameters are not determined or there are not more samples than free
     parameters.
 
-    *reason is why the fit has ended: 1 it has converged, and no parameter would move by more than
-    1e-7 of itself; 2 all residuals are 0; 0 the limit of the iterations; 3 the residuals do not
-    depend on each free parameter for itself, as in a valley that goes on to infinity; 4 no step
-    lowers the cost, but the parameters are not at rest to 7 digits: the model is not smooth, the
-    derivatives are not its own, or it is too sensitive to rounding errors. A minimum may be a
-    local one.
+    *reason is why the fit ended: 1 it has converged, and no parameter would change by more than
+    1e-7 of its value; 2 all residuals are 0; 0 the iteration limit was reached; 3 the residuals do
+    not determine each free parameter, as in a valley that extends to infinity; 4 no step lowers the
+    cost, but the parameters have not settled to 7 digits: the model is not smooth, the derivatives
+    do not belong to it, or it is too sensitive to rounding errors. The minimum may be a local one.
 
-    Sums of squares beyond the range of numbers, as for residuals from 1e154 on, are not finite.
-    Codes: ErrSizeMismatch (w is neither empty nor as long as y, or the size of x is no multiple of
-    that of y), ErrEmptyInput (y or guess is empty), ErrSizesDisagree (lower or upper is neither
+    Sums of squares that overflow, as for residuals from 1e154 on, are not finite.
+    Codes: ErrSizeMismatch (w is neither empty nor as long as y, or the size of x is not a multiple
+    of that of y), ErrEmptyInput (y or guess is empty), ErrSizesDisagree (lower or upper is neither
     empty nor as long as guess), ErrNotAvailable (model is null), ErrInvalidSelector (loss is not 0
     to 4), ErrNotStrictlyPositive (scale is not above 0, with a loss other than 0), ErrNaNInData (a
     bound is NaN), ErrBoundsCrossed (a lower bound is above its upper one), ErrFitPointsTooFew
     (fewer samples than free parameters), ErrNonFiniteInput (y, w or guess is not finite),
     ErrTooFewWeights (fewer weights other than 0 than free parameters), ErrOutOfMemory (no memory),
-    ErrNonFiniteFunction (no finite cost or derivatives at the start), ErrNotAvailable (a procedure
-    has ended the fit), ErrIterationLimit (the limit is reached; the outputs are valid),
+    ErrNonFiniteFunction (the cost or the derivatives at the start are not finite), ErrNotAvailable
+    (a procedure ended the fit), ErrIterationLimit (the limit is reached; the outputs are valid),
     WarnRankDeficient (reason 3), WarnLowAccuracy (reason 4).
     NaN: x refused with ErrNonFiniteFunction; y, w, guess refused with ErrNonFiniteInput; lower,
     upper refused with ErrNaNInData; scale refused with ErrNotStrictlyPositive or in no result;

@@ -14,9 +14,9 @@ struct Peaks {
     std::vector<double> derivatives; // their second derivatives, per sample squared
 };
 
-// Peaks above a threshold, or valleys below it, from a parabola over each window of `width` samples: block by
-// block, each of at least `width` samples. Calls PeakD. The last `width` samples of a block are scanned
-// with the next one, or by `last`.
+// Finds peaks above a threshold, or valleys below it, from a parabola over each window of `width`
+// samples, block by block. Each block has at least `width` samples. Calls PeakD. The last `width`
+// samples of a block are scanned with the next one, or by `last`.
 class PeakFinder {
 public:
     explicit PeakFinder(double threshold, int32_t width = 3, bool valleys = false) {
@@ -36,7 +36,7 @@ public:
         return step(block, false);
     }
     Peaks operator()(std::span<const double> block) { return step(block, false).value(); }
-    // The last block, behind which the next one starts a stream.
+    // Passes the last block; the next one starts a new stream.
     Returned<Peaks> last(Returning, std::span<const double> block) { return step(block, true); }
     Peaks last(std::span<const double> block) { return step(block, true).value(); }
 

@@ -1,28 +1,30 @@
 #ifndef QX_POLYPHASE_H
 #define QX_POLYPHASE_H
 
-/* FIR filtering of a stream in blocks with change of the rate, by polyphase terms only.
+/* FIR filtering of a stream in blocks with a change of the sampling rate. Only the polyphase terms
+   that contribute to an output are computed.
 
-   The caller keeps `state`, `delayLeft` and `phase` and hands them back unchanged with each block;
-   blocks may have any size, and give to the bit what one block would give. A stream begins with a
-   reset, as does every change of h, L or M. A failure empties y and state and clears delayLeft and
-   phase. */
+   The caller keeps `state`, `delayLeft` and `phase` and passes them back unchanged with each block.
+   Blocks may have any size; the results are to the bit those of a single block. A stream begins
+   with a reset; every change of h, L or M requires one, too. A failure empties y and state and
+   clears delayLeft and phase. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** Filters a block at one of four rates, with n taps h and upsampled position t of the outputs.
-    mode: 0 the same rate, y[t] = gain sum over k of h[k] x[t - k]; 1 L times the rate,
-    y[t] = gain L sum over j of h[t mod L + j L] x[t / L - j]; 2 every M-th output of mode 0
-    without the gain; 3 every M-th output of mode 1. *reset, or an empty state, begins a
-   stream; with *removeDelay its group delay of (n - 1) / 2 samples is taken off, else outputs begin
-   with the first input. The size of state is n - 1, ceil(n / L), ceil(n / M) + 1 or ceil(n / L) by
-    mode. A change of h or of the rates is noticed by that size alone.
-    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L or M below 1),
-    ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative and no reset is in
-    force), ErrBadTapCount (a reset is to remove the delay of an even number of taps),
-    ErrStateSizeMismatch (state has another size and no reset is in force), ErrOutOfMemory (no
+/** Filters a block at one of four rates. h holds n taps, and t is the position of an output at the
+    upsampled rate. mode: 0 the same rate, y[t] = gain sum over k of h[k] x[t - k]; 1 L times the
+    rate, y[t] = gain L sum over j of h[t mod L + j L] x[t / L - j]; 2 every M-th output of mode 0
+    without the gain; 3 every M-th output of mode 1. A non-zero *reset, or an empty state, begins a
+    stream. With *removeDelay the group delay of (n - 1) / 2 samples is then removed; otherwise
+    outputs begin with the first input. The size of state is n - 1, ceil(n / L), ceil(n / M) + 1 or
+    ceil(n / L) for mode 0 to 3. A change of h or of the rates is detected only if it changes that
+    size.
+    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L or M is below 1),
+    ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative and there is no
+    reset), ErrBadTapCount (a reset that removes the delay, with an even number of taps),
+    ErrStateSizeMismatch (state has the wrong size and there is no reset), ErrOutOfMemory (no
     memory), WarnEmptyResult (x is empty).
     NaN: x in some results; state, h, gain in some results or in no result. */
 QX_API ErrorCode ppMultiRateFIRH_DBL(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,

@@ -12,7 +12,7 @@ QX_BEGIN_DECLS
 
 /** Replaces x by its power spectrum: S[k] = |X[k]|^2 / n^2 for k from 0 to n-1, with X the unscaled
     transform. The sum of S is the mean square of x; S[k] equals S[n-k] to the bit.
-    Codes: ErrEmptyInput (x is empty), ErrInternal (the word holds something else than a plan),
+    Codes: ErrEmptyInput (x is empty), ErrInternal (the word holds something other than a plan),
     ErrOutOfMemory (no memory). A failure empties x.
     NaN: x in all results. */
 QX_API ErrorCode SpectrumH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
@@ -20,7 +20,7 @@ QX_API ErrorCode SpectrumH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
 QX_API ErrorCode SpectrumH_IDP(QX_INOUT DBL1D x, QX_INOUT InstanceWord *instance);
 
 /** The power spectrum of complex data: spectrum[k] = |X[k]|^2 / n^2, n values.
-    Codes: ErrEmptyInput (x is empty), ErrInternal (the word holds something else than a plan),
+    Codes: ErrEmptyInput (x is empty), ErrInternal (the word holds something other than a plan),
     ErrOutOfMemory (no memory, or the host refuses the output).
     NaN: x in all results. */
 QX_API ErrorCode CxSpectrumH(QX_IN CDB1D x, QX_OUT DBL1D spectrum, QX_INOUT PlanSlot *slot);
@@ -29,10 +29,10 @@ QX_API ErrorCode CxSpectrumH_IDP(QX_IN CDB1D x, QX_OUT DBL1D spectrum,
                                  QX_INOUT InstanceWord *instance);
 
 /** The cross spectrum: cross[k] = conj(X[k]) Y[k] / n^2, n values. Element 0 and, for even n,
-    element n/2 have the imaginary part zero; element n-k is the conjugate of element k to the bit.
+    element n/2 have a zero imaginary part; element n-k is the conjugate of element k to the bit.
     Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), the host's status
-    (it refuses the output; a positive one leaves the output as it is), ErrInternal (the word holds
-    something else than a plan), ErrOutOfMemory (no memory).
+    (it refuses the output; a positive status leaves the output unchanged), ErrInternal (the word
+    holds something other than a plan), ErrOutOfMemory (no memory).
     NaN: x, y in some results. */
 QX_API ErrorCode CrossSpectrumH(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT CDB1D cross,
                                 QX_INOUT PlanSlot *slot);
@@ -42,7 +42,7 @@ QX_API ErrorCode CrossSpectrumH_IDP(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT CDB1D c
 
 /** The cross spectrum of complex data: cross[k] = conj(X[k]) Y[k] / n^2, n values.
     Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), ErrOutOfMemory
-    (the host refuses the output), ErrInternal (the word holds something else than a plan),
+    (the host refuses the output), ErrInternal (the word holds something other than a plan),
     ErrOutOfMemory (no memory).
     NaN: x, y in all results. */
 QX_API ErrorCode CxCrossSpectrumH(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D cross,

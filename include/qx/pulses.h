@@ -3,24 +3,25 @@
 
 /* Levels, pulses, cycles and transitions of a waveform y, sampled every dt from t0 on.
 
-   A waveform stays mostly in two states, whose levels come from its histogram or its extremes.
-   Reference levels, as percentages of the amplitude above the low state or as absolute values, cut
-   it into transitions; times are interpolated between samples. IEEE Std 181 has the same terms.
+   A waveform is mostly in one of two states, whose levels are taken from its histogram or its
+   extremes. Reference levels, given as percentages of the amplitude above the low state or as
+   absolute values, define its transitions; times are interpolated between samples. The terms are
+   those of IEEE Std 181.
 
-   The counters of the histogram are kept from call to call in a slot: a word of the caller's, null
-   at first, of which the host is told so that it can clean up. An _IDP export keeps them in the
-   host's instance data, which MeasurementUnreserveProc gives back, and is otherwise its twin. A
-   word that holds what a slot of another kind, an _IDP export or a transform keeps is refused; any
-   other address in it cannot be told from counters and must not stand there.
+   The counters of the histogram are kept from call to call in a slot: a word of the caller, null at
+   first, which is registered with the host for clean-up. An _IDP twin keeps them in the instance
+   data of the host instead, which MeasurementUnreserveProc releases. A word that was filled by
+   another kind of slot, by an _IDP export or by a transform is refused. Any other address in the
+   word cannot be distinguished from counters: never store one there.
 
-   The counters take 4 bytes a bin for as long as the slot holds them, and every call that finds
-   levels by histogram or automatically clears and scans them all, however short the waveform is.
+   The counters take 4 bytes per bin as long as the slot holds them, and every call that determines
+   levels by histogram or automatically clears and scans all of them, however short the waveform is.
 
-   NaN belongs to no state. Numeric results are 0 after a failure. Times that pass the largest
-   number, as with a dt near 1e308, are infinite or NaN, with the code 0, and so is a slew rate by a
-   dt near 0. polarity: 0 falling; 1 rising. limit: 0 none; 1 the automatic method takes both levels
-   from the histogram or neither, and the regions of aberrations end three times the transition's
-   duration away from it. */
+   NaN samples belong to neither state. Numeric results are 0 after a failure. Times that overflow,
+   as with a dt near 1e308, are infinite or NaN, with the code 0, and so is a slew rate with a dt
+   near 0. polarity: 0 falling; 1 rising. limit: 0 none; 1 the automatic method takes either both
+   levels from the histogram or neither, and the regions of aberrations end at a distance of three
+   times the duration of the transition. */
 
 #include "qx/types.h"
 
@@ -30,7 +31,7 @@ QX_BEGIN_DECLS
 enum QXLevelMethod {
     QXLevelsByHistogram = 0, /* the fullest bins of the lowest and of the highest two fifths */
     QXLevelsByPeaks = 1,     /* minimum and maximum */
-    QXLevelsAutomatic = 2 /* the histogram where its bins hold over 5% of the samples, else peaks */
+    QXLevelsAutomatic = 2    /* the histogram if its bins hold over 5% of the samples, else peaks */
 };
 
 typedef struct HistogramOptions {
@@ -47,19 +48,19 @@ typedef struct ReferenceLevels {
         percent; /* 0: absolute values; else percentages of the amplitude above the low state */
 } ReferenceLevels;
 
-/* A word of the caller's in which an export keeps its counters from call to call; null at first. */
+/* A word of the caller in which an export keeps its counters from call to call; null at first. */
 typedef void *MeasurementSlot;
 /* The word that the host keeps for a call node, for the _IDP exports; null at first. */
 typedef void *MeasurementInstanceWord;
 
 /** The levels of the two states and their difference. method: 0 to 2 those of QXLevelMethod.
-    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
-    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something else than
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins is below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
     counters), ErrOutOfMemory (no memory for the counters), ErrMeasureEmpty (y is empty),
     ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor 1),
-    ErrMeasureNotPositive (y is flat, which peaks allow, has no numbers, or spans more than a number
-    can), WarnMeasurePartial (by histogram: the bin of a state holds fewer than 5% of the samples;
-    the results stand).
+    ErrMeasureNotPositive (y is flat (which is allowed by peaks), has only NaN, or spans more than
+    the largest double), WarnMeasurePartial (by histogram: the bin of a state holds fewer than 5% of
+    the samples; the results are valid).
     NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed. */
 QX_API ErrorCode StateLevels(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                              QX_INOUT MeasurementSlot *slot, QX_OUT double *high,
@@ -69,23 +70,25 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
                                  QX_INOUT MeasurementInstanceWord *instance, QX_OUT double *high,
                                  QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
 
-/** Pulse number `pulseNumber` (from 1) whose first edge has the polarity: it lies
-    between two successive crossings of the mid reference, and a crossing counts once the waveform
-    has left the band around mid that reaches to the nearer of the other references. In units of
-    time: the duration, the center, and the period between the crossings of number 2 pulseNumber - 1
-    and 2 pulseNumber + 1 of the waveform; dutyCycle = duration / period. With `partial` the last
-    crossing of the period may be missing; period and dutyCycle are then 0, as they always are with
-    it. Levels are computed only for references in percent, which come out as absolute values. The
-    crossings are found as sample numbers plus t0, so a t0 far beyond the number of samples costs
-    digits, and beyond some 1e16 times that number duration and period are 0 and dutyCycle is NaN.
-    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
-    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something else than
-   counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (pulseNumber below 1),
-   ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
-   (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels),
-   ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
-   the crossings, at most as many as y has samples; or pulseNumber above about 8e7),
-   ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels).
+/** Measures pulse number `pulseNumber` (from 1) among those whose first edge has the given
+    polarity. A pulse is between two successive crossings of the mid reference; a crossing counts
+    once the waveform has left the band around mid that extends to the nearer of the other
+    references. The results, in units of time, are the duration, the center, and the period between
+    the crossings of number 2 pulseNumber - 1 and 2 pulseNumber + 1 of the waveform; dutyCycle =
+    duration / period. With `partial` the last crossing of the period may be missing, and period and
+    dutyCycle are always 0. Levels are computed only for references in percent, which are returned
+    as absolute values. The crossings are found as sample numbers plus t0, so a t0 far beyond the
+    number of samples loses digits; beyond about 1e16 times that number duration and period are 0
+    and dutyCycle is NaN.
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins is below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
+    counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (pulseNumber is below
+    1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0),
+    ErrInvalidSelector (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude,
+    as in StateLevels), ErrMeasureRangeReversed (the references are out of order),
+    ErrMeasureOutOfMemory (no memory for the crossings, at most as many as y has samples; or
+    pulseNumber above about 8e7), ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as
+    in StateLevels).
     NaN: y, t0, ref.high in no result; dt refused with ErrMeasureLevelsReversed; ref.low, ref.mid
     refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
@@ -112,22 +115,23 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
                            QX_OUT double *center, QX_OUT double *lowRef, QX_OUT double *midRef,
                            QX_OUT double *highRef, int32_t limit);
 
-/** Transition number `number` (from 1) of this polarity between the low and the
-    high reference: start, end and duration in units of time, and slewRate, the difference of the
-    references by the duration. Aberrations are the excursions from the state before and behind the
-    transition, up to half the way to the neighbouring transitions or to the ends of the waveform,
-    in percent of the amplitude; an overshoot lies above the state's bin of the histogram, an
-    undershoot below it, and inside it there is none. Afterwards `ref` has absolute levels, and its
-    `percent` as it was; a failure leaves it.
-    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
-    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something else than
-   counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (number below 1),
-   ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
-   (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels
-   and for peaks as well), ErrMeasureRangeReversed (the references are out of order),
-   ErrMeasureOutOfMemory (no memory for the transitions, at most as many as y has samples; or number
-   above about 3e7), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange (the
-   duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well).
+/** Measures transition number `number` (from 1) of the given polarity between the low and the high
+    reference: start, end and duration in units of time, and slewRate, the difference of the
+    references divided by the duration. Aberrations are the excursions from the state before and
+    after the transition, up to half the way to the neighbouring transitions or to the ends of the
+    waveform, in percent of the amplitude; an overshoot is above the histogram bin of the state, an
+    undershoot below it, and excursions within the bin do not count. Afterwards `ref` holds absolute
+    levels, with `percent` unchanged; a failure leaves it unchanged.
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins is below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
+    counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (number is below 1),
+    ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
+    (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels
+    and for peaks as well), ErrMeasureRangeReversed (the references are out of order),
+    ErrMeasureOutOfMemory (no memory for the transitions, at most as many as y has samples; or
+    number above about 3e7), ErrMeasureTooFewPoints (there is no such transition),
+    ErrMeasureOutOfRange (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for
+    peaks as well).
     NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid
     refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
@@ -149,19 +153,19 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
                                QX_OUT double *postUndershoot, QX_OUT double *postOvershoot,
                                int32_t limit);
 
-/** Mean and root mean square over cycle number `cycleNumber` (from 1), between the crossings of
-    number 2 cycleNumber - 1 and 2 cycleNumber + 1 of the mid reference as PulseMeasEx counts them,
-    over whole samples; start and end in units of time. Sums and squares that overflow, from 1e154
-    on, make mean and rms infinite or NaN. Afterwards `ref` has absolute levels, and its `percent`
-    as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
-    ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method),
-    ErrInternal (the word holds something else than counters), ErrOutOfMemory (no memory for the
-   counters), ErrMeasureBadCount (cycleNumber below 1), ErrMeasureEmpty (y is empty),
-   ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor 1),
-   ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the references
-   are out of order), ErrMeasureOutOfMemory (no memory for so many crossings), ErrMeasureSearchShort
-   (too few crossings), ErrMeasureNotFound (a cycle of no samples), WarnMeasurePartial (as in
-   StateLevels).
+/** Mean and root mean square over cycle number `cycleNumber` (from 1), over the samples between the
+    crossings of number 2 cycleNumber - 1 and 2 cycleNumber + 1 of the mid reference, counted as in
+    PulseMeasEx; start and end are in units of time. Sums and squares that overflow, from 1e154 on,
+    make mean and rms infinite or NaN. Afterwards `ref` holds absolute levels, with `percent`
+    unchanged; a failure leaves it unchanged.
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins is below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
+    counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (cycleNumber is below
+    1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0),
+    ErrInvalidSelector (limit is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in
+    StateLevels), ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory
+    (no memory for so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound
+    (a cycle of no samples), WarnMeasurePartial (as in StateLevels).
     NaN: y, ref.high in no result; t0 refused with ErrMeasureNotFound; dt refused with
     ErrMeasureLevelsReversed; ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
@@ -179,16 +183,17 @@ QX_API ErrorCode CycleRMSAverage_IDP(QX_IN DBL1D y, double t0, double dt, int32_
                                      QX_OUT double *end, QX_OUT double *lowRef,
                                      QX_OUT double *midRef, QX_OUT double *highRef, int32_t limit);
 
-/** The first pulse of a waveform in units of samples: base and top, the fullest bins from below and
-    from above of a histogram of 101 bins, amplitude = top - base, overshoot = max - top, undershoot
-    = base - min; delay, the first crossing of 50% of the amplitude; width, from there to the next;
-    riseTime and fallTime between 10% and 90%; slewRate = 0.8 amplitude / riseTime, 1e30 where that
-    divides by 0. A waveform that starts above 50% holds a negative pulse: top and base are
-    exchanged, the amplitude is negative, and the times are those of the waveform turned over;
-    overshoot stays what lies above the upper level, undershoot what lies below the lower one. What
-    the waveform does not reach counts as its last sample in delay and width, and as its end,
-    counted from the last sample before the missing edge, in riseTime and fallTime. Where top - base
-    passes the largest number, amplitude and slewRate are infinite. The function result is 0.
+/** Measures the first pulse of a waveform in units of samples: base and top, the fullest bins from
+    below and from above in a histogram of 101 bins; amplitude = top - base, overshoot = max - top,
+    undershoot = base - min; delay, the first crossing of 50% of the amplitude; width, from there to
+    the next crossing; riseTime and fallTime between 10% and 90%; slewRate = 0.8 amplitude /
+    riseTime, or 1e30 if riseTime is 0. A waveform that starts above 50% has a negative pulse: top
+    and base are exchanged, the amplitude is negative, and the times are those of the inverted
+    waveform; overshoot is still the excursion above the upper level, undershoot that below the
+    lower level. A level that the waveform does not reach counts as reached at its last sample in
+    delay and width, and at its end, counted from the last sample before the missing edge, in
+    riseTime and fallTime. If top - base overflows, amplitude and slewRate are infinite. The
+    function result is 0.
     Codes: ErrEmptyInput (y is empty).
     NaN: y in no result. */
 QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double *base,
@@ -197,8 +202,8 @@ QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double 
                                QX_OUT double *riseTime, QX_OUT double *overshoot,
                                QX_OUT double *undershoot, QX_OUT ErrorCode *err);
 
-/** Gives the counters of an _IDP node back and clears its instance-data word. Null is allowed.
-    Codes: ErrInternal (the word holds something else than counters, and stays as it is). */
+/** Releases the counters of an _IDP node and clears its instance-data word. Null is allowed.
+    Codes: ErrInternal (the word holds something other than counters, and is unchanged). */
 QX_API ErrorCode MeasurementUnreserveProc(QX_INOUT MeasurementInstanceWord *instance);
 
 /** Has no effect: the measurements need no preparation. */

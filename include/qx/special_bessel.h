@@ -1,13 +1,14 @@
 #ifndef QX_SPECIAL_BESSEL_H
 #define QX_SPECIAL_BESSEL_H
 
-/* Bessel functions and their kin. NaN in gives NaN. docs/accuracy has the measured errors. The
-   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical
-   functions, 1964.
+/* Bessel functions and related functions. A NaN argument gives NaN. The measured errors are in
+   docs/accuracy. The formula numbers are those of M. Abramowitz and I. A. Stegun, Handbook of
+   mathematical functions, 1964.
 
-   A function that passes the largest number is infinite where its sign is known, else NaN: ber and
-   bei are from |x| = 1020 or so on, the parabolic cylinder functions for orders from a few hundred
-   on. I, ker and kei may be NaN for arguments beyond 1e154 with orders in the thousands or more. */
+   A function that exceeds the largest double is infinite if its sign is known, otherwise NaN. This
+   concerns ber and bei from about |x| = 1020 on, and the parabolic cylinder functions for orders
+   from a few hundred on. I, ker and kei may be NaN for arguments beyond 1e154 with orders in the
+   thousands or more. */
 
 #include "qx/types.h"
 
@@ -28,8 +29,8 @@ QX_API void QX_Airy(double x, QX_OUT DBL *ai, QX_OUT DBL *aip, QX_OUT DBL *bi, Q
 QX_API void QX_BesselJr(double order, double x, QX_OUT DBL *value);
 
 /** Bessel function Y of real order: kernels and upward recurrence for integers, otherwise
-    (cos(order pi) J_order(x) - J_-order(x)) / sin(order pi) (9.1.2), which loses digits close to
-    integers. NaN for x <= 0 and for orders below -200.
+    (cos(order pi) J_order(x) - J_-order(x)) / sin(order pi) (9.1.2), which loses digits for orders
+    close to integers. NaN for x <= 0 and for orders below -200.
     NaN: order, x in all results. */
 QX_API void QX_BesselYr(double order, double x, QX_OUT DBL *value);
 
@@ -44,14 +45,14 @@ QX_API void QX_BesselJs(int32_t n, double x, QX_OUT DBL *value);
 QX_API void QX_BesselYs(int32_t n, double x, QX_OUT DBL *value);
 
 /** Modified Bessel function I of real order, (x/2)^v exp(-x) M(v + 1/2, 2 v + 1, 2 x) / gamma(v +
-    1) (9.6.47), for integers by rational kernels and recurrence. NaN for orders below -200 and
-    for x < 0 unless the order is an integer; at 0 with a negative order an infinity of the sign
+    1) (9.6.47), for integer orders by rational kernels and recurrence. NaN for orders below -200
+    and for x < 0 unless the order is an integer; at 0 with a negative order an infinity of the sign
     of gamma(order + 1).
     NaN: order, x in all results. */
 QX_API void QX_BesselIr(double order, double x, QX_OUT DBL *value);
 
-/** Modified Bessel function K of order |n|, upward from K_0 and K_1 by K_(k+1) = K_(k-1) + 2 k
-    K_k / x (9.6.26). NaN for x < 0; +infinity at 0; 0 at +infinity.
+/** Modified Bessel function K of order |n|, by upward recurrence from K_0 and K_1 by K_(k+1) =
+    K_(k-1) + 2 k K_k / x (9.6.26). NaN for x < 0; +infinity at 0; 0 at +infinity.
     NaN: x in all results. */
 QX_API void QX_BesselKn(int32_t n, double x, QX_OUT DBL *value);
 

@@ -1,9 +1,9 @@
 #ifndef QX_SPECIAL_ELLIPTIC_EXPORTS_H
 #define QX_SPECIAL_ELLIPTIC_EXPORTS_H
 
-/* Elliptic integrals and Jacobian elliptic functions. NaN in gives NaN. docs/accuracy has the
-   measured errors. The numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of
-   mathematical functions, 1964. */
+/* Elliptic integrals and Jacobian elliptic functions. A NaN argument gives NaN. The measured errors
+   are in docs/accuracy. The formula numbers are those of M. Abramowitz and I. A. Stegun, Handbook
+   of mathematical functions, 1964. */
 
 #include "qx/types.h"
 
@@ -16,14 +16,15 @@ QX_BEGIN_DECLS
     NaN: m in all results; phi in no result. */
 QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
 
-/** As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete.
-    F(phi, 1) has an absolute error of 1e-16 here, which is every digit for phi below that;
-    QX_Elliptic1_2026 keeps them.
+/** As QX_Elliptic1, with a selector in place of the NaN: 1 complete, otherwise incomplete. Here
+    F(phi, 1) has an absolute error of 1e-16, so that no digit is left for phi below that;
+    QX_Elliptic1_2026 keeps all digits.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) within 1 eps: below a quarter
-    of pi as ln(1 + 2 t / (1 - t)), t = tan(phi / 2). Infinite from the double next to pi / 2 on.
+    of pi as ln(1 + 2 t / (1 - t)), t = tan(phi / 2). F(phi, 1) is infinite from the double next to
+    pi / 2 on.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_2026(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
@@ -33,14 +34,14 @@ QX_API void QX_Elliptic1_2026(double m, double phi, QX_OUT DBL *value, int32_t s
     NaN: m in all results; phi in no result. */
 QX_API void QX_Elliptic2(double m, double phi, QX_OUT DBL *value);
 
-/** As QX_Elliptic2, with a selector for what a NaN says there: 1 complete, otherwise incomplete.
+/** As QX_Elliptic2, with a selector in place of the NaN: 1 complete, otherwise incomplete.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic2_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** Jacobian elliptic functions sn = sin(phi), cn = cos(phi), dn = (1 - m sn^2)^(1/2) of u with
     parameter m, and the amplitude phi, for which F(phi, m) = u: by arithmetic-geometric means
-    (16.4), next to m = 0 and m = 1 by circular and hyperbolic functions (16.13, 16.15). Each
-    pointer may be null. NaN for m outside [0, 1].
+    (16.4), near m = 0 and m = 1 by circular and hyperbolic functions (16.13, 16.15). Each pointer
+    may be null. NaN for m outside [0, 1].
     NaN: u, m in all results. */
 QX_API void QX_EllipticJ(double u, double m, QX_OUT DBL *sn, QX_OUT DBL *cn, QX_OUT DBL *dn,
                          QX_OUT DBL *phi);

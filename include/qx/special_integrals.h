@@ -2,9 +2,9 @@
 #define QX_SPECIAL_INTEGRALS_H
 
 /* The error function, the exponential, sine, cosine and hyperbolic integrals, the dilogarithm,
-   Dawson's and the Fresnel integrals. NaN in gives NaN. docs/accuracy has the measured errors. The
-   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical
-   functions, 1964. */
+   Dawson's and the Fresnel integrals. A NaN argument gives NaN. The measured errors are in
+   docs/accuracy. The formula numbers are those of M. Abramowitz and I. A. Stegun, Handbook of
+   mathematical functions, 1964. */
 
 #include "qx/types.h"
 
@@ -22,14 +22,14 @@ QX_API void QX_ErfC(double x, QX_OUT DBL *value);
 
 /** Exponential integral E_n(x), the integral of exp(-x t) / t^n from 1 to infinity: the expansion
     5.1.52 for n > 5000, the continued fraction 5.1.22 for x > 1, the power series 5.1.12 below,
-    from n = 170 on without its logarithmic term. NaN for n < 0, x < 0 and infinities; 0 for x >
-    709.78; at x = 0 it is 1 / (n - 1), or +infinity for n = 0 and 1. E_1 is off by up to 6.4 eps next
-    to x = 1 and takes four times as long as QX_ExpI_2026.
+    without its logarithmic term from n = 170 on. NaN for n < 0, x < 0 and infinities; 0 for x >
+    709.78; at x = 0 it is 1 / (n - 1), or +infinity for n = 0 and 1. E_1 has an error of up to 6.4
+    eps near x = 1 and takes four times as long as QX_ExpI_2026.
     NaN: x in all results. */
 QX_API void QX_ExpI(double x, int32_t n, QX_OUT DBL *value);
 
-/** As QX_ExpI, with E_1 by rational functions of own coefficients on four intervals, broken at 0.4, 2
-    and 10, within 4 eps and down to the smallest numbers. NaN for n < 0, x < 0 and infinities. */
+/** As QX_ExpI, with E_1 by rational functions on four intervals, divided at 0.4, 2 and 10, with an
+    error within 4 eps down to the smallest numbers. NaN for n < 0, x < 0 and infinities. */
 QX_API void QX_ExpI_2026(double x, int32_t n, QX_OUT DBL *value);
 
 /** Sine integral Si(x), the integral of sin(t) / t from 0 to x: a rational function up to |x| = 4,

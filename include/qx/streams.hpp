@@ -21,9 +21,9 @@ struct Summary {
     double greatest = mean;
 };
 
-// Statistics of all values so far: whatever the blocks are, the bits are those of one block. Takes no memory.
-// Differences from the first value are summed, so a small spread far from zero keeps its digits as long as the
-// first value lies near the others.
+// Statistics of all values so far. The results do not depend on the division into blocks, to the
+// bit. Allocates no memory. Differences from the first value are summed, so a small spread far from
+// zero keeps its digits as long as the first value is near the others.
 class RunningStream {
 public:
     Summary operator()(std::span<const double> block) noexcept {
@@ -32,7 +32,7 @@ public:
         return summary();
     }
 
-    // NaN where there was no value.
+    // NaN if there was no value.
     Summary summary() const noexcept {
         if (count_ == 0)
             return {};
@@ -45,7 +45,7 @@ public:
                 least_, greatest_};
     }
 
-    // Begins anew.
+    // Restarts the stream.
     void reset() noexcept { *this = RunningStream(); }
 
 private:
@@ -72,8 +72,9 @@ struct Triggers {
     std::vector<std::int64_t> indices; // of the samples that trigger
 };
 
-// Where a stream passes a level: all blocks together give what one block gives. Calls Triggerh_86. A block
-// that is no longer than the longest before it, or than `longest`, takes memory for its results alone.
+// Finds where a stream crosses a level; the results do not depend on the division into blocks.
+// Calls Triggerh_86. A block that is not longer than the longest before it, or than `longest`,
+// allocates memory only for its results.
 class TriggerStream {
 public:
     enum class Direction : int32_t { rising = 0, falling = 1, either = 2 };
@@ -118,7 +119,7 @@ public:
     }
     Triggers operator()(std::span<const double> block) { return (*this)(returned, block).value(); }
 
-    // Begins anew.
+    // Restarts the stream.
     void reset() {
         state_ = {};
         before_ = 0;

@@ -1,35 +1,36 @@
 #ifndef QX_TONES_H
 #define QX_TONES_H
 
-/* Sinusoidal tones of a sampled signal, and the distortion and noise beside them.
+/* Sinusoidal tones of a sampled signal, and its distortion and noise.
 
    A tone is amplitude cos(2 pi frequency t + phase), with t = 0 at the first sample: the amplitude
-   is that of the peak, the phase above -pi and at most pi. The samples lie dt apart, so that a
-   record of n samples tells frequencies in bins of 1 / (n dt).
+   is the peak value, and the phase is above -pi and at most pi. The samples are dt apart, so a
+   frequency bin of a record of n samples is 1 / (n dt) wide.
 
-   Tones are found one after the other as the largest line in a windowed spectrum of what is left,
-   and all of them are then fitted to the samples together with a constant, by least squares: the
-   sine fit of IEEE Std 1057-2017 (four parameters) with more than one sine. In white noise that is
-   the estimate of maximum likelihood, whose deviations are those of the Cramer-Rao bound once the
-   tones stand out of the noise (D. C. Rife and R. R. Boorstyn, "Single tone parameter estimation
-   from discrete-time observations", 1974). Time grows with the samples, times the square of the
-   number of tones. Frequencies within a quarter of a bin of 0 and of half the sampling rate cannot
-   be found. */
+   Tones are found one after the other, each as the largest line in a windowed spectrum of the
+   residual, and all of them are then fitted to the samples together with a constant, by least
+   squares: the sine fit of IEEE Std 1057-2017 (four parameters) with more than one sine. In white
+   noise that is the estimate of maximum likelihood, whose deviations are those of the Cramer-Rao
+   bound once the tones stand out of the noise (D. C. Rife and R. R. Boorstyn, "Single tone
+   parameter estimation from discrete-time observations", 1974). The time grows with the number of
+   samples, times the square of the number of tones. Frequencies within a quarter of a bin of 0 or
+   of half the sampling rate cannot be found. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** The `count` largest tones of y, or fewer. order: 0 by falling amplitude; 1 by rising frequency.
-    *residualRms is the root mean square of what the tones and the constant leave. The search ends
-    early where the largest line left is below 1e-12 of the largest tone or could be noise, and
-    where there are no more than three samples for each tone and one for the constant. The largest
-    tone of all is given even where it may be noise.
+/** Finds up to `count` largest tones of y, with their frequencies, amplitudes and phases. order: 0
+    by falling amplitude; 1 by rising frequency. *residualRms is the root mean square of the
+    residual after the tones and the constant. The search ends early if the largest remaining line
+    is below 1e-12 of the largest tone or could be noise, and when there are no more than three
+    samples for each tone and one for the constant. The largest tone of all is always returned, even
+    if it may be noise.
 
-    Tones less than about two bins apart are one line in the spectrum and are told from each other
-    by the fit alone. It finds two of them from half a bin on; of three within three bins, half a
-    bin apart, one record in about 1000 is fitted by other tones than it was made of, also without
-    noise.
+    Tones less than about two bins apart form a single line in the spectrum and are separated only
+    by the fit. The fit separates two tones that are at least half a bin apart. For three tones
+    within three bins, half a bin apart, about one record in 1000 is fitted by tones other than
+    those it consists of, even without noise.
     Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite
     number), ErrMeasureBadCount (count is below 1), ErrInvalidSelector (order), ErrNonFiniteInput
     (y), ErrMeasureTooFewPoints (fewer than 4 samples), ErrMeasureNotFound (nothing but a constant),
@@ -39,12 +40,12 @@ QX_API ErrorCode MultipleToneMeasurements(QX_IN DBL1D y, double dt, int32_t coun
                                           QX_OUT DBL1D frequencies, QX_OUT DBL1D amplitudes,
                                           QX_OUT DBL1D phases, QX_OUT double *residualRms);
 
-/** The largest tone whose frequency is within halfWidth of `centre`; where halfWidth is not above
-    0, the largest of all. *offset is the constant, *residualRms the root mean square of what the
-    tone and the constant leave; other tones are part of it. Larger tones outside the band, up to
-    32, are fitted along, so that they do not disturb; smaller ones do, by about their amplitude
-    over pi times the distance in bins: MultipleToneMeasurements fits them all. In a band, a line
-    that could be noise does not count.
+/** Measures the largest tone whose frequency is within halfWidth of `centre`; if halfWidth is not
+    above 0, the largest of all. *offset is the constant, *residualRms the root mean square of the
+    residual after the tone and the constant, which includes the other tones. Up to 32 larger tones
+    outside the band are included in the fit, so that they do not disturb the result. Smaller tones
+    do disturb it, by about their amplitude divided by pi times the distance in bins;
+    MultipleToneMeasurements fits them all. In a band, a line that could be noise does not count.
     Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite
     number), ErrNonFiniteInput (y, centre or halfWidth), ErrMeasureTooFewPoints (fewer than 4
     samples), ErrMeasureNotFound (nothing but a constant, or nothing in the band), ErrOutOfMemory
@@ -56,20 +57,20 @@ QX_API ErrorCode SingleToneMeasurement(QX_IN DBL1D y, double dt, double centre, 
                                        QX_OUT double *phase, QX_OUT double *offset,
                                        QX_OUT double *residualRms);
 
-/** A tone, its harmonics and what is left, by the definitions of IEEE Std 1241-2010 and 1057-2017.
-    The largest tone within 2 bins or 1 % of `fundamental`, or of all where `fundamental` is not
-    above 0, and its multiples up to highestHarmonic are fitted together, with one frequency for
-    all. `fundamental` may exceed half the sampling rate.
+/** Measures a tone, its harmonics and the residual, by the definitions of IEEE Std 1241-2010 and
+    1057-2017. The largest tone within 2 bins or 1 % of `fundamental`, or the largest of all if
+    `fundamental` is not above 0, and its multiples up to highestHarmonic are fitted together, with
+    one frequency for all. `fundamental` may exceed half the sampling rate.
 
     Index 0 of frequencies, amplitudes and phases is the fundamental, index h - 1 harmonic h. Each
-    is given where it is seen, which beyond half the sampling rate 1 / dt is |h f - m / dt| with the
-    nearest integer m. A harmonic is NaN in all three where it is seen within half a bin of 0, of
-    half the sampling rate or of another harmonic (then both are) or the fundamental: its amplitude
-    cannot be told. What is seen of it still counts as distortion, once, but for what falls on 0 or
-    on the fundamental.
+    is given at the frequency where it appears; with the sampling rate 1 / dt, a harmonic above half
+    that rate appears at |h f - m / dt| with the nearest integer m. A harmonic is NaN in all three
+    arrays if it appears within half a bin of 0, of half the sampling rate, of another harmonic
+    (then both are NaN) or of the fundamental: its amplitude cannot be determined. Its line still
+    counts as distortion, once, unless it falls on 0 or on the fundamental.
 
     With A the amplitude of the fundamental, D the root of the sum of the squared amplitudes of the
-    harmonics, and root mean squares of what is left:
+    harmonics, and with root mean squares of residuals:
 
         *thd         D / A, a ratio
         *sinad       20 log10 of A / sqrt(2) over what constant and fundamental leave, in dB
@@ -79,7 +80,7 @@ QX_API ErrorCode SingleToneMeasurement(QX_IN DBL1D y, double dt, double centre, 
                      peak of a sine at full scale, or A where that is not above 0
         *noiseFloor  - *snr - 10 log10(n / 2): noise in each bin relative to the fundamental, in dB
 
-    Where nothing is left these are infinite.
+    Where a residual is 0, the values computed from it are infinite.
     Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite
     number), ErrMeasureBadCount (highestHarmonic is below 1), ErrNonFiniteInput (y, fundamental or
     fullScale), ErrMeasureTooFewPoints (fewer than 4 samples, or than 2 highestHarmonic + 2),

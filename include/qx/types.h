@@ -22,10 +22,10 @@
 #define QX_API __attribute__((visibility("default")))
 #endif
 
-/* What the compiler has to know of the types: elements that stand at any byte, blocks whose elements
-   have another type, and records without gaps. Compilers without attributes know the last by the
-   pragma around the record, which is there for all of them; they take a pointer to elements for
-   what it is, and read and write it at any address. */
+/* What the compiler has to know about the types: elements may start at any byte, the elements of a
+   block have another type than the block, and records have no padding. The pragma around each
+   record states the last point for all compilers. Compilers without attributes read and write
+   elements at any address anyway. */
 #if defined(__GNUC__)
 #define QX_ANY_ALIGNMENT __attribute__((aligned(1)))
 #define QX_MAY_ALIAS __attribute__((may_alias))
@@ -36,12 +36,12 @@
 #define QX_PACKED
 #endif
 
-/* The direction of an argument, read by tools/catalogue.py. An argument without a mark is an
-   input scalar. */
+/* The direction of an argument, read by tools/catalogue.py. An unmarked argument is an input
+   scalar. */
 #define QX_IN
 #define QX_OUT
 #define QX_INOUT
-/* Behind the direction of a pointer to elements: the argument that counts them. */
+/* Follows the direction of a pointer to elements and names the argument with their number. */
 #define QX_LENGTH(count)
 
 QX_BEGIN_DECLS
@@ -49,8 +49,8 @@ QX_BEGIN_DECLS
 /* 0 success, negative failure (outputs empty or NaN), positive warning (outputs valid). */
 typedef int32_t ErrorCode;
 
-/* Elements. Those of a one-dimensional block start at byte 4, so a DBL stands at an address that
-   is 4 modulo 8, and scratch blocks may start at any byte: the types say so to the compiler. */
+/* Elements. Those of a one-dimensional block start at byte 4, so the address of a DBL is 4 modulo
+   8, and scratch blocks may start at any byte. The types declare this to the compiler. */
 typedef int32_t I32 QX_ANY_ALIGNMENT;
 typedef uint8_t U8;
 typedef uint32_t U32 QX_ANY_ALIGNMENT;
@@ -81,18 +81,19 @@ typedef struct QX_MAY_ALIAS Array1DBlock {
     int32_t dimSize;
 } Array1DBlock;
 
-/* A host block of two dimensions: rows, columns, then the elements from byte 8, row after row. */
+/* A host block of two dimensions: rows, columns, then the elements from byte 8, row by row. */
 typedef struct QX_MAY_ALIAS Array2DBlock {
     int32_t dimSizes[2];
 } Array2DBlock;
 
-/* The host owns the blocks and may move one in any resize, so they are passed by handle: a pointer
-   to the pointer to the block. Each element has a handle type of its own, so that the compiler
-   refuses an array of the wrong element.
+/* The host owns the blocks and may move a block at any resize, so blocks are passed by handle: a
+   pointer to the pointer to the block. Each element type has its own handle type, so that the
+   compiler rejects an array of the wrong element type.
 
-   An input may be an output of the same call, which gives the result of two arrays, records that
-   carry arrays included. Two outputs may not be one array: ErrInternal, whatever the export, before
-   anything else is looked at. A block that says a negative size is an empty array. */
+   The same array may be an input and an output of a call, also within records that carry arrays;
+   the result is that of two separate arrays. Two outputs must not be the same array: every export
+   checks this first and returns ErrInternal. A block whose size field is negative is an empty
+   array. */
 #define QX_ARRAY_1D(element)                                                                       \
     struct QX_MAY_ALIAS QXArray1D_##element {                                                      \
         int32_t dimSize;                                                                           \
@@ -117,7 +118,7 @@ typedef Array1DBlock **Array1DHandle;
 typedef Array2DBlock **Array2DHandle;
 
 #pragma pack(push, 1)
-/* What the four workspace exports report into; packed by the host. */
+/* The status record of the four workspace exports; packed by the host. */
 typedef struct QX_PACKED WorkspaceStatus {
     uint8_t status; /* non-zero when an earlier step failed: the export then does nothing */
     int32_t code;   /* the ErrorCode of the last step that ran */

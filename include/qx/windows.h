@@ -1,12 +1,13 @@
 #ifndef QX_WINDOWS_H
 #define QX_WINDOWS_H
 
-/* Windows. Every export multiplies the array x in place; a caller who wants the bare window
-   passes ones. In a complex array the same real value multiplies both parts of a sample.
+/* Windows. Every export multiplies the array x by a window in place; pass an array of ones to
+   obtain the window itself. In a complex array the same real value multiplies both parts of a
+   sample.
 
-   Unless stated the form is periodic: the formula's denominator is n, the number of samples, the
-   first sample is the window's edge and the mirror of sample i is n - i. In the symmetric form
-   the mirror is n - 1 - i.
+   Unless stated otherwise the form is periodic: the denominator in the formula is n, the number of
+   samples, the first sample is the edge of the window, and sample i mirrors sample n - i. In the
+   symmetric form sample i mirrors sample n - 1 - i.
 
    Windows and their parameters by selector:
 
@@ -25,8 +26,9 @@
    F. J. Harris, "On the use of windows for harmonic analysis with the discrete Fourier
    transform", 1978, defines most of them.
 
-   A parameter so extreme that a step of the formula leaves the range of double gives NaN with code
-   0, wherever the window is reached from; each window says below where that begins.
+   If a parameter is so extreme that a step of the formula leaves the range of double, the result is
+   NaN with code 0, in every export that computes the window. The limits are stated with each window
+   below.
 
    Any failure empties the array. */
 
@@ -35,18 +37,18 @@
 QX_BEGIN_DECLS
 
 #pragma pack(push, 1)
-/* Two numbers that describe a window of n values w. */
+/* The constants of a window w of n values. */
 typedef struct WindowConstants {
     DBL enbw; /* equivalent noise bandwidth in bins, n sum(w^2) / sum(w)^2 */
     DBL cg;   /* coherent gain, sum(w) / n */
 } WindowConstants;
 #pragma pack(pop)
 
-/** Kaiser window: I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2i/n. The Bessel series stops
-    after 25 terms, so a large beta is cut short: the window is off by 6e-10 at beta 20, by 4e-7 at
-    25, by 3e-5 at 30 and by 0.03 at 50. From |beta| about 3e7 on (1e7 is still safe) the sum is
-    infinite and values are NaN. J. F. Kaiser, "Nonrecursive digital filter design using the I0-sinh
-    window function", 1974.
+/** Kaiser window: I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2i/n. The Bessel series is
+    truncated after 25 terms, which is inaccurate for large beta: the error of the window is 6e-10
+    at beta 20, 4e-7 at 25, 3e-5 at 30 and 0.03 at 50. From |beta| of about 3e7 on (1e7 is still
+    safe) the sum is infinite and values are NaN. J. F. Kaiser, "Nonrecursive digital filter design
+    using the I0-sinh window function", 1974.
     Codes: ErrEmptyInput (x is empty).
     NaN: x, beta in some results. */
 QX_API ErrorCode KaiserH(QX_INOUT DBL1D x, double beta);
@@ -54,8 +56,9 @@ QX_API ErrorCode KaiserH(QX_INOUT DBL1D x, double beta);
 QX_API ErrorCode CxKaiserH(QX_INOUT CDB1D x, double beta);
 
 /** Dolph-Chebyshev window with side lobes `ratio` (linear) below the main lobe and a peak of 1;
-    symmetric if `symmetric` is non-zero, else periodic. C. L. Dolph, "A current distribution for
-    broadside arrays which optimizes the relationship between beam width and side-lobe level", 1946.
+    symmetric if `symmetric` is non-zero, otherwise periodic. C. L. Dolph, "A current distribution
+    for broadside arrays which optimizes the relationship between beam width and side-lobe level",
+    1946.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or no plan). A ratio below
     1, or one above 1.3e154 (3082 dB), whose square overflows, gives NaN.
     NaN: x in some results; ratio in all results. */
@@ -64,8 +67,8 @@ QX_API ErrorCode DolChebyWinH(QX_INOUT DBL1D x, double ratio, int32_t symmetric)
 QX_API ErrorCode CxDolChebyWinH(QX_INOUT CDB1D x, double ratio, int32_t symmetric);
 
 /** Gaussian window exp(-t^2 / (2 sigma^2)): t = (i - n/2) / (n + 1), or (i - (n-1)/2) / n if
-    `symmetric` is non-zero. A sigma of 0 or less counts as 0.2. One whose square times n^2 falls
-    below about 3e-309 gives zeros, and NaN at a middle sample.
+    `symmetric` is non-zero. A sigma of 0 or less counts as 0.2. A sigma so small that sigma^2 n^2
+    is below about 3e-309 gives zeros, and NaN at a middle sample.
     Codes: ErrEmptyInput (x is empty).
     NaN: x in some results; sigma in all results. */
 QX_API ErrorCode GaussWinH(QX_INOUT DBL1D x, double sigma, int32_t symmetric);
@@ -88,8 +91,8 @@ QX_API ErrorCode ExpWinH(QX_INOUT DBL1D x, double finalValue);
 QX_API ErrorCode CxExpWinH(QX_INOUT CDB1D x, double finalValue);
 
 /** Cosine tapered window: sin^2 tapers over `taperRatio` of the samples, half at each end, in
-    symmetric form. A ratio of 1 or more gives the Hanning window, in periodic form; one of 0 or
-    less leaves x as it is.
+    symmetric form. A ratio of 1 or more gives the Hanning window, in periodic form; a ratio of 0 or
+    less leaves x unchanged.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory for the Hanning window).
     NaN: x in some results or in no result; taperRatio in no result. */
 QX_API ErrorCode CosTaperedH(QX_INOUT DBL1D x, double taperRatio);
@@ -124,8 +127,8 @@ QX_API ErrorCode BohmanWinH(QX_INOUT DBL1D x);
 /** As BohmanWinH, for complex samples. */
 QX_API ErrorCode CxBohmanWinH(QX_INOUT CDB1D x);
 
-/** Parzen window: with t = |i - n/2| / (n/2), 1 - 6 t^2 + 6 t^3 for t up to 1/2, 2 (1 - t)^3
-    beyond.
+/** Parzen window: with t = |i - n/2| / (n/2), 1 - 6 t^2 + 6 t^3 for t up to 1/2, and 2 (1 - t)^3
+    above.
     Codes: ErrEmptyInput (x is empty).
     NaN: x in some results. */
 QX_API ErrorCode ParzenWinH(QX_INOUT DBL1D x);
@@ -148,8 +151,9 @@ QX_API ErrorCode ScaledGenCosWinH(QX_INOUT DBL1D x, QX_IN DBL1D coefs);
 /** As ScaledGenCosWinH, for complex samples. */
 QX_API ErrorCode ScaledCxGenCosWinH(QX_INOUT CDB1D x, QX_IN DBL1D coefs);
 
-/** The cosine sums; divided by the coherent gain if `scaled` is non-zero. selector: 0 to 9; 11.
-    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (another selector), ErrOutOfMemory (no
+/** The windows that are cosine sums; divided by the coherent gain if `scaled` is non-zero.
+    selector: 0 to 9; 11.
+    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (any other selector), ErrOutOfMemory (no
     scratch memory).
     NaN: x in some results. */
 QX_API ErrorCode AllCosWinH(QX_INOUT DBL1D x, int32_t selector, int32_t scaled);
@@ -157,21 +161,20 @@ QX_API ErrorCode AllCosWinH(QX_INOUT DBL1D x, int32_t selector, int32_t scaled);
 QX_API ErrorCode CxAllCosWinH(QX_INOUT CDB1D x, int32_t selector, int32_t scaled);
 
 /** Any window that has a symmetric form. selector: 0 to 9; 11; 30 to 34; 60 to 62. The parameter is
-    used as it stands; that of selector 61 is a linear ratio.
+    used as is; that of selector 61 is a linear ratio.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or no plan),
-    ErrInvalidSelector (another selector (unless x has a single sample)).
+    ErrInvalidSelector (any other selector (unless x has a single sample)).
     NaN: x in some results; param in no result. */
 QX_API ErrorCode SymmWinH(QX_INOUT DBL1D x, int32_t selector, double param);
 /** As SymmWinH, for complex samples. */
 QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
 
-/** A window divided by its coherent gain. selector: as SymmWinH. `constants` are
-    those of the window before the division, NaN after a failure; for cosine sums they are stored
-    values, so x may be empty there. The parameter is used as it stands; that of selector 61 is a
-    linear ratio.
-    Codes: ErrNegativeDimension (x says a negative size; `constants` stay as they are),
-    ErrOutOfMemory (no scratch memory or no plan), ErrInvalidSelector (another selector),
-    ErrEmptyInput (x is empty).
+/** A window divided by its coherent gain. selector: as SymmWinH. `constants` are those of the
+    window before the division, NaN after a failure. For cosine sums they are stored values, and x
+    may be empty. The parameter is used as is; that of selector 61 is a linear ratio.
+    Codes: ErrNegativeDimension (x has a negative size; `constants` are unchanged), ErrOutOfMemory
+    (no scratch memory or no plan), ErrInvalidSelector (any other selector), ErrEmptyInput (x is
+    empty and the window is not a cosine sum).
     NaN: x in some results; param in no result. */
 QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param,
                             QX_OUT WindowConstants *constants);
@@ -180,10 +183,10 @@ QX_API ErrorCode CxScaledWinH(QX_INOUT CDB1D x, int32_t selector, double param,
                               QX_OUT WindowConstants *constants);
 
 /** Any window in any form: divided by its coherent gain if `scaled` is non-zero, symmetric if
-    `symmetric` is non-zero. A NaN as parameter, for selectors 61 and 62 also a negative one, means
-    the default; that of selector 61 is in decibels.
-    Codes: ErrInvalidSelector (both forms at once or an unknown selector), ErrNegativeDimension (x
-    says a negative size and `scaled` is non-zero), ErrEmptyInput (x is
+    `symmetric` is non-zero. A parameter of NaN, for selectors 61 and 62 also a negative one,
+    selects the default; that of selector 61 is in decibels.
+    Codes: ErrInvalidSelector (both forms at the same time, or an unknown selector),
+    ErrNegativeDimension (x has a negative size and `scaled` is non-zero), ErrEmptyInput (x is
     empty), ErrFewerThanTwo (force or exponential with fewer than 2 samples),
     ErrFinalValueNotPositive (exponential with a final value that is not above 0), ErrOutOfMemory
     (no scratch memory or no plan).

@@ -6,14 +6,14 @@
     help(qx.filters)                        # the functions of a topic
 
 The topics are modules: filters, fft, windows, spectra, signals, noise, multirate, linalg, poly, fit,
-interpolate, calculus, stats, special, measure, coordinates. They stand on the exports of the library,
-which are functions too, in `qx.exports` and under `qx` itself:
+interpolate, calculus, stats, special, measure, coordinates. They are built on the exports of the library,
+which can also be called as functions of `qx.exports` and of `qx` itself:
 
     qx.Moment_head([1.0, 2.0, 4.0], 2)      # 1.5555555555555554
-    qx.list("variance")                     # the exports whose name or text has the word
+    qx.list("variance")                     # the exports whose name or text contains the word
     help(qx.Moment_head)
 
-`python3 -m qx` has the same on the command line.
+`python3 -m qx` offers the same on the command line.
 """
 
 import importlib as _importlib
@@ -53,7 +53,7 @@ def __getattr__(name):
 
 
 class _First(str):
-    """A name that is sorted before all others by dir()."""
+    """A name that dir() sorts before all others."""
 
     def __lt__(self, other):
         return str.__lt__(self, other) if isinstance(other, _First) else True

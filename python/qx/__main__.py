@@ -1,4 +1,4 @@
-"""The command line: python3 -m qx COMMAND; the commands stand in qx/commands."""
+"""The command line, python3 -m qx COMMAND. The commands are in qx/commands."""
 
 import argparse
 import contextlib
@@ -18,7 +18,7 @@ examples:
   python3 -m qx report examples/data/ecg_208_360hz.csv
   python3 -m qx list variance
 
-python3 -m qx COMMAND --help has the options and examples of a command."""
+python3 -m qx COMMAND --help shows the options and examples of a command."""
 
 
 def parser():
@@ -36,14 +36,14 @@ def arguments(argv):
 def main(argv=None):
     options = arguments(argv)
     for stream in (sys.stdout, sys.stderr):
-        if isinstance(stream, io.TextIOWrapper):  # and no stand-in
+        if isinstance(stream, io.TextIOWrapper):  # not a substitute
             stream.reconfigure(errors="replace")
     try:
         options.run(options)
         _flush()
     except BrokenPipeError:
         os.dup2(os.open(os.devnull, os.O_WRONLY), sys.stdout.fileno())
-    except Exception as error:  # every failure is one line for the user
+    except Exception as error:  # every failure is reported in one line
         if os.environ.get("QX_TRACEBACK"):
             raise
         with contextlib.suppress(OSError):
@@ -54,7 +54,7 @@ def main(argv=None):
 
 
 def _flush():
-    """Writes what is left for standard output; where that fails the rest is dropped, and not tried again at exit."""
+    """Flushes standard output. If that fails, the rest is dropped and not tried again at exit."""
     try:
         sys.stdout.flush()
     except BrokenPipeError:
@@ -67,7 +67,7 @@ def _flush():
 def _line_of(error):
     """What went wrong, in one line."""
     if isinstance(error, OSError) and error.strerror:
-        # What has no name here is standard output: outputs.py names its files.
+        # An error without a file name concerns standard output: outputs.py names its files.
         place = error.filename or ("standard output: cannot be written" if error.errno in FULL else "")
         text = f"{place}: {error.strerror}" if place else error.strerror
     else:
@@ -76,7 +76,7 @@ def _line_of(error):
 
 
 def run():
-    """main() for a process of its own."""
+    """main() as the entry point of a process."""
     with Watch():
         return main()
     return EXIT

@@ -1,13 +1,14 @@
-"""NumPy arrays as host blocks and host blocks as NumPy arrays.
+"""Converts NumPy arrays to host blocks, and host blocks to NumPy arrays.
 
-An array goes into a block with one copy. A large block comes out as a NumPy view of it without any;
-the view keeps the block alive, and given to a call as an input it goes back in without a copy. The
-blocks of small arrays are kept for the next call and their content is copied out, which costs less
-than making a block and a view.
+An array is copied once into a block. A large block is returned as a NumPy view of it, without a copy. The
+view keeps the block alive, and is passed to a later call as an input without a copy. The blocks of small
+arrays are kept for the next call and their contents are copied out, which costs less than creating a block
+and a view.
 """
 
 import ctypes
 import functools
+import math
 
 import numpy as np
 
@@ -18,14 +19,14 @@ TYPE_CODES = {"I32": 3, "U8": 5, "U32": 7, "SGL": 9, "DBL": 10, "CSG": 12, "CDB"
 DTYPES = {"I32": np.dtype(np.int32), "U8": np.dtype(np.uint8), "U32": np.dtype(np.uint32),
           "SGL": np.dtype(np.float32), "DBL": np.dtype(np.float64), "CSG": np.dtype(np.complex64),
           "CDB": np.dtype(np.complex128)}
-LARGEST = 2**31 - 1  # elements that a block can have
+LARGEST = 2**31 - 1  # most elements of a block
 SMALL = 16384  # bytes up to which a block is kept
 KEPT_SHAPES, KEPT_PER_SHAPE = 32, 4
 
 
 @functools.lru_cache(maxsize=None)
 def element_dtype(element):
-    """The NumPy type of an element; records have their natural layout in C."""
+    """The NumPy type of an element; records have their natural C layout."""
     if element in DTYPES:
         return DTYPES[element]
     fields = library().records[element]["fields"]
@@ -35,7 +36,7 @@ def element_dtype(element):
 
 
 def came(value):
-    """How a value that was given in place of an array is named in a message."""
+    """The description, for a message, of a value that was passed instead of an array."""
     if isinstance(value, np.ndarray):
         return f"{value.ndim} of {value.dtype}"
     if isinstance(value, (list, tuple)):
@@ -44,15 +45,15 @@ def came(value):
 
 
 class _Memory:
-    """What shows memory to NumPy and does not own it."""
+    """Exposes memory to NumPy without owning it."""
 
     __slots__ = ("__array_interface__",)
     __array_interface__: dict
 
 
 class Block:
-    """A host array: owns a handle. `shape` and `elements`, a view of a small block that does not
-    leave the package, hold until the next call has the block as an output; then show()."""
+    """A host array, which owns a handle. `shape` and `elements`, a view of a small block that does not leave
+    the package, are valid until a call has the block as an output; then show() must be called."""
 
     __slots__ = ("handle", "kind", "address", "shown", "sizes", "dims", "shape", "small", "elements",
                  "_free", "__weakref__")
@@ -75,7 +76,7 @@ class Block:
         self.dims = self.sizes[:]
         self.shape = tuple(self.dims)
         interface = self.__array_interface__
-        self.small = int(np.prod(self.shape, dtype=np.int64)) * self.kind.dtype.itemsize <= SMALL
+        self.small = math.prod(self.shape) * self.kind.dtype.itemsize <= SMALL
         self.elements = None
         if self.small:
             memory = _Memory()
@@ -93,8 +94,8 @@ class Block:
 
 
 class Kind:
-    """The arrays of one element and one number of dimensions, with the blocks that are kept. Lists
-    and dictionaries do each step under the interpreter's lock, so threads share them."""
+    """The arrays of one element type and number of dimensions, with the blocks that are kept. Operations on
+    lists and dictionaries are atomic under the interpreter's lock, so threads can share them."""
 
     def __init__(self, element, dimensions):
         self.element, self.dimensions = element, dimensions
@@ -104,8 +105,8 @@ class Kind:
         self.kept = {}  # shape -> blocks
 
     def given(self, value, place, reuse=True):
-        """A block with the content of an array. With `reuse` the block behind `value` itself, where
-        `value` shows the whole of one: only for arrays that the call leaves alone."""
+        """A block with the content of an array. With `reuse`, if `value` is a view of a whole block, it is that
+        block itself; this is only for arrays that the call does not change."""
         if type(value) is np.ndarray and value.dtype is self.dtype:
             try:
                 block = self.kept[value.shape].pop()
@@ -140,8 +141,8 @@ class Kind:
         return block
 
     def checked(self, value, place):
-        """`value` as an array of the right number of dimensions whose cast to the element loses
-        nothing but precision."""
+        """`value` as an array of the right number of dimensions, which can be cast to the element type with no
+        loss except of precision."""
         dtype = self.dtype
         if isinstance(value, np.ma.MaskedArray) and np.ma.is_masked(value):
             raise ValueError(f"{at(place)}: {np.ma.count_masked(value)} elements are masked, and an array "
@@ -150,15 +151,15 @@ class Kind:
             else np.asarray(value)
         if array.ndim != self.dimensions:
             raise ValueError(f"{at(place)}: an array of {self.dimensions} dimension"
-                             f"{'s'[:self.dimensions - 1]} is needed; {came(value)} came, which has "
+                             f"{'s'[:self.dimensions - 1]} is needed; got {came(value)}, which has "
                              f"{array.ndim}")
         if array.size > LARGEST:
-            raise ValueError(f"{at(place)}: {array.size} elements are more than an array can have")
+            raise ValueError(f"{at(place)}: {array.size} elements are more than an array can hold")
         if array.dtype == dtype or array.size == 0:
             return array
         if not np.can_cast(array.dtype, dtype, "same_kind") and not (
                 array.dtype.kind in "bui" and dtype.kind in "bui"):
-            raise TypeError(f"{at(place)}: elements of {dtype} are needed; {array.dtype} came")
+            raise TypeError(f"{at(place)}: elements of {dtype} are needed; got {array.dtype}")
         if dtype.kind in "ui" and array.dtype.kind != "b":
             limits = np.iinfo(dtype)
             if array.min() < limits.min or array.max() > limits.max:
@@ -166,16 +167,16 @@ class Kind:
         return array
 
     def _records(self, value, place):
-        """A list of tuples as an array of records. NumPy itself would put a number into every field."""
+        """A list of tuples as an array of records. NumPy itself would copy a plain number to every field."""
         names = self.dtype.names
         for row in value if isinstance(value, (list, tuple)) else [value]:
             if not isinstance(row, (tuple, list, np.void)) or (
                     len(row) != len(names)):  # type: ignore[arg-type]  # np.void has a length
-                raise TypeError(f"{at(place)}: a list of tuples ({', '.join(names)}) is needed; {came(row)} came")
+                raise TypeError(f"{at(place)}: a list of tuples ({', '.join(names)}) is needed; got {came(row)}")
         return np.array([tuple(row) for row in value], self.dtype)
 
     def give_back(self, block):
-        """After a call that had the block as an input."""
+        """Takes back a block after a call that had it as an input."""
         if block.small and self.element in TYPE_CODES:
             self._keep(block)
 
@@ -189,7 +190,7 @@ class Kind:
             kept.append(block)
 
     def changed(self, block):
-        """The array in a block that was input and output."""
+        """The array in a block that was both input and output."""
         if not block.is_shown():
             block.show()
         if not block.small:
@@ -199,7 +200,7 @@ class Kind:
         return array
 
     def output(self, spare):
-        """A block of no elements, for an output; `spare` has those of earlier calls."""
+        """An empty block for an output; `spare` has the blocks of earlier calls."""
         try:
             block = spare.pop()
         except IndexError:
@@ -229,7 +230,7 @@ class Kind:
 
 
 class Vector(Kind):
-    """Arrays of one dimension, whose one size is set and read in less time."""
+    """One-dimensional arrays, whose single size is set and read faster."""
 
     def changed(self, block):
         if block.small and block.address.value == block.shown and block.sizes[0] == block.dims[0]:

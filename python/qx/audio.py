@@ -1,4 +1,4 @@
-"""Audio files by libsndfile: every format and coding that it reads."""
+"""Audio files, read by libsndfile, in every format and coding that it supports."""
 
 import contextlib
 import errno
@@ -15,7 +15,7 @@ STARTS = (b"RIFF", b"RIFX", b"RF64", b"FORM", b"fLaC", b"OggS", b".snd", b"caff"
 ENDINGS = (".wav", ".wave", ".flac", ".aif", ".aiff", ".aifc", ".ogg", ".oga", ".opus", ".mp3", ".au",
            ".snd", ".caf", ".w64", ".rf64", ".voc")
 FRAMES_AT_ONCE = 1 << 20
-FULL = 1 << 20  # bytes; where no more are free the disk is taken for full
+FULL = 1 << 20  # bytes; with less free space, the disk counts as full
 
 
 def is_audio(path, start):
@@ -23,10 +23,10 @@ def is_audio(path, start):
 
 
 def read(path, local, column, first, most, whole, outlines, outline):
-    """Samples of one channel from a frame on, the rate, the channel from 1 and the numbers of
-    channels and frames. `whole` is given all samples from `first` on; `outlines` those of the
-    other channels by their indices, in what `outline` makes. `path` is what messages name, `local` the
-    file."""
+    """Samples of one channel from a frame on, the rate, the number of the channel from 1, and the numbers of
+    channels and frames. `whole` receives all samples from `first` on. `outlines` receives those of the other
+    channels, by their indices, in objects created by `outline`. Messages call the file `path`; `local` is the
+    actual file."""
     import soundfile
     try:
         with soundfile.SoundFile(local) as file:
@@ -67,8 +67,8 @@ def _channel(path, file, channel, first, most, whole, outlines, outline):
 
 @contextlib.contextmanager
 def written(path, rate, channels, subtype, kind):
-    """A new audio file to write to. It is whole when the block is left without an exception: where the disk is full
-    libsndfile says "System error", and of the last samples of a FLAC file nothing."""
+    """A new audio file to write to. It is complete if the block ends without an exception: on a full disk,
+    libsndfile only says "System error", and for the last samples of a FLAC file it says nothing."""
     import soundfile
     try:
         with soundfile.SoundFile(path, "w", rate, channels, subtype, format=kind) as file:
@@ -76,7 +76,7 @@ def written(path, rate, channels, subtype, kind):
             frames = file.frames
         if soundfile.info(path).frames == frames:
             return
-        reason = "it was not written as a whole"
+        reason = "it was not written completely"
     except soundfile.SoundFileError as error:
         reason = str(error)
     if shutil.disk_usage(os.path.dirname(path) or ".").free < FULL:
@@ -85,8 +85,8 @@ def written(path, rate, channels, subtype, kind):
 
 
 def wrong_length(local, frames):
-    """What is wrong with the lengths that a file announces, or an empty text. `frames` is how many could be
-    read."""
+    """What is wrong with the lengths that a file announces, or an empty text. `frames` is the number of frames
+    that could be read."""
     try:
         return _wrong_length(local, frames)
     except struct.error:
@@ -112,10 +112,10 @@ def _wrong_length(local, frames):
         return _cut(file.frames, frames, "samples")
 
 
-OPEN = 0xFFFFFFFF  # what recorders write that cannot go back to the header
-LEFT_OPEN = "the header leaves the length open: all to the end of the file is taken"
-# By the first bytes: the struct of name and length of a chunk, where the first one begins, the name of the samples,
-# to how many bytes chunks are filled, and what of its own head a length counts.
+OPEN = 0xFFFFFFFF  # the length written by recorders that cannot go back to the header
+LEFT_OPEN = "the header does not give the length: the file is read to its end"
+# By the first bytes: the struct of name and length of a chunk, the start of the first chunk, the name of the chunk
+# with the samples, the number of bytes to which chunks are padded, and the part of its own head that a length counts.
 CHUNKS = {b"RIFF": ("<4sI", 12, b"data", 2, 0), b"RIFX": (">4sI", 12, b"data", 2, 0),
           b"RF64": ("<4sI", 12, b"data", 2, 0), b"FORM": (">4sI", 12, b"SSND", 2, 0),
           b"caff": (">4sq", 8, b"data", 1, 0), b"riff": ("<4s12xQ", 40, b"data", 8, 24)}
@@ -143,12 +143,12 @@ def _wrong_chunks(file, start, size, frames, head, at, samples, filled, counted)
             if length > rest:
                 return _cut(length, rest)
             if announced is not None and announced != frames:
-                return f"the header announces {announced} samples, {frames} are there"
+                return f"the header announces {announced} samples, but there are {frames}"
         elif not 0 <= length <= rest or not re.fullmatch(rb"[\x20-\x7e]{4}", name):
-            return f"{rest + width} bytes at the end of the file belong to no part of it: the header may be wrong"
+            return f"{rest + width} bytes at the end of the file belong to no chunk: the header may be wrong"
         at += width + -(-length // filled) * filled
     if start[:4] in (b"RIFF", b"RIFX", b"FORM"):
         named = struct.unpack(head[0] + "I", start[4:8])[0] + 8
         if abs(named - size) > 1 and named not in (8, OPEN + 8):
-            return f"the header announces a file of {named} bytes, which has {size}"
+            return f"the header announces a file of {named} bytes, but it has {size}"
     return ""

@@ -1,4 +1,4 @@
-"""Integrals and derivatives of samples and of functions, and from acceleration to displacement.
+"""Integrals and derivatives of samples and of functions, and velocity and displacement from acceleration.
 """
 
 from __future__ import annotations
@@ -27,28 +27,28 @@ def _step(function: Any, x: Any, dx: Any) -> Any:
     """The distance between samples: dx, or that of the evenly spaced x."""
     if x is None:
         if not dx > 0:
-            refuse(function, "dx", f"must be above 0; {dx} came", "ErrSamplingNotPositive")
+            refuse(function, "dx", f"must be above 0; got {dx}", "ErrSamplingNotPositive")
         return float(dx)
     x = as_array(x).astype(float)
     steps = np.diff(x)
     if x.ndim != 1 or not len(steps) or not steps[0] > 0 or \
             np.abs(steps - steps.mean()).max() > 1e-9 * np.abs(x).max(initial=0) + 1e-12 * steps[0]:
-        refuse(function, "x", "must be evenly spaced and rise", "ErrAbscissaeOrder")
+        refuse(function, "x", "must be evenly spaced and increasing", "ErrAbscissaeOrder")
     return float((x[-1] - x[0]) / len(steps))
 
 
 @result
 class Quadrature(Result):
-    """The integral of a function; unpacked, value and error.
+    """The integral of a function; unpacks into value and error.
 
     Attributes
     ----------
     value : float or complex
         The integral.
     error : float
-        An estimate of its error, mostly far above it.
+        An estimate of the error of the integral, usually far above the actual error.
     evaluations : int
-        At how many points the function was asked.
+        The number of points at which the function was evaluated.
     """
 
     value: float
@@ -58,14 +58,14 @@ class Quadrature(Result):
 
 
 def trapezoid(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: int = LAST) -> Any:
-    """The integral by trapezoids; here x may be spaced as it likes.
+    """The integral by the trapezoidal rule; x may be spaced unevenly.
 
     Parameters
     ----------
     y : array_like
         Samples.
     x : array_like, optional
-        Where the samples are, evenly spaced.
+        The abscissae of the samples, in any spacing.
     dx : float
         The distance between samples, where x is not given.
     axis : int
@@ -78,7 +78,7 @@ def trapezoid(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: i
     Raises
     ------
     ValueError
-        If there are too few samples for the rule, x is not evenly spaced, or dx is not above 0.
+        If there are too few samples, x is evenly spaced but decreasing, or dx is not above 0.
 
     Examples
     --------
@@ -93,14 +93,14 @@ def trapezoid(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: i
 
 
 def simpson(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: int = LAST) -> Any:
-    """The integral by Simpson's rule, exact for cubic polynomials, with any number of samples from 3 on.
+    """The integral by Simpson's rule, which is exact for cubic polynomials, for 3 or more samples.
 
     Parameters
     ----------
     y : array_like
         Samples.
     x : array_like, optional
-        Where the samples are, evenly spaced.
+        The abscissae of the samples, evenly spaced.
     dx : float
         The distance between samples, where x is not given.
     axis : int
@@ -127,15 +127,15 @@ def simpson(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: int
 def integrate(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0,
               rule: Literal["trapezoid", "simpson", "simpson38", "boole", "left", "right"] = "boole",
               axis: int = LAST) -> Any:
-    """The integral by a composite rule of Newton and Cotes; what is left over of whole panels is taken
-    by a one-sided formula of the same order.
+    """The integral by a composite Newton-Cotes rule. Samples left over after the last whole panel are
+    integrated by a one-sided formula of the same order.
 
     Parameters
     ----------
     y : array_like
         Samples.
     x : array_like, optional
-        Where the samples are, evenly spaced.
+        The abscissae of the samples, evenly spaced.
     dx : float
         The distance between samples, where x is not given.
     rule : {"trapezoid", "simpson", "simpson38", "boole", "left", "right"}
@@ -172,11 +172,11 @@ def integrate2(y: ArrayLike, dx: float = 1.0, dy: float = 1.0,
     y : array_like
         Samples in two dimensions.
     dx : float
-        The distance of samples in a row.
+        The distance between samples in a row.
     dy : float
-        The distance of rows.
+        The distance between rows.
     rule : {"trapezoid", "simpson", "simpson38", "boole"}
-        As of `integrate`.
+        As for `integrate`.
 
     Returns
     -------
@@ -185,7 +185,7 @@ def integrate2(y: ArrayLike, dx: float = 1.0, dy: float = 1.0,
     Raises
     ------
     ValueError
-        If a dimension is below 3 or shorter than a panel, or rule is none of its words.
+        If a dimension is below 3 or shorter than a panel, or rule is not a valid choice.
 
     Examples
     --------
@@ -206,9 +206,9 @@ def integrate3(y: ArrayLike, dx: float = 1.0, dy: float = 1.0, dz: float = 1.0,
     y : array_like
         Samples y[plane, row, column].
     dx, dy, dz : float
-        The distances of samples in a row, of rows, and of planes.
+        The distances between samples in a row, between rows, and between planes.
     rule : {"trapezoid", "simpson", "simpson38", "boole"}
-        As of `integrate`.
+        As for `integrate`.
 
     Returns
     -------
@@ -217,8 +217,8 @@ def integrate3(y: ArrayLike, dx: float = 1.0, dy: float = 1.0, dz: float = 1.0,
     Raises
     ------
     ValueError
-        If there are not three dimensions, one is below 3 or shorter than a panel, or rule is none of its
-        words.
+        If there are not three dimensions, one is below 3 or shorter than a panel, or rule is not a valid
+        choice.
 
     Examples
     --------
@@ -229,8 +229,8 @@ def integrate3(y: ArrayLike, dx: float = 1.0, dy: float = 1.0, dz: float = 1.0,
     code = chosen("calculus.integrate3", "rule", rule, {name: RULES[name] for name in [*RULES][:4]})
     y = as_array(y)
     if y.ndim != 3:
-        refuse("calculus.integrate3", "y", f"three dimensions are needed; {y.ndim} came", "ErrSizesDisagree")
-    # The export has sizes of its own: so many rows, columns, planes, with the planes one behind the other.
+        refuse("calculus.integrate3", "y", f"three dimensions are needed; got {y.ndim}", "ErrSizesDisagree")
+    # The export takes the numbers of rows, columns and planes, and the planes one after the other.
     planes, rows, columns = y.shape
     return core.integrate3(np.ascontiguousarray(y, float).reshape(rows, columns, planes),
                            [float(dx), float(dy), float(dz)], code)
@@ -246,20 +246,20 @@ def cumulative(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0,
     y : array_like
         Samples.
     x : array_like, optional
-        Where the samples are, evenly spaced.
+        The abscissae of the samples, evenly spaced.
     dx : float
         The distance between samples, where x is not given.
     rule : {"corrected", "trapezoid", "simpson", "simpson38", "boole", "left", "right"}
-        "corrected" takes trapezoids and, by the formula of Euler and Maclaurin, the slopes at both ends:
-        an error of fourth order. Simpson's and the higher rules are exact for smooth samples, but noise
-        at half the sampling rate grows in them without bounds.
+        "corrected" uses trapezoids and corrects them by the slopes at both ends, by the Euler-Maclaurin
+        formula, with an error of fourth order. Simpson's and the higher rules are accurate for smooth
+        samples, but amplify noise at half the sampling rate without bound.
     axis : int
         The axis along which to work.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of y.
+    ndarray, or the pandas type of x
+        The same shape as y.
 
     Raises
     ------
@@ -290,11 +290,11 @@ def _corrected(channel: Any, step: Any) -> Any:
 
 
 def _slopes(channel: Any, step: Any, code: Any) -> Any:
-    """The derivative, with samples beyond the ends from the polynomial through as many as the rule has."""
+    """The derivative, with samples beyond the ends from a polynomial through as many samples as the rule takes."""
     order = {0: 2, 1: 4, 2: 1, 3: 1}[code]
     need = 2 if code == 1 else 1
     if len(channel) <= order:
-        refuse("calculus.derivative", "y", f"at least {order + 1} samples are needed; {len(channel)} came",
+        refuse("calculus.derivative", "y", f"at least {order + 1} samples are needed; got {len(channel)}",
                "ErrSizesDisagree")
     before, behind = list(channel[:order + 1]), list(channel[-order - 1:])
     for _ in range(need):  # the next value of a polynomial has vanishing differences
@@ -307,26 +307,26 @@ def _slopes(channel: Any, step: Any, code: Any) -> Any:
 def derivative(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0,
                rule: Literal["central", "five-point", "forward", "backward"] = "central",
                axis: int = LAST) -> Any:
-    """The derivative of samples. Samples beyond the ends are those of the polynomial through the nearest
-    ones, so that the order of the rule holds up to the ends.
+    """The derivative of samples. The samples are extended beyond the ends by the polynomial through the
+    nearest ones, so that the order of the rule holds up to the ends.
 
     Parameters
     ----------
     y : array_like
         Samples.
     x : array_like, optional
-        Where the samples are, evenly spaced.
+        The abscissae of the samples, evenly spaced.
     dx : float
         The distance between samples, where x is not given.
     rule : {"central", "five-point", "forward", "backward"}
-        Two or four samples around, the next one, the one before.
+        The samples used besides the current one: two or four neighbours, the next one, or the previous one.
     axis : int
         The axis along which to work.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of y.
+    ndarray, or the pandas type of x
+        The same shape as y.
 
     Raises
     ------
@@ -363,21 +363,21 @@ _G15[1::2] = np.r_[_GAUSS, _GAUSS[-2::-1]]
 
 
 def quad(f: Callable[..., Any], a: float, b: float, tolerance: float = 1e-10, limit: int = 1000) -> Quadrature:
-    r"""The integral of a function from a to b, by halving of the interval where the formulas of Gauss and
-    Kronrod disagree most.
+    r"""The integral of a function from a to b, by Gauss-Kronrod quadrature that halves the interval with the
+    largest error estimate.
 
     .. math:: \int_a^b f(x)\,dx
 
     Parameters
     ----------
     f : callable
-        Of an array of points; returns as many values, real or complex.
+        Takes an array of points and returns the same number of values, real or complex.
     a, b : float
         The ends; infinite ones are allowed.
     tolerance : float
-        The error that is strived for, relative to the integral.
+        The error to aim at, relative to the integral.
     limit : int
-        The most intervals.
+        The largest number of intervals.
 
     Returns
     -------
@@ -426,7 +426,7 @@ def quad(f: Callable[..., Any], a: float, b: float, tolerance: float = 1e-10, li
 
 
 def _quad_infinite(f: Any, a: Any, b: Any, tolerance: Any, limit: Any) -> Any:
-    """By x = t / (1 - t^2), which takes -1 to 1 to all numbers."""
+    """By the substitution x = t / (1 - t^2), which maps -1 to 1 to the whole axis."""
     def place(x: Any) -> Any:
         if math.isinf(x):
             return math.copysign(1.0, x)
@@ -441,27 +441,27 @@ def _quad_infinite(f: Any, a: Any, b: Any, tolerance: Any, limit: Any) -> Any:
 
 def velocity(acceleration: ArrayLike, fs: float, drift: int | None = 1, cutoff: float | None = None,
              axis: int = LAST) -> Any:
-    """The velocity of a measured acceleration. What an offset of the acceleration and the unknown
-    velocity at the beginning make of it, a line, is removed.
+    """The velocity from a measured acceleration. An offset of the acceleration and the unknown initial
+    velocity add a line to it, which is removed.
 
     Parameters
     ----------
     acceleration : array_like
-        In units of length by time squared.
+        The acceleration, in units of length per time squared.
     fs : float
         The sampling rate.
     drift : int or None
-        The order of the polynomial that is removed from the result; None for nothing.
+        The order of the polynomial that is removed from the result; None to remove nothing.
     cutoff : float, optional
-        A frequency, in the unit of fs, below which there is only drift: a Butterworth highpass of second
-        order in both directions removes it.
+        A frequency, in the unit of fs, below which there is only drift. It is removed by a second-order
+        Butterworth highpass, applied in both directions.
     axis : int
         The axis of time.
 
     Returns
     -------
-    ndarray, or what acceleration is of pandas
-        Of the shape of acceleration.
+    ndarray, or the pandas type of acceleration
+        The same shape as acceleration.
 
     Raises
     ------
@@ -483,7 +483,7 @@ def velocity(acceleration: ArrayLike, fs: float, drift: int | None = 1, cutoff: 
 def _motion(acceleration: Any, fs: Any, drift: Any, cutoff: Any, times: Any, axis: Any) -> Any:
     from . import filters
     if not fs > 0:
-        refuse("calculus.velocity", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        refuse("calculus.velocity", "fs", f"must be above 0; got {fs}", "ErrSamplingNotPositive")
     found = acceleration
     for _ in range(times):
         found = cumulative(found, dx=1 / fs, axis=axis)
@@ -495,36 +495,36 @@ def _motion(acceleration: Any, fs: Any, drift: Any, cutoff: Any, times: Any, axi
 
 
 def _driftless(channel: Any, order: Any) -> Any:
-    """The values less a polynomial of least squares under a Blackman window, in which vibrations of some
-    periods and more leave next to nothing."""
+    """The values less a least-squares polynomial under a Blackman window, which vibrations of several periods
+    hardly affect."""
     n = len(channel)
     order = whole_number("calculus.displacement", "drift", order, 0, "ErrPolynomialOrderNegative")
-    weights = windows.blackman(n + 2)[1:-1]  # none is 0
+    weights = windows.blackman(n + 2)[1:-1]  # all above 0
     return channel - core.velocity(np.linspace(-1, 1, n), channel, order, weights, 0, [], [])[0]
 
 
 def displacement(acceleration: ArrayLike, fs: float, drift: int | None = 2, cutoff: float | None = None,
                  axis: int = LAST) -> Any:
-    """The displacement of a measured acceleration. What an offset of the acceleration, and velocity and
-    place at the beginning make of it, a parabola, is removed.
+    """The displacement from a measured acceleration. An offset of the acceleration and the unknown initial
+    velocity and position add a parabola to it, which is removed.
 
     Parameters
     ----------
     acceleration : array_like
-        In units of length by time squared.
+        The acceleration, in units of length per time squared.
     fs : float
         The sampling rate.
     drift : int or None
         The order of the polynomial that is removed from the result; None for nothing.
     cutoff : float, optional
-        As of `velocity`.
+        As for `velocity`.
     axis : int
         The axis of time.
 
     Returns
     -------
-    ndarray, or what acceleration is of pandas
-        Of the shape of acceleration.
+    ndarray, or the pandas type of acceleration
+        The same shape as acceleration.
 
     Raises
     ------

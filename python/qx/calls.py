@@ -8,14 +8,14 @@ from .library import library
 
 
 class NoSuchExport(LookupError):
-    """No export has that name."""
+    """There is no export of that name."""
 
     def __str__(self):
         return self.args[0]
 
 
 def hint(name, names):
-    """What a wrong name may have meant, as the end of a message."""
+    """The names that a wrong name may have meant, as the end of a message."""
     lower = {known.lower(): known for known in names}
     near = [lower[match] for match in difflib.get_close_matches(name.lower(), lower, 3, 0.6)]
     return f"; did you mean {' or '.join(near)}?" if near else ""
@@ -35,13 +35,13 @@ def export(name):
 
 
 def call(name, /, *positional, **named):
-    """Calls an export by its name, as its function qx.NAME does.
+    """Calls an export by its name, like its function qx.NAME.
 
-    Inputs are given in the order of the declaration: arrays as anything that NumPy takes, scalars
-    as numbers whether they travel by value or by reference, records as dictionaries (fields left
-    out are 0 or empty), arrays of records as lists of tuples. Outputs come back in the order of the
-    declaration, arrays as NumPy arrays, a single one bare and several as a tuple; an array that is
-    input and output comes back as a new one. Plans are kept behind the scenes. A failure raises
-    QxError, a warning is given as QxWarning. A function of real numbers maps over arrays.
+    Inputs are passed in the order of the declaration: arrays as anything that NumPy accepts, scalars as
+    numbers, whether passed by value or by reference, records as dictionaries (omitted fields are 0 or empty),
+    and arrays of records as lists of tuples. Outputs are returned in the order of the declaration, arrays as
+    NumPy arrays; several outputs are returned as a tuple. An array that is both input and output is returned
+    as a new array. Plans are cached. A failure raises QxError, and a warning is issued as QxWarning. A
+    function of real numbers is mapped over arrays.
     """
     return export(name)(*positional, **named)

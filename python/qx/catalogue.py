@@ -1,4 +1,4 @@
-"""Finding exports by their names and texts."""
+"""Finds exports by their names and texts."""
 
 import fnmatch
 import textwrap
@@ -14,7 +14,7 @@ def first_sentence(documentation):
 
 
 def summary(entry, width=90):
-    """One line; a twin's is that of the export whose text it takes over, and its own."""
+    """A summary in one line. For an export that shares the text of another, it is its own text and that text."""
     text = first_sentence(entry["documentation"])
     if entry["inherited"]:
         root = library().entries[entry["inherited"][-1]]
@@ -23,7 +23,7 @@ def summary(entry, width=90):
 
 
 class Found(list):
-    """Names of exports; shown with a line on each."""
+    """Names of exports, shown with a line on each."""
 
     def __repr__(self):
         return "\n".join(f"{name:<30} {summary(library().entries[name])}" for name in self)
@@ -36,8 +36,8 @@ def _words(entry):
 
 
 def find(pattern="*"):
-    """The exports whose name matches a pattern with * or ?; else those that have the word, or all
-    of several words, in their name, family or text, with the names first."""
+    """The exports whose name matches a pattern with * or ?. Without these, those that have the word, or all of
+    several words, in their name, family or text; matches of names come first."""
     entries = library().entries
     lower = pattern.lower()
     if any(mark in pattern for mark in "*?["):

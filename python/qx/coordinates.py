@@ -1,8 +1,9 @@
 """Rotations of the coordinate system, Euler angles, and Cartesian, spherical and cylindrical coordinates.
 
-Angles are in radians. The coordinate system turns and the points stay: by a positive angle about Z the
-point (1, 0, 0) gets a negative y. Three Euler angles turn the system three times, each time about an axis
-of the system as it has been turned so far; the direction matrix is :math:`R = R_3 R_2 R_1`.
+Angles are in radians. The coordinate system is rotated and the points stay where they are: after a rotation
+by a positive angle about Z, the point (1, 0, 0) has a negative y. Three Euler angles rotate the system three
+times, each time about an axis of the system as rotated so far; the direction matrix is
+:math:`R = R_3 R_2 R_1`.
 """
 
 from __future__ import annotations
@@ -26,12 +27,12 @@ KINDS = {"cartesian": 0, "spherical": 1, "cylindrical": 2}
 
 @result
 class EulerAngles(Result):
-    """Three Euler angles in radians, in the order in which the system is turned.
+    """Three Euler angles in radians, in the order in which the system is rotated.
 
     Attributes
     ----------
     angle1, angle2, angle3 : float
-        About the first, second and third axis of the sequence.
+        The angles about the first, second and third axis of the sequence.
     """
 
     angle1: float
@@ -40,7 +41,7 @@ class EulerAngles(Result):
 
 
 def _points(function: Any, *coordinates: Any) -> Any:
-    """Coordinates of points as arrays of one dimension, and their common shape."""
+    """The coordinates of points as one-dimensional arrays, and their common shape."""
     arrays = np.broadcast_arrays(*(np.asarray(one, float) for one in coordinates))
     return [one.ravel() for one in arrays], arrays[0].shape
 
@@ -50,7 +51,7 @@ def _shaped(found: Any, shape: Any) -> Any:
 
 
 def rotate2(x: ArrayLike, y: ArrayLike, angle: float) -> tuple[Any, Any]:
-    r"""Coordinates of points of the plane in a system turned by an angle.
+    r"""Coordinates of points of the plane in a system rotated by an angle.
 
     .. math:: x' = x \cos\alpha + y \sin\alpha,\quad y' = y \cos\alpha - x \sin\alpha
 
@@ -59,7 +60,7 @@ def rotate2(x: ArrayLike, y: ArrayLike, angle: float) -> tuple[Any, Any]:
     x, y : float or array_like
         Coordinates of points, of any shape.
     angle : float
-        In radians.
+        The angle, in radians.
 
     Returns
     -------
@@ -81,14 +82,14 @@ def rotate2(x: ArrayLike, y: ArrayLike, angle: float) -> tuple[Any, Any]:
 
 
 def rotate(x: ArrayLike, y: ArrayLike, z: ArrayLike, direction: ArrayLike) -> tuple[Any, Any, Any]:
-    """Coordinates of points of space in the system that a direction matrix gives.
+    """Coordinates of points of space in the system given by a direction matrix.
 
     Parameters
     ----------
     x, y, z : float or array_like
         Coordinates of points, of any shape.
     direction : array_like
-        A rotation, 3 by 3; the nearest one is used.
+        A 3-by-3 rotation; the nearest rotation is used.
 
     Returns
     -------
@@ -97,7 +98,7 @@ def rotate(x: ArrayLike, y: ArrayLike, z: ArrayLike, direction: ArrayLike) -> tu
     Raises
     ------
     ValueError
-        If the matrix is no rotation of 3 by 3, or a number is not finite.
+        If the matrix is not a 3-by-3 rotation, or a number is not finite.
 
     Examples
     --------
@@ -111,16 +112,16 @@ def rotate(x: ArrayLike, y: ArrayLike, z: ArrayLike, direction: ArrayLike) -> tu
 
 def rotate_euler(x: ArrayLike, y: ArrayLike, z: ArrayLike, angles: tuple[float, float, float],
                  sequence: str = "ZYX") -> tuple[Any, Any, Any]:
-    """Coordinates of points of space in the system turned by three Euler angles.
+    """Coordinates of points of space in the system rotated by three Euler angles.
 
     Parameters
     ----------
     x, y, z : float or array_like
         Coordinates of points, of any shape.
     angles : (float, float, float)
-        In radians, in the order of the turns.
+        The angles in radians, in the order of the rotations.
     sequence : str
-        The axes of the three turns: XYX, XYZ, XZX, XZY, YXY, YXZ, YZX, YZY, ZXY, ZXZ, ZYX or ZYZ. ZYX is
+        The axes of the three rotations: XYX, XYZ, XZX, XZY, YXY, YXZ, YZX, YZY, ZXY, ZXZ, ZYX or ZYZ. ZYX is
         yaw, pitch and roll.
 
     Returns
@@ -130,7 +131,7 @@ def rotate_euler(x: ArrayLike, y: ArrayLike, z: ArrayLike, angles: tuple[float, 
     Raises
     ------
     ValueError
-        If there are not three angles, a number is not finite, or sequence is none of its words.
+        If there are not three angles, a number is not finite, or sequence is not a valid choice.
 
     Examples
     --------
@@ -146,7 +147,7 @@ def rotate_euler(x: ArrayLike, y: ArrayLike, z: ArrayLike, angles: tuple[float, 
 def _three(function: Any, angles: Any) -> Any:
     given = [float(angle) for angle in angles]
     if len(given) != 3:
-        refuse(f"coordinates.{function}", "angles", f"three are needed; {len(given)} came", "ErrSizesDisagree")
+        refuse(f"coordinates.{function}", "angles", f"three angles are needed; got {len(given)}", "ErrSizesDisagree")
     return given
 
 
@@ -156,20 +157,20 @@ def euler_to_matrix(angles: tuple[float, float, float], sequence: str = "ZYX") -
     Parameters
     ----------
     angles : (float, float, float)
-        In radians, in the order of the turns.
+        The angles in radians, in the order of the rotations.
     sequence : str
-        The axes of the three turns: XYX, XYZ, XZX, XZY, YXY, YXZ, YZX, YZY, ZXY, ZXZ, ZYX or ZYZ. ZYX is
+        The axes of the three rotations: XYX, XYZ, XZX, XZY, YXY, YXZ, YZX, YZY, ZXY, ZXZ, ZYX or ZYZ. ZYX is
         yaw, pitch and roll.
 
     Returns
     -------
     ndarray
-        3 by 3.
+        The 3-by-3 rotation.
 
     Raises
     ------
     ValueError
-        If there are not three angles, one is not finite, or sequence is none of its words.
+        If there are not three angles, one is not finite, or sequence is not a valid choice.
 
     Examples
     --------
@@ -184,13 +185,13 @@ def euler_to_matrix(angles: tuple[float, float, float], sequence: str = "ZYX") -
 
 
 def matrix_to_euler(direction: ArrayLike, sequence: str = "ZYX") -> EulerAngles:
-    """The Euler angles of a direction matrix; at the lock, where only a sum or difference of two has a
-    meaning, the third one is 0.
+    """The Euler angles of a direction matrix. At gimbal lock, where only the sum or the difference of two
+    angles is determined, the third one is 0.
 
     Parameters
     ----------
     direction : array_like
-        A rotation, 3 by 3.
+        A 3-by-3 rotation.
     sequence : str
         The axes of the three turns: XYX, XYZ, XZX, XZY, YXY, YXZ, YZX, YZY, ZXY, ZXZ, ZYX or ZYZ. ZYX is
         yaw, pitch and roll.
@@ -202,7 +203,7 @@ def matrix_to_euler(direction: ArrayLike, sequence: str = "ZYX") -> EulerAngles:
     Raises
     ------
     ValueError
-        If the matrix is no rotation of 3 by 3, or sequence is none of its words.
+        If the matrix is not a 3-by-3 rotation, or sequence is not a valid choice.
 
     Examples
     --------
@@ -220,15 +221,15 @@ def matrix_to_euler(direction: ArrayLike, sequence: str = "ZYX") -> EulerAngles:
 def convert(first: ArrayLike, second: ArrayLike, third: ArrayLike,
             source: Literal["cartesian", "spherical", "cylindrical"],
             target: Literal["cartesian", "spherical", "cylindrical"]) -> tuple[Any, Any, Any]:
-    """Coordinates of points in another kind: Cartesian (x, y, z), spherical (radius, azimuth,
-    inclination from the positive z axis) or cylindrical (radius, azimuth, height).
+    """Converts coordinates of points between Cartesian (x, y, z), spherical (radius, azimuth, inclination
+    from the positive z axis) and cylindrical (radius, azimuth, height).
 
     Parameters
     ----------
     first, second, third : float or array_like
         Coordinates of points, of any shape.
     source, target : {"cartesian", "spherical", "cylindrical"}
-        The kinds from and to.
+        The kind of the given coordinates, and the kind to return.
 
     Returns
     -------
@@ -238,7 +239,7 @@ def convert(first: ArrayLike, second: ArrayLike, third: ArrayLike,
     Raises
     ------
     ValueError
-        If a number is not finite, or a kind is none of the words.
+        If a number is not finite, or a kind is not a valid choice.
 
     Examples
     --------

@@ -1,4 +1,4 @@
-"""Filters by the design functions of qx.filters, from words and edges as the command design takes them."""
+"""Designs filters by the functions of qx.filters, from the words and edges that the command design takes."""
 
 import dataclasses
 
@@ -8,7 +8,7 @@ from . import filters
 from .topical import served
 
 TYPES = ("lowpass", "highpass", "bandpass", "bandstop")
-FAMILIES = {  # function, and which levels it takes
+FAMILIES = {  # the function, and the levels that it takes
     "butterworth": ("butterworth", ()), "chebyshev": ("chebyshev1", ("ripple",)),
     "inverse-chebyshev": ("chebyshev2", ("attenuation",)),
     "elliptic": ("elliptic", ("ripple", "attenuation")), "bessel": ("bessel", ())}
@@ -17,7 +17,7 @@ WINDOWS = {"hanning": "hann", "hamming": "hamming", "blackman": "blackman"}
 
 @dataclasses.dataclass
 class Design:
-    """A filter, and how it was made."""
+    """A filter, and how it was designed."""
     filter: filters.Filter
     python: str  # the expression that makes it
     edges: list  # in the unit of the rate
@@ -26,7 +26,7 @@ class Design:
 
 
 def check_edges(kind, edges, rate):
-    """Refuses what no filter can have, in words that the edges were given in."""
+    """Refuses edges that no filter can have, in the unit in which they were given."""
     half = rate / 2
     unit = " Hz" if rate != 1 else ""
     for edge, following in zip(edges, edges[1:]):
@@ -66,7 +66,7 @@ def iir(family, kind, edges, rate, order, ripple=1.0, attenuation=60.0, fourth=F
 
 
 def in_fourth_order(sos):
-    """Pairs of sections as one: a without its leading 1, and b."""
+    """Pairs of sections combined into one each: a, without its leading 1, and b."""
     if len(sos) % 2:
         sos = np.vstack([sos, [1, 0, 0, 1, 0, 0]])
     pairs = list(zip(sos[::2], sos[1::2]))
@@ -85,7 +85,8 @@ def windowed(kind, edges, rate, taps, window=None):
 
 
 def equiripple(kind, edges, rate, taps, weight=1.0):
-    """The edges of the bands in ascending order; a deviation in the stop band counts `weight` times."""
+    """Takes the edges of the bands in ascending order. A deviation in the stop band has `weight` times the
+    weight of one in the pass band."""
     gains = {"lowpass": (1, 0), "highpass": (0, 1), "bandpass": (0, 1, 0), "bandstop": (1, 0, 1)}[kind]
     if len(edges) != 2 * len(gains) - 2:
         raise ValueError(f"an equiripple {kind} needs {2 * len(gains) - 2} edges, not {len(edges)}")
@@ -97,8 +98,8 @@ def equiripple(kind, edges, rate, taps, weight=1.0):
 
 
 def narrow(kind, edges, rate, ripple=1.0, attenuation=60.0):
-    """The edges of the pass and the stop band are two of a lowpass or highpass; of the others the four in
-    ascending order, about one centre."""
+    """Takes the edges of the pass and the stop band: two for a lowpass or highpass, for the others four in
+    ascending order, symmetric about a common centre."""
     needed = 2 if kind in ("lowpass", "highpass") else 4
     if len(edges) != needed:
         raise ValueError(f"a narrow {kind} needs {needed} edges, not {len(edges)}")
@@ -113,7 +114,7 @@ def narrow(kind, edges, rate, ripple=1.0, attenuation=60.0):
 
 
 def stages_of(kind, edges, rate, ripple, attenuation):
-    """The two stages of a narrow filter, for programs that filter by them."""
+    """The two stages of a narrow filter, for programs that apply them."""
     if len(edges) == 2:
         (passed, stopped), center = edges if kind == "lowpass" else edges[::-1], 0.0
     else:

@@ -1,4 +1,4 @@
-"""The page that shows what a filter does, where its poles and zeros are, and how a program uses it."""
+"""The page that shows the responses of a filter, its poles and zeros, and how a program uses it."""
 
 import html
 import math
@@ -10,14 +10,14 @@ from .sections import Row, Section, number, resolved
 
 POINTS = 4000
 FLOOR = -200.0  # dB
-AROUND = 4.0  # times the highest edge, up to which the axes go at first
-MOST_ZEROS = 300  # that are sought
-MOST_ROWS = 12  # of coefficients that are shown unfolded
-SHOWN = 40  # coefficients in the lines of C; more are left out
+AROUND = 4.0  # initial range of the axes, in multiples of the highest edge
+MOST_ZEROS = 300  # most zeros that are computed
+MOST_ROWS = 12  # most rows of coefficients that are shown unfolded
+SHOWN = 40  # most coefficients shown in C programs
 
 
 def write(design, title, rate, path):
-    """Writes the page and gives the lines for the terminal."""
+    """Writes the page and returns the lines for the terminal."""
     sections = described(design, rate)
     outputs.write_text(path, pages.page("design", title, "", sections))
     rows = sections[0].rows
@@ -26,7 +26,7 @@ def write(design, title, rate, path):
 
 
 def half_power(frequencies, gain):
-    """Where the magnitude crosses the half of its greatest power, between points along a line."""
+    """The frequencies at which the magnitude crosses half of its greatest power, by linear interpolation."""
     excess = np.abs(gain) ** 2 / np.max(np.abs(gain)) ** 2 - 0.5
     at = np.flatnonzero((excess[1:] > 0) != (excess[:-1] > 0))
     share = excess[at] / (excess[at] - excess[at + 1])
@@ -34,14 +34,14 @@ def half_power(frequencies, gain):
 
 
 def frequencies_for(edges, rate):
-    """Even ones up to half the rate, and as many about the edges."""
+    """Evenly spaced frequencies up to half the rate, and the same number around the edges."""
     low, high = shown_range(edges, rate)
     return np.unique(np.concatenate([np.linspace(0, rate / 2, POINTS + 1), np.linspace(low, high, POINTS + 1),
                                      np.geomspace(1e-4 * edges[0], rate / 2, POINTS // 4), edges]))
 
 
 def shown_range(edges, rate):
-    """What the axes of frequency show at first: the edges, and what is about them."""
+    """The initial range of the frequency axes: the edges and their surroundings."""
     if len(edges) == 1:
         return 0.0, min(rate / 2, AROUND * edges[0])
     room = max(AROUND * (edges[-1] - edges[0]), 0.05 * edges[-1])
@@ -49,7 +49,8 @@ def shown_range(edges, rate):
 
 
 def unwrapped(gain):
-    """The phase in degrees, without jumps of a turn, and of half a turn where the gain passes 0."""
+    """The phase in degrees, without jumps of 360 degrees, and without jumps of 180 degrees where the gain passes
+    0."""
     phase = np.angle(gain)
     phase[np.abs(gain) < 1e-12] = math.nan
     known = np.flatnonzero(np.isfinite(phase))
@@ -58,7 +59,7 @@ def unwrapped(gain):
 
 
 def described(design, rate):
-    """The sections: what the filter is, its responses, its poles and zeros, its coefficients, its use."""
+    """The sections: the filter, its responses, its poles and zeros, its coefficients, and its use."""
     filter_, edges = design.filter, design.edges
     frequencies = frequencies_for(edges, rate)
     response = filter_.response(frequencies, rate)
@@ -75,17 +76,17 @@ def described(design, rate):
             Row("Greatest gain", number(round(float(decibels.max()), 6) + 0.0, 4), "dB", "Filter.response")]
     if len(delays):
         low, high = number(delays.min(), 4), number(delays.max(), 4)
-        rows.append(Row("Group delay of what passes", low if low == high else f"{low} to {high}", delay_unit,
+        rows.append(Row("Group delay in the pass band", low if low == high else f"{low} to {high}", delay_unit,
                         "Filter.response"))
     return [Section("Filter", f"Edges at {', '.join(f'{edge:g}' for edge in edges)} {unit}, at a rate of {rate:g}.",
                     rows, _over_frequency(design, frequencies, rate, unit, [
                         ("Magnitude", "Gain (dB)", decibels, _gain_range(decibels)),
                         ("Phase, without jumps", "Phase (degrees)", unwrapped(gain), None),
                         ("Group delay", f"Delay ({delay_unit})", delay, _delay_range(delay, gain))])),
-            Section("Responses over time", "To a single 1, and to ones without end.", [],
+            Section("Responses over time", "To an impulse, and to a step.", [],
                     _over_time(filter_, rate, factor, delay_unit)),
             in_the_plane(filter_),
-            Section("Coefficients", "Sections of second order, one to a row, as SciPy has them in sos."
+            Section("Coefficients", "Sections of second order, one to a row, as in SciPy's sos."
                     if filter_.is_iir else "The taps, which are also the impulse response.", [],
                     [coefficients(filter_)]),
             Section("In a program", "The same filter in Python, C and C++.", [], programs(design))]
@@ -97,7 +98,7 @@ def _gain_range(decibels):
 
 
 def _delay_range(delay, gain):
-    """Where nothing passes the delay may be anything."""
+    """The range of the delay in the pass band; elsewhere the delay can be arbitrary."""
     passed = delay[(np.abs(gain) > 1e-3 * np.abs(gain).max()) & np.isfinite(delay)]
     room = 0.1 * np.ptp(passed) + 1e-3 * np.abs(passed).max() + 1e-12
     return float(passed.min() - room), float(passed.max() + room)
@@ -115,7 +116,7 @@ def _over_time(filter_, rate, factor, unit):
     impulse = filter_(np.r_[1.0, np.zeros(settled - 1)])
     step = filter_(np.ones(settled))
     energy = np.cumsum(impulse[::-1]**2)[::-1]
-    first = int(np.count_nonzero(energy > 1e-4 * np.sum(impulse[1:]**2))) + 8  # what follows is too small to be seen
+    first = int(np.count_nonzero(energy > 1e-4 * np.sum(impulse[1:]**2))) + 8  # the rest is too small to be seen
     return [figures.Plot(title, f"Time ({unit})", "Response", [figures.Curve("response", values)], step=factor,
                          x_range=(0.0, factor * min(first, settled - 1)), link="time")
             for title, values in (("Impulse response", impulse), ("Step response", step))]
@@ -125,12 +126,12 @@ def in_the_plane(filter_):
     if not filter_.is_iir and len(filter_.taps) > MOST_ZEROS:
         return Section("Poles and zeros", f"The {len(filter_.taps) - 1} zeros are not drawn; all poles are at 0.")
     poles = filter_.poles if filter_.is_iir else np.zeros(1, complex)
-    return Section("Poles and zeros", "In the z plane, × poles and ○ zeros; the filter is stable with all poles "
+    return Section("Poles and zeros", "In the z plane: × poles, ○ zeros. The filter is stable if all poles are "
                    "inside the circle.", [], [plane(poles, filter_.zeros)])
 
 
 def plane(poles, zeros):
-    """Poles and zeros with the unit circle, as a drawing."""
+    """A drawing of the poles, the zeros and the unit circle."""
     reach = max(1.0, float(np.abs(np.r_[poles, zeros, 1.0])[np.abs(np.r_[poles, zeros, 1.0]) < 3].max(initial=1))) * 1.15
 
     def at(point):
@@ -165,7 +166,7 @@ def coefficients(filter_):
 
 
 def arrays_of(filter_):
-    """a and b as the exports take them."""
+    """a and b in the layout that the exports take."""
     if not filter_.is_iir:
         return [], filter_.taps.tolist()
     sos = filter_.sos
@@ -180,7 +181,7 @@ def programs(design):
     if len(a) + len(b) <= SHOWN:
         texts += [("C", c_program(a, b)), ("C++", cpp_program(a, b))]
     else:
-        texts.append(("C and C++", "The coefficients are too many to be shown here: design.json has them, for\n"
+        texts.append(("C and C++", "There are too many coefficients to show here. design.json has them, for\n"
                       "IIR_Filter2 (sections) or IIR_Filter (taps) of qx/filtering.h."))
     return ["".join(f"<h3>{name}</h3><pre>{html.escape(text)}</pre>" for name, text in texts)]
 

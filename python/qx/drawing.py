@@ -1,5 +1,5 @@
-"""Plots drawn by matplotlib: as SVG texts for pages without dygraphs, and as files of their own. Colours
-are those of a light page; the style of the pages (pages.py) turns them round on a dark one."""
+"""Plots drawn by matplotlib, as SVG texts for pages without dygraphs and as separate files. The colours are for a
+light page; the style of the pages (pages.py) inverts them on a dark one."""
 
 import io
 import math
@@ -18,7 +18,7 @@ NARROW = 4.6  # inches
 
 def pyplot():
     import logging
-    logging.getLogger("matplotlib").setLevel(logging.ERROR)  # no remarks where the home cannot be written
+    logging.getLogger("matplotlib").setLevel(logging.ERROR)  # no warnings if the home folder is not writable
     import matplotlib
     matplotlib.use("svg")
     import matplotlib.pyplot as plt
@@ -29,13 +29,13 @@ def pyplot():
         "axes.spines.right": False, "axes.grid": True, "grid.color": "#dfe5ec",
         "grid.linewidth": 0.7, "axes.axisbelow": True, "xtick.color": DARK, "ytick.color": DARK,
         "axes.formatter.useoffset": False, "text.parse_math": False, "savefig.transparent": True,
-        # Texts stay texts: the reader's fonts have what ours lacks.
+        # Texts are kept as texts: the reader's fonts may have characters that ours lack.
         "svg.fonttype": "none", "figure.constrained_layout.use": True})
     return plt
 
 
 def svg(plot):
-    """The plot for a page: as it is, and redrawn for windows as narrow as a telephone."""
+    """The plot for a page, in normal width and redrawn for windows as narrow as a telephone."""
     plt = pyplot()
     figure, axes = plt.subplots(figsize=(10, 3.0))
     draw(axes, plot)
@@ -52,7 +52,7 @@ def svg(plot):
 
 def _drawn(plt, figure, kind):
     buffer = io.StringIO()
-    # Names in the drawing are made from its content; the two of a figure are never shown together.
+    # Identifiers in a drawing are derived from its content; the two drawings of a figure are never shown together.
     plt.rcParams["svg.hashsalt"] = kind
     with warnings.catch_warnings():
         warnings.filterwarnings("ignore", message="Glyph .* missing from current font")
@@ -62,7 +62,7 @@ def _drawn(plt, figure, kind):
 
 
 def draw(axes, plot):
-    """The plot on axes of matplotlib, with the legend above the data where there is one."""
+    """Draws the plot on matplotlib axes, with its legend, if any, above the data."""
     plot = figures.reduced(plot, 6000)
     places = plot.places() if plot.curves else np.empty(0)
     if plot.image:
@@ -100,7 +100,7 @@ def draw(axes, plot):
 
 
 def save(plots, path, command, heights=None):
-    """Writes the plots, one above the other, to a file whose ending says the format."""
+    """Writes the plots, one above the other, to a file whose extension determines the format."""
     plt = pyplot()
     figure, all_axes = plt.subplots(len(plots), 1, figsize=(10, 3.0 * len(plots) + 1), squeeze=False,
                                     gridspec_kw={"height_ratios": heights})

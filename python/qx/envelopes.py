@@ -1,4 +1,4 @@
-"""The outline of a signal of any length: the lowest and the highest value of blocks that grow with it."""
+"""The outline of a signal of any length: the lowest and the highest values of blocks, which grow with the signal."""
 
 import numpy as np
 
@@ -6,13 +6,13 @@ from .figures import extremes
 
 
 class Envelope:
-    """Takes a signal part by part and keeps no more than `most` blocks; as long as it is shorter, its
-    samples. `samples` of them are in a block."""
+    """Takes a signal part by part and keeps at most `most` blocks, or all samples while there are fewer. A block
+    has `samples` samples."""
 
     def __init__(self, most=1 << 16):
         self.most, self.samples, self.count = most, 1, 0
         self._lows, self._highs, self._blocks = np.empty(most), np.empty(most), 0
-        self._rest = np.empty(0)  # of the block that is not full
+        self._rest = np.empty(0)  # samples of the incomplete block
 
     def add(self, values):
         self.count += len(values)
@@ -36,11 +36,11 @@ class Envelope:
         self._blocks, self.samples = half, 2 * self.samples
 
     def __getstate__(self):
-        """Without the room for further blocks."""
+        """Leaves out the space for further blocks."""
         return {**self.__dict__, "_lows": self._lows[:self._blocks], "_highs": self._highs[:self._blocks]}
 
     def bounds(self):
-        """The lowest and the highest values of the blocks, the last one perhaps shorter."""
+        """The lowest and the highest values of the blocks; the last block may be shorter."""
         lows, highs = self._lows[:self._blocks], self._highs[:self._blocks]
         if len(self._rest):
             lows, highs = np.append(lows, np.fmin.reduce(self._rest)), np.append(highs, np.fmax.reduce(self._rest))

@@ -1,11 +1,11 @@
-"""Every export of the module as a function, nothing added: inputs in the order of the declaration or by
-their names, outputs as NumPy arrays and numbers.
+"""Every export of the module as a plain function. Inputs are passed in the order of the declaration or by name;
+outputs are NumPy arrays and numbers.
 
     from qx import exports
     exports.Moment_head([1.0, 2.0, 4.0], 2)      # 1.5555555555555554
     help(exports.Moment_head)                    # arguments, formula, codes
 
-The topics (`qx.filters`, `qx.fft`, ...) call the newest revision of each under the field's name. Elder
+The topics (`qx.filters`, `qx.fft`, ...) call the newest revision of each, under the field's usual name. Elder
 revisions are here for comparison.
 """
 

@@ -14,15 +14,15 @@ def Contingency_head(table: ArrayLike) -> tuple[float, float]:
 
 
 def Contingency2026_head(table: ArrayLike) -> tuple[float, float]:
-    """As Contingency_head, with both numbers to the last digits: the statistic from exact O total - ..."""
+    """As Contingency_head, with both numbers accurate to the last digits: the statistic from exact ..."""
 
 
 def Anova1Way_head(y: ArrayLike, labels: ArrayLike, k: int) -> tuple[float, float, float, float, float, float, float]:
-    """One-way analysis of variance of y, whose element i belongs to the level labels[i], on *k levels: ..."""
+    """One-way analysis of variance of y, where element i belongs to the level labels[i], with *k ..."""
 
 
 def Anova1Way_head_2017(y: ArrayLike, labels: ArrayLike, k: int, alpha: float) -> tuple[float, float, float, float, float, float, float, float]:
-    """As Anova1Way_head, with the value that f exceeds with probability alpha, by bisection to 1e-4, ..."""
+    """As Anova1Way_head, and with *fCritical, the value that f exceeds with probability alpha, by ..."""
 
 
 def Anova1Way_head_2026(y: ArrayLike, labels: ArrayLike, k: int, alpha: float) -> tuple[float, float, float, float, float, float, float, float]:
@@ -34,7 +34,7 @@ def Anova2Way_head(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, levelsA
 
 
 def Anova2Way_head_2017(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, levelsA: int, levelsB: int, observations: int, significance: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """As Anova2Way_head, with the values that f exceeds with probability `significance`, within 1e-9 ..."""
+    """As Anova2Way_head, and with the critical values that f exceeds with probability `significance`, ..."""
 
 
 def ANOVA3Way_head(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, labelsC: ArrayLike, levelsA: int, levelsB: int, levelsC: int, observations: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -42,7 +42,7 @@ def ANOVA3Way_head(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, labelsC
 
 
 def ANOVA3Way_head_2017(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, labelsC: ArrayLike, levelsA: int, levelsB: int, levelsC: int, observations: int, significance: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """As Anova2Way_head_2017, with three factors, sources and denominators as of ANOVA3Way_head. ..."""
+    """As Anova2Way_head_2017, with three factors; sources and denominators are those of ..."""
 
 
 def Mean_head(x: ArrayLike) -> float:
@@ -54,11 +54,11 @@ def RMS_head(x: ArrayLike) -> float:
 
 
 def CxRMS_head(z: ArrayLike) -> float:
-    """Root mean square of complex values, sqrt(sum(im^2 + re^2) / n), with the squares of RMS_head."""
+    """Root mean square of complex values, sqrt(sum(im^2 + re^2) / n), with the limits of RMS_head."""
 
 
 def MSE_head(x: ArrayLike, y: ArrayLike) -> float:
-    """Mean squared difference over the shorter length m, sum(x x + y (y - 2 x)) / m."""
+    """Mean squared difference over the shorter of the two lengths, m: sum(x x + y (y - 2 x)) / m."""
 
 
 def Moment_head(x: ArrayLike, order: int) -> float:
@@ -70,11 +70,11 @@ def BoundLinearFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, lower: ArrayLi
 
 
 def BoundLinearFitLAR_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, lower: ArrayLike, upper: ArrayLike) -> tuple[NDArray[np.float64], int, float, float, float]:
-    """As BoundLinearFit_head, by least absolute residuals: lines of least squares with the weights 1 / ..."""
+    """As BoundLinearFit_head, by least absolute residuals: least-squares lines with the weights 1 / ..."""
 
 
 def BoundLinearFitBi_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, lower: ArrayLike, upper: ArrayLike) -> tuple[NDArray[np.float64], int, float, float, float]:
-    """As BoundLinearFitLAR_head, by bisquare weights: (1 - u^2)^2 for |u| < 1 and 0 beyond, u being ..."""
+    """As BoundLinearFitLAR_head, by bisquare weights: (1 - u^2)^2 for |u| < 1 and 0 beyond, where u is ..."""
 
 
 def BoundExpFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float]:
@@ -86,15 +86,15 @@ def BoundPowerFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: floa
 
 
 def BoundLogFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, base: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int, tolerance: float) -> tuple[NDArray[np.float64], int, float, float, float]:
-    """y = a log(b x) to the base, with x above 0, within bounds: the line over log(x) where that lies ..."""
+    """y = a log(b x) to the given base, with x above 0, within bounds: the line over log(x) if that is ..."""
 
 
 def BoundGaussianFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float, float]:
-    """As BoundExpFit_head, for the peak or dip y = a exp(-0.5 ((x - m) / s)^2) + c; s comes back ..."""
+    """As BoundExpFit_head, for the peak or dip y = a exp(-0.5 ((x - m) / s)^2) + c; s is returned as ..."""
 
 
 def BoundGaussianFit2026_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float, float]:
-    """As BoundGaussianFit_head, from starts at every scale, of which the best are fitted and the least ..."""
+    """As BoundGaussianFit_head, with start values at every scale, of which the best are fitted and the ..."""
 
 
 def NumerIntegration_head(x: ArrayLike, dt: float, rule: int) -> float:
@@ -106,7 +106,7 @@ def NumerIntegration_2017_head(x: ArrayLike, dt: float, rule: int) -> float:
 
 
 def NumerIntegration2D_head(x: ArrayLike, dts: ArrayLike, rule: int) -> float:
-    """Definite integral over both dimensions."""
+    """Definite integral of x over both dimensions."""
 
 
 def NumerIntegration2D_2017_head(x: ArrayLike, dts: ArrayLike, rule: int) -> float:
@@ -114,7 +114,7 @@ def NumerIntegration2D_2017_head(x: ArrayLike, dts: ArrayLike, rule: int) -> flo
 
 
 def NumerIntegration3D_head(x: ArrayLike, dts: ArrayLike, rule: int) -> float:
-    """Definite integral over three dimensions d0, d1, d2."""
+    """Definite integral of x over three dimensions d0, d1, d2."""
 
 
 def NumerIntegration3D_2017_head(x: ArrayLike, dts: ArrayLike, rule: int) -> float:
@@ -130,11 +130,11 @@ def Integral90(x: ArrayLike, initial: ArrayLike, final: ArrayLike, dt: float, ru
 
 
 def Integral_2017(x: ArrayLike, dt: float, rule: int) -> NDArray[np.float64]:
-    """Running integral from y[0] = 0 without values beyond the data: the first ones by one-sided ..."""
+    """Running integral from y[0] = 0 without values beyond the data: the first values by one-sided ..."""
 
 
 def Derivative(x: ArrayLike, initial: float, final: float, dt: float) -> NDArray[np.float64]:
-    """Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final behind the data."""
+    """Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final after the data."""
 
 
 def Derivative85(x: ArrayLike, initial: ArrayLike, final: ArrayLike, dt: float, rule: int) -> NDArray[np.float64]:
@@ -186,35 +186,35 @@ def Convolve_2DH(x: ArrayLike, y: ArrayLike, outputSize: int, algorithm: int) ->
 
 
 def CxConvolve_2DH(x: ArrayLike, y: ArrayLike, outputSize: int, algorithm: int) -> NDArray[np.complex128]:
-    """As Convolve_2DH, for complex data, and with outputSize 2 an x or a y that is wider than tall ..."""
+    """As Convolve_2DH, for complex data. out[r][c] = sum over i and j of x[i][j] y[r - i][c - j]."""
 
 
 def Correlation_2DH(x: ArrayLike, y: ArrayLike, algorithm: int) -> NDArray[np.float64]:
-    """The convolution of x, turned by 180 degrees, with y, in full size; lag zero is the element in ..."""
+    """The convolution of x, rotated by 180 degrees, with y, in full size."""
 
 
 def CxCorrelation_2DH(x: ArrayLike, y: ArrayLike, algorithm: int) -> NDArray[np.complex128]:
-    """As Correlation_2DH, for complex data; x is conjugated. The convolution of x, turned by 180 ..."""
+    """As Correlation_2DH, for complex data; x is conjugated. The convolution of x, rotated by 180 ..."""
 
 
 def CoordRotation2D_head(x: ArrayLike, y: ArrayLike, angle: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Coordinates of points of the plane in a system turned by `angle`: newX = x cos(angle) + y ..."""
+    """Coordinates of points in the plane in a system rotated by `angle`: newX = x cos(angle) + y ..."""
 
 
 def CoordRotationDirection_head(x: ArrayLike, y: ArrayLike, z: ArrayLike, direction: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """Coordinates of points of space in the system that a direction matrix gives: (newX, newY, newZ)' ..."""
+    """Coordinates of points in space in the system given by a direction matrix: (newX, newY, newZ)' = ..."""
 
 
 def CoordRotationEuler2011_head(x: ArrayLike, y: ArrayLike, z: ArrayLike, angle1: float, angle2: float, angle3: float, sequence: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """Coordinates of points of space in the system turned by three Euler angles (see above)."""
+    """Coordinates of points in space in the system rotated by three Euler angles (see above)."""
 
 
 def CoordRotationEuler_head(x: ArrayLike, y: ArrayLike, z: ArrayLike, angle1: float, angle2: float, angle3: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """As CoordRotationEuler2011_head, with sequence 10 (ZYX). Coordinates of points of space in the ..."""
+    """As CoordRotationEuler2011_head, with sequence 10 (ZYX). Coordinates of points in space in the ..."""
 
 
 def Euler2Direction2011_head(angle1: float, angle2: float, angle3: float, sequence: int) -> NDArray[np.float64]:
-    """The direction matrix R = R3 R2 R1 of three Euler angles (see above), each element within an ulp ..."""
+    """The direction matrix R = R3 R2 R1 of three Euler angles (see above), each element within 2.2e-16 ..."""
 
 
 def Euler2Direction_head(angle1: float, angle2: float, angle3: float) -> NDArray[np.float64]:
@@ -230,7 +230,7 @@ def CoordConversion_head(from_: int, to: int, first: ArrayLike, second: ArrayLik
 
 
 def DCT_1DH(in_: ArrayLike, size: int) -> NDArray[np.float64]:
-    """Cosine transform, type II, orthonormal, of `size` values (those of the input if below 1; more ..."""
+    """Cosine transform, type II, orthonormal, of `size` values: the first ones of the input, zero- ..."""
 
 
 def DCT_1DH_IDP(in_: ArrayLike, size: int) -> NDArray[np.float64]:
@@ -262,7 +262,7 @@ def InvDST_1DH_IDP(in_: ArrayLike) -> NDArray[np.float64]:
 
 
 def DCT_2DH(in_: ArrayLike, rows: int, cols: int) -> NDArray[np.float64]:
-    """As DCT_1DH, of all rows, then of all columns, of the upper left rows by cols values (those of ..."""
+    """As DCT_1DH, of all rows, then of all columns, of the upper left rows by cols values, zero-padded ..."""
 
 
 def DCT_2DH_IDP(in_: ArrayLike, rows: int, cols: int) -> NDArray[np.float64]:
@@ -294,7 +294,7 @@ def InvDST_2DH_IDP(in_: ArrayLike) -> NDArray[np.float64]:
 
 
 def DecimateCIN(x: ArrayLike, factor: int, average: int) -> NDArray[np.float64]:
-    """Keeps every *factor-th value of x, from the first on, or with *average the means of *factor ..."""
+    """Keeps every *factor-th value of x, starting with the first, or with *average the means of ..."""
 
 
 def CxDecimate_H(x: ArrayLike, factor: int, average: int) -> NDArray[np.complex128]:
@@ -310,7 +310,7 @@ def CxDecimateContinuous_H(x: ArrayLike, factor: int, average: int, start: int, 
 
 
 def InterpolatedFIRH(x: ArrayLike, L: int, gain: float, h: ArrayLike, state: ArrayLike, reset: int, delay: int) -> tuple[NDArray[np.float64], NDArray[np.float64], int]:
-    """Filters a stream with taps that stand L samples apart: y[i] = gain sum over k of h[k] x[i - k L]."""
+    """Filters a stream with taps that are L samples apart: y[i] = gain sum over k of h[k] x[i - k L]."""
 
 
 def InterpolatorFIRH(x: ArrayLike, gain: float, L: int, h: ArrayLike, state: ArrayLike, reset: int, delay: int) -> tuple[NDArray[np.float64], NDArray[np.float64], int]:
@@ -322,11 +322,11 @@ def DecimatorFIRH(x: ArrayLike, gain: float, M: int, h: ArrayLike, state: ArrayL
 
 
 def CICDecimatorByMovH(x: ArrayLike, state: ArrayLike, stages: int, factor: int, differentialDelay: int, alternate: int, reset: int, delay: int) -> tuple[NDArray[np.float64], NDArray[np.float64], int]:
-    """Decimates a stream by `factor` behind a cascade of `stages` moving averages over w = factor ..."""
+    """Decimates a stream by `factor` after a cascade of `stages` moving averages over w = factor ..."""
 
 
 def CICInterpolatorByMovH(x: ArrayLike, state: ArrayLike, stages: int, factor: int, differentialDelay: int, alternate: int, reset: int, delay: int) -> tuple[NDArray[np.float64], NDArray[np.float64], int]:
-    """Interpolates a stream by `factor`: the input, times factor and with factor - 1 zeros after each ..."""
+    """Interpolates a stream by `factor`: the input, multiplied by factor and with factor - 1 zeros ..."""
 
 
 def ReDecimatedMovingAverageH(x: ArrayLike, factor: int, sum: float, count: int, reset: int) -> tuple[NDArray[np.float64], float, int, int]:
@@ -338,11 +338,11 @@ def CxDecimatedMovingAverageH(x: ArrayLike, factor: int, sum: complex, count: in
 
 
 def ReCascadedMovingAverageH(x: ArrayLike, stages: int, width: int, sums: ArrayLike, buffers: ArrayLike, position: int, reset: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], int]:
-    """Runs x through a cascade of moving sums over `width` samples: v + x[i] - x[i - width], without ..."""
+    """Filters x by a cascade of moving sums over `width` samples, v + x[i] - x[i - width], without ..."""
 
 
 def CxCascadedMovingAverageH(x: ArrayLike, stages: int, width: int, sums: ArrayLike, buffers: ArrayLike, position: int, reset: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], int]:
-    """As ReCascadedMovingAverageH, for complex data. Runs x through a cascade of moving sums over ..."""
+    """As ReCascadedMovingAverageH, for complex data. Filters x by a cascade of moving sums over ..."""
 
 
 def CxComplexModulatorH(x: ArrayLike, frequency: float, sampleRate: float, phase: float) -> tuple[NDArray[np.complex128], float]:
@@ -358,7 +358,7 @@ def NormDist_head(x: float | ArrayLike) -> float | NDArray[Any]:
 
 
 def TDist_head(t: float | ArrayLike, dof: int | ArrayLike) -> float | NDArray[Any]:
-    """P(T <= t) of Student's distribution with *dof degrees of freedom: half I_z(dof / 2, 1 / 2) for t ..."""
+    """P(T <= t) of Student's distribution with *dof degrees of freedom: q = I_z(dof / 2, 1 / 2) / 2 ..."""
 
 
 def FDist_head(f: float | ArrayLike, n: int | ArrayLike, d: int | ArrayLike) -> float | NDArray[Any]:
@@ -374,19 +374,19 @@ def InvNdist_head(p: float | ArrayLike) -> float | NDArray[Any]:
 
 
 def InvTdist_head(p: float | ArrayLike, dof: int | ArrayLike) -> float | NDArray[Any]:
-    """The quantile of Student's distribution, by bisection of [-10000, 10000] to an absolute 1e-4, ..."""
+    """The quantile of Student's distribution, by bisection on [-10000, 10000] to an absolute error of ..."""
 
 
 def InvFDist_head(p: float | ArrayLike, n: int | ArrayLike, d: int | ArrayLike) -> float | NDArray[Any]:
-    """The quantile of Fisher's distribution, by bisection of [1e-6, 10000] to an absolute 1e-4, from ..."""
+    """The quantile of Fisher's distribution, by bisection on [1e-6, 10000] to an absolute error of ..."""
 
 
 def InvChiSquare_head(p: float | ArrayLike, dof: int | ArrayLike) -> float | NDArray[Any]:
-    """The quantile of the chi-square distribution, by bisection to an absolute 1e-4, from below; 0 and ..."""
+    """The quantile of the chi-square distribution, by bisection to an absolute error of 1e-4, from ..."""
 
 
 def NormDist2026_head(x: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
-    """A value of the standard normal distribution at *x, within 3 eps and down to the smallest ..."""
+    """A value of the standard normal distribution at *x, within 3 eps down to the smallest numbers: ..."""
 
 
 def TDist2026_head(t: float | ArrayLike, dof: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
@@ -442,15 +442,19 @@ def CxEigenValueVector_head(a: ArrayLike, matrixType: int, output: int) -> tuple
 
 
 def EigenValueVector2026_head(a: ArrayLike, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """As EigenValueVector_head, by blocks from order 160 on, in half the time at order 500: reduction ..."""
+    """As EigenValueVector_head, with a block algorithm from order 160 on, in half the time at order ..."""
 
 
 def CxEigenValueVector2026_head(a: ArrayLike, matrixType: int, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """As CxEigenValueVector_head, for general matrices by blocks from order 160 on as ..."""
+    """As CxEigenValueVector_head, with the block algorithms of EigenValueVector2026_head for general ..."""
 
 
 def SymEvectorEvalue_head(a: ArrayLike, output: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds."""
+    """Eigenvalues, in ascending order, of the symmetric matrix whose lower triangle is in a."""
+
+
+def SymEvectorEvalue2026_head(a: ArrayLike, output: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
+    """As SymEvectorEvalue_head, with a block algorithm from order 64 on: reduction to tridiagonal form ..."""
 
 
 def Schur_head(a: ArrayLike, wantVectors: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128]]:
@@ -470,15 +474,15 @@ def CxSchur80_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[
 
 
 def Schur2026_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128]]:
-    """As Schur80_head, with eigenvalues that are in order as w has them: blocks are sorted, by up to ..."""
+    """As Schur80_head, with the eigenvalues in w guaranteed to be in order: blocks are sorted, in up ..."""
 
 
 def create_oxfft_table(length: int) -> Pointer:
-    """The plan for transforms of `length` values, built at the first request and shared after it."""
+    """Returns the plan for transforms of `length` values, which is built at the first request and then ..."""
 
 
 def destroy_oxfft_table(plan: Pointer | None) -> None:
-    """Gives a plan back; the last of its holders releases it."""
+    """Releases a plan, which is freed when its last holder releases it."""
 
 
 def CxOXFFTH(in_: ArrayLike) -> NDArray[np.complex128]:
@@ -546,7 +550,7 @@ def InvReOXFFTHCH_IDP(in_: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.f
 
 
 def TransformUnreserveProc() -> None:
-    """Gives the plans of an _IDP node back and clears its instance-data word."""
+    """Releases the plans of an _IDP node and clears its instance-data word."""
 
 
 def CxFFT2D_H(in_: ArrayLike, rowStart: int, colStart: int, rows: int, cols: int, shift: int) -> NDArray[np.complex128]:
@@ -574,7 +578,7 @@ def CxInvFFT2D_H_IDP(in_: ArrayLike, shift: int) -> NDArray[np.complex128]:
 
 
 def ReInvFFT2D_H(in_: ArrayLike, shift: int) -> NDArray[np.float64]:
-    """As CxInvFFT2D_H, of the spectrum of a real matrix: rows of negative row frequency are not read. ..."""
+    """As CxInvFFT2D_H, of the spectrum of a real matrix: the rows of negative row frequency are not ..."""
 
 
 def ReInvFFT2D_H_IDP(in_: ArrayLike, shift: int) -> NDArray[np.float64]:
@@ -594,11 +598,11 @@ def CxIIR_Filter_H(x: ArrayLike, a: ArrayLike, b: ArrayLike, xState: ArrayLike, 
 
 
 def CxIIRReSig_Filter_H(x: ArrayLike, a: ArrayLike, b: ArrayLike, xState: ArrayLike, yState: ArrayLike, keepState: int) -> tuple[NDArray[np.complex128], NDArray[np.float64], NDArray[np.complex128]]:
-    """A real signal through a filter of complex coefficients, in direct form; without any coefficients ..."""
+    """Filters a real signal x by a filter with complex coefficients, in direct form; without any ..."""
 
 
 def IIR_Filter_OneState(x: ArrayLike, a: ArrayLike, b: ArrayLike, state: ArrayLike, keepState: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Filters x in place, in direct form, with the state of x and, behind it, that of y in one array."""
+    """Filters x in place, in direct form, with the state of x, followed by that of y, in one array."""
 
 
 def CxSigIIR_Filter_OneState(x: ArrayLike, a: ArrayLike, b: ArrayLike, state: ArrayLike, keepState: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
@@ -626,7 +630,7 @@ def FIRCoefs(fs: float, fl: float, fh: float, taps: int, type: int) -> tuple[NDA
 
 
 def Parks(n: int, fs: float, bands: ArrayLike, type: int, maxIterations: int) -> tuple[NDArray[np.float64], float]:
-    """An equiripple filter of n taps: the one whose greatest weighted deviation on a grid of the bands ..."""
+    """Designs an equiripple filter of n taps: the one with the smallest maximum of the weighted ..."""
 
 
 def FIRNarrowCoef_head(fs: float, fPass: float, fStop: float, fCenter: float, passRipple: float, stopAttenuation: float, type: int, design: Mapping[str, Any]) -> dict[str, Any]:
@@ -634,11 +638,11 @@ def FIRNarrowCoef_head(fs: float, fPass: float, fStop: float, fCenter: float, pa
 
 
 def FIRnarrowFilter_head(x: ArrayLike, design: Mapping[str, Any]) -> NDArray[np.float64]:
-    """x through a filter of FIRNarrowCoef_head."""
+    """Filters x by a filter of FIRNarrowCoef_head."""
 
 
 def CxSigFIRnarrowFilter_head(x: ArrayLike, design: Mapping[str, Any]) -> NDArray[np.complex128]:
-    """As FIRnarrowFilter_head, for a complex signal: its parts run through the same filter. x through ..."""
+    """As FIRnarrowFilter_head, for a complex signal, whose real and imaginary parts are filtered ..."""
 
 
 def ConfBndLinear_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -646,7 +650,7 @@ def ConfBndLinear_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: A
 
 
 def PredBndLinear_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndLinear_head, with the bounds of prediction, and none of the coefficients. Bounds of ..."""
+    """As ConfBndLinear_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def ConfBndExp_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -654,7 +658,7 @@ def ConfBndExp_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: Arra
 
 
 def PredBndExp_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndExp_head, with the bounds of prediction, and none of the coefficients. Bounds of the ..."""
+    """As ConfBndExp_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def ConfBndPower_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -662,7 +666,7 @@ def ConfBndPower_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: Ar
 
 
 def PredBndPower_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndPower_head, with the bounds of prediction, and none of the coefficients. Bounds of the ..."""
+    """As ConfBndPower_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def ConfBndLog_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, base: float, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -670,7 +674,7 @@ def ConfBndLog_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: Arra
 
 
 def PredBndLog_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, base: float, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndLog_head, with the bounds of prediction, and none of the coefficients. Bounds of the ..."""
+    """As ConfBndLog_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def ConfBndGauss_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -678,7 +682,7 @@ def ConfBndGauss_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: Ar
 
 
 def PredBndGauss_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndGauss_head, with the bounds of prediction, and none of the coefficients. Bounds of the ..."""
+    """As ConfBndGauss_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def ConfBndPoly_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -686,7 +690,7 @@ def ConfBndPoly_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: Arr
 
 
 def PredBndPoly_head(x: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndPoly_head, with the bounds of prediction, and none of the coefficients. Bounds of the ..."""
+    """As ConfBndPoly_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def ConfBndGenLS_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -694,7 +698,7 @@ def ConfBndGenLS_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: Ar
 
 
 def PredBndGenLS_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, coefficients: ArrayLike, confidence: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As ConfBndGenLS_head, with the bounds of prediction, and none of the coefficients. Bounds of the ..."""
+    """As ConfBndGenLS_head, with prediction bounds for the curve, and without bounds for the ..."""
 
 
 def InitializeAnalysisWorkspaceH(size: int, status: Mapping[str, Any]) -> dict[str, Any]:
@@ -702,19 +706,19 @@ def InitializeAnalysisWorkspaceH(size: int, status: Mapping[str, Any]) -> dict[s
 
 
 def EnableAnalysisWorkspaceH(status: Mapping[str, Any]) -> dict[str, Any]:
-    """From now on scratch requests are served from the region."""
+    """Enables the workspace: from now on scratch memory is taken from the region."""
 
 
 def DisableAnalysisWorkspaceH(status: Mapping[str, Any]) -> dict[str, Any]:
-    """From now on scratch requests are served from the heap again."""
+    """Disables the workspace: from now on scratch memory is taken from the heap again."""
 
 
 def UninitializeAnalysisWorkspaceH(status: Mapping[str, Any]) -> dict[str, Any]:
-    """Gives the region back to the heap; without a region nothing happens."""
+    """Releases the region to the heap; a no-op without a region."""
 
 
 def SetQXRTModule(module: Pointer | None, reserved: int) -> Pointer:
-    """Names the module of the process that holds the host's run-time functions, ahead of every place ..."""
+    """Sets the module of the process in which the host's run-time functions are looked up first; then ..."""
 
 
 def QZ80_head(a: ArrayLike, b: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.float64]]:
@@ -726,7 +730,7 @@ def CxQZ80_head(a: ArrayLike, b: ArrayLike, wantVectors: int, order: int) -> tup
 
 
 def QZ_head(a: ArrayLike, b: ArrayLike, wantVectors: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.float64]]:
-    """As QZ80_head, with the eigenvalues as they come. Generalised Schur form of two square matrices: ..."""
+    """As QZ80_head, without a choice of the order of the eigenvalues. Generalised Schur form of two ..."""
 
 
 def CxQZ_head(a: ArrayLike, b: ArrayLike, wantVectors: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128]]:
@@ -734,7 +738,7 @@ def CxQZ_head(a: ArrayLike, b: ArrayLike, wantVectors: int) -> tuple[NDArray[np.
 
 
 def TmiQZ_head(a: ArrayLike, b: ArrayLike, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.float64], NDArray[np.complex128]]:
-    """As QZ80_head, always with vectors, and in the columns of `vectors` the right eigenvectors of ..."""
+    """As QZ80_head, always with q and z. Generalised Schur form of two square matrices: a = q s z^T ..."""
 
 
 def CxTmiQZ_head(a: ArrayLike, b: ArrayLike, order: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128]]:
@@ -782,7 +786,7 @@ def FastHilbertTransformH_IDP(x: ArrayLike) -> NDArray[np.float64]:
 
 
 def InvFastHilbertTransformH(x: ArrayLike) -> NDArray[np.float64]:
-    """The negative of FastHilbertTransformH, which returns x less its mean and, for even n, less its ..."""
+    """The negative of FastHilbertTransformH."""
 
 
 def InvFastHilbertTransformH_IDP(x: ArrayLike) -> NDArray[np.float64]:
@@ -794,7 +798,7 @@ def histgran_head(x: ArrayLike, bins: int) -> tuple[NDArray[np.int32], NDArray[n
 
 
 def GenHistH(x: ArrayLike, intervals: ArrayLike) -> tuple[NDArray[np.int32], dict[str, Any]]:
-    """Counts the samples of x in each of the caller's intervals, which are expected in ascending order."""
+    """Counts the samples of x in each of the given intervals, which are expected in ascending order."""
 
 
 def BWCoefs(fs: float, fl: float, fh: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
@@ -838,23 +842,23 @@ def BesselCoefs90(fs: float, fl: float, fh: float, order: int, type: int, form: 
 
 
 def BWCoefs2026(fs: float, fl: float, fh: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
-    """Butterworth filter by its poles and zeros: the definition is that of BWCoefs."""
+    """Butterworth filter, defined as in BWCoefs, designed from its poles and zeros."""
 
 
 def ChebyshevCoefs2026(fs: float, fl: float, fh: float, ripple: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
-    """Chebyshev filter as of ChebyshevCoefs, with outputs as of BWCoefs2026."""
+    """Chebyshev filter as in ChebyshevCoefs, with the outputs of BWCoefs2026."""
 
 
 def InvChebyshevCoefs2026(fs: float, fl: float, fh: float, attenuation: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
-    """Inverse Chebyshev filter as of InvChebyshevCoefs, with outputs as of BWCoefs2026."""
+    """Inverse Chebyshev filter as in InvChebyshevCoefs, with the outputs of BWCoefs2026."""
 
 
 def EllipticCoefs2026(fs: float, fl: float, fh: float, ripple: float, attenuation: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
-    """Elliptic filter as of EllipticCoefs, with outputs as of BWCoefs2026: by theta functions of the ..."""
+    """Elliptic filter as in EllipticCoefs, with the outputs of BWCoefs2026, by theta functions of the ..."""
 
 
 def BesselCoefs2026(fs: float, fl: float, fh: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
-    """Bessel filter as of BesselCoefs, with outputs as of BWCoefs2026."""
+    """Bessel filter as in BesselCoefs, with the outputs of BWCoefs2026."""
 
 
 def PolyInterp_head(y: ArrayLike, x: ArrayLike, xi: float) -> tuple[float, float]:
@@ -870,15 +874,15 @@ def Spline_head(y: ArrayLike, x: ArrayLike, firstSlope: float, lastSlope: float)
 
 
 def SpInterp_head(y: ArrayLike, x: ArrayLike, secondDerivatives: ArrayLike, xi: float) -> float:
-    """The cubic spline of Spline_head at *xi; beyond the table the end segment goes on."""
+    """The cubic spline of Spline_head at *xi; beyond the table the first or last segment is extrapolated."""
 
 
 def LinFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike) -> tuple[NDArray[np.float64], float, float, float]:
-    """The line y = slope x + intercept; its values take the place of y."""
+    """The line y = slope x + intercept; its values replace y."""
 
 
 def LinFitCoef_head(y: ArrayLike, x: ArrayLike) -> tuple[float, float]:
-    """As LinFit_head, for the coefficients alone and without weights. The line y = slope x + ..."""
+    """As LinFit_head, for the coefficients only and without weights. The line y = slope x + intercept; ..."""
 
 
 def LinFitCoef80_head(y: ArrayLike, x: ArrayLike, w: ArrayLike) -> tuple[float, float]:
@@ -890,7 +894,7 @@ def PolyFit_head(x: ArrayLike, y: ArrayLike, order: int, algorithm: int) -> tupl
 
 
 def PolyFit80_head(x: ArrayLike, y: ArrayLike, order: int, algorithm: int, fixedOrders: ArrayLike, fixedValues: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], float]:
-    """As PolyFit_head, with coefficients that are given: that of order fixedOrders[i] is ..."""
+    """As PolyFit_head, with some coefficients fixed: that of order fixedOrders[i] is fixedValues[i]. ..."""
 
 
 def PolyFit81_head(x: ArrayLike, y: ArrayLike, order: int, w: ArrayLike, algorithm: int, fixedOrders: ArrayLike, fixedValues: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], float]:
@@ -898,15 +902,15 @@ def PolyFit81_head(x: ArrayLike, y: ArrayLike, order: int, w: ArrayLike, algorit
 
 
 def PolyFit2026_head(x: ArrayLike, y: ArrayLike, order: int, w: ArrayLike, tolerance: float, fixedOrders: ArrayLike, fixedValues: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], float]:
-    """As PolyFit81_head, with coefficients that are exact to nearly the last digit for x, y and ..."""
+    """As PolyFit81_head, with coefficients that are accurate to nearly the last digit for the given x, ..."""
 
 
 def GenLSFit80_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, algorithm: int, wantCovariance: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
-    """The coefficients c that minimise the weighted squares of y - H c, for a matrix with one row per ..."""
+    """The coefficients c that minimise the weighted sum of squares of y - H c, for a matrix with one ..."""
 
 
 def GenLSFit2026_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, tolerance: float, wantCovariance: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
-    """As GenLSFit80_head, with coefficients that are exact to nearly the last digit for H, y and ..."""
+    """As GenLSFit80_head, with coefficients that are accurate to nearly the last digit for the given ..."""
 
 
 def GenLSFit_head(H: ArrayLike, y: ArrayLike, deviations: ArrayLike, algorithm: int, wantCovariance: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
@@ -914,7 +918,7 @@ def GenLSFit_head(H: ArrayLike, y: ArrayLike, deviations: ArrayLike, algorithm: 
 
 
 def GoodnessOfFit_head(y: ArrayLike, fit: ArrayLike, w: ArrayLike, dof: int) -> tuple[float, float, float]:
-    """How well `fit` describes y: *sse, the weighted sum of squared residuals; *rSquare, 1 less its ..."""
+    """Goodness of a fit: *sse, the weighted sum of squared residuals; *rSquare, 1 minus the ratio of ..."""
 
 
 def GetNewCoef_head(coefficients: ArrayLike, a: ArrayLike, gradient: ArrayLike, lambda_: float) -> NDArray[np.float64]:
@@ -946,31 +950,31 @@ def CxEqsSetByLU2026_head(a: ArrayLike, b: ArrayLike) -> tuple[NDArray[np.comple
 
 
 def LULinEqs_head(lu: ArrayLike, pivots: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """Solves in place of b with the factors and pivots of LU_head."""
+    """Solves a x = b with the factors and pivots of LU_head; x replaces b."""
 
 
 def CxLULinEqs_head(lu: ArrayLike, pivots: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
-    """As LULinEqs_head, for complex data. Solves in place of b with the factors and pivots of LU_head."""
+    """As LULinEqs_head, for complex data. Solves a x = b with the factors and pivots of LU_head; x ..."""
 
 
 def InvMatrixLUDri_head(a: ArrayLike) -> NDArray[np.float64]:
-    """Inverse by LU factorisation, in place of a."""
+    """Replaces a by its inverse, by LU factorisation."""
 
 
 def CxInvMatrixLUDri_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As InvMatrixLUDri_head, for complex data. Inverse by LU factorisation, in place of a."""
+    """As InvMatrixLUDri_head, for complex data. Replaces a by its inverse, by LU factorisation."""
 
 
 def LUInvMatrix_head(lu: ArrayLike, pivots: ArrayLike) -> NDArray[np.float64]:
-    """Inverse from the factors and pivots of LU_head, in place of the factors."""
+    """Replaces the factors of LU_head by the inverse of the matrix, from the factors and pivots."""
 
 
 def CxLUInvMatrix_head(lu: ArrayLike, pivots: ArrayLike) -> NDArray[np.complex128]:
-    """As LUInvMatrix_head, for complex data. Inverse from the factors and pivots of LU_head, in place ..."""
+    """As LUInvMatrix_head, for complex data. Replaces the factors of LU_head by the inverse of the ..."""
 
 
 def GenLinEqs_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """Least-squares solution of smallest norm of a x = b for an m by n matrix, by singular values."""
+    """Least-squares solution of smallest norm of a x = b for an m by n matrix, by the singular value ..."""
 
 
 def CxGenLinEqs_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
@@ -978,7 +982,7 @@ def CxGenLinEqs_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
 
 
 def GenLinEqs82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.float64]:
-    """As GenLinEqs_head, with the tolerance in place of 2.2e-16, which one of 0 or below still ..."""
+    """As GenLinEqs_head, with `tolerance` in place of 2.2e-16. Least-squares solution of smallest norm ..."""
 
 
 def CxGenLinEqs82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
@@ -986,15 +990,15 @@ def CxGenLinEqs82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[
 
 
 def GenLinEqs2010_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Least-squares solution as GenLinEqs82_head gives it, with the digits that it loses at small norms."""
+    """Least-squares solution with the method of GenLinEqs82_head, which loses digits at small norms."""
 
 
 def GenLinEqsbySVD2011_head(a: ArrayLike, b: ArrayLike, tolerance: float, refinements: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As GenLinEqs2010_head, with iterative refinement and m + n more elements of `work`: starting ..."""
+    """As GenLinEqs2010_head, with iterative refinement and m + n more elements in `work`: starting ..."""
 
 
 def EqsSetBySVDDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """Least-squares solutions of smallest norm of a x = b for all columns of b, as GenLinEqs_head ..."""
+    """Least-squares solutions of smallest norm of a x = b for all columns of b, by the method of ..."""
 
 
 def CxEqsSetBySVDDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
@@ -1002,7 +1006,7 @@ def CxEqsSetBySVDDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
 
 
 def EqsSetBySVDDri82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.float64]:
-    """As EqsSetBySVDDri_head, with the tolerance in place of 2.2e-16, which one of 0 or below still ..."""
+    """As EqsSetBySVDDri_head, with `tolerance` in place of 2.2e-16. Least-squares solutions of ..."""
 
 
 def CxEqsSetBySVDDri82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
@@ -1018,7 +1022,7 @@ def CxGenLinEqs2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArra
 
 
 def EqsSetBySVD2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.float64]:
-    """As GenLinEqs2026_head, for all columns of b, each of which is scaled by itself. Least-squares ..."""
+    """As GenLinEqs2026_head, for all columns of b, each scaled separately. Least-squares solution of ..."""
 
 
 def CxEqsSetBySVD2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
@@ -1026,7 +1030,7 @@ def CxEqsSetBySVD2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDAr
 
 
 def EqsByCholeskyDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """Solves a x = b for a positive definite a by Cholesky factorisation, of which the upper triangle ..."""
+    """Solves a x = b for a positive definite a by Cholesky factorisation."""
 
 
 def CxEqsByCholeskyDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
@@ -1034,7 +1038,7 @@ def CxEqsByCholeskyDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128
 
 
 def EqsSetByCholeskyDri_head(a: ArrayLike, useUpper: int, b: ArrayLike) -> NDArray[np.float64]:
-    """As EqsByCholeskyDri_head, for all columns of b, with the upper triangle of a if useUpper is not ..."""
+    """As EqsByCholeskyDri_head, for all columns of b, from the upper triangle of a if useUpper is not ..."""
 
 
 def CxEqsSetByCholeskyDri_head(a: ArrayLike, useUpper: int, b: ArrayLike) -> NDArray[np.complex128]:
@@ -1042,55 +1046,55 @@ def CxEqsSetByCholeskyDri_head(a: ArrayLike, useUpper: int, b: ArrayLike) -> NDA
 
 
 def CholeskyLinEqs_head(packedFactor: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """Solves L L^T x = b in place of b with a packed lower factor of Cholesky_head."""
+    """Solves L L^T x = b with a packed lower factor of Cholesky_head; x replaces b."""
 
 
 def CxCholeskyLinEqs_head(packedFactor: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
-    """As CholeskyLinEqs_head, for complex data: L L^H x = b. Solves L L^T x = b in place of b with a ..."""
+    """As CholeskyLinEqs_head, for complex data: L L^H x = b. Solves L L^T x = b with a packed lower ..."""
 
 
 def TriEqsSetDri_head(a: ArrayLike, triangle: int, b: ArrayLike) -> NDArray[np.float64]:
-    """Solves a x = b for all columns of b with a triangle of a; the other one is not read."""
+    """Solves a x = b for all columns of b, where a is triangular; the other triangle of a is not read."""
 
 
 def CxTriEqsSetDri_head(a: ArrayLike, triangle: int, b: ArrayLike) -> NDArray[np.complex128]:
-    """As TriEqsSetDri_head, for complex data. Solves a x = b for all columns of b with a triangle of ..."""
+    """As TriEqsSetDri_head, for complex data. Solves a x = b for all columns of b, where a is ..."""
 
 
 def TriLinEqs_head(a: Mapping[str, Any], b: ArrayLike) -> NDArray[np.float64]:
-    """As TriEqsSetDri_head, for a packed triangle and in place of b, with the code in *err. Solves a x ..."""
+    """As TriEqsSetDri_head, for a packed triangle and one right-hand side; x replaces b. Solves a x = ..."""
 
 
 def CxTriLinEqs_head(a: Mapping[str, Any], b: ArrayLike) -> NDArray[np.complex128]:
-    """As TriLinEqs_head, for complex data. Solves a x = b for all columns of b with a triangle of a; ..."""
+    """As TriLinEqs_head, for complex data. Solves a x = b for all columns of b, where a is triangular; ..."""
 
 
 def BandEqsDriH(band: ArrayLike, b: ArrayLike, lowerBands: int, upperBands: int) -> NDArray[np.float64]:
-    """Solves a band system in place of b."""
+    """Solves a x = b for a band matrix a; x replaces b."""
 
 
 def CxBandEqsDriH(band: ArrayLike, b: ArrayLike, lowerBands: int, upperBands: int) -> NDArray[np.complex128]:
-    """As BandEqsDriH, for complex data. Solves a band system in place of b."""
+    """As BandEqsDriH, for complex data. Solves a x = b for a band matrix a; x replaces b."""
 
 
 def BandEqsSetDriH(band: ArrayLike, b: ArrayLike, lowerBands: int, upperBands: int) -> NDArray[np.float64]:
-    """As BandEqsDriH, for all columns of b. Solves a band system in place of b."""
+    """As BandEqsDriH, for all columns of b. Solves a x = b for a band matrix a; x replaces b."""
 
 
 def CxBandEqsSetDriH(band: ArrayLike, b: ArrayLike, lowerBands: int, upperBands: int) -> NDArray[np.complex128]:
-    """As BandEqsSetDriH, for complex data. Solves a band system in place of b."""
+    """As BandEqsSetDriH, for complex data. Solves a x = b for a band matrix a; x replaces b."""
 
 
 def TriDiagLU_head(lower: ArrayLike, diag: ArrayLike, upper: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.int32]]:
-    """LU factorisation with row exchanges of a tridiagonal matrix of order n, in place: the ..."""
+    """LU factorisation with row exchanges of a tridiagonal matrix of order n, in place: lower, diag ..."""
 
 
 def TriDiagEqsByLU_head(transposed: int, lower: ArrayLike, diag: ArrayLike, upper: ArrayLike, upper2: ArrayLike, pivots: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """Solves with the factors of TriDiagLU_head in place of b, or with their transpose if `transposed` ..."""
+    """Solves a x = b with the factors of TriDiagLU_head, or a^T x = b if `transposed` is not 0; x ..."""
 
 
 def TriDiagEqsSetByLU_head(transposed: int, lower: ArrayLike, diag: ArrayLike, upper: ArrayLike, upper2: ArrayLike, pivots: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """As TriDiagEqsByLU_head, for all columns of b. Solves with the factors of TriDiagLU_head in place ..."""
+    """As TriDiagEqsByLU_head, for all columns of b. Solves a x = b with the factors of TriDiagLU_head, ..."""
 
 
 def Sylvester2011_head(a: ArrayLike, b: ArrayLike, c: ArrayLike, equation: int) -> NDArray[np.float64]:
@@ -1126,71 +1130,71 @@ def CxLyapunov_head(a: ArrayLike, q: ArrayLike) -> NDArray[np.complex128]:
 
 
 def LU_head(a: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.int32], int]:
-    """P a = L U in place of the m by n matrix a, by Crout's method with the largest pivot of each ..."""
+    """Factors the m by n matrix a in place, P a = L U, by Crout's method with partial pivoting: L, ..."""
 
 
 def CxLU_head(a: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.int32], int]:
-    """As LU_head, for complex elements. P a = L U in place of the m by n matrix a, by Crout's method ..."""
+    """As LU_head, for complex elements. Factors the m by n matrix a in place, P a = L U, by Crout's ..."""
 
 
 def Cholesky_head(packed: ArrayLike) -> NDArray[np.float64]:
-    """Cholesky factor L of the symmetric positive definite a = L L^T, in place of its lower triangle ..."""
+    """Cholesky factor L of the symmetric positive definite a = L L^T; it replaces the lower triangle ..."""
 
 
 def CxCholesky_head(packed: ArrayLike) -> NDArray[np.complex128]:
-    """As Cholesky_head, for a Hermitian a = L L^H, of whose diagonal the real parts count. Cholesky ..."""
+    """As Cholesky_head, for a Hermitian a = L L^H; only the real parts of its diagonal are used. ..."""
 
 
 def FullCholesky_head(a: ArrayLike) -> NDArray[np.float64]:
-    """The factor of Cholesky_head in place of a square matrix: read from the lower triangle, and ..."""
+    """Replaces a square matrix by its Cholesky factor (Cholesky_head): the lower triangle is read and ..."""
 
 
 def CxFullCholesky_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As FullCholesky_head, for a Hermitian matrix. The factor of Cholesky_head in place of a square ..."""
+    """As FullCholesky_head, for a Hermitian matrix. Replaces a square matrix by its Cholesky factor ..."""
 
 
 def Cholesky_InvMatrix_head(packedFactor: ArrayLike) -> NDArray[np.float64]:
-    """The inverse of L L^T, as a packed lower triangle in place of the factor of Cholesky_head."""
+    """Replaces the packed factor of Cholesky_head by the packed lower triangle of the inverse of L L^T."""
 
 
 def CxCholesky_InvMatrix_head(packedFactor: ArrayLike) -> NDArray[np.complex128]:
-    """As Cholesky_InvMatrix_head, for L L^H. The inverse of L L^T, as a packed lower triangle in place ..."""
+    """As Cholesky_InvMatrix_head, for L L^H. Replaces the packed factor of Cholesky_head by the packed ..."""
 
 
 def InvMatrixChoDri_head(a: ArrayLike) -> NDArray[np.float64]:
-    """The inverse of a symmetric positive definite matrix in its place."""
+    """Replaces a symmetric positive definite matrix by its inverse."""
 
 
 def CxInvMatrixChoDri_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As InvMatrixChoDri_head, for a Hermitian matrix. The inverse of a symmetric positive definite ..."""
+    """As InvMatrixChoDri_head, for a Hermitian matrix. Replaces a symmetric positive definite matrix ..."""
 
 
 def PreallocInvMatrixChoDri_H(a: ArrayLike, packedWork: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2 ..."""
+    """As InvMatrixChoDri_head, without allocating memory: packedWork, of at least n(n+1)/2 elements, ..."""
 
 
 def Tri_InvMatrix_head(a: Mapping[str, Any]) -> dict[str, Any]:
-    """The inverse of a packed triangle, in its place."""
+    """Replaces a packed triangle by its inverse."""
 
 
 def CxTri_InvMatrix_head(a: Mapping[str, Any]) -> dict[str, Any]:
-    """As Tri_InvMatrix_head, for complex elements. The inverse of a packed triangle, in its place."""
+    """As Tri_InvMatrix_head, for complex elements. Replaces a packed triangle by its inverse."""
 
 
 def InvMatrixTriDri_head(a: ArrayLike, triangle: int) -> NDArray[np.float64]:
-    """The inverse of a triangular matrix, in its place."""
+    """Replaces a triangular matrix by its inverse."""
 
 
 def CxInvMatrixTriDri_head(a: ArrayLike, triangle: int) -> NDArray[np.complex128]:
-    """As InvMatrixTriDri_head, for complex elements. The inverse of a triangular matrix, in its place."""
+    """As InvMatrixTriDri_head, for complex elements. Replaces a triangular matrix by its inverse."""
 
 
 def qrd_head(a: ArrayLike, algorithm: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """a = q r with q of m by m unitary and r of m by n upper triangular, for a of m by n."""
+    """a = q r with q (m by m) unitary and r (m by n) upper triangular, for an m by n matrix a."""
 
 
 def Cxqrd_head(a: ArrayLike, algorithm: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """As qrd_head, for complex elements; the diagonal of r is real. a = q r with q of m by m unitary ..."""
+    """As qrd_head, for complex elements; the diagonal of r is real. a = q r with q (m by m) unitary ..."""
 
 
 def QRDecH(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.float64], NDArray[np.float64]]:
@@ -1202,7 +1206,7 @@ def CxQRDecH(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int3
 
 
 def QRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.float64], NDArray[np.float64]]:
-    """As QRDecH, by blocks of reflections where min(m, n) is at least 160: with q, in half the time at ..."""
+    """As QRDecH, with blocks of reflections if min(m, n) is at least 160: with q in half the time at ..."""
 
 
 def CxQRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.complex128], NDArray[np.complex128]]:
@@ -1218,7 +1222,7 @@ def CxSVD_head(a: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64
 
 
 def SVDEx_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """As SVD_head, but u is an output of its own and the code is the function result; with fullSize ..."""
+    """As SVD_head, but u is a separate output and the code is the function result; if fullSize is not ..."""
 
 
 def CxSVDEx_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.complex128], NDArray[np.float64], NDArray[np.complex128]]:
@@ -1226,7 +1230,7 @@ def CxSVDEx_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.complex128], N
 
 
 def SVDS_head(a: ArrayLike) -> NDArray[np.float64]:
-    """As SVD_head, the values alone: the same to the bit as with the vectors. Singular value ..."""
+    """As SVD_head, the values only: the same to the bit as with the vectors. Singular value ..."""
 
 
 def CxSVDS_head(a: ArrayLike) -> NDArray[np.float64]:
@@ -1242,7 +1246,7 @@ def CxSVD2026_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.complex128],
 
 
 def SVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
-    """As SVD2026_head, the values alone: the same to the bit as with the vectors. Singular value ..."""
+    """As SVD2026_head, the values only: the same to the bit as with the vectors. Singular value ..."""
 
 
 def CxSVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
@@ -1250,35 +1254,35 @@ def CxSVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
 
 
 def Hessenberg_head(a: ArrayLike, low: int, high: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections: ..."""
+    """Replaces the square matrix a by its Hessenberg form h = q^T a q, which is zero below the first ..."""
 
 
 def CxHessenberg_head(a: ArrayLike, low: int, high: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """As Hessenberg_head, for complex elements: h = q^H a q. Hessenberg form h = q^T a q of the square ..."""
+    """As Hessenberg_head, for complex elements: h = q^H a q. Replaces the square matrix a by its ..."""
 
 
 def MatrixBalance_head(a: ArrayLike, job: int) -> tuple[NDArray[np.float64], int, int, NDArray[np.float64]]:
-    """Balances the square matrix a in its place."""
+    """Balances the square matrix a in place."""
 
 
 def CxMatrixBalance_head(a: ArrayLike, job: int) -> tuple[NDArray[np.complex128], int, int, NDArray[np.float64]]:
-    """As MatrixBalance_head, for complex elements, whose size is taken as |re| + |im|. Balances the ..."""
+    """As MatrixBalance_head, for complex elements, whose magnitude is taken as |re| + |im|. Balances ..."""
 
 
 def EigenVBack_head(job: int, side: int, low: int, high: int, scale: ArrayLike, v: ArrayLike) -> NDArray[np.float64]:
-    """Turns eigenvectors of a matrix that MatrixBalance_head has balanced, the columns of v, into ..."""
+    """Transforms eigenvectors of a matrix balanced by MatrixBalance_head, the columns of v, into those ..."""
 
 
 def CxEigenVBack_head(job: int, side: int, low: int, high: int, scale: ArrayLike, v: ArrayLike) -> NDArray[np.complex128]:
-    """As EigenVBack_head, for complex vectors. Turns eigenvectors of a matrix that MatrixBalance_head ..."""
+    """As EigenVBack_head, for complex vectors. Transforms eigenvectors of a matrix balanced by ..."""
 
 
 def MatrixExp_head(a: ArrayLike) -> NDArray[np.float64]:
-    """exp(a) in place of the square matrix a, by scaling, a Pade approximant and repeated squaring; of ..."""
+    """Replaces the square matrix a by exp(a), by scaling, a Pade approximant and repeated squaring; ..."""
 
 
 def CxMatrixExp_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As MatrixExp_head, for complex elements. exp(a) in place of the square matrix a, by scaling, a ..."""
+    """As MatrixExp_head, for complex elements. Replaces the square matrix a by exp(a), by scaling, a ..."""
 
 
 def MatrixExp2026_head(a: ArrayLike) -> NDArray[np.float64]:
@@ -1306,35 +1310,35 @@ def CxMatrixLn2026_head(a: ArrayLike) -> NDArray[np.complex128]:
 
 
 def MatrixSqrt_head(a: ArrayLike) -> NDArray[np.float64]:
-    """The real part of the principal square root in place of the square matrix a; imaginary parts, ..."""
+    """Replaces the square matrix a by the real part of its principal square root; imaginary parts, ..."""
 
 
 def MatrixSqrtH(a: ArrayLike) -> NDArray[np.complex128]:
-    """As MatrixSqrt_head, with the whole complex root in `out`; the code is the function result. The ..."""
+    """As MatrixSqrt_head, with the whole complex root in `out`; the code is the function result. ..."""
 
 
 def CxMatrixSqrt_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As MatrixSqrt_head, for complex elements; nothing is dropped. The real part of the principal ..."""
+    """As MatrixSqrt_head, for complex elements; nothing is dropped. Replaces the square matrix a by ..."""
 
 
 def MatrixSqrt2026_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """The principal square root of the square matrix a: that with eigenvalues of no negative real part."""
+    """The principal square root of the square matrix a, whose eigenvalues have no negative real part."""
 
 
 def CxMatrixSqrt2026_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As MatrixSqrt2026_head, for complex elements. The principal square root of the square matrix a: ..."""
+    """As MatrixSqrt2026_head, for complex elements. The principal square root of the square matrix a, ..."""
 
 
 def MatrixPower_head(a: ArrayLike, power: int) -> NDArray[np.float64]:
-    """a^power in place of the square matrix a, by repeated squaring."""
+    """Replaces the square matrix a by a^power, by repeated squaring."""
 
 
 def CxMatrixPower_head(a: ArrayLike, power: int) -> NDArray[np.complex128]:
-    """As MatrixPower_head, for complex elements. a^power in place of the square matrix a, by repeated ..."""
+    """As MatrixPower_head, for complex elements. Replaces the square matrix a by a^power, by repeated ..."""
 
 
 def MatrixPower2026_head(a: ArrayLike, power: int) -> NDArray[np.float64]:
-    """a^power of the square matrix a by repeated squaring; a negative power is one of the inverse by ..."""
+    """a^power of the square matrix a by repeated squaring; a negative power is a power of the inverse ..."""
 
 
 def CxMatrixPower2026_head(a: ArrayLike, power: int) -> NDArray[np.complex128]:
@@ -1342,11 +1346,11 @@ def CxMatrixPower2026_head(a: ArrayLike, power: int) -> NDArray[np.complex128]:
 
 
 def PseudoInverse_head(a: ArrayLike, tolerance: float) -> NDArray[np.float64]:
-    """The pseudo-inverse (E."""
+    """Replaces the m by n matrix a by its pseudo-inverse (E."""
 
 
 def CxPseudoInverse_head(a: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
-    """As PseudoInverse_head, for complex elements. The pseudo-inverse (E."""
+    """As PseudoInverse_head, for complex elements. Replaces the m by n matrix a by its pseudo-inverse (E."""
 
 
 def PseudoInverse2026_head(a: ArrayLike, tolerance: float) -> NDArray[np.float64]:
@@ -1358,51 +1362,51 @@ def CxPseudoInverse2026_head(a: ArrayLike, tolerance: float) -> NDArray[np.compl
 
 
 def MatrixMulAligned_head(a: ArrayLike, b: ArrayLike, alignedCopy: int) -> NDArray[np.float64]:
-    """Matrix product c = a b of an m by k and a k by n matrix."""
+    """Matrix product c = a b, where a is m by k and b is k by n."""
 
 
 def MatrixMul_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
-    """As MatrixMulAligned_head, with alignedCopy 0. Matrix product c = a b of an m by k and a k by n ..."""
+    """As MatrixMulAligned_head, with alignedCopy 0. Matrix product c = a b, where a is m by k and b is ..."""
 
 
 def AxBCxAlignedCIN(a: ArrayLike, b: ArrayLike, alignedCopy: int) -> NDArray[np.complex128]:
-    """As MatrixMulAligned_head, for complex data. Matrix product c = a b of an m by k and a k by n matrix."""
+    """As MatrixMulAligned_head, for complex data. Matrix product c = a b, where a is m by k and b is k ..."""
 
 
 def AxBCxCIN(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
-    """As AxBCxAlignedCIN, with alignedCopy 0. Matrix product c = a b of an m by k and a k by n matrix."""
+    """As AxBCxAlignedCIN, with alignedCopy 0. Matrix product c = a b, where a is m by k and b is k by n."""
 
 
 def AxVectAligned_head(a: ArrayLike, x: ArrayLike, alignedCopy: int) -> NDArray[np.float64]:
-    """y = a x: one sum per row, added up from the first column to the last."""
+    """y = a x, where a is a matrix and x a vector, with one sum per row, from the first column to the ..."""
 
 
 def AxVect_head(a: ArrayLike, x: ArrayLike) -> NDArray[np.float64]:
-    """As AxVectAligned_head, with alignedCopy 0. y = a x: one sum per row, added up from the first ..."""
+    """As AxVectAligned_head, with alignedCopy 0. y = a x, where a is a matrix and x a vector, with one ..."""
 
 
 def AxVectorCxAligned(a: ArrayLike, x: ArrayLike, alignedCopy: int) -> NDArray[np.complex128]:
-    """As AxVectAligned_head, for complex data. y = a x: one sum per row, added up from the first ..."""
+    """As AxVectAligned_head, for complex data. y = a x, where a is a matrix and x a vector, with one ..."""
 
 
 def AxVectorCx(a: ArrayLike, x: ArrayLike) -> NDArray[np.complex128]:
-    """As AxVectorCxAligned, with alignedCopy 0. y = a x: one sum per row, added up from the first ..."""
+    """As AxVectorCxAligned, with alignedCopy 0. y = a x, where a is a matrix and x a vector, with one ..."""
 
 
 def vectxAAligned_head(x: ArrayLike, a: ArrayLike, alignedCopy: int) -> NDArray[np.float64]:
-    """y = x a with x as a matrix of one row, by the product of matrices."""
+    """y = x a, with x as a matrix of one row, computed as a matrix product."""
 
 
 def vectxA_head(x: ArrayLike, a: ArrayLike) -> NDArray[np.float64]:
-    """As vectxAAligned_head, with alignedCopy 0. y = x a with x as a matrix of one row, by the product ..."""
+    """As vectxAAligned_head, with alignedCopy 0. y = x a, with x as a matrix of one row, computed as a ..."""
 
 
 def CxVectxAAligned_head(x: ArrayLike, a: ArrayLike, alignedCopy: int) -> NDArray[np.complex128]:
-    """As vectxAAligned_head, for complex data. y = x a with x as a matrix of one row, by the product ..."""
+    """As vectxAAligned_head, for complex data. y = x a, with x as a matrix of one row, computed as a ..."""
 
 
 def CxVectxA_head(x: ArrayLike, a: ArrayLike) -> NDArray[np.complex128]:
-    """As CxVectxAAligned_head, with alignedCopy 0. y = x a with x as a matrix of one row, by the ..."""
+    """As CxVectxAAligned_head, with alignedCopy 0. y = x a, with x as a matrix of one row, computed as ..."""
 
 
 def Determinant_head(a: ArrayLike, matrixType: int) -> float:
@@ -1414,11 +1418,11 @@ def CxDeterminant_head(a: ArrayLike, matrixType: int) -> complex:
 
 
 def Rank_head(a: ArrayLike, tolerance: float) -> int:
-    """Numerical rank: the number of singular values above *tolerance, which is max(m, n) times the ..."""
+    """Numerical rank: the number of singular values above *tolerance."""
 
 
 def CxRank_head(a: ArrayLike, tolerance: float) -> int:
-    """As Rank_head, for complex data. Numerical rank: the number of singular values above *tolerance, ..."""
+    """As Rank_head, for complex data. Numerical rank: the number of singular values above *tolerance."""
 
 
 def CondNumber_head(a: ArrayLike, normType: int) -> float:
@@ -1438,7 +1442,7 @@ def CxNorm_head(a: ArrayLike, normType: int) -> float:
 
 
 def Rank2026_head(a: ArrayLike, tolerance: float) -> int:
-    """Numerical rank of a matrix of any norm: the number of singular values above the tolerance, which ..."""
+    """Numerical rank of a matrix of any norm: the number of singular values above the tolerance."""
 
 
 def CxRank2026_head(a: ArrayLike, tolerance: float) -> int:
@@ -1486,67 +1490,67 @@ def CxVectorNormH(x: ArrayLike, p: float) -> float:
 
 
 def unitVector_head(x: ArrayLike) -> tuple[NDArray[np.float64], float]:
-    """Scales x to the 2-norm 1 and gives its former norm."""
+    """Scales x to a 2-norm of 1 and returns its previous norm."""
 
 
 def CxUnitVector_head(x: ArrayLike) -> tuple[NDArray[np.complex128], float]:
-    """As unitVector_head, for complex data. Scales x to the 2-norm 1 and gives its former norm."""
+    """As unitVector_head, for complex data. Scales x to a 2-norm of 1 and returns its previous norm."""
 
 
 def unitVector80_head(x: ArrayLike, p: float) -> tuple[NDArray[np.float64], float]:
-    """As unitVector_head, for the p-norm of vectorNormH. Scales x to the 2-norm 1 and gives its former ..."""
+    """As unitVector_head, for the p-norm of vectorNormH. Scales x to a 2-norm of 1 and returns its ..."""
 
 
 def CxUnitVector80_head(x: ArrayLike, p: float) -> tuple[NDArray[np.complex128], float]:
-    """As unitVector80_head, for complex data. Scales x to the 2-norm 1 and gives its former norm."""
+    """As unitVector80_head, for complex data. Scales x to a 2-norm of 1 and returns its previous norm."""
 
 
 def CheckSym_head(a: ArrayLike, tolerance: float, relative: int) -> int:
-    """Whether |a[i][j] - a[j][i]| is nowhere above a limit: the tolerance, or 0 if that is negative; ..."""
+    """Tests whether a is symmetric: no |a[i][j] - a[j][i]| is above a limit."""
 
 
 def CxCheckSym_head(a: ArrayLike, tolerance: float, relative: int, hermitian: int) -> int:
-    """As CheckSym_head, for complex data; with `hermitian` not 0 elements are compared with the ..."""
+    """As CheckSym_head, for complex data. Tests whether a is symmetric: no |a[i][j] - a[j][i]| is ..."""
 
 
 def CheckPosdef_head(a: ArrayLike) -> int:
-    """Whether a is positive definite: exactly symmetric, with all eigenvalues above 2.2e-16 times the ..."""
+    """Tests whether a is positive definite: exactly symmetric, with all eigenvalues above 2.2e-16 ..."""
 
 
 def CxCheckPosdef_head(a: ArrayLike) -> int:
-    """As CheckPosdef_head, for complex data: exactly Hermitian. Whether a is positive definite: ..."""
+    """As CheckPosdef_head, for complex data: exactly Hermitian. Tests whether a is positive definite: ..."""
 
 
 def CheckPosSemiDef_head(a: ArrayLike, tolerance: float) -> tuple[int, int]:
-    """Whether a is positive semi-definite, and its rank, by symmetric elimination that takes the ..."""
+    """Sets *isSemiDefinite to 1 if a is positive semi-definite, otherwise to 0, and *rank to its rank, ..."""
 
 
 def CxCheckPosSemiDef_head(a: ArrayLike, tolerance: float) -> tuple[int, int]:
-    """As CheckPosSemiDef_head, for complex data: Hermitian within t. Whether a is positive semi- ..."""
+    """As CheckPosSemiDef_head, for complex data: Hermitian within t. Sets *isSemiDefinite to 1 if a is ..."""
 
 
 def MatrixCharacteristicPoly_head(a: ArrayLike) -> NDArray[np.float64]:
-    """Coefficients of det(t - a), ascending: poly has one element more than a has rows, the last one is 1."""
+    """Coefficients of the characteristic polynomial det(t I - a), in ascending powers: poly has one ..."""
 
 
 def CxMatrixCharacteristicPoly_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As MatrixCharacteristicPoly_head, for complex data. Coefficients of det(t - a), ascending: poly ..."""
+    """As MatrixCharacteristicPoly_head, for complex data. Coefficients of the characteristic ..."""
 
 
 def ExpFit_head(y: ArrayLike, x: ArrayLike, deviations: ArrayLike) -> tuple[NDArray[np.float64], float, float, float]:
-    """y = a exp(b x) by the line through (x, ln |y|) with weights w y^2, which make up for the ..."""
+    """y = a exp(b x) by the line through (x, ln |y|) with weights w y^2, which compensate for the ..."""
 
 
 def ExpFit80_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, method: int, iterations: int, floor: float) -> tuple[NDArray[np.float64], float, float, float, int]:
-    """y = a exp(b x), with weights as they are."""
+    """y = a exp(b x), with the weights w as given."""
 
 
 def ExpFitCoef_head(y: ArrayLike, x: ArrayLike) -> tuple[float, float]:
-    """As ExpFit_head, for the coefficients alone and without weights. y = a exp(b x) by the line ..."""
+    """As ExpFit_head, for the coefficients only and without weights. y = a exp(b x) by the line ..."""
 
 
 def ExpFitCoef80_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, method: int, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[float, float, int]:
-    """As ExpFit80_head, for the coefficients alone. y = a exp(b x), with weights as they are."""
+    """As ExpFit80_head, for the coefficients only. y = a exp(b x), with the weights w as given."""
 
 
 def PowerFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[NDArray[np.float64], float, float, float, int]:
@@ -1554,15 +1558,15 @@ def PowerFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, gu
 
 
 def PowerFitCoef_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[float, float, int]:
-    """As PowerFit_head, for the coefficients alone. y = a x^b for x above 0, by Gauss-Newton steps ..."""
+    """As PowerFit_head, for the coefficients only. y = a x^b for x above 0, by Gauss-Newton steps from ..."""
 
 
 def LogFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, base: float) -> tuple[NDArray[np.float64], float, float, float]:
-    """y = a log(b x) to the given base, for x of one sign, which b takes; its values take the place of y."""
+    """y = a log(b x) to the given base, for x of one sign; b has the same sign."""
 
 
 def LogFitCoef_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, base: float) -> tuple[float, float]:
-    """As LogFit_head, for the coefficients alone. y = a log(b x) to the given base, for x of one sign, ..."""
+    """As LogFit_head, for the coefficients only. y = a log(b x) to the given base, for x of one sign; ..."""
 
 
 def GaussianPeakFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[NDArray[np.float64], float, float, float, float, int]:
@@ -1570,11 +1574,11 @@ def GaussianPeakFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: fl
 
 
 def GaussianPeakFitCoef_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[float, float, float, int]:
-    """As GaussianPeakFit_head, for the coefficients alone. y = a exp(-((x - c) / s)^2 / 2), a peak up ..."""
+    """As GaussianPeakFit_head, for the coefficients only. y = a exp(-((x - c) / s)^2 / 2), a peak up ..."""
 
 
 def GaussianPeakFit2026_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[NDArray[np.float64], float, float, float, float, int]:
-    """As GaussianPeakFit_head, from starts at every scale and by the trust region of ..."""
+    """As GaussianPeakFit_head, with start values at every scale and the trust region of ..."""
 
 
 def white(n: int, amplitude: float, seed: int, state: Mapping[str, Any]) -> tuple[NDArray[np.float64], dict[str, Any]]:
@@ -1594,7 +1598,7 @@ def GammaNoiseH(n: int, order: int, seed: int, state: Mapping[str, Any]) -> tupl
 
 
 def PoissonNoiseH(n: int, mean: float, seed: int, state: Mapping[str, Any]) -> tuple[NDArray[np.float64], dict[str, Any]]:
-    """Poisson noise: numbers of events, of the given mean."""
+    """Poisson noise: numbers of events with the given mean."""
 
 
 def BinomialNoiseH(n: int, trials: int, p: float, seed: int, state: Mapping[str, Any], cache: Mapping[str, Any]) -> tuple[NDArray[np.uint32], dict[str, Any], dict[str, Any]]:
@@ -1610,19 +1614,19 @@ def Gauss2026(n: int, sigma: float, key: int, stream: int, position: float) -> N
 
 
 def Gamma2026(n: int, shape: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
-    """Gamma noise of any shape above 0, with density x^(shape - 1) exp(-x) / Gamma(shape): by ..."""
+    """Gamma noise of any shape above 0, with density x^(shape - 1) exp(-x) / Gamma(shape), by ..."""
 
 
 def Poisson2026(n: int, mean: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
-    """Poisson noise of means to 1e15: below a mean of 10 by the sum of probabilities, above by ..."""
+    """Poisson noise with means up to 1e15: below a mean of 10 by summing probabilities, otherwise by ..."""
 
 
 def Binomial2026(n: int, trials: float, p: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
-    """Binomial noise: numbers of successes in `trials` trials of probability p, trials a whole number ..."""
+    """Binomial noise: numbers of successes in `trials` trials of probability p, where trials is an ..."""
 
 
 def NonlinearFit2026(x: ArrayLike, y: ArrayLike, w: ArrayLike, model: Callable[..., Any] | None, jacobian: Callable[..., Any] | None, context: Pointer | None, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, loss: int, scale: float, tolerance: float, iterations: int) -> tuple[int, NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float, int]:
-    """The parameters p of a model f(x, p) with the least cost = 1/2 sum over i of scale^2 rho(|w[i]| ..."""
+    """Finds the parameters p of a model f(x, p) with the smallest cost = 1/2 sum over i of scale^2 ..."""
 
 
 def Median_head(x: ArrayLike) -> float:
@@ -1634,7 +1638,7 @@ def ModeH(x: ArrayLike, intervals: int) -> NDArray[np.float64]:
 
 
 def PeakDetector(x: ArrayLike, threshold: float, width: int) -> tuple[NDArray[np.int32], int]:
-    """Runs of samples at or above *threshold that are at least *width samples long: indices gets the ..."""
+    """Finds the runs of samples at or above *threshold that are at least *width samples long: indices ..."""
 
 
 def PeakD(request: Mapping[str, Any], state: Mapping[str, Any], buffer: ArrayLike) -> tuple[dict[str, Any], dict[str, Any], NDArray[np.float64]]:
@@ -1642,7 +1646,7 @@ def PeakD(request: Mapping[str, Any], state: Mapping[str, Any], buffer: ArrayLik
 
 
 def PeakD2010(request: Mapping[str, Any], state: Mapping[str, Any], buffer: ArrayLike, mode: int) -> tuple[dict[str, Any], dict[str, Any], NDArray[np.float64]]:
-    """As PeakD2014, without a source: mode 2 has no data. The peaks or valleys of the next block of a ..."""
+    """As PeakD2014, without a source, so that mode 2 has no data. The peaks or valleys of the next ..."""
 
 
 def PeakD2014(source: ArrayLike, request: Mapping[str, Any], state: Mapping[str, Any], buffer: ArrayLike, mode: int) -> tuple[dict[str, Any], dict[str, Any], NDArray[np.float64]]:
@@ -1666,27 +1670,27 @@ def CxSubtractPolyH(p: ArrayLike, q: ArrayLike) -> NDArray[np.complex128]:
 
 
 def MultiplyPolyH(p: ArrayLike, q: ArrayLike) -> NDArray[np.float64]:
-    """The product r = p q of m + n - 1 coefficients, or one 0 where p or q is empty: r[k] = sum over i ..."""
+    """The product r = p q of m + n - 1 coefficients, or a single 0 if p or q is empty: r[k] = sum over ..."""
 
 
 def CxMultiplyPolyH(p: ArrayLike, q: ArrayLike) -> NDArray[np.complex128]:
-    """As MultiplyPolyH, for complex coefficients. The product r = p q of m + n - 1 coefficients, or ..."""
+    """As MultiplyPolyH, for complex coefficients. The product r = p q of m + n - 1 coefficients, or a ..."""
 
 
 def DividePolyH(p: ArrayLike, q: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Quotient and remainder of the long division, p = quotient q + remainder."""
+    """Quotient and remainder of polynomial division, p = quotient q + remainder."""
 
 
 def CxDividePolyH(p: ArrayLike, q: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """As DividePolyH, for complex coefficients. Quotient and remainder of the long division, p = ..."""
+    """As DividePolyH, for complex coefficients. Quotient and remainder of polynomial division, p = ..."""
 
 
 def PolyGCD_H(p: ArrayLike, q: ArrayLike, tolerance: float) -> tuple[NDArray[np.float64], float]:
-    """The greatest common divisor of polynomials near p and q: of all pairs whose coefficients are ..."""
+    """The approximate greatest common divisor of p and q."""
 
 
 def CxPolyGCD_H(p: ArrayLike, q: ArrayLike, tolerance: float) -> tuple[NDArray[np.complex128], float]:
-    """As PolyGCD_H, for complex coefficients. The greatest common divisor of polynomials near p and q: ..."""
+    """As PolyGCD_H, for complex coefficients. The approximate greatest common divisor of p and q."""
 
 
 def PolyLCM_H(p: ArrayLike, q: ArrayLike, tolerance: float) -> NDArray[np.float64]:
@@ -1702,11 +1706,11 @@ def CxPolyEv(p: ArrayLike, x: ArrayLike) -> NDArray[np.complex128]:
 
 
 def EvPoly2D(p: ArrayLike, a: ArrayLike, mode: int) -> NDArray[np.float64]:
-    """A polynomial of a matrix, y as large as a."""
+    """A polynomial of a matrix; y has the size of a."""
 
 
 def CxEvPoly2D(p: ArrayLike, a: ArrayLike, mode: int) -> NDArray[np.complex128]:
-    """As EvPoly2D, for complex coefficients and elements, with values as of CxPolyEv. A polynomial of ..."""
+    """As EvPoly2D, for complex coefficients and elements, with the values of CxPolyEv. A polynomial of ..."""
 
 
 def PolyDerivativeH(p: ArrayLike, order: int) -> NDArray[np.float64]:
@@ -1726,7 +1730,7 @@ def CxPolyIntegralH(p: ArrayLike, constant: complex) -> NDArray[np.complex128]:
 
 
 def PolyComposeH(p: ArrayLike, q: ArrayLike) -> NDArray[np.float64]:
-    """The composition r(x) = p(q(x)) of (m - 1) (n - 1) + 1 coefficients by Horner's rule; zeros at ..."""
+    """The composition r(x) = p(q(x)) of (m - 1) (n - 1) + 1 coefficients by Horner's rule; leading ..."""
 
 
 def CxPolyComposeH(p: ArrayLike, q: ArrayLike) -> NDArray[np.complex128]:
@@ -1734,11 +1738,11 @@ def CxPolyComposeH(p: ArrayLike, q: ArrayLike) -> NDArray[np.complex128]:
 
 
 def PolyFromRootsH(roots: ArrayLike) -> NDArray[np.float64]:
-    """The monic real polynomial with these roots, each as often as it is there; no roots give [1]."""
+    """The monic real polynomial with the given roots, each as often as it occurs in `roots`; no roots ..."""
 
 
 def CxPolyFromRootsH(roots: ArrayLike) -> NDArray[np.complex128]:
-    """The monic complex polynomial with these roots, each as often as it is there; no roots give [1]."""
+    """The monic complex polynomial with the given roots, each as often as it occurs in `roots`; no ..."""
 
 
 def PartialFractionsH(numerator: ArrayLike, denominator: ArrayLike, tolerance: float) -> tuple[NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128]]:
@@ -1746,23 +1750,23 @@ def PartialFractionsH(numerator: ArrayLike, denominator: ArrayLike, tolerance: f
 
 
 def PolyRootsNtBst_head(coef: ArrayLike, realGuesses: ArrayLike, newtonMaxIterations: int, newtonTolerance: float, complexGuesses: ArrayLike, bairstowMaxIterations: int, bairstowTolerance: float) -> NDArray[np.complex128]:
-    """Improves roots that are known roughly: each real guess by Newton steps, of which the point with ..."""
+    """Improves approximate roots: each real guess by Newton steps, keeping the point with the smallest ..."""
 
 
 def CxPolyRoots_head(coef: ArrayLike, maxIterations: int) -> NDArray[np.complex128]:
-    """All roots of a complex polynomial in place of its coefficients, in the order in which they are ..."""
+    """Replaces the coefficients of a complex polynomial by all of its roots, in the order in which ..."""
 
 
 def PolyRoots2026_head(coef: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64]]:
-    """All roots of a real polynomial at once, each as often as its multiplicity, by rising modulus; ..."""
+    """All roots of a real polynomial, found simultaneously: each as often as its multiplicity, by ..."""
 
 
 def CxPolyRoots2026_head(coef: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64]]:
-    """As PolyRoots2026_head, for complex coefficients, without pairs. All roots of a real polynomial ..."""
+    """As PolyRoots2026_head, for complex coefficients, without pairs. All roots of a real polynomial, ..."""
 
 
 def MultPolyRoots_head(coef: ArrayLike, refine: int, tolerance: float) -> tuple[NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.int32]]:
-    """Distinct roots of a real polynomial and their multiplicities: the structure by repeated greatest ..."""
+    """Distinct roots of a real polynomial and their multiplicities."""
 
 
 def CxMultPolyRoots_head(coef: ArrayLike, refine: int, tolerance: float) -> tuple[NDArray[np.complex128], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.int32]]:
@@ -1770,15 +1774,15 @@ def CxMultPolyRoots_head(coef: ArrayLike, refine: int, tolerance: float) -> tupl
 
 
 def ppMultiRateFIRH_DBL(x: ArrayLike, state: ArrayLike, mode: int, L: int, M: int, h: ArrayLike, gain: float, reset: int, removeDelay: int, delayLeft: int, phase: int) -> tuple[NDArray[np.float64], NDArray[np.float64], int, int]:
-    """Filters a block at one of four rates, with n taps h and upsampled position t of the outputs."""
+    """Filters a block at one of four rates."""
 
 
 def ppMultiRateFIRH_SGL(x: ArrayLike, state: ArrayLike, mode: int, L: int, M: int, h: ArrayLike, gain: float, reset: int, removeDelay: int, delayLeft: int, phase: int) -> tuple[NDArray[np.float32], NDArray[np.float32], int, int]:
-    """As ppMultiRateFIRH_DBL, in single precision throughout. Filters a block at one of four rates, ..."""
+    """As ppMultiRateFIRH_DBL, in single precision throughout. Filters a block at one of four rates."""
 
 
 def ppMultiRateFIRH_CDB(x: ArrayLike, state: ArrayLike, mode: int, L: int, M: int, h: ArrayLike, gain: float, reset: int, removeDelay: int, delayLeft: int, phase: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128], int, int]:
-    """As ppMultiRateFIRH_DBL, for complex data and real taps. Filters a block at one of four rates, ..."""
+    """As ppMultiRateFIRH_DBL, for complex data and real taps. Filters a block at one of four rates."""
 
 
 def ppMultiRateFIRH_CSG(x: ArrayLike, state: ArrayLike, mode: int, L: int, M: int, h: ArrayLike, gain: float, reset: int, removeDelay: int, delayLeft: int, phase: int) -> tuple[NDArray[np.complex64], NDArray[np.complex64], int, int]:
@@ -1826,27 +1830,27 @@ def StateLevels_IDP(y: ArrayLike, t0: float, dt: float, method: int, bins: int, 
 
 
 def PulseMeasEx(y: ArrayLike, t0: float, dt: float, polarity: int, partial: int, pulseNumber: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[float, float, float, float, float, float, float]:
-    """Pulse number `pulseNumber` (from 1) whose first edge has the polarity: it lies between two ..."""
+    """Measures pulse number `pulseNumber` (from 1) among those whose first edge has the given polarity."""
 
 
 def PulseMeasEx_IDP(y: ArrayLike, t0: float, dt: float, polarity: int, partial: int, pulseNumber: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[float, float, float, float, float, float, float]:
-    """As PulseMeasEx, with its counters in the host's instance data. Pulse number `pulseNumber` (from ..."""
+    """As PulseMeasEx, with its counters in the host's instance data. Measures pulse number ..."""
 
 
 def PulseMeas(y: ArrayLike, t0: float, dt: float, polarity: int, pulseNumber: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[float, float, float, float, float, float, float]:
-    """As PulseMeasEx, of whole periods only. Pulse number `pulseNumber` (from 1) whose first edge has ..."""
+    """As PulseMeasEx, of whole periods only. Measures pulse number `pulseNumber` (from 1) among those ..."""
 
 
 def TransMeas(y: ArrayLike, t0: float, dt: float, polarity: int, number: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[dict[str, Any], float, float, float, float, float, float, float, float, float, float, float]:
-    """Transition number `number` (from 1) of this polarity between the low and the high reference: ..."""
+    """Measures transition number `number` (from 1) of the given polarity between the low and the high ..."""
 
 
 def TransMeas_IDP(y: ArrayLike, t0: float, dt: float, polarity: int, number: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[dict[str, Any], float, float, float, float, float, float, float, float, float, float, float]:
-    """As TransMeas, with its counters in the host's instance data. Transition number `number` (from 1) ..."""
+    """As TransMeas, with its counters in the host's instance data. Measures transition number `number` ..."""
 
 
 def CycleRMSAverage(y: ArrayLike, t0: float, dt: float, cycleNumber: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[dict[str, Any], float, float, float, float, float, float, float]:
-    """Mean and root mean square over cycle number `cycleNumber` (from 1), between the crossings of ..."""
+    """Mean and root mean square over cycle number `cycleNumber` (from 1), over the samples between the ..."""
 
 
 def CycleRMSAverage_IDP(y: ArrayLike, t0: float, dt: float, cycleNumber: int, ref: Mapping[str, Any], hist: Mapping[str, Any], limit: int) -> tuple[dict[str, Any], float, float, float, float, float, float, float]:
@@ -1854,11 +1858,11 @@ def CycleRMSAverage_IDP(y: ArrayLike, t0: float, dt: float, cycleNumber: int, re
 
 
 def PulseParameters(y: ArrayLike) -> tuple[float, float, float, float, float, float, float, float, float, float]:
-    """The first pulse of a waveform in units of samples: base and top, the fullest bins from below and ..."""
+    """Measures the first pulse of a waveform in units of samples: base and top, the fullest bins from ..."""
 
 
 def MeasurementUnreserveProc() -> None:
-    """Gives the counters of an _IDP node back and clears its instance-data word."""
+    """Releases the counters of an _IDP node and clears its instance-data word."""
 
 
 def measurements_create() -> None:
@@ -1890,27 +1894,27 @@ def CxRationalResampleMCh_H(x: ArrayLike, L: int, M: int, reset: int, offset: in
 
 
 def Resample_Const(x: ArrayLike, state: Mapping[str, Any], design: Mapping[str, Any], reset: int, antiAlias: int) -> tuple[dict[str, Any], NDArray[np.float64], int]:
-    """The samples of a stream at times start, start + ratio, start + 2 ratio ..."""
+    """The values of a stream at times start, start + ratio, start + 2 ratio ..."""
 
 
 def CxResample_Const(x: ArrayLike, state: Mapping[str, Any], design: Mapping[str, Any], reset: int, antiAlias: int) -> tuple[dict[str, Any], NDArray[np.complex128], int]:
-    """As Resample_Const, for complex data. The samples of a stream at times start, start + ratio, ..."""
+    """As Resample_Const, for complex data. The values of a stream at times start, start + ratio, start ..."""
 
 
 def Resample_Variable(x: ArrayLike, t: ArrayLike, design: Mapping[str, Any], lastTime: float) -> tuple[NDArray[np.float64], float, int, int]:
-    """The samples at the times of t, in input samples from x[0], as far as x reaches: the first ..."""
+    """The values at the times in t, given in input samples from x[0], as far as x extends."""
 
 
 def CxResample_Variable(x: ArrayLike, t: ArrayLike, design: Mapping[str, Any], lastTime: float) -> tuple[NDArray[np.complex128], float, int, int]:
-    """As Resample_Variable, for complex data; times are the real parts of t. The samples at the times ..."""
+    """As Resample_Variable, for complex data; times are the real parts of t. The values at the times ..."""
 
 
 def Resample_Variable_MultiCh(x: ArrayLike, t: ArrayLike, design: Mapping[str, Any], lastTime: float) -> tuple[NDArray[np.float64], NDArray[np.float64], float, int, int]:
-    """As Resample_Variable, for channels in the rows of x; the outputs go to y, a row of *outCount for ..."""
+    """As Resample_Variable, for channels in the rows of x. The values at the times in t, given in ..."""
 
 
 def CxResample_Variable_MultiCh(x: ArrayLike, t: ArrayLike, design: Mapping[str, Any], lastTime: float) -> tuple[NDArray[np.complex128], NDArray[np.float64], float, int, int]:
-    """As Resample_Variable_MultiCh, for complex data. The samples at the times of t, in input samples ..."""
+    """As Resample_Variable_MultiCh, for complex data. The values at the times in t, given in input ..."""
 
 
 def Scale(x: ArrayLike) -> tuple[NDArray[np.float64], float, float]:
@@ -1922,11 +1926,11 @@ def Scale1DCIN(x: ArrayLike) -> tuple[NDArray[np.float64], float, float]:
 
 
 def QScale(x: ArrayLike) -> tuple[NDArray[np.float64], float]:
-    """Divides x by its largest magnitude, which `scale` gives."""
+    """Divides x by its largest magnitude, which is returned in `scale`."""
 
 
 def QS1D(x: ArrayLike) -> tuple[NDArray[np.float64], float]:
-    """As QScale, for one dimension. Divides x by its largest magnitude, which `scale` gives."""
+    """As QScale, for one dimension. Divides x by its largest magnitude, which is returned in `scale`."""
 
 
 def Norm1(x: ArrayLike) -> tuple[NDArray[np.float64], float, float]:
@@ -1938,11 +1942,11 @@ def Norm2(x: ArrayLike) -> tuple[NDArray[np.float64], float, float]:
 
 
 def Line1(x: ArrayLike, a: float, b: float) -> NDArray[np.float64]:
-    """x becomes a x + b, infinite or NaN where that overflows."""
+    """Replaces x by a x + b, which is infinite or NaN where that overflows."""
 
 
 def LinEv(x: ArrayLike, a: float, b: float) -> NDArray[np.float64]:
-    """As Line1, for a matrix. x becomes a x + b, infinite or NaN where that overflows."""
+    """As Line1, for a matrix. Replaces x by a x + b, which is infinite or NaN where that overflows."""
 
 
 def unWrap(x: ArrayLike) -> NDArray[np.float64]:
@@ -1950,7 +1954,7 @@ def unWrap(x: ArrayLike) -> NDArray[np.float64]:
 
 
 def unWrap85(x: ArrayLike, mode: int) -> NDArray[np.float64]:
-    """As unWrap, in units of the caller's choice. Unwraps a phase in radians: from the second element ..."""
+    """As unWrap, with a choice of units. Unwraps a phase in radians: from the second element on, each ..."""
 
 
 def RiffleArrayDBL2012_head(x: ArrayLike, seed: int, state: Mapping[str, Any], unbiased: int) -> tuple[NDArray[np.float64], NDArray[np.int32], dict[str, Any]]:
@@ -1978,35 +1982,35 @@ def RiffleArrayInt_head(x: ArrayLike, seed: int, state: Mapping[str, Any]) -> tu
 
 
 def RiffleIntNum2012_head(count: int, seed: int, state: Mapping[str, Any], unbiased: int) -> tuple[NDArray[np.int32], dict[str, Any]]:
-    """A random order of 0 to count - 1; without bias if `unbiased` is non-zero."""
+    """A random permutation of 0 to count - 1; without bias if `unbiased` is non-zero."""
 
 
 def RiffleIntNum_head(count: int, seed: int, state: Mapping[str, Any]) -> tuple[NDArray[np.int32], dict[str, Any]]:
-    """As RiffleIntNum2012_head, biased. A random order of 0 to count - 1; without bias if `unbiased` ..."""
+    """As RiffleIntNum2012_head, biased. A random permutation of 0 to count - 1; without bias if ..."""
 
 
 def RiffleArrayDBL2026_head(x: ArrayLike, key: int, stream: int, position: float) -> tuple[NDArray[np.float64], NDArray[np.int32]]:
-    """Shuffles x without bias; the numbers by D."""
+    """Shuffles x without bias."""
 
 
 def RiffleArrayCDB2026_head(x: ArrayLike, key: int, stream: int, position: float) -> tuple[NDArray[np.complex128], NDArray[np.int32]]:
-    """As RiffleArrayDBL2026_head, for complex elements. Shuffles x without bias; the numbers by D."""
+    """As RiffleArrayDBL2026_head, for complex elements. Shuffles x without bias."""
 
 
 def RiffleArrayInt2026_head(x: ArrayLike, key: int, stream: int, position: float) -> tuple[NDArray[np.int32], NDArray[np.int32]]:
-    """As RiffleArrayDBL2026_head, for integers. Shuffles x without bias; the numbers by D."""
+    """As RiffleArrayDBL2026_head, for integers. Shuffles x without bias."""
 
 
 def RiffleIntNum2026_head(count: int, key: int, stream: int, position: float) -> NDArray[np.int32]:
-    """A random order of 0 to count - 1, as RiffleArrayDBL2026_head makes it."""
+    """A random permutation of 0 to count - 1, as RiffleArrayDBL2026_head makes it."""
 
 
 def SavitzkyGolayCoefH(order: int, frame: int, weights: ArrayLike, wantDifferentiators: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
-    """Matrices of the least-squares fit of a polynomial of this order to a frame of samples at t = ..."""
+    """The matrices of the least-squares fit of a polynomial of degree `order` to a frame of samples at ..."""
 
 
 def SavitzkyGolayFiltH(x: ArrayLike, order: int, frame: int, weights: ArrayLike) -> NDArray[np.float64]:
-    """y[i] is the value at i of the polynomial of this order that fits the `frame` samples of x around ..."""
+    """y[i] is the value at i of the polynomial of degree `order` that best fits the `frame` samples of ..."""
 
 
 def MedianFilterCIN(x: ArrayLike, rank: int) -> NDArray[np.float64]:
@@ -2014,7 +2018,7 @@ def MedianFilterCIN(x: ArrayLike, rank: int) -> NDArray[np.float64]:
 
 
 def MedianFilter81_H(x: ArrayLike, leftRank: int, rightRank: int) -> NDArray[np.float64]:
-    """Running median in place, of x[i - leftRank] to x[i + rightRank]; of an even number of values it ..."""
+    """Running median in place, of x[i - leftRank] to x[i + rightRank]."""
 
 
 def CubicSplineFit_head(x: ArrayLike, y: ArrayLike, deviations: ArrayLike, method: int, parameter: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float, float]:
@@ -2050,7 +2054,7 @@ def QX_BesselIr(order: float | ArrayLike, x: float | ArrayLike) -> float | NDArr
 
 
 def QX_BesselKn(n: int | ArrayLike, x: float | ArrayLike) -> float | NDArray[Any]:
-    """Modified Bessel function K of order |n|, upward from K_0 and K_1 by K_(k+1) = K_(k-1) + 2 k K_k ..."""
+    """Modified Bessel function K of order |n|, by upward recurrence from K_0 and K_1 by K_(k+1) = ..."""
 
 
 def QX_KelvinI(x: float | ArrayLike, n: int | ArrayLike) -> tuple[float, float]:
@@ -2094,11 +2098,11 @@ def QX_CxBesselH2r(order: float | ArrayLike, z: complex | ArrayLike, scaled: int
 
 
 def QX_CxAiryAi(z: complex | ArrayLike, scaled: int | ArrayLike) -> complex | NDArray[Any]:
-    """Airy function Ai, the solution of w'' = z w that falls along the positive axis (10.4)."""
+    """Airy function Ai, the solution of w'' = z w that decays along the positive axis (10.4)."""
 
 
 def QX_CxAiryAiP(z: complex | ArrayLike, scaled: int | ArrayLike) -> complex | NDArray[Any]:
-    """As QX_CxAiryAi, the derivative of Ai. Airy function Ai, the solution of w'' = z w that falls ..."""
+    """As QX_CxAiryAi, the derivative of Ai. Airy function Ai, the solution of w'' = z w that decays ..."""
 
 
 def QX_CxAiryBi(z: complex | ArrayLike, scaled: int | ArrayLike) -> complex | NDArray[Any]:
@@ -2114,7 +2118,7 @@ def QX_Elliptic1(m: float | ArrayLike, phi: float | ArrayLike) -> float | NDArra
 
 
 def QX_Elliptic1_85(m: float | ArrayLike, phi: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete. ..."""
+    """As QX_Elliptic1, with a selector in place of the NaN: 1 complete, otherwise incomplete. Elliptic ..."""
 
 
 def QX_Elliptic1_2026(m: float | ArrayLike, phi: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
@@ -2126,7 +2130,7 @@ def QX_Elliptic2(m: float | ArrayLike, phi: float | ArrayLike) -> float | NDArra
 
 
 def QX_Elliptic2_85(m: float | ArrayLike, phi: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Elliptic2, with a selector for what a NaN says there: 1 complete, otherwise incomplete. ..."""
+    """As QX_Elliptic2, with a selector in place of the NaN: 1 complete, otherwise incomplete. Elliptic ..."""
 
 
 def QX_EllipticJ(u: float | ArrayLike, m: float | ArrayLike) -> tuple[float, float, float, float]:
@@ -2138,7 +2142,7 @@ def QX_Beta(a: float | ArrayLike, b: float | ArrayLike, x: float | ArrayLike) ->
 
 
 def QX_Beta_85(a: float | ArrayLike, b: float | ArrayLike, x: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Beta, with a selector for what a NaN says there: 1 complete, otherwise I_x(a, b). Beta ..."""
+    """As QX_Beta, with a selector in place of the NaN: 1 complete, otherwise I_x(a, b). Beta function."""
 
 
 def QX_Fact(n: int | ArrayLike) -> float | NDArray[Any]:
@@ -2154,7 +2158,7 @@ def QX_Gamma(a: float | ArrayLike, x: float | ArrayLike) -> float | NDArray[Any]
 
 
 def QX_Gamma_85(a: float | ArrayLike, x: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Gamma, with a selector for what a NaN says there: 1 complete, otherwise P(a, x). Gamma ..."""
+    """As QX_Gamma, with a selector in place of the NaN: 1 complete, otherwise P(a, x). Gamma function."""
 
 
 def QX_GammaC(a: float | ArrayLike, x: float | ArrayLike) -> float | NDArray[Any]:
@@ -2182,11 +2186,11 @@ def QX_Gauss(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike, c
 
 
 def QX_Gauss_2011(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike, c: float | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Gauss, with Pfaff's transformation for all x < 0.2, where its argument lies in [-0.25, ..."""
+    """As QX_Gauss, with Pfaff's transformation for all x < 0.2, where its argument is in [-0.25, 0.5]. ..."""
 
 
 def QX_Gauss_2026(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike, c: float | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Gauss_2011, for all x <= 1 and region by region. Gauss's hypergeometric function F(a, b; ..."""
+    """As QX_Gauss_2011, for all x <= 1 and with a method for each region. Gauss's hypergeometric ..."""
 
 
 def QX_Kummer(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
@@ -2194,7 +2198,7 @@ def QX_Kummer(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) 
 
 
 def QX_Kummer_2026(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Kummer, region by region: for |x| >= 30 both sums of the asymptotic form where their ..."""
+    """As QX_Kummer, with a method for each region: for |x| >= 30 both sums of the asymptotic form if ..."""
 
 
 def QX_Tricomi(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
@@ -2202,7 +2206,7 @@ def QX_Tricomi(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike)
 
 
 def QX_Tricomi_2026(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Tricomi, region by region: the asymptotic sum where its smallest term is below 9e-15; for ..."""
+    """As QX_Tricomi, with a method for each region: the asymptotic sum where its smallest term is ..."""
 
 
 def QX_Erf(x: float | ArrayLike) -> float | NDArray[Any]:
@@ -2218,7 +2222,7 @@ def QX_ExpI(x: float | ArrayLike, n: int | ArrayLike) -> float | NDArray[Any]:
 
 
 def QX_ExpI_2026(x: float | ArrayLike, n: int | ArrayLike) -> float | NDArray[Any]:
-    """As QX_ExpI, with E_1 by rational functions of own coefficients on four intervals, broken at 0.4, ..."""
+    """As QX_ExpI, with E_1 by rational functions on four intervals, divided at 0.4, 2 and 10, with an ..."""
 
 
 def QX_SinI(x: float | ArrayLike) -> float | NDArray[Any]:
@@ -2250,11 +2254,11 @@ def QX_FresnelIntegrals(x: float | ArrayLike) -> tuple[float, float]:
 
 
 def SpecialMatrix_head(kind: int, size: int, x: ArrayLike, y: ArrayLike) -> NDArray[np.float64]:
-    """A matrix of a kind."""
+    """Creates a matrix of a named kind."""
 
 
 def CxSpecialMatrix_head(kind: int, size: int, x: ArrayLike, y: ArrayLike) -> NDArray[np.complex128]:
-    """As SpecialMatrix_head, for complex data. A matrix of a kind."""
+    """As SpecialMatrix_head, for complex data. Creates a matrix of a named kind."""
 
 
 def OuterProd_head(x: ArrayLike, y: ArrayLike) -> NDArray[np.float64]:
@@ -2274,11 +2278,11 @@ def CxKroneckerProd_H(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
 
 
 def Compact_to_Matrix_head(a: Mapping[str, Any]) -> NDArray[np.float64]:
-    """A packed triangle as a full square matrix: of triangle 0 and 1 the other triangle is 0, of 2 it ..."""
+    """Unpacks a packed triangle into a full square matrix."""
 
 
 def CxCompact_to_Matrix_head(a: Mapping[str, Any]) -> NDArray[np.complex128]:
-    """As Compact_to_Matrix_head, for complex data; the mirror image is not conjugated. A packed ..."""
+    """As Compact_to_Matrix_head, for complex data; the mirror image is not conjugated. Unpacks a ..."""
 
 
 def Matrix_to_Compact_head(a: ArrayLike, triangle: int) -> NDArray[np.float64]:
@@ -2290,11 +2294,11 @@ def CxMatrix_to_Compact_head(a: ArrayLike, triangle: int) -> NDArray[np.complex1
 
 
 def CompactToMatrix_H(packed: ArrayLike) -> NDArray[np.float64]:
-    """Packed storage of a symmetric matrix, as fits give it, as a full square matrix."""
+    """Unpacks a symmetric matrix in packed storage, as returned by fits, into a full square matrix."""
 
 
 def MatrixToCompact_H(a: ArrayLike) -> NDArray[np.float64]:
-    """The lower triangle of a square matrix in packed storage, as fits take it."""
+    """Packs the lower triangle of a square matrix, as fits expect it."""
 
 
 def Transpose_head(a: ArrayLike) -> NDArray[np.float64]:
@@ -2306,11 +2310,11 @@ def CxTranspose_head(a: ArrayLike) -> NDArray[np.complex128]:
 
 
 def InitialMatrixH(rows: int, cols: int) -> NDArray[np.float64]:
-    """A matrix of zeros."""
+    """Creates a matrix of zeros."""
 
 
 def CxInitialMatrixH(rows: int, cols: int) -> NDArray[np.complex128]:
-    """As InitialMatrixH, for complex data. A matrix of zeros."""
+    """As InitialMatrixH, for complex data. Creates a matrix of zeros."""
 
 
 def CreateMatrixFromEVs_head(values: ArrayLike) -> NDArray[np.float64]:
@@ -2326,23 +2330,23 @@ def CxAutoCorrMtrxH(x: ArrayLike, y: ArrayLike, maxLag: int, normalization: int)
 
 
 def MultipleToneMeasurements(y: ArrayLike, dt: float, count: int, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
-    """The `count` largest tones of y, or fewer."""
+    """Finds up to `count` largest tones of y, with their frequencies, amplitudes and phases."""
 
 
 def SingleToneMeasurement(y: ArrayLike, dt: float, centre: float, halfWidth: float) -> tuple[float, float, float, float, float]:
-    """The largest tone whose frequency is within halfWidth of `centre`; where halfWidth is not above ..."""
+    """Measures the largest tone whose frequency is within halfWidth of `centre`; if halfWidth is not ..."""
 
 
 def HarmonicAnalysis(y: ArrayLike, dt: float, fundamental: float, highestHarmonic: int, fullScale: float) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float, float, float, float, float, float]:
-    """A tone, its harmonics and what is left, by the definitions of IEEE Std 1241-2010 and 1057-2017."""
+    """Measures a tone, its harmonics and the residual, by the definitions of IEEE Std 1241-2010 and ..."""
 
 
 def Triggerh_86(y: ArrayLike, level: float, hysteresis: float, slope: int, start: int, holdoff: int, state: Mapping[str, Any]) -> tuple[dict[str, Any], int, float]:
-    """The next trigger in a block of a stream, from sample `start` on."""
+    """Finds the next trigger in a block of a stream, from sample `start` on."""
 
 
 def Triggerh(y: ArrayLike, level: float, slope: int, start: int) -> tuple[int, float]:
-    """As Triggerh_86, with hysteresis 0, holdoff 0 and a state of zeros. The next trigger in a block ..."""
+    """As Triggerh_86, with hysteresis 0, holdoff 0 and a state of zeros. Finds the next trigger in a ..."""
 
 
 def SineWaveCIN(n: int, amp: float, f: float, phase: float) -> tuple[NDArray[np.float64], float]:
@@ -2350,7 +2354,7 @@ def SineWaveCIN(n: int, amp: float, f: float, phase: float) -> tuple[NDArray[np.
 
 
 def SquareWaveCIN(n: int, amp: float, f: float, phase: float, duty: float) -> tuple[NDArray[np.float64], float]:
-    """Square wave: amp while p is below 3.6 duty, else -amp; duty in per cent, clamped to 0 to 100."""
+    """Square wave: amp while p is below 3.6 duty, else -amp; duty is in per cent, clamped to 0 to 100."""
 
 
 def TriangleWaveCIN(n: int, amp: float, f: float, phase: float) -> tuple[NDArray[np.float64], float]:
@@ -2362,15 +2366,15 @@ def SawtoothWaveCIN(n: int, amp: float, f: float, phase: float) -> tuple[NDArray
 
 
 def ArbitraryWaveCIN(n: int, amp: float, f: float, phase: float, table: ArrayLike, interpolate: int) -> tuple[NDArray[np.float64], float]:
-    """A wave whose period stands in a table, times amp: the value before the phase, or interpolated ..."""
+    """A wave whose period is given by a table, multiplied by amp: the table value at or before the ..."""
 
 
 def ChirpCIN(n: int, amp: float, f1: float, f2: float) -> NDArray[np.float64]:
-    """Linear chirp amp sin(i ((f2 - f1) pi/n i + 2 pi f1)): the frequency goes from f1 at the first ..."""
+    """Linear chirp amp sin(i ((f2 - f1) pi/n i + 2 pi f1)): the frequency changes from f1 at the first ..."""
 
 
 def SinePtrn(n: int, amp: float, phase: float, cycles: float) -> NDArray[np.float64]:
-    """`cycles` periods of a sine over the array, which need not be whole, from the phase in degrees; ..."""
+    """`cycles` periods (not necessarily an integer) of a sine over the array, starting at the phase in ..."""
 
 
 def Square(n: int, amp: float, duty: float, cycles: float) -> NDArray[np.float64]:
@@ -2378,11 +2382,11 @@ def Square(n: int, amp: float, duty: float, cycles: float) -> NDArray[np.float64
 
 
 def PulsePtrn(n: int, amp: float, delay: int, width: int) -> NDArray[np.float64]:
-    """`width` samples of amp from sample `delay` on, the others 0."""
+    """A rectangular pulse: `width` samples of amp from sample `delay` on, the others 0."""
 
 
 def ImpulsePtrn(n: int, amp: float, delay: int) -> NDArray[np.float64]:
-    """One sample of amp at `delay`, the others 0."""
+    """An impulse: sample `delay` is amp, the others are 0."""
 
 
 def SincWave(n: int, amp: float, delay: float, dt: float) -> NDArray[np.float64]:
@@ -2394,11 +2398,11 @@ def RampPtrn(n: int, start: float, end: float) -> NDArray[np.float64]:
 
 
 def RampPtrn80(n: int, start: float, end: float, excludeEnd: int) -> NDArray[np.float64]:
-    """A straight line from start to end; with `excludeEnd` non-zero the end would be sample n."""
+    """A straight line from start to end; if `excludeEnd` is non-zero, end would be reached at sample n."""
 
 
 def RampPtrn85(n: int, start: float, end: float, excludeEnd: int, scale: int) -> NDArray[np.float64]:
-    """As RampPtrn80, on a scale. A straight line from start to end; with `excludeEnd` non-zero the end ..."""
+    """As RampPtrn80, with a choice of scale. A straight line from start to end; if `excludeEnd` is ..."""
 
 
 def GaussPulseH(x: ArrayLike, n: int, amp: float, delay: float, dt: float, fc: float, bandwidth: float, dBReference: float) -> NDArray[np.float64]:
@@ -2410,7 +2414,7 @@ def GaussMonopulseH(x: ArrayLike, n: int, dt: float, delay: float, fc: float, am
 
 
 def AperiodTriangleH(x: ArrayLike, n: int, amp: float, delay: float, dt: float, width: float, skew: float) -> NDArray[np.float64]:
-    """As GaussPulseH, one triangle of the given width with its peak of amp at skew width. Gaussian ..."""
+    """As GaussPulseH, a single triangle of the given width, with its peak of amp at skew width from ..."""
 
 
 def PeriodicSincH(x: ArrayLike, n: int, amp: float, order: int, dt: float, delay: float) -> NDArray[np.float64]:
@@ -2426,7 +2430,7 @@ def FreqMod(n: int, dt: float, fc: float, y: ArrayLike, peak: float, phase: floa
 
 
 def NumWinConstH(window: ArrayLike) -> dict[str, Any]:
-    """The constants of the window held in an array, measured in one pass."""
+    """The constants of a window given as an array, computed in one pass."""
 
 
 def WinConstByNameH(n: int, selector: int, param: float) -> dict[str, Any]:
@@ -2434,7 +2438,7 @@ def WinConstByNameH(n: int, selector: int, param: float) -> dict[str, Any]:
 
 
 def WinConstByNameH_2016(n: int, selector: int, param: float) -> dict[str, Any]:
-    """As WinConstByNameH, with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62 ..."""
+    """As WinConstByNameH, with the parameter as in AllWinH: NaN, for selectors 61 and 62 also a ..."""
 
 
 def KaiserH(x: ArrayLike, beta: float) -> NDArray[np.float64]:
@@ -2518,7 +2522,7 @@ def CxBohmanWinH(x: ArrayLike) -> NDArray[np.complex128]:
 
 
 def ParzenWinH(x: ArrayLike) -> NDArray[np.float64]:
-    """Parzen window: with t = |i - n/2| / (n/2), 1 - 6 t^2 + 6 t^3 for t up to 1/2, 2 (1 - t)^3 beyond."""
+    """Parzen window: with t = |i - n/2| / (n/2), 1 - 6 t^2 + 6 t^3 for t up to 1/2, and 2 (1 - t)^3 above."""
 
 
 def CxParzenWinH(x: ArrayLike) -> NDArray[np.complex128]:
@@ -2542,11 +2546,11 @@ def ScaledCxGenCosWinH(x: ArrayLike, coefs: ArrayLike) -> NDArray[np.complex128]
 
 
 def AllCosWinH(x: ArrayLike, selector: int, scaled: int) -> NDArray[np.float64]:
-    """The cosine sums; divided by the coherent gain if `scaled` is non-zero."""
+    """The windows that are cosine sums; divided by the coherent gain if `scaled` is non-zero."""
 
 
 def CxAllCosWinH(x: ArrayLike, selector: int, scaled: int) -> NDArray[np.complex128]:
-    """As AllCosWinH, for complex samples. The cosine sums; divided by the coherent gain if `scaled` is ..."""
+    """As AllCosWinH, for complex samples. The windows that are cosine sums; divided by the coherent ..."""
 
 
 def SymmWinH(x: ArrayLike, selector: int, param: float) -> NDArray[np.float64]:
@@ -2594,8 +2598,8 @@ def CosTapered(x: ArrayLike) -> NDArray[np.float64]:
 
 
 def zeroPhaseFiltH(x: ArrayLike, a: ArrayLike, b: ArrayLike, xStateForward: ArrayLike, xStateBackward: ArrayLike, yStateForward: ArrayLike, yStateBackward: ArrayLike, keepState: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """Filters x in place by a filter in direct form, as of IIR_Filter; without a it is an FIR filter, ..."""
+    """Filters x in place by the filter with the coefficients a and b in direct form, as in IIR_Filter."""
 
 
 def zeroPhaseCascadeFiltH(x: ArrayLike, form: int, a: ArrayLike, b: ArrayLike, stateForward: ArrayLike, stateBackward: ArrayLike, keepState: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
-    """Filters x in place by a cascade."""
+    """Filters x in place by a cascade with the coefficients a and b."""

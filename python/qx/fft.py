@@ -4,8 +4,8 @@ The transform of :math:`x_0, \ldots, x_{n-1}` is
 
 .. math:: X_k = \sum_{j=0}^{n-1} x_j e^{-2\pi i j k / n}.
 
-Names, order of arguments, defaults and scaling are those of `numpy.fft` and `scipy.fft`. Plans are kept
-behind the scenes for each length and thread.
+Names, order of arguments, defaults and scaling are those of `numpy.fft` and `scipy.fft`. Plans are cached
+for each length and thread.
 """
 
 from __future__ import annotations
@@ -24,13 +24,13 @@ __all__ = ["czt", "dct", "dst", "dzt", "fft", "fft2", "fftfreq", "fftshift", "ha
 
 core = served("fft")
 
-# The factor of a forward transform; an inverse one has that of the opposite word.
+# The factor of a forward transform; an inverse transform takes the factor of the opposite word.
 NORMS = {"backward": lambda n: 1.0, "ortho": lambda n: n**-0.5, "forward": lambda n: 1 / n}
 OPPOSITE = {"backward": "forward", "ortho": "ortho", "forward": "backward"}
 
 
 def _scaled(spectrum: Any, function: Any, norm: Any, n: Any, axis: Any, forward: Any = True) -> Any:
-    """A transform as the exports scale it (only the inverse, by 1 / n) with another norm."""
+    """Rescales a transform to another norm. The exports scale only the inverse transform, by 1 / n."""
     factor = chosen(function, "norm", norm, NORMS)(n) if forward else \
         chosen(function, "norm", OPPOSITE.get(norm, norm), NORMS)(n) * n
     return spectrum * factor
@@ -46,7 +46,7 @@ def _length(function: Any, n: Any, x: Any, axis: Any) -> int:
 
 
 def _fitted(channel: Any, n: Any) -> Any:
-    """The first n values, with zeros behind where there are fewer."""
+    """The first n values, zero-padded where there are fewer."""
     if len(channel) >= n:
         return channel[:n]
     return np.concatenate([channel, np.zeros(n - len(channel), channel.dtype)])
@@ -61,8 +61,8 @@ def fft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     x : array_like
         Real or complex values.
     n : int, optional
-        Length of the transform: more than there are values means zeros behind them, fewer the first
-        ones. All values by default.
+        Length of the transform. Longer input is cut off, shorter input is zero-padded. By default, the
+        number of values.
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho", "forward"}
@@ -76,7 +76,7 @@ def fft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -101,7 +101,7 @@ def ifft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     x : array_like
         A spectrum, as `fft` returns it.
     n : int, optional
-        Length of the transform; all values by default.
+        Length of the transform; the number of values by default.
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho", "forward"}
@@ -114,7 +114,7 @@ def ifft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -129,7 +129,7 @@ def ifft(x: ArrayLike, n: int | None = None, axis: int = LAST,
                    axis, False)
 
 
-LONG = 1 << 15  # from here on a spectrum in half-complex form, of half the memory, is faster
+LONG = 1 << 15  # from this length on, a spectrum in half-complex form, which takes half the memory, is faster
 
 
 def _half(channel: Any) -> Any:
@@ -145,14 +145,14 @@ def _half(channel: Any) -> Any:
 
 def rfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
          norm: Literal["backward", "ortho", "forward"] = "backward") -> NDArray[np.complex128]:
-    r"""The Fourier transform of real values, at the frequencies that are not negative.
+    r"""The Fourier transform of real values, at the non-negative frequencies.
 
     Parameters
     ----------
     x : array_like
         Real values.
     n : int, optional
-        Length of the transform, as of `fft`.
+        Length of the transform, as for `fft`.
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho", "forward"}
@@ -168,7 +168,7 @@ def rfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     TypeError
         If x is complex.
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -192,10 +192,10 @@ def irfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Parameters
     ----------
     x : array_like
-        The spectrum at the frequencies that are not negative. Of zero and the highest one only the
-        real part counts where n is even.
+        The spectrum at the non-negative frequencies. For even n, only the real part is used at zero
+        and at the highest frequency.
     n : int, optional
-        How many values to return; twice as many as x has, less 2, by default.
+        Number of values to return; by default, 2 less than twice the length of x.
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho", "forward"}
@@ -208,7 +208,7 @@ def irfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If n is below 1 or norm is none of its words.
+        If n is below 1 or norm is not a valid choice.
 
     Examples
     --------
@@ -289,7 +289,7 @@ def ifft2(x: ArrayLike) -> NDArray[np.complex128]:
 
 def _matrices(function: Any, transform: Any, x: Any) -> Any:
     if x.ndim < 2:
-        refuse(function, "x", f"two dimensions are needed; {x.ndim} came", "ErrSizesDisagree")
+        refuse(function, "x", f"two dimensions are needed; got {x.ndim}", "ErrSizesDisagree")
     if x.ndim == 2:
         return transform(x)
     return np.stack([transform(one) for one in x.reshape(-1, *x.shape[-2:])]).reshape(x.shape)
@@ -373,7 +373,7 @@ def fftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
     >>> qx.fft.fftshift([0, 1, 2, -2, -1])
     array([-2, -1,  0,  1,  2])
     """
-    count_of(x, axis)  # refuses what has no such axis
+    count_of(x, axis)  # refuses an axis that x does not have
     return np.fft.fftshift(x, axis)
 
 
@@ -397,14 +397,14 @@ def ifftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
     >>> qx.fft.ifftshift([-2, -1, 0, 1, 2])
     array([ 0,  1,  2, -2, -1])
     """
-    count_of(x, axis)  # refuses what has no such axis
+    count_of(x, axis)  # refuses an axis that x does not have
     return np.fft.ifftshift(x, axis)
 
 
-# Cosine and sine transforms: the exports have the orthonormal cosine and the plain sine sums.
+# Cosine and sine transforms: the exports compute the orthonormal cosine transform and the plain sine sums.
 
 def _unscale(found: Any, n: Any, axis: Any, inverse: Any) -> Any:
-    """The orthonormal type II with the factors of norm "backward", or what type III is given."""
+    """Converts the orthonormal type II to the norm "backward", or with inverse the input of type III back."""
     factors = np.full(n, (2 * n) ** (-0.5 if inverse else 0.5))
     factors[0] *= 2**-0.5 if inverse else 2**0.5
     return found * factors
@@ -421,13 +421,12 @@ def dct(x: ArrayLike, n: int | None = None, axis: int = LAST,
     x : array_like
         Real values.
     n : int, optional
-        Length of the transform: more than there are values means zeros behind them, fewer the first
-        ones.
+        Length of the transform. Longer input is cut off, shorter input is zero-padded.
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho"}
-        "ortho" has the factor :math:`\sqrt{1/(2n)}`, and :math:`\sqrt{1/(4n)}` for k = 0: the
-        transform is a rotation then.
+        "ortho" multiplies by :math:`\sqrt{1/(2n)}`, and by :math:`\sqrt{1/(4n)}` for k = 0, which makes
+        the transform orthogonal.
 
     Returns
     -------
@@ -436,7 +435,7 @@ def dct(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -464,7 +463,7 @@ def idct(x: ArrayLike, n: int | None = None, axis: int = LAST,
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho"}
-        As it was of `dct`.
+        The norm that was passed to `dct`.
 
     Returns
     -------
@@ -473,7 +472,7 @@ def idct(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -502,11 +501,11 @@ def dst(x: ArrayLike, n: int | None = None, axis: int = LAST,
     x : array_like
         Real values.
     n : int, optional
-        Length of the transform, as of `dct`.
+        Length of the transform, as for `dct`.
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho"}
-        "ortho" has the factor :math:`1/\sqrt{2(n+1)}`: the transform is its own inverse then.
+        "ortho" multiplies by :math:`1/\sqrt{2(n+1)}`, which makes the transform its own inverse.
 
     Returns
     -------
@@ -515,7 +514,7 @@ def dst(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -541,7 +540,7 @@ def idst(x: ArrayLike, n: int | None = None, axis: int = LAST,
     axis : int
         The axis along which to transform.
     norm : {"backward", "ortho"}
-        As it was of `dst`.
+        The norm that was passed to `dst`.
 
     Returns
     -------
@@ -550,7 +549,7 @@ def idst(x: ArrayLike, n: int | None = None, axis: int = LAST,
     Raises
     ------
     ValueError
-        If x is empty, n is below 1 or norm is none of its words.
+        If x is empty, n is below 1, or norm is not a valid choice.
 
     Examples
     --------
@@ -624,9 +623,9 @@ def ihartley(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
 
 
 def hilbert(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
-    """The Hilbert transform of real values: a cosine becomes a sine, a mean becomes 0.
+    """The Hilbert transform of real values: a cosine becomes a sine, and the mean is removed.
 
-    The imaginary part of the analytic signal; `qx.spectra.analytic` returns that itself.
+    This is the imaginary part of the analytic signal, which `qx.spectra.analytic` returns as a whole.
 
     Parameters
     ----------
@@ -682,8 +681,8 @@ def ihilbert(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
 
 
 def half_complex(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
-    r"""The spectrum of real values in as many real numbers: :math:`\mathrm{Re}\,X_k` at k and
-    :math:`\mathrm{Im}\,X_k` at n - k.
+    r"""The spectrum of n real values, packed in n real numbers: :math:`\mathrm{Re}\,X_k` at index k and
+    :math:`\mathrm{Im}\,X_k` at index n - k.
 
     Parameters
     ----------
@@ -742,7 +741,7 @@ def ihalf_complex(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
 
 def czt(x: ArrayLike, m: int | None = None, w: complex | None = None, a: complex = 1.0,
         axis: int = LAST) -> NDArray[np.complex128]:
-    r"""The chirp-Z transform: the z-transform at m points of a spiral.
+    r"""The chirp-Z transform: the z-transform at m points on a spiral.
 
     .. math:: X_k = \sum_j x_j\, a^{-j} w^{jk}
 
@@ -751,9 +750,9 @@ def czt(x: ArrayLike, m: int | None = None, w: complex | None = None, a: complex
     x : array_like
         Real or complex values.
     m : int, optional
-        How many points; as many as there are values by default.
+        Number of points; the number of values by default.
     w : complex, optional
-        The ratio between points; :math:`e^{-2\pi i/m}` by default.
+        The ratio between successive points; :math:`e^{-2\pi i/m}` by default.
     a : complex
         The first point.
     axis : int
@@ -781,18 +780,18 @@ def czt(x: ArrayLike, m: int | None = None, w: complex | None = None, a: complex
 
 
 def iczt(x: ArrayLike, w: complex | None = None, a: complex = 1.0, axis: int = LAST) -> NDArray[np.complex128]:
-    r"""The inverse of `czt`: the values whose transform at as many points is x.
+    r"""The inverse of `czt`: the values whose transform at the same number of points is x.
 
-    Away from the whole circle the error grows exponentially with the length.
+    Unless the points cover the whole unit circle, the error grows exponentially with the length.
 
     Parameters
     ----------
     x : array_like
         A chirp-Z transform.
     w : complex, optional
-        As of `czt`.
+        The ratio between successive points, as for `czt`.
     a : complex
-        As of `czt`.
+        The first point, as for `czt`.
     axis : int
         The axis along which to transform.
 
@@ -817,22 +816,23 @@ def iczt(x: ArrayLike, w: complex | None = None, a: complex = 1.0, axis: int = L
 
 
 def dzt(x: ArrayLike, start: int, size: int, n: int | None = None, axis: int = LAST) -> NDArray[np.complex128]:
-    r"""Some neighbouring bins of a long transform, without the others (dilated Z transform).
+    r"""A range of neighbouring bins of a long transform, without the others (dilated Z transform).
 
     .. math:: X_k = \sum_j x_j\, e^{-2\pi i j k / n}, \quad k = \text{start} \ldots \text{start} + \text{size} - 1
 
-    It is made of transforms whose length is a divisor of n, and so gains nothing where n is prime.
+    The bins are computed from transforms whose length divides n, so nothing is gained where n is prime.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     start : int
-        The first bin, cyclic: -1 is the last one.
+        The first bin, counted cyclically: -1 is the last one.
     size : int
-        How many bins.
+        Number of bins.
     n : int, optional
-        The length of the transform; the values are cut or filled with zeros. As many as there are by default.
+        Length of the transform; the values are cut off or zero-padded to it. The number of values by
+        default.
     axis : int
         The axis along which to transform.
 
@@ -858,14 +858,14 @@ def dzt(x: ArrayLike, start: int, size: int, n: int | None = None, axis: int = L
     pieces = _pieces(length, count)
 
     def of(export: Any) -> Any:
-        # The export folds what is longer and works in place.
+        # The export folds longer input and works in place.
         return lambda channel: export(channel[:length], pieces, length // pieces, first, count)[1]
 
     return either(of(core.dzt), of(core.dzt_complex), x, axis)
 
 
 def _pieces(length: int, count: int) -> int:
-    """Into how many transforms it is least work to cut one of which `count` bins are wanted."""
+    """The number of shorter transforms that gives `count` bins of a long one with the least work."""
     divisors = [one for small in range(1, math.isqrt(length) + 1) if length % small == 0
                 for one in (small, length // small)]
     return min(divisors, key=lambda pieces: length * math.log2(2 * length / pieces) + 4 * count * pieces)
@@ -873,7 +873,7 @@ def _pieces(length: int, count: int) -> int:
 
 def zoom(x: ArrayLike, band: tuple[float, float], m: int | None = None, fs: float = 1.0,
          axis: int = LAST) -> NDArray[np.complex128]:
-    r"""The spectrum at m frequencies of a band, evenly spaced, the end excluded.
+    r"""The spectrum at m evenly spaced frequencies of a band, whose end is excluded.
 
     Parameters
     ----------
@@ -882,7 +882,7 @@ def zoom(x: ArrayLike, band: tuple[float, float], m: int | None = None, fs: floa
     band : (float, float)
         The first frequency and the end, in the unit of fs.
     m : int, optional
-        How many frequencies; as many as there are values by default.
+        Number of frequencies; the number of values by default.
     fs : float
         The sampling rate.
     axis : int
@@ -906,7 +906,7 @@ def zoom(x: ArrayLike, band: tuple[float, float], m: int | None = None, fs: floa
     60
     """
     if np.shape(band) != (2,):
-        refuse("fft.zoom", "band", f"two frequencies are needed; {band!r} came", "ErrSizesDisagree")
+        refuse("fft.zoom", "band", f"two frequencies are needed; got {band!r}", "ErrSizesDisagree")
     m = count_of(x, axis) if m is None else whole_number("fft.zoom", "m", m, 1)
     fs = positive("fft.zoom", "fs", fs, "ErrSamplingNotPositive")
     first, end = (float(edge) / fs for edge in band)

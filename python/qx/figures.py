@@ -1,5 +1,5 @@
-"""What a plot shows, apart from how it is drawn: pages draw it with dygraphs (pages.py), files and pages
-without dygraphs with matplotlib (drawing.py)."""
+"""The contents of plots, independent of how they are drawn: pages draw them with dygraphs (pages.py), files and
+pages without dygraphs with matplotlib (drawing.py)."""
 
 import base64
 import dataclasses
@@ -7,8 +7,8 @@ import io
 
 import numpy as np
 
-BLUE, WARM, GREY = "blue", "warm", "grey"  # of the page's style, light or dark
-MOST_POINTS = 1 << 15  # of a curve in a page; longer ones are there as lowest and highest values
+BLUE, WARM, GREY = "blue", "warm", "grey"  # colours of the page's style, light or dark
+MOST_POINTS = 1 << 15  # points of a curve in a page; longer curves are reduced to lowest and highest values
 
 
 @dataclasses.dataclass
@@ -16,8 +16,8 @@ class Curve:
     name: str
     values: np.ndarray
     colour: str = BLUE
-    highs: "np.ndarray | None" = None  # where the values are the lowest of blocks: the highest ones
-    dots: bool = False  # points, no line
+    highs: "np.ndarray | None" = None  # the highest values of blocks, if the values are the lowest ones
+    dots: bool = False  # points instead of a line
 
 
 @dataclasses.dataclass
@@ -30,18 +30,18 @@ class Mark:
 
 @dataclasses.dataclass
 class Image:
-    """Values over x and y in colours, from 0 to 255; the first row is the lowest."""
+    """Values over x and y, from 0 to 255, shown as colours; the first row is the lowest."""
     values: np.ndarray
     left: float
     right: float
     bottom: float
     top: float
-    label: str  # of the colours: quantity, and what the darkest and the brightest are
+    label: str  # label of the colours: the quantity, and the values of the darkest and the brightest
 
 
 @dataclasses.dataclass
 class Plot:
-    """Curves over one axis: of even steps, or of the places x."""
+    """Curves over a common axis, with even steps or at the abscissae x."""
     title: str
     x_label: str
     y_label: str
@@ -53,10 +53,10 @@ class Plot:
     levels: list = dataclasses.field(default_factory=list)  # pairs of a y and a label
     verticals: list = dataclasses.field(default_factory=list)  # pairs of an x and a label
     y_range: "tuple | None" = None
-    x_range: "tuple | None" = None  # shown at first
-    link: str = ""  # plots of one link have one x axis
+    x_range: "tuple | None" = None  # the range shown initially
+    link: str = ""  # plots with the same link share their x axis
     bars: bool = False
-    may_be_log: bool = False  # the x axis, where the reader asks for it
+    may_be_log: bool = False  # whether the reader can make the x axis logarithmic
     image: "Image | None" = None
 
     def places(self):
@@ -64,14 +64,14 @@ class Plot:
 
 
 def extremes(values, group, highs=None):
-    """The lowest and the highest of every `group` values, the last group perhaps shorter."""
+    """The lowest and the highest of every `group` values; the last group may be shorter."""
     starts = np.arange(0, len(values), group)
     return (np.fmin.reduceat(values, starts),
             np.fmax.reduceat(values if highs is None else highs, starts))
 
 
 def reduced(plot, most=MOST_POINTS):
-    """The plot with no more than `most` points in a curve; nothing that stands out is lost."""
+    """The plot with at most `most` points in a curve, without losing extremes."""
     longest = max((len(curve.values) for curve in plot.curves), default=0)
     if longest <= most:
         return plot
@@ -85,7 +85,7 @@ def reduced(plot, most=MOST_POINTS):
 
 
 def numbers(values):
-    """An array as text, each number to seven digits of the largest distance from the middle."""
+    """An array as text, each number with an accuracy of seven digits of the largest distance from the middle."""
     values = np.asarray(values, float)
     finite = values[np.isfinite(values)]
     middle = float(finite.min() / 2 + finite.max() / 2) if len(finite) else 0.0
@@ -113,7 +113,7 @@ def png(values):
 
 
 def described(plot, most=MOST_POINTS):
-    """The plot as a page takes it: numbers, texts, lists and dictionaries."""
+    """The plot in the form that a page takes: numbers, texts, lists and dictionaries."""
     plot = reduced(plot, most)
     found = {name: getattr(plot, name) for name in ("title", "x_label", "y_label", "start", "step", "link", "bars",
                                                     "may_be_log", "y_range", "x_range", "levels",

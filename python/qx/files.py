@@ -1,4 +1,4 @@
-"""What a file is, by its first bytes, and its contents: compressed, from a pipe, or as they are."""
+"""The kind of a file, by its first bytes, and its contents, which may be compressed or come from a pipe."""
 
 import bz2
 import contextlib
@@ -17,10 +17,10 @@ UNPACKING = {b"\x1f\x8b": gzip.open, b"BZh": bz2.open, b"\xfd7zXZ\0": lzma.open}
 ZSTD = b"\x28\xb5\x2f\xfd"
 COMPRESSED = (".gz", ".bz2", ".xz", ".zst", ".zip")
 
-# What begins so is read by stored.py ...
+# Files that begin like this are read by stored.py ...
 ARRAYS = ((b"\x93NUMPY", "npy"), (b"\x89HDF\r\n\x1a\n", "hdf5"), (b"PAR1", "parquet"),
           (b"\xffBIOSEMI", "bdf"), (b"\xd0\xcf\x11\xe0\xa1\xb1\x1a\xe1", "xls"))
-# ... and what begins so by nobody here.
+# ... and files that begin like this are not supported.
 FOREIGN = (
     (rb"%PDF-", "a PDF document"), (rb"\s*<(?:!doctype html|html)", "an HTML page"),
     (rb"\s*<\?xml", "an XML document"), (rb"\{\\rtf", "an RTF document"),
@@ -35,7 +35,7 @@ FOREIGN = (
     (rb"\x0e\x03\x13\x01", "an HDF4 file"), (rb"MDF     |UnFinMF ", "an MDF recording"),
     (rb"GDF [12]", "a GDF recording"), (rb"ABF2?[ \0]", "an ABF recording"),
     (rb"\x80[\x02-\x05]", "a Python pickle"))
-# Their first bytes a text may have as well, but no byte 0.
+# A text may begin with the same bytes, but it has no byte 0.
 BINARY = {"an ORC table", "an MP4 video or sound", "an ABF recording", "an Arrow (Feather) table",
           "an MDF recording"}
 
@@ -44,26 +44,26 @@ CONTROL = re.compile("[\x00-\x1f\x7f-\x9f\u061c\u200e\u200f\u2028-\u202e\u2066-\
 
 
 def printable(text):
-    """A text of a file, or the name of one, without what a terminal takes for a command and without marks that
-    turn its direction."""
+    """A text from a file, or the name of a file, without terminal control characters and without marks that
+    change the writing direction."""
     return CONTROL.sub(lambda found: " " if found[0] in "\t\n\r" else "\N{REPLACEMENT CHARACTER}", text)
 
 
 class InputError(Exception):
-    """What is wrong with an input, with file and line; one line that a terminal may show."""
+    """A problem with an input, with file and line, in one line that can be shown on a terminal."""
 
     def __init__(self, text=""):
         super().__init__(printable(text))
 
 
 def needs(what, package):
-    """The refusal of a file whose reader is not installed."""
+    """The error for a file whose reader is not installed."""
     return InputError(f"{what}: reading needs {package}")
 
 
 @contextlib.contextmanager
 def unpacking(path):
-    """What an unpacker raises is an InputError: of a broken file that may be an exception of any kind."""
+    """Turns an exception of an unpacker into an InputError. A broken file can cause exceptions of any kind."""
     try:
         yield
     except (InputError, MemoryError):
@@ -96,7 +96,8 @@ class _Unpacked(io.RawIOBase):
 
 
 class Source:
-    """The contents of a file, which messages call `path`. A context manager: copies end with it."""
+    """The contents of a file, which messages call `path`. It is a context manager, which deletes its copies at
+    the end."""
 
     def __init__(self, path, file):
         self.path, self._file = path, file
@@ -120,7 +121,7 @@ class Source:
             self._folder.cleanup()
 
     def _copy(self, stream):
-        """The path of a file with what a stream holds."""
+        """The path of a file with the contents of a stream."""
         if not self._folder:
             self._folder = tempfile.TemporaryDirectory(prefix="qx-")
         handle, path = tempfile.mkstemp(dir=self._folder.name)
@@ -160,7 +161,7 @@ class Source:
         return io.BufferedReader(_Unpacked(self.path, self._unpack), 1 << 18) if self._unpack else open(self._file, "rb")
 
     def local(self):
-        """The path of a file that holds the contents as they are."""
+        """The path of a file with the unpacked contents."""
         if not self._unpack:
             return self._file
         if not self._local:
@@ -169,18 +170,18 @@ class Source:
         return self._local
 
     def keep(self, file):
-        """An open file, which is closed when the contents are left."""
+        """Keeps an open file, which is closed together with the contents."""
         return self._open.enter_context(file)
 
     def kind(self):
-        """The kind that stored.py reads, or an empty text; what nobody reads is refused by its name."""
+        """The kind that stored.py reads, or an empty text. Unsupported kinds are refused by their names."""
         if not self._unpack and self.members:
             return self._kind_of_archive()
         for start, kind in ARRAYS:
             if self.head.startswith(start) and (kind != "parquet" or b"\0" in self.head):
                 return kind
         if self.head[512:520] == ARRAYS[1][0]:
-            return "hdf5"  # behind a block of its maker's
+            return "hdf5"  # after a user block
         if b"MAT-file" in self.head[:128] or self.name.lower().endswith(".mat") and b"\0" in self.head[:128]:
             return "mat"
         if self.head.startswith(b"0       ") and len(self.head) >= 256 and b"\n" not in self.head[:256]:
@@ -188,7 +189,7 @@ class Source:
         for pattern, name in FOREIGN:
             if re.match(pattern, self.head[:512], re.IGNORECASE | re.DOTALL) and (
                     name not in BINARY or b"\0" in self.head):
-                raise InputError(f"{self.path}: is {name}, no recording that is read here")
+                raise InputError(f"{self.path}: is {name}, which is not a supported recording")
         return ""
 
     def _kind_of_archive(self):

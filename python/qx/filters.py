@@ -1,12 +1,12 @@
-r"""Filters as objects: designed by name, applied to arrays of any dimension, forwards, in both directions
-or block by block.
+r"""Filters as objects. A filter is designed by name and applied to arrays of any dimension, forwards, in
+both directions or block by block.
 
     lowpass = qx.filters.butterworth(4, 40, fs=1000)
     y = lowpass(x)                     # along the last axis
-    y = lowpass.zero_phase(x)          # without delay, the ends extended
-    stream = lowpass.stream()          # y = stream(block), as often as there are blocks
+    y = lowpass.zero_phase(x)          # without delay, with extended ends
+    stream = lowpass.stream()          # y = stream(block) for each block
 
-Frequencies are in the unit of the sampling rate `fs`; with its default 1.0 in cycles per sample.
+Frequencies are in the unit of the sampling rate `fs`; with its default of 1.0, in cycles per sample.
 """
 
 from __future__ import annotations
@@ -28,13 +28,13 @@ core = served("filters")
 
 KINDS = {"lowpass": 0, "highpass": 1, "bandpass": 2, "bandstop": 3}
 EXTENSIONS = {"odd": "odd", "even": "even", "constant": "constant", "none": None}
-RINGING = 1e-10  # what is left of the memory of a filter where an extension begins
+RINGING = 1e-10  # the level to which the impulse response decays over the length of an extension
 EMPTY = np.empty(0)
 
 
 @result
 class Response(Result):
-    """What a filter does to frequencies. Unpacked it is frequencies and values, as of
+    """A frequency response; unpacks into frequencies and values, like the result of
     `scipy.signal.freqz`.
 
     Attributes
@@ -65,19 +65,19 @@ class Response(Result):
 
     @property
     def phase(self) -> Any:
-        """The phase in radians, without jumps."""
+        """The phase in radians, unwrapped."""
         return np.unwrap(np.angle(self.values))
 
 
 class Filter:
-    r"""A linear filter: second-order sections one after the other, or one quotient.
+    r"""A linear filter: a cascade of second-order sections, or a single quotient.
 
     .. math:: H(z) = \prod_s \frac{b_{s0} + b_{s1} z^{-1} + b_{s2} z^{-2}}
                                    {1 + a_{s1} z^{-1} + a_{s2} z^{-2}}
               \quad\text{or}\quad \frac{\sum_j b_j z^{-j}}{\sum_j a_j z^{-j}}
 
-    Made by the functions of this module, `from_sos` and `from_ba`. It is never changed, and can be
-    pickled.
+    Filters are returned by the design functions of this module, by `from_sos` and by `from_ba`. They are
+    immutable and can be pickled.
 
     Examples
     --------
@@ -90,7 +90,7 @@ class Filter:
     """
 
     ripple: float  # of an equiripple filter
-    _designed: tuple[NDArray[Any], NDArray[Any]] | None = None  # zeros and poles, where a design gives them
+    _designed: tuple[NDArray[Any], NDArray[Any]] | None = None  # zeros and poles, where the design returns them
 
     def __init__(self, b: Any, a: Any, is_cascade: Any, fs: Any = 1.0, title: Any = "",
                  main: Any = None) -> None:
@@ -101,7 +101,7 @@ class Filter:
         self._is_cascade, self.fs, self.title = is_cascade, float(fs), title
         self._main = main  # a frequency of the pass band, in cycles per sample
         self._rings: int | None = None  # _ringing(), once it is known
-        # The memory at rest: in its size a call makes no array for it.
+        # The states at rest, in full size, so that no call has to allocate them.
         sizes = [2 * (len(self._b) // 3)] if is_cascade else [max(len(self._b) - 1, 0), max(len(self._a) - 1, 0)]
         self._rest = [np.zeros(size) for size in sizes]
         self._rest_complex = [np.zeros(size, complex) for size in sizes]
@@ -114,14 +114,14 @@ class Filter:
         Parameters
         ----------
         x : array_like
-            Real or complex samples, of any dimension; complex ones run through as two real signals.
+            Real or complex samples, of any dimension. Complex samples are filtered as two real signals.
         axis : int
-            The axis of time; of a pandas table the rows.
+            The axis of time; for a pandas table, the rows by default.
 
         Returns
         -------
-        ndarray, or what x is of pandas
-            Of the shape of x.
+        ndarray, or the pandas type of x
+            The same shape as x.
 
         Raises
         ------
@@ -150,11 +150,10 @@ class Filter:
     def zero_phase(self, x: ArrayLike, axis: int = LAST,
                    extension: Literal["odd", "even", "constant", "none"] = "odd",
                    pad: int | None = None) -> Any:
-        r"""The signal filtered forwards and backwards: no delay, the magnitude squared.
+        r"""The signal filtered forwards and backwards, which removes the delay and squares the magnitude.
 
-        Before and behind the signal it is extended, and the memory of the filter begins as if the first
-        value had always been there, so that an offset or a ramp comes out as it went in, where the
-        filter lets it pass.
+        The signal is extended at both ends, and the filter starts as if the first value had always been
+        there. An offset or a ramp in the pass band therefore comes out unchanged.
 
         Parameters
         ----------
@@ -163,20 +162,21 @@ class Filter:
         axis : int
             The axis of time.
         extension : {"odd", "even", "constant", "none"}
-            What is put at the ends: the signal turned about its end point, :math:`2 x_0 - x_j`; its
-            mirror image; the end point; nothing.
+            The extension at the ends: the signal reflected about its end point, :math:`2 x_0 - x_j`; its
+            mirror image; the end value repeated; nothing.
         pad : int, optional
-            How many values; as long as the filter rings by default, and at most one less than there are.
+            Number of values to add at each end. By default, as many as the filter rings for, but at most
+            one less than the number of values.
 
         Returns
         -------
-        ndarray, or what x is of pandas
-            Of the shape of x.
+        ndarray, or the pandas type of x
+            The same shape as x.
 
         Raises
         ------
         ValueError
-            If x is empty, pad is not below its length, or extension is none of its words.
+            If x is empty, pad is not below its length, or extension is not a valid choice.
 
         Examples
         --------
@@ -193,27 +193,27 @@ class Filter:
         elif pad is None:
             pad = min(self._ringing(), n - 1)
         elif not 0 <= pad < n:
-            refuse("filters.Filter.zero_phase", "pad", f"must be from 0 to {n - 1}, one less than there "
-                   f"are values; {pad} came", "ErrSizesDisagree")
+            refuse("filters.Filter.zero_phase", "pad", f"must be from 0 to {n - 1}, one less than the number "
+                   f"of values; got {pad}", "ErrSizesDisagree")
         return along(lambda channel: self._both_ways(channel, kind, pad), x, axis)
 
     def _both_ways(self, x: Any, kind: Any, pad: Any) -> Any:
         long = np.pad(x, pad, "edge") if kind == "constant" else \
             np.pad(x, pad, "reflect", reflect_type=kind) if kind else x
         there = self._from_rest(long)
-        # Backwards with the conjugate, so that the magnitude is squared and no phase stays.
+        # Backwards with the conjugate, so that the magnitude is squared and no phase remains.
         behind = Filter(self._b.conj(), self._a.conj(), False) if self.is_complex else self
         back = behind._from_rest(there[::-1])
         return back[::-1][pad:pad + len(x)]
 
     def _from_rest(self, x: Any) -> Any:
-        """Filtered as if the first value had always been there."""
+        """x, filtered as if its first value had always been there."""
         x = np.ascontiguousarray(x)
         return FilterStream(self, dtype=complex if x.dtype.kind == "c" else float, value=x[0])(x) \
             if len(x) else self(x)
 
     def _ringing(self) -> Any:
-        """Samples until the impulse response has fallen to RINGING, by the largest pole."""
+        """The number of samples until the impulse response has decayed to RINGING, by the largest pole."""
         if self._rings is None:
             largest = float(np.abs(self.poles).max(initial=0)) if self.is_iir else 0.0
             rings = math.ceil(math.log(RINGING) / math.log(largest)) if 0 < largest < 1 else 0
@@ -222,16 +222,16 @@ class Filter:
 
     def stream(self, channels: int | None = None, axis: int = -1,
                dtype: type[float] | type[complex] = float) -> FilterStream:
-        """The filter for blocks: all blocks together give the bits of `self(x)`.
+        """The filter as a stream: all blocks together have the same bits as `self(x)`.
 
         Parameters
         ----------
         channels : int, optional
-            How many channels a block of two dimensions has; without it blocks have one dimension.
+            Number of channels of a two-dimensional block; without it, blocks have one dimension.
         axis : int
-            The axis of time in a block of two dimensions.
+            The axis of time in a two-dimensional block.
         dtype : {float, complex}
-            Of the samples.
+            The type of the samples.
 
         Returns
         -------
@@ -247,28 +247,28 @@ class Filter:
         """
         return FilterStream(self, channels, axis, dtype)
 
-    # What it is
+    # Properties
 
     @property
     def is_iir(self) -> bool:
-        """Whether it has a feedback."""
+        """Whether the filter has feedback."""
         return bool(len(self._a) > (0 if self._is_cascade else 1) and np.any(self._a[not self._is_cascade:]))
 
     @property
     def sos(self) -> NDArray[Any]:
-        """The second-order sections, one to a row: b0, b1, b2, 1, a1, a2, as of SciPy."""
+        """The second-order sections, one to a row: b0, b1, b2, 1, a1, a2, as in SciPy."""
         if self._is_cascade:
             b, a = self._b.reshape(-1, 3), self._a.reshape(-1, 2)
             return np.hstack([b, np.ones((len(b), 1)), a])
         if max(len(self._b), len(self._a)) > 3:
-            refuse("filters.Filter.sos", "self", "is a quotient of a higher order than 2, which is "
-                   "not taken apart into sections", "ErrCoefficientSizes")
+            refuse("filters.Filter.sos", "self", "is a quotient of an order above 2, which is "
+                   "not split into sections", "ErrCoefficientSizes")
         a = np.r_[self._a, np.zeros(3 - len(self._a))] if len(self._a) else np.array([1.0, 0, 0])
         return np.r_[np.r_[self._b, np.zeros(3 - len(self._b))], a][None] / a[0]
 
     @property
     def ba(self) -> tuple[NDArray[Any], NDArray[Any]]:
-        """Numerator and denominator in ascending powers of 1/z. Of a high order they lose digits;
+        """Numerator and denominator in ascending powers of 1/z. At high orders they lose digits;
         `sos` does not."""
         if not self._is_cascade:
             return self._b.copy(), self._a.copy() if len(self._a) else np.ones(1)
@@ -281,12 +281,12 @@ class Filter:
     def taps(self) -> NDArray[Any]:
         """The impulse response of a filter without feedback."""
         if self.is_iir:
-            refuse("filters.Filter.taps", "self", "a filter with feedback has no end of taps",
+            refuse("filters.Filter.taps", "self", "a filter with feedback has infinitely many taps",
                    "ErrBadCoefficients")
         return self.ba[0]
 
     def _pairs(self) -> Any:
-        """Numerators and denominators of the factors."""
+        """The numerator and the denominator of each factor."""
         if self._is_cascade:
             return [(row[:3], row[3:]) for row in self.sos]
         return [self.ba]
@@ -303,24 +303,24 @@ class Filter:
 
     @property
     def poles(self) -> NDArray[np.complex128]:
-        """The poles in the z plane; a filter without feedback has them all at 0. Of an IIR design those
-        that its coefficients are rounded from."""
+        """The poles in the z plane; a filter without feedback has all of them at 0. For an IIR design,
+        these are the poles from which its coefficients were rounded."""
         return self._designed[1] if self._designed else self._roots(1)
 
     @property
     def zeros(self) -> NDArray[np.complex128]:
-        """The zeros in the z plane; of an IIR design those that its coefficients are rounded from."""
+        """The zeros in the z plane; for an IIR design, those from which its coefficients were rounded."""
         return self._designed[0] if self._designed else self._roots(0)
 
     @property
     def is_stable(self) -> bool:
-        """Whether all poles of the coefficients as they are stored are inside the unit circle."""
+        """Whether all poles of the stored coefficients are inside the unit circle."""
         return bool(np.all(np.abs(self._roots(1)) < 1))
 
     @property
     def delay(self) -> float:
-        """The group delay in samples: the one of all frequencies where the taps are symmetric, else that
-        in the middle of the pass band. `response().delay` has it for each frequency."""
+        """The group delay in samples. Symmetric taps have the same delay at all frequencies; other filters
+        report the delay in the middle of the pass band. `response().delay` has it for each frequency."""
         if not self.is_iir:
             h = self.taps
             rounding = 1e-12 * np.abs(h).max()
@@ -338,9 +338,10 @@ class Filter:
         Parameters
         ----------
         frequencies : int or array_like
-            How many, evenly spaced from 0 to below fs / 2; or which ones, in the unit of fs.
+            Number of frequencies, evenly spaced from 0 to below fs / 2; or the frequencies themselves, in
+            the unit of fs.
         fs : float, optional
-            The sampling rate; that of the design by default.
+            The sampling rate; by default, that of the design.
 
         Returns
         -------
@@ -370,14 +371,14 @@ class Filter:
         return Response(frequencies, values.reshape(frequencies.shape), delay.reshape(frequencies.shape))
 
     def plot(self, axes: Any = None, frequencies: ArrayLike = 2048) -> Any:
-        """Draws the gain in decibels over the frequency with matplotlib.
+        """Plots the gain in decibels against frequency with matplotlib.
 
         Parameters
         ----------
         axes : matplotlib Axes, optional
-            Where to draw; new ones by default.
+            The axes to draw in; new ones by default.
         frequencies : int or array_like
-            As of `response`.
+            As for `response`.
 
         Returns
         -------
@@ -394,7 +395,7 @@ class Filter:
         return axes
 
     def __mul__(self, other: Any) -> Any:
-        """Both filters one after the other."""
+        """The cascade of both filters."""
         if not isinstance(other, Filter):
             return NotImplemented
         if self.is_complex or other.is_complex:
@@ -421,15 +422,15 @@ class Filter:
 
 
 def _polynomial(coefficients: Any, z: Any) -> Any:
-    """Ascending powers."""
+    """The value of a polynomial with coefficients in ascending powers."""
     if len(coefficients) < 8:
         return np.polynomial.polynomial.polyval(z, coefficients)
     return core.Filter_polynomial(np.asarray(coefficients, complex), np.asarray(z, complex))
 
 
 def _roots(descending: Any) -> Any:
-    """Of a polynomial, highest power first: eigenvalues of the companion matrix, and 0 for each
-    coefficient of 0 at the end; coefficients of 0 at the beginning do not count."""
+    """The roots of a polynomial, highest power first: the eigenvalues of the companion matrix, and 0 for each
+    trailing zero coefficient. Leading zero coefficients are ignored."""
     kept = np.trim_zeros(descending)
     degree = len(kept) - 1
     at_zero = len(descending) - len(np.trim_zeros(descending, "b")) if degree >= 0 else 0
@@ -443,10 +444,10 @@ def _roots(descending: Any) -> Any:
 
 
 class FilterStream(Stream):
-    """A filter for blocks; made by `Filter.stream`.
+    """A filter that is applied block by block, as returned by `Filter.stream`.
 
-    Called with blocks of any size; `reset()`, `copy()`, `finish()`; can be pickled in the middle of a
-    signal.
+    It is called with blocks of any size, and has `reset()`, `copy()` and `finish()`. It can be pickled in
+    the middle of a signal.
     """
 
     def __init__(self, filter_: Any, channels: Any = None, axis: Any = -1, dtype: Any = float,
@@ -457,7 +458,7 @@ class FilterStream(Stream):
         super().__init__(channels, axis, dtype)
 
     def _start(self) -> Any:
-        """The memory as if `value` had always been there: zeros for 0, and where there is no rest."""
+        """The state as if `value` had always been there: zeros for 0, and where no steady state exists."""
         f, value = self.filter, self._value
         if not f._is_cascade:
             b, a = f.ba
@@ -490,21 +491,21 @@ class FilterStream(Stream):
 # Design
 
 def _edges(function: Any, kind: Any, cutoff: Any, fs: Any) -> Any:
-    """The code of the kind, and fl and fh, in the words that they were given in."""
+    """The code of the kind, and the edges fl and fh in the unit of fs."""
     code = chosen(function, "kind", kind, KINDS)
     edges = np.atleast_1d(np.asarray(cutoff, float))
     needed = 1 if code < 2 else 2
     if edges.shape != (needed,):
         refuse(function, "cutoff", f"a {kind} needs {'one frequency' if needed == 1 else 'two'}; "
-               f"{cutoff!r} came" + "; name the kind for a band" * (code == 0), "ErrSizesDisagree")
+               f"got {cutoff!r}" + "; pass the kind for a band" * (code == 0), "ErrSizesDisagree")
     if not np.all(np.isfinite(edges)) or not fs > 0:
         refuse(function, "cutoff, fs", "must be finite, and fs above 0", "ErrBadCutoff")
     if np.any(edges <= 0) or np.any(edges >= fs / 2):
-        refuse(function, "cutoff", f"must be between 0 and half the sampling rate, {fs / 2:g}; {cutoff!r} "
-               "came" + "; give fs for frequencies in its unit" * (fs == 1),
+        refuse(function, "cutoff", f"must be between 0 and half the sampling rate, {fs / 2:g}; got "
+               f"{cutoff!r}" + "; pass fs for frequencies in its unit" * (fs == 1),
                "ErrAboveNyquist" if np.any(edges > fs / 2) else "ErrBadCutoff")
     if needed == 2 and not edges[0] < edges[1]:
-        refuse(function, "cutoff", f"must rise; {cutoff!r} came", "ErrBadCutoff")
+        refuse(function, "cutoff", f"must be increasing; got {cutoff!r}", "ErrBadCutoff")
     return code, float(edges[0]), float(edges[-1])
 
 
@@ -519,7 +520,7 @@ def _iir(name: Any, order: Any, levels: Any, cutoff: Any, kind: Any, fs: Any) ->
     code, fl, fh = _edges(function, kind, cutoff, fs)
     for argument, level in levels.items():
         if not level > 0:
-            refuse(function, argument, f"must be above 0 dB; {level} came",
+            refuse(function, argument, f"must be above 0 dB; got {level}",
                    "ErrRippleNotPositive" if argument == "ripple" else "ErrAttenuationNotPositive")
     if len(levels) == 2 and not levels["ripple"] < levels["attenuation"]:
         refuse(function, "ripple", "must be below the attenuation", "ErrRippleAboveAttenuation")
@@ -543,9 +544,9 @@ def butterworth(order: int, cutoff: float | tuple[float, float],
     order : int
         The order n of the prototype; a band filter has twice as many poles.
     cutoff : float or (float, float)
-        The edge, or the two edges of a band, in the unit of fs.
+        The edge frequency, or the two edges of a band, in the unit of fs.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     fs : float
         The sampling rate.
 
@@ -556,7 +557,7 @@ def butterworth(order: int, cutoff: float | tuple[float, float],
     Raises
     ------
     ValueError
-        If the order is below 1, an edge is not between 0 and fs / 2, or kind is none of its words.
+        If the order is below 1, an edge is not between 0 and fs / 2, or kind is not a valid choice.
 
     Examples
     --------
@@ -579,11 +580,11 @@ def chebyshev1(order: int, ripple: float, cutoff: float | tuple[float, float],
     order : int
         The order n of the prototype.
     ripple : float
-        How far the gain falls in the pass band, in dB; at the cutoff it is down by as much.
+        The ripple in the pass band, in dB. At the cutoff, the gain is down by the same amount.
     cutoff : float or (float, float)
-        The edge, or the two edges of a band, in the unit of fs.
+        The edge frequency, or the two edges of a band, in the unit of fs.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     fs : float
         The sampling rate.
 
@@ -595,7 +596,7 @@ def chebyshev1(order: int, ripple: float, cutoff: float | tuple[float, float],
     ------
     ValueError
         If the order is below 1, the ripple is not above 0, an edge is not between 0 and fs / 2, or kind
-        is none of its words.
+        is not a valid choice.
 
     Examples
     --------
@@ -619,11 +620,11 @@ def chebyshev2(order: int, attenuation: float, cutoff: float | tuple[float, floa
     order : int
         The order n of the prototype.
     attenuation : float
-        How far the gain is down in the stop band at least, in dB.
+        The minimum attenuation in the stop band, in dB.
     cutoff : float or (float, float)
         The edge of the stop band, or its two edges, in the unit of fs.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     fs : float
         The sampling rate.
 
@@ -635,7 +636,7 @@ def chebyshev2(order: int, attenuation: float, cutoff: float | tuple[float, floa
     ------
     ValueError
         If the order is below 1, the attenuation is not above 0, an edge is not between 0 and fs / 2, or
-        kind is none of its words.
+        kind is not a valid choice.
 
     Examples
     --------
@@ -649,7 +650,7 @@ def chebyshev2(order: int, attenuation: float, cutoff: float | tuple[float, floa
 def elliptic(order: int, ripple: float, attenuation: float, cutoff: float | tuple[float, float],
              kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
              fs: float = 1.0) -> Filter:
-    r"""An elliptic filter: equal ripples in both bands, and the narrowest transition.
+    r"""An elliptic filter: equal ripples in both bands, and the narrowest transition band.
 
     .. math:: |H|^2 = \frac{1}{1 + \varepsilon^2 R_n(\Omega)^2}
 
@@ -658,13 +659,13 @@ def elliptic(order: int, ripple: float, attenuation: float, cutoff: float | tupl
     order : int
         The order n of the prototype.
     ripple : float
-        How far the gain falls in the pass band, in dB.
+        The ripple in the pass band, in dB.
     attenuation : float
-        How far the gain is down in the stop band at least, in dB.
+        The minimum attenuation in the stop band, in dB.
     cutoff : float or (float, float)
         The edge of the pass band, or its two edges, in the unit of fs.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     fs : float
         The sampling rate.
 
@@ -676,7 +677,7 @@ def elliptic(order: int, ripple: float, attenuation: float, cutoff: float | tupl
     ------
     ValueError
         If the order is below 1, ripple or attenuation is not above 0, the ripple is not below the
-        attenuation, an edge is not between 0 and fs / 2, or kind is none of its words.
+        attenuation, an edge is not between 0 and fs / 2, or kind is not a valid choice.
 
     Examples
     --------
@@ -695,16 +696,16 @@ def bessel(order: int, cutoff: float | tuple[float, float],
 
     .. math:: |H|^2 = \frac{B_n(0)^2}{|B_n(i\Omega)|^2}
 
-    with the reverse Bessel polynomial :math:`B_n`. The bilinear transform bends the delay near fs / 2.
+    with the reverse Bessel polynomial :math:`B_n`. The bilinear transform distorts the delay near fs / 2.
 
     Parameters
     ----------
     order : int
         The order n of the prototype, up to 500.
     cutoff : float or (float, float)
-        The edge, or the two edges of a band, in the unit of fs.
+        The edge frequency, or the two edges of a band, in the unit of fs.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     fs : float
         The sampling rate.
 
@@ -715,8 +716,8 @@ def bessel(order: int, cutoff: float | tuple[float, float],
     Raises
     ------
     ValueError
-        If the order is below 1 or too high, an edge is not between 0 and fs / 2, or kind is none of its
-        words.
+        If the order is below 1 or too high, an edge is not between 0 and fs / 2, or kind is not a valid
+        choice.
 
     Examples
     --------
@@ -731,26 +732,26 @@ def windowed(taps: int, cutoff: float | tuple[float, float],
              kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
              window: str | tuple[Any, ...] | ArrayLike = "hamming", fs: float = 1.0,
              scale: bool = True) -> Filter:
-    r"""A filter of linear phase: the ideal response cut off under a window.
+    r"""A linear-phase filter: the ideal response, truncated by a window.
 
     .. math:: h_i = w_i \frac{\sin(\omega_c (i - c))}{\pi (i - c)},\quad c = \frac{N - 1}{2}
 
-    for the lowpass, and differences of such for the others.
+    for the lowpass; the other kinds are differences of such responses.
 
     Parameters
     ----------
     taps : int
         The length N; odd for a highpass or a bandstop.
     cutoff : float or (float, float)
-        The edge, or the two edges of a band, in the unit of fs; the gain is a half there.
+        The edge frequency, or the two edges of a band, in the unit of fs; the gain is one half there.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     window : str, tuple or array_like
-        A window of `qx.windows.get`: its name, name and parameter, or its values.
+        A window, as for `qx.windows.get`: its name, its name and parameter, or its values.
     fs : float
         The sampling rate.
     scale : bool
-        Whether the gain is made 1 in the middle of the pass band (at 0, fs / 2 or between the edges).
+        Whether to scale the gain to 1 in the middle of the pass band (at 0, at fs / 2 or between the edges).
 
     Returns
     -------
@@ -760,7 +761,7 @@ def windowed(taps: int, cutoff: float | tuple[float, float],
     ------
     ValueError
         If taps is below 1, or even for a highpass or a bandstop, an edge is not between 0 and fs / 2, or
-        kind or window is none of its words.
+        kind or window is not a valid choice.
 
     Examples
     --------
@@ -774,8 +775,8 @@ def windowed(taps: int, cutoff: float | tuple[float, float],
     taps = whole_number(name, "taps", taps, 1, "ErrOrderNotPositive")
     code, fl, fh = _edges(name, kind, cutoff, fs)
     if code in (1, 3) and taps % 2 == 0:
-        refuse(name, "taps", f"a {kind} needs an odd number, since its gain at fs / 2 is 0 with an even "
-               f"one; {taps} came", "ErrBadTapCount")
+        refuse(name, "taps", f"a {kind} needs an odd number, since an even number makes the gain at fs / 2 "
+               f"0; got {taps}", "ErrBadTapCount")
     h = core.windowed(fs, fl, fh, taps, code)[0] * windows.get(window, taps, symmetric=True)
     middle = (0.0, 0.5, (fl + fh) / 2 / fs, 0.0)[code]
     if scale:
@@ -787,7 +788,7 @@ def windowed(taps: int, cutoff: float | tuple[float, float],
 def equiripple(taps: int, bands: ArrayLike, desired: ArrayLike, weight: ArrayLike | None = None,
                kind: Literal["symmetric", "differentiator", "hilbert"] = "symmetric",
                fs: float = 1.0) -> Filter:
-    """The filter of linear phase with the least weighted deviation from what is desired in bands.
+    """The linear-phase filter with the least weighted deviation from the desired gain in each band.
 
     After McClellan, Parks and Rabiner, "A computer program for designing optimum FIR linear phase digital
     filters", 1973.
@@ -797,11 +798,12 @@ def equiripple(taps: int, bands: ArrayLike, desired: ArrayLike, weight: ArrayLik
     taps : int
         The length.
     bands : array_like
-        The edges of the bands, two for each, rising, in the unit of fs.
+        The edges of the bands, two for each, in ascending order, in the unit of fs.
     desired : array_like
-        The gain of each band; of a differentiator the slope, gain by cycles per sample.
+        The gain of each band; for a differentiator, the slope, that is, the gain divided by the frequency
+        in cycles per sample.
     weight : array_like, optional
-        How much a deviation counts in each band; 1 by default.
+        The weight of a deviation in each band; 1 by default.
     kind : {"symmetric", "differentiator", "hilbert"}
         Symmetric taps, or antisymmetric ones for a differentiator or a Hilbert transformer.
     fs : float
@@ -810,13 +812,13 @@ def equiripple(taps: int, bands: ArrayLike, desired: ArrayLike, weight: ArrayLik
     Returns
     -------
     Filter
-        With the greatest weighted deviation on the grid as `ripple`.
+        Its attribute `ripple` is the greatest weighted deviation on the grid.
 
     Raises
     ------
     ValueError
-        If taps is below 3, the edges do not rise from 0 to fs / 2 or are not two for each gain, a weight
-        is not above 0, taps is even with a gain at fs / 2, or the exchange does not settle.
+        If taps is below 3, the edges do not ascend from 0 to fs / 2 or are not two for each gain, a weight
+        is not above 0, taps is even with a gain at fs / 2, or the exchange does not converge.
 
     Examples
     --------
@@ -831,13 +833,13 @@ def equiripple(taps: int, bands: ArrayLike, desired: ArrayLike, weight: ArrayLik
     edges, gains = np.ravel(np.asarray(bands, float)), np.atleast_1d(np.asarray(desired, float))
     weights = np.ones(len(gains)) if weight is None else np.atleast_1d(np.asarray(weight, float))
     if len(edges) != 2 * len(gains) or len(weights) != len(gains):
-        refuse(name, "bands, desired, weight", f"each band has two edges, a gain and a weight; {len(edges)}, "
-               f"{len(gains)} and {len(weights)} came", "ErrSizesDisagree")
+        refuse(name, "bands, desired, weight", f"each band has two edges, a gain and a weight; got {len(edges)}, "
+               f"{len(gains)} and {len(weights)}", "ErrSizesDisagree")
     if np.any(np.diff(edges) < 0) or edges[0] < 0 or edges[-1] > fs / 2:
-        refuse(name, "bands", f"the edges must rise from 0 to half the sampling rate, {fs / 2:g}; {bands!r} "
-               "came", "ErrAboveNyquist" if edges[-1] > fs / 2 else "ErrBadCutoff")
+        refuse(name, "bands", f"the edges must ascend from 0 to half the sampling rate, {fs / 2:g}; got "
+               f"{bands!r}", "ErrAboveNyquist" if edges[-1] > fs / 2 else "ErrBadCutoff")
     if code == 0 and taps % 2 == 0 and edges[-1] == fs / 2 and gains[-1]:
-        refuse(name, "taps", f"must be odd with a gain at fs / 2; {taps} came", "ErrBadTapCount")
+        refuse(name, "taps", f"must be odd with a gain at fs / 2; got {taps}", "ErrBadTapCount")
     rows = [tuple(row) for row in np.column_stack([gains, edges[::2], edges[1::2], weights])]
     h, ripple = core.equiripple(taps, fs, rows, code, 0)
     best = int(np.argmax(np.abs(gains)))
@@ -849,32 +851,32 @@ def equiripple(taps: int, bands: ArrayLike, desired: ArrayLike, weight: ArrayLik
 
 def narrow(edges: ArrayLike, kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
            ripple: float = 0.1, attenuation: float = 60.0, fs: float = 1.0) -> Filter:
-    """A filter of linear phase for a narrow band, designed in two stages: a filter with zeros between
-    its taps, and one that takes away its images.
+    """A linear-phase filter for a narrow band, designed in two stages: a filter with zeros between its
+    taps, and a second filter that removes its images.
 
     Parameters
     ----------
     edges : sequence of float
-        The edges of the bands, rising, in the unit of fs: two of a lowpass or a highpass, four of the
-        others, about one centre.
+        The edges of the bands in ascending order, in the unit of fs: two for a lowpass or a highpass, four,
+        symmetric about a common centre, for the others.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}
-        What passes.
+        Which frequencies pass.
     ripple : float
-        How far the gain may be from 1, in dB.
+        The largest deviation of the gain from 1 in the pass band, in dB.
     attenuation : float
-        How far the gain is down in the stop band, in dB.
+        The attenuation in the stop band, in dB.
     fs : float
         The sampling rate.
 
     Returns
     -------
     Filter
-        With all taps of both stages.
+        Its taps are those of both stages, convolved.
 
     Raises
     ------
     ValueError
-        If the edges do not rise between 0 and fs / 2 or are not as many as kind needs, or ripple or
+        If the edges are not increasing between 0 and fs / 2, their number does not suit kind, or ripple or
         attenuation is not above 0.
 
     Examples
@@ -888,9 +890,9 @@ def narrow(edges: ArrayLike, kind: Literal["lowpass", "highpass", "bandpass", "b
     code = chosen(name, "kind", kind, KINDS)
     corners = np.asarray(edges, float).ravel()
     if len(corners) != (2 if code < 2 else 4):
-        refuse(name, "edges", f"a {kind} needs {2 if code < 2 else 4}; {len(corners)} came", "ErrSizesDisagree")
+        refuse(name, "edges", f"a {kind} needs {2 if code < 2 else 4}; got {len(corners)}", "ErrSizesDisagree")
     if np.any(np.diff(corners) <= 0) or corners[0] <= 0 or corners[-1] >= fs / 2:
-        refuse(name, "edges", f"must rise between 0 and half the sampling rate, {fs / 2:g}", "ErrBadCutoff")
+        refuse(name, "edges", f"must be increasing between 0 and half the sampling rate, {fs / 2:g}", "ErrBadCutoff")
     if code < 2:
         (fpass, fstop), centre = corners[::1 if code == 0 else -1], 0.0
     else:
@@ -905,7 +907,7 @@ def narrow(edges: ArrayLike, kind: Literal["lowpass", "highpass", "bandpass", "b
 
 
 def from_sos(sos: ArrayLike, fs: float = 1.0) -> Filter:
-    """The filter of second-order sections, as other programs have them.
+    """The filter with the given second-order sections, in the layout that other programs use.
 
     Parameters
     ----------
@@ -921,7 +923,7 @@ def from_sos(sos: ArrayLike, fs: float = 1.0) -> Filter:
     Raises
     ------
     ValueError
-        If there are no rows of six, or an a0 is 0.
+        If sos does not have rows of six, or an a0 is 0.
 
     Examples
     --------
@@ -931,7 +933,7 @@ def from_sos(sos: ArrayLike, fs: float = 1.0) -> Filter:
     """
     rows = np.asarray(sos, float)
     if rows.ndim != 2 or rows.shape[1] != 6 or not len(rows):
-        refuse("filters.from_sos", "sos", f"rows of six are needed; shape {rows.shape} came",
+        refuse("filters.from_sos", "sos", f"rows of six are needed; got shape {rows.shape}",
                "ErrCoefficientSizes")
     if np.any(rows[:, 3] == 0):
         refuse("filters.from_sos", "sos", "a0 must not be 0", "ErrBadCoefficients")
@@ -940,8 +942,8 @@ def from_sos(sos: ArrayLike, fs: float = 1.0) -> Filter:
 
 
 def from_ba(b: ArrayLike, a: ArrayLike = (1.0,), fs: float = 1.0) -> Filter:
-    """The filter of a numerator and a denominator, in direct form; without the latter the taps of one
-    without feedback.
+    """The filter with the given numerator and denominator, in direct form. Without a denominator, b are the
+    taps of a filter without feedback.
 
     Parameters
     ----------
@@ -967,7 +969,7 @@ def from_ba(b: ArrayLike, a: ArrayLike = (1.0,), fs: float = 1.0) -> Filter:
     """
     b, a = vector(b, "filters.from_ba", "b"), vector(a, "filters.from_ba", "a")
     if not len(b) or not len(a) or a[0] == 0:
-        refuse("filters.from_ba", "b, a", "b must have a coefficient, and a must not begin with 0",
+        refuse("filters.from_ba", "b, a", "b must not be empty, and a must not begin with 0",
                "ErrBadCoefficients")
     if len(a) == 1:
         return Filter(b / a[0], EMPTY, False, fs)
@@ -978,8 +980,8 @@ def from_ba(b: ArrayLike, a: ArrayLike = (1.0,), fs: float = 1.0) -> Filter:
 
 def savgol(x: ArrayLike, window_length: int, polyorder: int, deriv: int = 0, delta: float = 1.0,
            axis: int = LAST) -> Any:
-    """Smoothing by the least-squares polynomial of the values around each (Savitzky-Golay), or a
-    derivative of it. At the ends the polynomial of the first and last values goes on.
+    """Smooths by a least-squares polynomial through the neighbours of each value (Savitzky-Golay), or
+    returns its derivative. At the ends, the polynomial through the first or last values is used.
 
     A. Savitzky and M. J. E. Golay, "Smoothing and differentiation of data by simplified least squares
     procedures", 1964.
@@ -989,11 +991,11 @@ def savgol(x: ArrayLike, window_length: int, polyorder: int, deriv: int = 0, del
     x : array_like
         Real values.
     window_length : int
-        How many values around each, odd, and no more than there are.
+        Number of values around each, odd, and at most the number of values.
     polyorder : int
         The order of the polynomial, at least 1 and below window_length.
     deriv : int
-        Which derivative; 0 for the values themselves.
+        The order of the derivative; 0 for the values themselves.
     delta : float
         The distance between values, for derivatives.
     axis : int
@@ -1001,8 +1003,8 @@ def savgol(x: ArrayLike, window_length: int, polyorder: int, deriv: int = 0, del
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
@@ -1022,12 +1024,12 @@ def savgol(x: ArrayLike, window_length: int, polyorder: int, deriv: int = 0, del
     order = whole_number(name, "polyorder", polyorder, 1, "ErrBadCoefficients")
     deriv = whole_number(name, "deriv", deriv, 0, "ErrNegativeCount")
     if frame % 2 == 0:
-        refuse(name, "window_length", f"must be odd; {frame} came", "ErrBadTapCount")
+        refuse(name, "window_length", f"must be odd; got {frame}", "ErrBadTapCount")
     if order >= frame:
-        refuse(name, "polyorder", f"must be below window_length, {frame}; {order} came",
+        refuse(name, "polyorder", f"must be below window_length, {frame}; got {order}",
                "ErrPolynomialOrderTooHigh")
     if count_of(x, axis) < frame:
-        refuse(name, "window_length", f"{frame} is more than there are values, {count_of(x, axis)}",
+        refuse(name, "window_length", f"{frame} exceeds the number of values, {count_of(x, axis)}",
                "ErrSizesDisagree")
     if not deriv:
         return along(lambda channel: core.savgol(channel, order, frame, EMPTY), x, axis)
@@ -1038,7 +1040,7 @@ def savgol(x: ArrayLike, window_length: int, polyorder: int, deriv: int = 0, del
 
 
 def _derivative(x: Any, rows: Any, deriv: Any) -> Any:
-    """Row i of rows is the coefficient of t^i of the polynomial around the centre of a frame."""
+    """The derivative. Row i of rows gives the coefficient of t^i of the polynomial about the frame's centre."""
     frame, half = rows.shape[1], rows.shape[1] // 2
     weights = math.factorial(deriv) * rows[deriv]
     inner = core.Filter_direct(x, EMPTY, weights[::-1], EMPTY, EMPTY, 0)[0][frame - 1:]
@@ -1049,29 +1051,30 @@ def _derivative(x: Any, rows: Any, deriv: Any) -> Any:
 
 def median(x: ArrayLike, size: int = 3, ends: Literal["reflect", "nearest", "zero"] = "reflect",
            axis: int = LAST) -> Any:
-    """The running median: of the `size` values around each.
+    """The running median of the `size` values around each.
 
     Parameters
     ----------
     x : array_like
         Real values without NaN.
     size : int
-        How many values; of an even number one more is before than behind, and the median is the mean of
-        the two in the middle.
+        Number of values. For an even number, one more value is taken before than after, and the median
+        is the mean of the two in the middle.
     ends : {"reflect", "nearest", "zero"}
-        What is beyond the ends: the mirror image with the end value twice, the end value, or zeros.
+        How the values are continued beyond the ends: by the mirror image, with the end value twice, by the
+        end value, or by zeros.
     axis : int
         The axis along which to filter.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
     ValueError
-        If x is empty, size is below 1, or ends is none of its words.
+        If x is empty, size is below 1, or ends is not a valid choice.
 
     Examples
     --------

@@ -1,12 +1,12 @@
-"""Fits with parameters by name, their standard errors, bands, and splines through noisy data.
+"""Fits with named parameters, standard errors and confidence bands, and splines through noisy data.
 
     fit = qx.fit.exponential(x, y)
     fit.parameters["b"], fit.errors["b"]
     fit.predict(5.0)
-    low, high = fit.confidence(5.0)         # of the curve; fit.prediction() of one more value
+    low, high = fit.confidence(5.0)         # of the curve; fit.prediction() for one more observation
 
-Standard errors and bands take the scatter of the residuals; those of models that are not linear in their
-parameters hold to first order.
+Standard errors and bands are based on the scatter of the residuals. For models that are not linear in their
+parameters, they hold to first order.
 """
 
 from __future__ import annotations
@@ -30,18 +30,18 @@ __all__ = ["BSpline", "Fit", "SmoothingSpline", "curve", "exponential", "gaussia
 core = served("fit")
 
 EMPTY = np.empty(0)
-NATURAL = 2.71828  # the exports take these digits for e
+NATURAL = 2.71828  # the exports use these digits of e
 TOLERANCE, ITERATIONS = 1e-12, 2000
-AS_EPSILON = -1.0  # of a tolerance for singular values
+AS_EPSILON = -1.0  # as a tolerance for singular values: eps
 METHODS = {"least squares": 0, "absolute": 1, "bisquare": 2}
 LOSSES = {"linear": 0, "soft_l1": 1, "huber": 2, "cauchy": 3, "arctan": 4}
-UNDETERMINED = 3  # the reason for the end of a fit
-SETTLED = 1e-10  # the part of itself by which a parameter may still move
+UNDETERMINED = 3  # the reason with which such a fit ends
+SETTLED = 1e-10  # the relative step of the parameters below which a fit has converged
 
 
 @result
 class Fit(Result):
-    """A fitted model; unpacked, the parameters as an array and their covariance, as of
+    """A fitted model; unpacks into the parameters as an array and their covariance, like the result of
     `scipy.optimize.curve_fit`.
 
     Attributes
@@ -49,19 +49,19 @@ class Fit(Result):
     formula : str
         The model.
     parameters : dict
-        Their values by their names.
+        The values of the parameters by name.
     errors : dict
-        Their standard errors; 0 of fixed ones.
+        The standard errors of the parameters by name; 0 for fixed ones.
     covariance : ndarray
-        Of the parameters, in their order.
+        The covariance of the parameters, in their order.
     r_square : float
-        The part of the variance that is explained.
+        The fraction of the variance that the model explains.
     rmse : float
-        The root of the (weighted) sum of squared residuals over the degrees of freedom.
+        The root of the (weighted) sum of squared residuals divided by the degrees of freedom.
     dof : int
-        The degrees of freedom: weighted samples less free parameters.
+        The degrees of freedom: the number of samples with a weight above 0, less that of free parameters.
     residuals, values : ndarray
-        y less the model, and the model, at the samples.
+        The residuals y - values, and the values of the model, at the samples.
     """
 
     formula: str
@@ -73,7 +73,7 @@ class Fit(Result):
     dof: int
     residuals: NDArray[Any]
     values: NDArray[Any]
-    # What it was made from.
+    # What the fit was made from.
     _model: _Model = dataclasses.field(init=False, repr=False)
     _x: NDArray[Any] = dataclasses.field(init=False, repr=False)
     _w: NDArray[Any] = dataclasses.field(init=False, repr=False)
@@ -100,7 +100,7 @@ class Fit(Result):
         Parameters
         ----------
         x : float or array_like
-            Where, of any shape.
+            The points, of any shape.
 
         Returns
         -------
@@ -109,14 +109,14 @@ class Fit(Result):
         return self._model.value(np.asarray(x, float), np.array([*self.parameters.values()]))[()]
 
     def confidence(self, x: ArrayLike | None = None, level: float = 0.95) -> tuple[Any, Any]:
-        """Bounds of the curve at each x by itself.
+        """Bounds of the curve, at each x separately.
 
         Parameters
         ----------
         x : float or array_like, optional
-            Where; at the samples by default.
+            The points; the samples by default.
         level : float
-            The confidence, between 0 and 1.
+            The confidence level, between 0 and 1.
 
         Returns
         -------
@@ -126,19 +126,19 @@ class Fit(Result):
         return self._band(core.Fit_confidence, x, level)
 
     def prediction(self, x: Any = None, level: Any = 0.95) -> Any:
-        """Bounds of one more observation of weight 1 at each x; arguments and results as of `confidence`."""
+        """Bounds of one more observation of weight 1 at each x; arguments and results as for `confidence`."""
         return self._band(core.Fit_prediction, x, level)
 
     def intervals(self, level: Any = 0.95) -> Any:
-        """Confidence intervals of the parameters: lower and upper bound by their names; of fixed ones their
-        value twice."""
+        """Confidence intervals of the parameters: the lower and the upper bound by name. Both bounds of a
+        fixed parameter are its value."""
         found = self._bounds(core.Fit_confidence, self._x[:0], level)
         free = iter(zip(*found[:2]))
         return {name: (float(value), float(value)) if is_fixed else tuple(map(float, next(free)))
                 for (name, value), is_fixed in zip(self.parameters.items(), self._fixed)}
 
     def derived(self, f: Callable[..., Any]) -> tuple[Any, Any]:
-        r"""What follows from the parameters, with its standard error, to first order (the law of
+        r"""A quantity derived from the parameters, and its standard error to first order (the law of
         propagation of uncertainty in the "Guide to the expression of uncertainty in measurement", 2008).
 
         .. math:: u^2 = \sum_{jk} \frac{\partial f}{\partial p_j} \frac{\partial f}{\partial p_k} C_{jk}
@@ -146,7 +146,7 @@ class Fit(Result):
         Parameters
         ----------
         f : callable
-            Takes the parameters by their order; returns a number or an array.
+            Takes the parameters in their order; returns a number or an array.
 
         Returns
         -------
@@ -162,15 +162,15 @@ class Fit(Result):
         True
         """
         p = np.array([*self.parameters.values()])
-        # Of a model without x, whose values are those of f.
+        # The bounds of a model without x, whose values are those of f.
         slopes = _Model("", self.parameters, lambda _, p: np.asarray(f(*p), float)).jacobian(None, p)
         variance = np.einsum("...j,jk,...k", slopes, self.covariance, slopes)
         return np.asarray(f(*p), float)[()], np.sqrt(np.maximum(variance, 0.0))[()]
 
     def _bounds(self, bounds: Any, x: Any, level: Any) -> Any:
-        """The export's bounds of the model that is linearised at the parameters, at the samples and at x."""
+        """The export's bounds of the model, linearised at the parameters, at the samples and at x."""
         if not 0 < level < 1:
-            refuse("fit.Fit", "level", f"must be between 0 and 1; {level} came", "ErrProbabilityOutOfRange")
+            refuse("fit.Fit", "level", f"must be between 0 and 1; got {level}", "ErrProbabilityOutOfRange")
         p = np.array([*self.parameters.values()])
         free = ~self._fixed
         rows = self._model.jacobian(np.concatenate([self._x, x]), p)[:, free]
@@ -182,7 +182,7 @@ class Fit(Result):
 
     def _band(self, bounds: Any, x: Any, level: Any) -> Any:
         at = self._x if x is None else np.asarray(x, float)
-        shape = at.shape[:1 - self._x.ndim or None]  # without that of a row
+        shape = at.shape[:1 - self._x.ndim or None]  # without the dimensions of a row
         new = at.reshape(-1, *self._x.shape[1:]) if x is not None else self._x[:0]
         lower, upper = self._bounds(bounds, new, level)[-2:]
         if x is not None:
@@ -191,14 +191,14 @@ class Fit(Result):
         return middle + lower[()], middle + upper[()]
 
     def plot(self, axes: Any = None, level: float = 0.95) -> Any:
-        """Draws samples, model and the bounds of the curve with matplotlib.
+        """Plots the samples, the model and the bounds of the curve with matplotlib.
 
         Parameters
         ----------
         axes : matplotlib Axes, optional
             Where to draw; new ones by default.
         level : float
-            The confidence of the bounds.
+            The confidence level of the bounds.
 
         Returns
         -------
@@ -216,9 +216,9 @@ class Fit(Result):
 
 
 class _Model:
-    """A formula, the names of its parameters, its values, and its derivatives by them in columns."""
+    """A formula, the names of its parameters, its values, and its derivatives with respect to them in columns."""
 
-    made_by: tuple[Any, ...]  # how it is pickled
+    made_by: tuple[Any, ...]  # the function and arguments that make it, for pickling
 
     def __init__(self, formula: Any, names: Any, value: Any, jacobian: Any = None) -> None:
         self.formula, self.names, self.value = formula, list(names), value
@@ -238,7 +238,7 @@ class _Model:
 
 
 def _maker(build: Any) -> Any:
-    """A maker of models, which are pickled by its name and arguments."""
+    """Decorates a function that makes models, so that they are pickled by its name and arguments."""
     @functools.wraps(build)
     def make(*arguments: Any) -> Any:
         model = build(*arguments)
@@ -298,7 +298,7 @@ def _gaussian(offset: Any) -> Any:
 
 @_maker
 def _rows(names: Any) -> Any:
-    """y = H c, whose x are rows."""
+    """y = H c, where each x is a row."""
     return _Model("H c", names, lambda H, p: np.asarray(H, float) @ p, lambda H, p: np.asarray(H, float))
 
 
@@ -316,10 +316,10 @@ def _of_vector(f: Any, names: Any, jacobian: Any) -> Any:
 
 
 def _samples(function: Any, x: Any, y: Any, sigma: Any) -> tuple[NDArray[Any], NDArray[Any], NDArray[Any]]:
-    """x, y and weights 1 / sigma^2, or none."""
+    """x, y and the weights 1 / sigma^2, which are empty without sigma."""
     x, y = (vector(one, f"fit.{function}", name).astype(float) for one, name in ((x, "x"), (y, "y")))
     if len(x) != len(y):
-        refuse(f"fit.{function}", "x, y", f"must be of one length; {len(x)} and {len(y)} came",
+        refuse(f"fit.{function}", "x, y", f"must have the same length; got {len(x)} and {len(y)}",
                "ErrSizeMismatch")
     if sigma is None:
         return x, y, EMPTY
@@ -331,7 +331,7 @@ def _samples(function: Any, x: Any, y: Any, sigma: Any) -> tuple[NDArray[Any], N
 
 def _finished(model: Any, x: Any, y: Any, w: Any, p: Any, fixed: Any = None, absolute: Any = False,
               covariance: Any = None) -> Any:
-    """The Fit of parameters that were found, and their covariance where it is known."""
+    """The Fit for the parameters found, and for their covariance where it is known."""
     p = np.array([float(one) for one in p])
     fixed = np.zeros(len(p), bool) if fixed is None else np.asarray(fixed, bool)
     values = model.value(x, p)
@@ -369,7 +369,7 @@ def _limits(function: Any, names: Any, bounds: Any, guess: Any, fixed: Any) -> A
     lower = [float(bounds.get(name, (-math.inf, math.inf))[0]) for name in every]
     upper = [float(bounds.get(name, (-math.inf, math.inf))[1]) for name in every]
     if any(not low <= high for low, high in zip(lower, upper)):
-        refuse(f"fit.{function}", "bounds", "a lower one is above its upper one", "ErrBoundsCrossed")
+        refuse(f"fit.{function}", "bounds", "a lower bound is above its upper bound", "ErrBoundsCrossed")
     start = []
     if guess:
         if missing := [name for name in names if name not in guess]:
@@ -380,7 +380,7 @@ def _limits(function: Any, names: Any, bounds: Any, guess: Any, fixed: Any) -> A
 
 def _bounded(function: Any, run: Any, model: Any, x: Any, y: Any, w: Any, bounds: Any, guess: Any, method: Any,
              fixed: Any) -> Any:
-    """A fit by an export that knows bounds, start values and methods."""
+    """A fit by an export that takes bounds, start values and methods."""
     code = chosen(f"fit.{function}", "method", method, METHODS)
     lower, upper, start = _limits(function, model.names, bounds, guess, fixed)
     p = run(y, x, w, start, lower, upper, code)
@@ -397,25 +397,25 @@ def line(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, bounds: dic
     x, y : array_like
         The samples.
     sigma : float or array_like, optional
-        The standard deviation of each y, up to a factor.
+        The standard deviation of each y, up to a common factor.
     bounds : dict, optional
-        By the name of a parameter its lower and upper bound; equal ones fix it.
+        The lower and upper bounds of parameters by name; equal bounds fix a parameter.
     method : {"least squares", "absolute", "bisquare"}
-        What is made least: the squares of the residuals, their absolute values, or squares without those
-        far off.
+        What is minimised: the squares of the residuals, their absolute values, or squares in which outliers
+        have no weight.
 
     Returns
     -------
     Fit
-        With the parameters a, the slope, and b.
+        The fit, with the parameters a, the slope, and b.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -458,15 +458,15 @@ def polynomial(x: ArrayLike, y: ArrayLike, degree: int, sigma: ArrayLike | None 
     Returns
     -------
     Fit
-        With the parameters c0, c1, ...
+        The fit, with the parameters c0, c1, ...
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -476,7 +476,7 @@ def polynomial(x: ArrayLike, y: ArrayLike, degree: int, sigma: ArrayLike | None 
     """
     degree = whole_number("fit.polynomial", "degree", degree, 0, "ErrPolynomialOrderNegative")
     if degree > 25:
-        refuse("fit.polynomial", "degree", f"must be at most 25; {degree} came", "ErrPolynomialOrderTooHigh")
+        refuse("fit.polynomial", "degree", f"must be at most 25; got {degree}", "ErrPolynomialOrderTooHigh")
     x, y, w = _samples("polynomial", x, y, sigma)
     names = [f"c{j}" for j in range(degree + 1)]
     given = fixed or {}
@@ -497,11 +497,11 @@ def exponential(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offs
     sigma : float or array_like, optional
         The standard deviation of each y, up to a factor.
     offset : bool
-        Whether there is a constant c.
+        Whether the model has a constant c.
     bounds : dict, optional
         By the name of a parameter its lower and upper bound; equal ones fix it.
     guess : dict, optional
-        Start values by the names of the parameters.
+        Start values of the parameters by name.
     method : {"least squares", "absolute", "bisquare"}
         What is made least: the squares of the residuals, their absolute values, or squares without those
         far off.
@@ -509,15 +509,15 @@ def exponential(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offs
     Returns
     -------
     Fit
-        With the parameters a, b, c.
+        The fit, with the parameters a, b, c.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -544,11 +544,11 @@ def power(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset: bo
     sigma : float or array_like, optional
         The standard deviation of each y, up to a factor.
     offset : bool
-        Whether there is a constant c.
+        Whether the model has a constant c.
     bounds : dict, optional
         By the name of a parameter its lower and upper bound; equal ones fix it.
     guess : dict, optional
-        Start values by the names of the parameters.
+        Start values of the parameters by name.
     method : {"least squares", "absolute", "bisquare"}
         What is made least: the squares of the residuals, their absolute values, or squares without those
         far off.
@@ -556,15 +556,15 @@ def power(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset: bo
     Returns
     -------
     Fit
-        With the parameters a, b, c.
+        The fit, with the parameters a, b, c.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -595,7 +595,7 @@ def logarithm(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, bounds
     bounds : dict, optional
         By the name of a parameter its lower and upper bound; equal ones fix it.
     guess : dict, optional
-        Start values by the names of the parameters.
+        Start values of the parameters by name.
     method : {"least squares", "absolute", "bisquare"}
         What is made least: the squares of the residuals, their absolute values, or squares without those
         far off.
@@ -603,15 +603,15 @@ def logarithm(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, bounds
     Returns
     -------
     Fit
-        With the parameters a, b.
+        The fit, with the parameters a, b.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -640,11 +640,11 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
     sigma : float or array_like, optional
         The standard deviation of each y, up to a factor.
     offset : bool
-        Whether there is a constant c.
+        Whether the model has a constant c.
     bounds : dict, optional
         By the name of a parameter its lower and upper bound; equal ones fix it.
     guess : dict, optional
-        Start values by the names of the parameters.
+        Start values of the parameters by name.
     method : {"least squares", "absolute", "bisquare"}
         What is made least: the squares of the residuals, their absolute values, or squares without those
         far off.
@@ -652,20 +652,20 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
     Returns
     -------
     Fit
-        With the parameters a, m, s, c.
+        The fit, with the parameters a, m, s, c.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If there is no fit.
+        If no fit is found.
 
     Warns
     -----
     QxWarning
-        If the fit does not come to an end: there may be no peak in the data.
+        If the fit does not converge: there may be no peak in the data.
 
     Examples
     --------
@@ -686,13 +686,13 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
 
 
 def _as_far_as_it_goes(names: Any, run: Any) -> Any:
-    """The parameters of a fit, with a warning where it has not come to an end."""
+    """The parameters of a fit, with a warning where it has not converged."""
     try:
         return run()
     except QxError as error:
         if error.name != "ErrIterationLimit" or not isinstance(error.results, dict):
             raise
-        warn(QxWarning("qx.fit.gaussian", error.code, f"qx.fit.gaussian: the fit has not come to an end in {ITERATIONS} "
+        warn(QxWarning("qx.fit.gaussian", error.code, f"qx.fit.gaussian: the fit has not converged in {ITERATIONS} "
                                                       "steps: the data may have no peak"))
         return [error.results[name] for name in names]
 
@@ -710,20 +710,20 @@ def linear(H: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
     sigma : float or array_like, optional
         The standard deviation of each y, up to a factor.
     names : sequence of str, optional
-        Names of the parameters; c0, c1, ... by default.
+        The names of the parameters; c0, c1, ... by default.
 
     Returns
     -------
     Fit
-        `predict` and the bands take further rows.
+        The fit; `predict` and the bands take further rows.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -733,10 +733,10 @@ def linear(H: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
     """
     H = np.asarray(H, float)
     if H.ndim != 2:
-        refuse("fit.linear", "H", f"two dimensions are needed; {H.ndim} came", "ErrSizesDisagree")
+        refuse("fit.linear", "H", f"two dimensions are needed; got {H.ndim}", "ErrSizesDisagree")
     names = [f"c{j}" for j in range(H.shape[1])] if names is None else list(names)
     if len(names) != H.shape[1]:
-        refuse("fit.linear", "names", f"{H.shape[1]} are needed; {len(names)} came", "ErrSizesDisagree")
+        refuse("fit.linear", "names", f"{H.shape[1]} names are needed; got {len(names)}", "ErrSizesDisagree")
     _, y, w = _samples("linear", np.zeros(len(H)), y, sigma)
     p = core.linear(H, y, w, AS_EPSILON, 0)[0]
     return _finished(_rows(tuple(names)), H, y, w, p)
@@ -747,34 +747,35 @@ def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, An
           absolute_sigma: bool = False, jacobian: Callable[..., Any] | None = None,
           loss: Literal["linear", "soft_l1", "huber", "cauchy", "arctan"] = "linear",
           scale: float = 1.0) -> Fit:
-    """Any model, by a trust region (J. J. More, "The Levenberg-Marquardt algorithm: implementation and
-    theory", 1978).
+    """Fits any model, by a trust-region method (J. J. More, "The Levenberg-Marquardt algorithm:
+    implementation and theory", 1978).
 
     Parameters
     ----------
     f : callable
-        f(x, a, b, ...): the model; the names of its arguments are those of the parameters. An exception in
-        it ends the fit.
+        f(x, a, b, ...): the model. The parameters have the names of its arguments. An exception that it
+        raises ends the fit.
     x, y : array_like
         The samples.
     guess : dict or sequence
         Start values, by name or in the order of the arguments.
     sigma : float or array_like, optional
-        The standard deviation of each y, up to a factor.
+        The standard deviation of each y, up to a common factor.
     bounds : dict, optional
-        By the name of a parameter its lower and upper bound; equal ones fix it. f is not asked for values
-        beyond them.
+        The lower and upper bounds of parameters by name; equal bounds fix a parameter. f is not evaluated
+        beyond the bounds.
     absolute_sigma : bool
-        Whether sigma are the standard deviations themselves: the covariance then does not take the
-        scatter of the residuals.
+        Whether sigma are the actual standard deviations. The covariance is then not scaled by the scatter
+        of the residuals.
     jacobian : callable, optional
-        jacobian(x, a, b, ...): the derivatives of f by its parameters, a row for each sample. By
-        differences where there is none.
+        jacobian(x, a, b, ...): the derivatives of f with respect to its parameters, a row for each sample.
+        By default, they are approximated by differences.
     loss : {"linear", "soft_l1", "huber", "cauchy", "arctan"}
-        How squared residuals count, as of `scipy.optimize.least_squares`: all but "linear" count
-        less what lies far off. The covariance is to first order, as the loss counts the derivatives.
+        The loss function of the squared residuals, as for `scipy.optimize.least_squares`. All but "linear"
+        reduce the influence of outliers. The covariance holds to first order, with the derivatives weighted
+        by the loss.
     scale : float
-        From which residual on, in units of sigma, that is.
+        The size of the residuals, in units of sigma, from which the loss reduces their influence.
 
     Returns
     -------
@@ -783,16 +784,16 @@ def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, An
     Warns
     -----
     QxWarning
-        If the samples do not determine each parameter, whose errors are infinite then, or the parameters
-        are not at rest to 7 digits.
+        If the samples do not determine all parameters, whose errors are then infinite, or the parameters
+        have not settled to 7 digits.
 
     Raises
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma or the scale is not
-        above 0, bounds cross, or a word is none of its words.
+        above 0, a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -807,7 +808,7 @@ def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, An
     given = guess if isinstance(guess, dict) else [*guess]
     start = given if isinstance(given, dict) else dict(zip(names, given))
     if len(given) != len(names) or set(start) != set(names):
-        refuse("fit.curve", "guess", f"values for {', '.join(names)} are needed; {guess!r} came", "ErrFitStartValues")
+        refuse("fit.curve", "guess", f"values for {', '.join(names)} are needed; got {guess!r}", "ErrFitStartValues")
     x, y, w = _samples("curve", x, y, sigma)
     return _nonlinear("curve", _any(f, tuple(names), jacobian), x, y, w, start, bounds, absolute_sigma,
                       jacobian is not None, loss, scale)
@@ -818,12 +819,12 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
               absolute_sigma: bool = False, jacobian: Callable[..., Any] | None = None,
               loss: Literal["linear", "soft_l1", "huber", "cauchy", "arctan"] = "linear",
               scale: float = 1.0, names: Sequence[str] | None = None) -> Fit:
-    """As `curve`, for models f(x, p) whose parameters are an array, of samples with one or several x each.
+    """Like `curve`, for models f(x, p) with an array of parameters, and samples with one or more x each.
 
     Parameters
     ----------
     f : callable
-        f(x, p): the model. An exception in it ends the fit.
+        f(x, p): the model. An exception that it raises ends the fit.
     x : array_like
         A number, a row or an array for each sample.
     y : array_like
@@ -831,13 +832,13 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
     guess : sequence
         Start values of p.
     sigma, absolute_sigma, loss, scale : optional
-        As of `curve`.
+        As for `curve`.
     bounds : dict, optional
         By the name of a parameter its lower and upper bound; equal ones fix it.
     jacobian : callable, optional
-        jacobian(x, p): the derivatives of f by p, a row for each sample.
+        jacobian(x, p): the derivatives of f with respect to p, a row for each sample.
     names : sequence of str, optional
-        Names of the parameters; p0, p1, ... by default.
+        The names of the parameters; p0, p1, ... by default.
 
     Returns
     -------
@@ -847,9 +848,9 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
     ------
     ValueError
         If x and y differ in length, there are fewer samples than parameters, a sigma or the scale is not
-        above 0, bounds cross, or a word is none of its words.
+        above 0, a lower bound is above its upper bound, or an option is not a valid choice.
     QxError
-        If the fit does not come to an end.
+        If the fit does not converge.
 
     Examples
     --------
@@ -864,10 +865,10 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
     start = [float(one) for one in guess]
     names = [f"p{j}" for j in range(len(start))] if names is None else list(names)
     if len(names) != len(start) or len(set(names)) < len(names):
-        refuse("fit.nonlinear", "names", f"{len(start)} different ones are needed; {names!r} came", "ErrSizesDisagree")
+        refuse("fit.nonlinear", "names", f"{len(start)} different names are needed; got {names!r}", "ErrSizesDisagree")
     x = np.asarray(x, float)
     if not x.ndim:
-        refuse("fit.nonlinear", "x", "a number or a row for each sample is needed; one number came", "ErrEmptyInput")
+        refuse("fit.nonlinear", "x", "a number or a row for each sample is needed; got one number", "ErrEmptyInput")
     _, y, w = _samples("nonlinear", np.zeros(len(x)), y, sigma)
     return _nonlinear("nonlinear", _of_vector(f, tuple(names), jacobian), x, y, w, dict(zip(names, start)), bounds,
                       absolute_sigma, jacobian is not None, loss, scale)
@@ -875,14 +876,14 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
 
 def _nonlinear(function: Any, model: Any, x: Any, y: Any, w: Any, start: Any, bounds: Any, absolute: Any,
                has_jacobian: Any, loss: Any, scale: Any) -> Any:
-    """The fit of a model whose values and derivatives are those of Python functions."""
+    """The fit of a model whose values and derivatives are computed by Python functions."""
     code = chosen(f"fit.{function}", "loss", loss, LOSSES)
     names = model.names
     if len(x) < len(names):
-        refuse(f"fit.{function}", "x", f"at least {len(names)} samples are needed; {len(x)} came",
+        refuse(f"fit.{function}", "x", f"at least {len(names)} samples are needed; got {len(x)}",
                "ErrFitPointsTooFew")
     if not scale > 0:
-        refuse(f"fit.{function}", "scale", f"must be above 0; {scale} came", "ErrNotStrictlyPositive")
+        refuse(f"fit.{function}", "scale", f"must be above 0; got {scale}", "ErrNotStrictlyPositive")
     lower, upper, p = _limits(function, names, bounds, start, {})
     export = getattr(core, function)
     jacobian = (lambda _, p: model.jacobian(x, p)) if has_jacobian else None
@@ -908,36 +909,36 @@ def _nonlinear(function: Any, model: Any, x: Any, y: Any, w: Any, start: Any, bo
 
 
 class SmoothingSpline:
-    r"""The natural cubic spline that is near the samples and smooth.
+    r"""The smoothing spline: a natural cubic spline that is a compromise between closeness and smoothness.
 
-    It has the least sum of :math:`((y - s(x)) / \sigma)^2 + \lambda \int s''^2`, with lambda by
-    generalised cross validation where nothing is said. C. H. Reinsch, "Smoothing by spline functions",
-    1967; P. Craven, G. Wahba, "Smoothing noisy data with spline functions", 1979.
+    It minimises :math:`\sum ((y - s(x)) / \sigma)^2 + \lambda \int s''^2`. By default, lambda is chosen by
+    generalised cross validation. C. H. Reinsch, "Smoothing by spline functions", 1967; P. Craven, G. Wahba,
+    "Smoothing noisy data with spline functions", 1979.
 
     Parameters
     ----------
     x, y : array_like
-        The samples; x rises.
+        The samples; x is increasing.
     sigma : float or array_like, optional
         The standard deviation of each y.
     smoothing : float, optional
-        lambda: 0 goes through all samples.
+        lambda; with 0, the spline passes through all samples.
     residual : float, optional
-        Instead of lambda, the sum of squared (y - s) / sigma that the smoothest spline may have.
+        Instead of lambda, the sum of squares of (y - s) / sigma that the spline is allowed to have.
 
     Attributes
     ----------
     x, values : ndarray
-        Where the samples are, and the spline there.
+        The abscissae of the samples, and the values of the spline there.
     smoothing : float
         lambda.
     effective_parameters : float
-        How many parameters the spline is worth.
+        The effective number of parameters of the spline.
 
     Raises
     ------
     ValueError
-        If x and y differ in length, x does not rise, or a sigma is not above 0.
+        If x and y differ in length, x is not increasing, or a sigma is not above 0.
 
     Examples
     --------
@@ -951,7 +952,7 @@ class SmoothingSpline:
     def __init__(self, x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
                  smoothing: float | None = None, residual: float | None = None) -> None:
         if smoothing is not None and residual is not None:
-            refuse("fit.SmoothingSpline", "smoothing, residual", "one of both is given")
+            refuse("fit.SmoothingSpline", "smoothing, residual", "only one of them may be given")
         x, y, w = _samples("SmoothingSpline", x, y, sigma)
         method, parameter = (1, float(smoothing)) if smoothing is not None else \
             (2, float(residual)) if residual is not None else (0, 0.0)
@@ -960,7 +961,7 @@ class SmoothingSpline:
             x, y, 1 / np.sqrt(w) if len(w) else EMPTY, method, parameter)
 
     def __call__(self, xi: Any, derivative: Any = 0) -> Any:
-        """The spline, or a derivative from 0 to 3, at xi; beyond the samples it is a line."""
+        """The spline, or its derivative of order 0 to 3, at xi; beyond the samples the spline is a line."""
         xi = np.asarray(xi, float)
         if len(self.x) == 1:
             return (np.full(xi.shape, self.values[0]) if not derivative else np.zeros(xi.shape))[()]
@@ -980,23 +981,23 @@ class SmoothingSpline:
 
 
 class BSpline:
-    """The spline of a degree and with few knots that fits the samples best by least squares.
+    """The least-squares spline of a given degree with a few knots.
 
     Parameters
     ----------
     x, y : array_like
-        The samples; x does not fall.
+        The samples; x is not decreasing.
     knots : int or array_like
-        How many interior knots, at quantiles of x; or where they are.
+        The number of interior knots, which are placed at quantiles of x; or the knots themselves.
     degree : int
-        From 1 to 9.
+        The degree of the spline, from 1 to 9.
     sigma : float or array_like, optional
         The standard deviation of each y.
 
     Attributes
     ----------
     knots, coefficients : ndarray
-        Of the B-splines (C. de Boor, "A Practical Guide to Splines", 1978).
+        The knots and coefficients of the B-splines (C. de Boor, "A Practical Guide to Splines", 1978).
     values : ndarray
         The spline at the samples.
     mse : float
@@ -1005,7 +1006,7 @@ class BSpline:
     Raises
     ------
     ValueError
-        If x and y differ in length, x falls, degree is not from 1 to 9, or there are too many knots.
+        If x and y differ in length, x decreases, degree is not from 1 to 9, or there are too many knots.
 
     Examples
     --------
@@ -1026,7 +1027,7 @@ class BSpline:
             x, y, w, self.degree, interior, places)
 
     def __call__(self, xi: Any) -> Any:
-        """The spline at xi, by de Boor's recurrence; beyond the samples the end pieces go on."""
+        """The spline at xi, by de Boor's recurrence; beyond the samples the end pieces are extrapolated."""
         xi = np.asarray(xi, float)
         k, t = self.degree, self.knots
         i = np.clip(np.searchsorted(t, xi, "right") - 1, k, len(t) - k - 2)

@@ -1,4 +1,4 @@
-"""Fits of a model to two columns of a table: which columns they are, and how the result is told and shown."""
+"""Fits of a model to two columns of a table: the choice of the columns, and the presentation of the result."""
 
 import dataclasses
 import math
@@ -16,14 +16,14 @@ from .sections import number, uncertain
 METHODS = ("least squares", "absolute", "bisquare")
 FORMULAS = {"line": ("a x + b", "ab"), "exponential": ("a exp(b x) + c", "abc"), "power": ("a x^b + c", "abc"),
             "logarithm": ("a ln(b x)", "ab"), "gaussian": ("a exp(-((x - m) / s)^2 / 2) + c", "amsc")}
-TIED = 0.9999  # correlation of parameters of which only a combination is known
+TIED = 0.9999  # correlation from which only a combination of parameters is known
 FAR = 100.0  # times the range of the data
 
 
 @dataclasses.dataclass
 class Options:
-    """What a fit may be told, values by the names of the parameters."""
-    method: int = 0  # of METHODS
+    """The options of a fit; values are given by the names of the parameters."""
+    method: int = 0  # index in METHODS
     guess: dict = dataclasses.field(default_factory=dict)
     lower: dict = dataclasses.field(default_factory=dict)
     upper: dict = dataclasses.field(default_factory=dict)
@@ -64,9 +64,9 @@ def _label(layout, column):
 
 def read(path, x=None, y=None, weights=None, decimal=None, missing=None, time=None, dates=None,
          thousands=False):
-    """Two columns of a table, and a third one with weights. Each is a name or a number from 1; x is the column
-    `time`, the first one where neither is said, and y the first other one. With `time` "none", and for a table
-    of one column, x is the number of the row. The others are as in recording.read."""
+    """Two columns of a table, and a third one with weights. Each is a name or a number from 1. By default, x is
+    the column `time`, or else the first one, and y is the first other column. With `time` "none", and for a table
+    of one column, x is the row number. The other arguments are those of recording.read."""
     return isolation.read(_read, path, x, y, weights, decimal, missing, time, dates, thousands)
 
 
@@ -132,10 +132,10 @@ def fit(model, columns, options=Options(), order=2):
 
 
 def doubts(model, found, columns):
-    """Why parameters may mean nothing, in sentences."""
+    """Reasons why the parameters may be meaningless, as sentences."""
     free = [name for name in found.parameters if found.errors[name] != 0]
     if found.dof <= 0:
-        return ["there are no more samples than parameters, so that nothing says how well they are known"]
+        return ["there are no more samples than parameters, so their uncertainties are unknown"]
     said = []
     unknown = [name for name in free if not math.isfinite(found.errors[name])]
     if unknown:
@@ -147,9 +147,9 @@ def doubts(model, found, columns):
         if 2 * found.errors["a"] > abs(height):
             said.append(f"a is below twice its standard error: there may be no {model} in the data")
         if abs(height) > FAR * spread:
-            said.append(f"a is {abs(height) / spread:.2g} times the range of the data, which do not reach there")
+            said.append(f"a is {abs(height) / spread:.2g} times the range of the data, which do not extend that far")
     if model == "gaussian" and not columns.x.min() <= found.parameters["m"] <= columns.x.max():
-        said.append("m is outside the data, which have no top of a bell")
+        said.append("m is outside the data, which do not contain the peak")
     return said
 
 
@@ -185,7 +185,7 @@ def _deviation(found):
 
 
 def plots(result):
-    """Data and fit, and residuals."""
+    """The plots of data and fit, and of the residuals."""
     found, columns = result.fit, result.columns
     fine = np.linspace(columns.x.min(), columns.x.max(), 500)
     x = np.concatenate([columns.x, fine])
@@ -202,5 +202,5 @@ def plots(result):
 
 
 def plot(result, path):
-    """Data and fit above, residuals below; the suffix of the path says the format."""
+    """Plots data and fit above and residuals below. The suffix of the path determines the format."""
     drawing.save(plots(result), path, "fit", [2, 1])

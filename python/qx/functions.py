@@ -1,8 +1,8 @@
 """Every export as a Python function.
 
-A function is written from the catalogue, one line for what each argument needs before the call and
-one for what it gives after it, and compiled at its first use. That makes it a plain function, with
-a signature, names for arguments and the header's text, and costs nothing at a call that the export
+The source of a function is generated from the catalogue, with a line for what each argument needs before
+the call and a line for what it returns after it, and is compiled at its first use. The result is a plain
+function with a signature, named arguments and the header's text, and a call does nothing that the export
 does not need.
 """
 
@@ -42,13 +42,13 @@ def is_taken(argument):
 
 
 def gives_value(entry):
-    """Whether the function result is a value and no status."""
+    """Whether the function result is a value rather than a status."""
     return (not any(map(is_taken, entry["arguments"])) and entry["returns"] not in ("ErrorCode", "void")
             and not any(a["kind"] == "error" for a in entry["arguments"]))
 
 
 def is_of_scalars(entry):
-    """A function of numbers, which maps over arrays."""
+    """Whether the export is a function of numbers, which is mapped over arrays."""
     arguments = entry["arguments"]
     return any(map(is_given, arguments)) and entry["returns"] in (*RESULTS, "void") and all(
         a["kind"] in ("value", "reference", "output", "error") for a in arguments)
@@ -59,7 +59,7 @@ def plain_type(element):
 
 
 def annotation(argument):
-    """The type of an argument or a result for readers and type checkers."""
+    """The type of an argument or a result, for readers and type checkers."""
     kind, element, given = argument["kind"], argument.get("element"), argument["direction"] != "out"
     if kind.startswith("array") or kind == "buffer":
         if given:
@@ -98,7 +98,7 @@ def returned(entry):
 
 
 def documentation(entry):
-    """What is said of an export itself, or of those whose text it takes over."""
+    """The documentation of an export, and of the exports whose documentation it shares."""
     entries = library().entries
     parts = [entry["documentation"]]
     parts += [f"{name}: {entries[name]['documentation']}" for name in entry["inherited"]]
@@ -109,7 +109,8 @@ def documentation(entry):
 
 
 def surroundings(entry):
-    """What belongs to several exports: the records and enumerations that this one takes, its family's text."""
+    """Documentation shared by several exports: the records and enumerations that this one takes, and the text of
+    its family."""
     catalogue = library().catalogue
     names = dict.fromkeys(a["element"] for a in entry["arguments"]
                           if a.get("element") in catalogue["records"] and a["element"] not in COMPLEX)
@@ -129,7 +130,7 @@ def _record_text(name, record):
     lines = [_filled(f"{name}, a dictionary. {record.get('documentation', '')}".rstrip(), "")]
     for field in record["fields"]:
         if field["type"].endswith("*"):
-            continue  # set by the export at every call
+            continue  # set by the export in every call
         kind = f"array of {field['array']}, {field['dimensions']}D" if "array" in field else field["type"]
         count = f" [{field['count']}]" if "count" in field else ""
         said = f": {field['documentation']}" if field.get("documentation") else ""
@@ -143,7 +144,7 @@ def _enumeration_text(name, one):
 
 
 def values_of(argument):
-    """What a selector may be, with a text for each: that of its enumeration, where the header names one."""
+    """The values of a selector, each with a text: that of its enumeration, if the header names one."""
     values = dict(argument.get("values", ()))
     for text in set(values.values()):
         named = re.fullmatch(r"those of (\w+)", text)
@@ -160,13 +161,13 @@ class Writer:
         self.entry, self.name = entry, entry["name"]
         self.before, self.given, self.after, self.results = [], [], [], []
         self.status = "_result" if entry["returns"] == "ErrorCode" else None
-        self.types = []  # of the arguments in C
+        self.types = []  # the C types of the arguments
         self.names = {"__name__": "qx", "_byref": ctypes.byref, "_c_void_p": ctypes.c_void_p, "_tell": tell, "_whole": whole,
                       "_real": real, "_chosen": chosen, "_c_number": c_number, "_word": plans.word,
                       "_Record": Record,
                       "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
                       "_mapped": mapped, "_Procedure": Procedure,
-                      # An argument may be called as a type is.
+                      # An argument may have the name of a type.
                       "_type": type, "_int": int, "_float": float, "_complex": complex}
         for i, argument in enumerate(entry["arguments"]):
             kind = argument["kind"]
@@ -197,7 +198,7 @@ class Writer:
         self.types.append(c_type)
 
     def _number(self, argument):
-        """Holds a real or whole number to its limits; the usual one without a call."""
+        """Checks a real or whole number against its limits; the usual types need no call."""
         name, element, place = python_name(argument), argument["element"], self._place(argument)
         if values := values_of(argument):
             held = f"_values_of_{name}"
@@ -247,7 +248,7 @@ class Writer:
         self.status = self.results.pop()
 
     def _slot(self, i, argument):
-        """What the length of a plan may depend on: the shapes of arrays, whole numbers."""
+        """The values on which the length of a plan may depend: the shapes of arrays, and whole numbers."""
         key = [repr(self.name), str(i)]
         for j, other in enumerate(self.entry["arguments"]):
             if is_given(other) and other["kind"].startswith("array"):
@@ -289,7 +290,7 @@ class Writer:
         self._pass(f"_{i}.address", FIT)
 
     def _mapping(self):
-        """The way of a function of numbers that is given arrays."""
+        """The branch of a function of numbers that is called with arrays."""
         given = [a for a in self.entry["arguments"] if is_given(a)]
         plain = " and ".join(f"_type({python_name(a)}) is {plain_type(a['element'])}" for a in given)
         values = ", ".join(map(python_name, given)) + ","
@@ -339,17 +340,17 @@ class Writer:
 
 
 def buffer(value, element, count, place):
-    """A copy as memory behind a plain pointer, which has no length of its own: the count is held
-    against the array."""
+    """A copy of an array for a plain pointer. A pointer has no length, so the size of the array is checked against
+    the count."""
     kind = arrays.kind(element, 1)
     array = np.array(kind.checked(value, place), kind.dtype)
     if array.size < count:
-        raise ValueError(f"{at(place)}: {count} elements are needed; {array.size} came")
+        raise ValueError(f"{at(place)}: {count} elements are needed; got {array.size}")
     return array
 
 
 def many(*values):
-    """Whether one of the values is no single number."""
+    """Whether one of the values is not a single number."""
     for value in values:
         if type(value) is np.ndarray:
             if value.ndim:
@@ -359,12 +360,12 @@ def many(*values):
     return False
 
 
-SEVERAL = 1 << 15  # elements from which on a function is mapped by several threads
-LETTERS = {"DBL": "d", "I32": "i", "CDB": "z"}  # of arguments by value; upper ones are pointers
+SEVERAL = 1 << 15  # number of elements from which a function is mapped by several threads
+LETTERS = {"DBL": "d", "I32": "i", "CDB": "z"}  # for arguments by value; capitals are pointers
 
 
 def form_of(entry):
-    """What a function of numbers returns and takes, as QXHostCalls of the stand-in host has it."""
+    """The return and argument types of a function of numbers, in the notation of the stand-in host's QXHostCalls."""
     letters = [LETTERS.get(a["element"], "?") for a in entry["arguments"]]
     return ("v" if entry["returns"] == "void" else "e") + "".join(
         letter if a["kind"] == "value" else letter.upper() for letter, a in zip(letters, entry["arguments"]))
@@ -372,8 +373,8 @@ def form_of(entry):
 
 @functools.cache
 def _of_columns(name):
-    """The form of an export, and of each argument: whether it is given, its type, whether it is a result, and what
-    messages call it."""
+    """The form of an export, and for each argument whether it is given, its type, whether it is a result, and its
+    name in messages."""
     entry = library().entries[name]
     return form_of(entry).encode(), [
         (is_given(a), arrays.element_dtype(a["element"]), a["element"], a["kind"] == "error", f"{name}: {a['name']}")
@@ -381,11 +382,11 @@ def _of_columns(name):
 
 
 def _spread(values, columns):
-    """The values in one shape, checked, each as consecutive elements of its type."""
+    """The values, checked and broadcast to a common shape, each as consecutive elements of its type."""
     checked, shape = [], None
     for value, (_, dtype, element, _, place) in zip(values, (column for column in columns if column[0])):
         if isinstance(value, (str, bytes)):
-            raise TypeError(f"{at(place)}: a number is needed; {shown(value)} came")
+            raise TypeError(f"{at(place)}: a number is needed; got {shown(value)}")
         is_single = type(value) is float and element == "DBL" or type(value) is int and (
             element == "I32" and -2**31 <= value < 2**31)
         if not is_single:
@@ -398,12 +399,12 @@ def _spread(values, columns):
                    np.full(shape, value, dtype) for value, dtype, is_single in checked]
 
 
-FEW = 512  # elements up to which the memory of a call is kept for the next one
+FEW = 512  # number of elements up to which the memory of a call is kept for the next one
 KEPT_CALLS, KEPT_EACH = 64, 4
 
 
 class _Few:
-    """The columns of calls of few elements: memory for arguments and results, and where it is."""
+    """The columns for calls with few elements: the memory for arguments and results, and its addresses."""
 
     def __init__(self, name, function, shape):
         form, columns = _of_columns(name)
@@ -418,8 +419,8 @@ class _Few:
             (ctypes.c_void_p * len(memory))(*(array.ctypes.data for array in memory)), found.ctypes.data)
 
     def results_for(self, values):
-        """Copies of the results; None where an argument is not an array of this shape or a plain number of the
-        type of its column, or where an element has a code."""
+        """Copies of the results; None if an argument is neither an array of this shape nor a plain number of the
+        type of its column, or if an element has a code."""
         for (array, dtype, element), value in zip(self.given, values):
             if type(value) is np.ndarray:
                 if value.dtype is not dtype or value.shape != array.shape:
@@ -439,11 +440,11 @@ class _Few:
         return self.results[0].copy() if len(self.results) == 1 else tuple([array.copy() for array in self.results])
 
 
-_few = {}  # (export, shape) -> those of earlier calls
+_few = {}  # (export, shape) -> the columns of earlier calls
 
 
 def _of_few(name, function, values):
-    """The results for few elements, or None where there is more to do than to call."""
+    """The results for few elements, or None if more than a plain call is needed."""
     for value in values:
         if type(value) is np.ndarray:
             break
@@ -468,9 +469,9 @@ def _of_few(name, function, values):
 
 
 def mapped(entry, function, values):
-    """A function of scalars over arrays, element by element, with NumPy's broadcasting. The
-    function writes straight into the elements of the result, called by the stand-in host, in several threads
-    where there are many."""
+    """A function of scalars, applied to arrays element by element with NumPy's broadcasting. The stand-in host
+    calls the function, which writes directly into the elements of the result, in several threads if there are
+    many elements."""
     few = _of_few(entry["name"], function, values)
     if few is not None:
         return few
@@ -514,7 +515,7 @@ def _tell_first(name, codes):
 
 
 def signature_text(entry):
-    """How the export is called from Python, for readers."""
+    """The call of the export in Python, for readers."""
     results = [a["name"] for a in entry["arguments"] if is_taken(a)] or (
         ["value"] if gives_value(entry) else [])
     names = ", ".join(python_name(a) for a in entry["arguments"] if is_given(a))

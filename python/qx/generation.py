@@ -1,4 +1,4 @@
-"""Signals by name: waves, noises and patterns of a given number of samples."""
+"""Signals by name: waves, noise and patterns with a given number of samples."""
 
 import math
 
@@ -8,12 +8,12 @@ from . import noise, outputs, signals
 
 
 def _wave(make, *more):
-    """A continuous wave; `more` are functions of the options for what follows the phase."""
+    """A continuous wave; `more` are functions of the options for the arguments after the phase."""
     return lambda n, o: make(n, o.frequency, o.rate, o.amplitude, math.radians(o.phase), *(one(o) for one in more))
 
 
 def _times(n, o):
-    """The times of a pulse, from its own."""
+    """The times of the samples, relative to the pulse."""
     return np.arange(n) / o.rate - o.delay
 
 
@@ -40,7 +40,7 @@ SIGNALS = {
 }
 
 
-# What has a frequency, by the options that say it.
+# The signals with a frequency, and the options that give it.
 FREQUENCIES: dict[str, tuple[str, ...]] = {
     "chirp": ("frequency", "to"),
     **{name: ("frequency",) for name in ("sine", "square", "triangle", "sawtooth", "sinc", "gauss-pulse",
@@ -48,7 +48,7 @@ FREQUENCIES: dict[str, tuple[str, ...]] = {
 
 
 def generate(options):
-    """The samples that the options of the command ask for."""
+    """The samples for the options of the command."""
     for name in FREQUENCIES.get(options.signal, ()):
         frequency = getattr(options, name)
         if abs(frequency) > options.rate / 2:
@@ -59,7 +59,7 @@ def generate(options):
 
 
 def write(path, samples, rate):
-    """A table of times and values, or audio of 32-bit floats, by the name's ending."""
+    """Writes a table of times and values, or audio of 32-bit floats, depending on the extension."""
     ending = path.lower().rpartition(".")[2]
     if ending == "csv":
         times = np.arange(len(samples)) / rate

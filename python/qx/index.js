@@ -1,4 +1,4 @@
-// Sorts a table by the column whose name is clicked: numbers by their value, others as texts.
+// Sorts a table by the column whose name is clicked: numbers by value, other cells as texts.
 "use strict";
 
 for (const table of document.querySelectorAll("table.sorted")) {

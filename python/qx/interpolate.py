@@ -17,21 +17,21 @@ core = served("interpolate")
 def _table(function: str, x: ArrayLike, y: ArrayLike) -> tuple[NDArray[Any], NDArray[Any]]:
     x, y = (vector(one, f"interpolate.{function}", name).astype(float) for one, name in ((x, "x"), (y, "y")))
     if len(x) != len(y) or not len(x):
-        refuse(f"interpolate.{function}", "x, y", f"must be of one length, and not empty; {len(x)} and {len(y)} "
-               "came", "ErrSizeMismatch")
+        refuse(f"interpolate.{function}", "x, y", f"must have the same length and not be empty; got {len(x)} "
+               f"and {len(y)} values", "ErrSizeMismatch")
     return x, y
 
 
 @result
 class Interpolated(Result):
-    """Interpolated values; unpacked, values and errors.
+    """Interpolated values; unpacks into values and errors.
 
     Attributes
     ----------
     values : float or ndarray
-        At the points that were asked for.
+        The values at the requested points.
     errors : float or ndarray
-        Estimates of their errors, the last corrections.
+        Estimates of their errors: the last corrections.
     """
 
     values: NDArray[Any]
@@ -44,9 +44,9 @@ class CubicSpline:
     Parameters
     ----------
     x, y : array_like
-        The points; x rises.
+        The points; x is strictly increasing.
     start, end : float, optional
-        The slopes at the ends; a second derivative of 0 where there is none (natural spline).
+        The slopes at the ends. Without a slope, the second derivative at that end is 0 (natural spline).
 
     Attributes
     ----------
@@ -56,7 +56,7 @@ class CubicSpline:
     Raises
     ------
     ValueError
-        If x and y differ in length, are empty, or x does not rise.
+        If x and y differ in length or are empty, or x is not increasing.
 
     Examples
     --------
@@ -70,27 +70,27 @@ class CubicSpline:
                  end: float | None = None) -> None:
         self.x, self.y = _table("CubicSpline", x, y)
         if np.any(np.diff(self.x) <= 0):
-            refuse("interpolate.CubicSpline", "x", "must rise", "ErrAbscissaeOrder")
+            refuse("interpolate.CubicSpline", "x", "must be increasing", "ErrAbscissaeOrder")
         natural = float("nan")
         self.second_derivatives = core.CubicSpline(self.y, self.x, natural if start is None else float(start),
                                                    natural if end is None else float(end))
 
     def __call__(self, xi: ArrayLike, derivative: int = 0) -> Any:
-        """Values of the spline, or of a derivative.
+        """Values of the spline or of one of its derivatives.
 
         Parameters
         ----------
         xi : float or array_like
-            Where, of any shape; beyond the table the end segments go on.
+            The points, of any shape. Beyond the table, the end segments are extrapolated.
         derivative : int
-            Which derivative, from 0 to 3.
+            The order of the derivative, from 0 to 3.
 
         Returns
         -------
         float or ndarray
         """
         if derivative not in (0, 1, 2, 3):
-            refuse("interpolate.CubicSpline", "derivative", f"must be from 0 to 3; {derivative} came")
+            refuse("interpolate.CubicSpline", "derivative", f"must be from 0 to 3; got {derivative}")
         xi = np.asarray(xi, float)
         if len(self.x) == 1:
             return (np.full(xi.shape, self.y[0]) if not derivative else np.zeros(xi.shape))[()]
@@ -117,7 +117,7 @@ def _each(run: Any, xi: Any) -> Any:
 
 
 def linear(xi: ArrayLike, x: ArrayLike, y: ArrayLike) -> Any:
-    """Straight lines between the points of a table; beyond it the first and the last value.
+    """Linear interpolation in a table; beyond its ends, the first or the last value.
 
     Parameters
     ----------
@@ -133,7 +133,7 @@ def linear(xi: ArrayLike, x: ArrayLike, y: ArrayLike) -> Any:
     Raises
     ------
     ValueError
-        If x and y differ in length, are empty, or x does not rise.
+        If x and y differ in length or are empty, or x is not increasing.
 
     Examples
     --------
@@ -143,7 +143,7 @@ def linear(xi: ArrayLike, x: ArrayLike, y: ArrayLike) -> Any:
     """
     x, y = _table("linear", x, y)
     if np.any(np.diff(x) <= 0):
-        refuse("interpolate.linear", "x", "must rise", "ErrAbscissaeOrder")
+        refuse("interpolate.linear", "x", "must be increasing", "ErrAbscissaeOrder")
     return np.interp(np.asarray(xi, float), x, y)[()]
 
 

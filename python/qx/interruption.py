@@ -1,8 +1,8 @@
-"""Ctrl-C on the command line: one line, and the process has ended within a second.
+"""Handles Ctrl-C on the command line: it prints one line and ends the process within a second.
 
-The interpreter raises KeyboardInterrupt once the main thread is back from whatever C code it is in,
-which may be long, and then all that is open is closed. So a second thread, woken by the signal itself,
-ends the process where that takes too long.
+The interpreter raises KeyboardInterrupt only when the main thread returns from C code, which may take long, and then
+closes everything that is open. Therefore a second thread, woken by the signal itself, ends the process if this takes
+too long.
 """
 
 import atexit
@@ -22,7 +22,7 @@ EXIT = 128 + signal.SIGINT
 
 
 class Watch:
-    """While it is entered, an interruption ends the process in time."""
+    """A context manager within which an interruption ends the process in time."""
 
     def __init__(self):
         self._telling = threading.Lock()
@@ -33,7 +33,7 @@ class Watch:
         self._sender.setblocking(False)
         signal.set_wakeup_fd(self._sender.fileno(), warn_on_full_buffer=False)
         threading.Thread(target=self._wait, daemon=True).start()
-        atexit.register(self._end)  # what is registered later runs before
+        atexit.register(self._end)  # functions that are registered later run earlier
         return self
 
     def __exit__(self, kind, *_):
@@ -49,7 +49,7 @@ class Watch:
             threading.Event().wait(SECONDS)
             forget_all()
             self._tell()
-            ctypes.CDLL(None).signal(signal.SIGINT, None)  # Python's own is for the main thread alone
+            ctypes.CDLL(None).signal(signal.SIGINT, None)  # Python's own function works only in the main thread
             os.kill(os.getpid(), signal.SIGINT)
             time.sleep(0.1)
             os.kill(os.getpid(), signal.SIGKILL)
@@ -58,12 +58,12 @@ class Watch:
         with self._telling:
             if not self._told:
                 self._told = True
-                start = "\r" if sys.stderr.isatty() else ""  # in place of the ^C that a terminal shows
+                start = "\r" if sys.stderr.isatty() else ""  # overwrites the ^C that a terminal shows
                 with contextlib.suppress(OSError):
                     os.write(2, f"{start}qx: interrupted\n".encode())
 
     def _end(self):
-        """Ends the process as the signal does by default, so that a shell's loop ends as well."""
+        """Ends the process by the default action of the signal, so that a shell's loop ends as well."""
         if self._told:
             signal.signal(signal.SIGINT, signal.SIG_DFL)
             os.kill(os.getpid(), signal.SIGINT)

@@ -1,13 +1,15 @@
-"""Files are read in a process of its own, with limits: where a library crashes, hangs or takes all memory over a
-file, that file is refused with one line, and the process of the user goes on.
+"""Files are read in a separate process with limits. If a library crashes, hangs or takes all memory while reading a
+file, that file is refused with one line, and the user's process goes on.
 
     result = read(function, path, *arguments, told=progress)
 
-calls function(tell, path, file, *arguments) in a worker: `file` is where the contents are, `path` what messages
-name, and what the function gives to `tell` is given to `told` here. What it raises is raised here. A worker is kept
-for the next file, since its start takes about 0.2 s. Results come as qx/messages.py has it, without a copy.
+calls function(tell, path, file, *arguments) in a worker. `file` is the file with the contents, and `path` its name
+in messages. Values that the function passes to `tell` are passed to `told` in this process, and exceptions that it
+raises are raised in this process. A worker is kept for the next file, since starting one takes about 0.2 s. Results
+are sent by qx/messages.py, without a copy.
 
-The limits keep faults and floods away and are no sandbox: a worker has the rights of the user.
+The limits protect against faults and excessive use of resources. They are not a sandbox: a worker has the user's
+permissions.
 """
 
 import atexit
@@ -27,12 +29,12 @@ from typing import NamedTuple
 
 from .files import PIPE, InputError
 
-SECONDS, SECONDS_A_BYTE = 8, 1e-5  # of processor time
+SECONDS, SECONDS_A_BYTE = 8, 1e-5  # processor time
 MEMORY, MEMORY_A_BYTE = 1 << 30, 4
-WRITTEN, WRITTEN_A_BYTE = 1 << 30, 64  # of each temporary file
-ALLOWED_SECONDS, ALLOWED_MEMORY = "QX_READ_SECONDS", "QX_READ_MB"  # in the environment, in place of these
+WRITTEN, WRITTEN_A_BYTE = 1 << 30, 64  # bytes of each temporary file
+ALLOWED_SECONDS, ALLOWED_MEMORY = "QX_READ_SECONDS", "QX_READ_MB"  # environment variables that replace these
 STILL = 30  # seconds without any processor time after which a worker counts as hanging
-KEPT = 400 << 20  # bytes; a worker that has had more is not kept for the next file
+KEPT = 400 << 20  # bytes; a worker that has used more is not kept for the next file
 START = "import sys; sys.path[:] = {!r}; from qx.isolation import serve; serve({}, {})"
 AVAILABLE = sys.platform == "linux" and bool(sys.executable)  # elsewhere files are read in the user's process
 
@@ -52,7 +54,7 @@ def limits_for(size):
 
 
 class Died(Exception):
-    """A worker has ended, or was ended, without an answer."""
+    """A worker has ended, or was terminated, without an answer."""
 
     def __init__(self, reason, crashed=False):
         super().__init__(reason)
@@ -60,7 +62,7 @@ class Died(Exception):
 
 
 class Worker:
-    """A process that reads one file after another. It ends with this one, in whatever way this one ends."""
+    """A process that reads one file after another. It ends with this process, however this process ends."""
 
     def __init__(self):
         from .messages import Channel
@@ -81,12 +83,12 @@ class Worker:
     def close(self):
         os.close(self._held)
         self._socket.close()
-        if self.owner == os.getpid():  # and no child of it, which has a copy
+        if self.owner == os.getpid():  # not a forked child, which has a copy
             self.process.kill()
             self.process.wait()
 
     def run(self, limits, folder, function, arguments, options, told):
-        """The result of function(tell, *arguments, **options), and whether the worker is good for more."""
+        """The result of function(tell, *arguments, **options), and whether the worker can be used again."""
         self.files += 1
         try:
             self._channel.send((limits, folder, _current(), function, arguments, options))
@@ -108,7 +110,7 @@ class Worker:
                 used = self._processor_time()
                 still, before = still + 1 if used == before else 0, used
                 if still >= STILL:
-                    raise Died(f"its reader has done nothing for {STILL} s and was ended") from None
+                    raise Died(f"its reader has done nothing for {STILL} s and was terminated") from None
 
     def _processor_time(self):
         with contextlib.suppress(OSError), open(f"/proc/{self.process.pid}/stat") as file:
@@ -119,7 +121,7 @@ class Worker:
         if code == -signal.SIGXCPU:
             return Died(f"reading takes more than {limits.seconds} s of processor time; {ALLOWED_SECONDS} allows more")
         if code == -signal.SIGKILL:
-            return Died("its reader was ended, perhaps for want of memory (SIGKILL)")
+            return Died("its reader was terminated, perhaps for lack of memory (SIGKILL)")
         if code < 0:
             return Died(f"its reader crashed ({signal.Signals(-code).name})", True)
         return Died(f"its reader ended with {code}", True)
@@ -143,14 +145,14 @@ def _keep(worker):
 
 
 def prepare():
-    """Starts a worker, which is ready by the time a file is to be read."""
+    """Starts a worker in advance, so that it is ready when a file is read."""
     if AVAILABLE and not _idle:
         _keep(Worker())
 
 
 @atexit.register
 def close():
-    """Ends the workers that wait."""
+    """Ends the idle workers."""
     while _idle:
         _idle.pop().close()
 
@@ -191,7 +193,7 @@ def _isolated(limits, folder, function, arguments, options, told):
         except Died as death:
             if worker.files == 1 or heard or not death.crashed:
                 raise
-            continue  # what an earlier file has left behind may be the reason
+            continue  # something left behind by an earlier file may be the reason
         finally:
             _keep(worker) if reusable else worker.close()
         if kind == "failed":
@@ -201,7 +203,7 @@ def _isolated(limits, folder, function, arguments, options, told):
 
 @contextlib.contextmanager
 def _folder():
-    """A folder for temporary files, which goes in whatever way the worker ends; None where there can be none."""
+    """A folder for temporary files, which is removed however the worker ends; None if it cannot be created."""
     try:
         folder = tempfile.mkdtemp(prefix="qx-")
     except OSError:
@@ -214,7 +216,8 @@ def _folder():
 
 
 def _named(path, folder):
-    """How messages name the input, and where its contents are: standard input and pipes go through a file."""
+    """The name of the input in messages, and the file with its contents. Standard input and pipes are copied to a
+    file."""
     if path == PIPE:
         return "standard input", _spooled("standard input", sys.stdin.buffer, folder)
     with contextlib.suppress(OSError):
@@ -241,7 +244,7 @@ def _current():
     return None
 
 
-# In the worker.
+# The following runs in the worker.
 
 def serve(descriptor, watched):
     """Reads files for the process that holds the other ends, and ends with it."""
@@ -249,11 +252,11 @@ def serve(descriptor, watched):
     import resource
 
     from .messages import Channel
-    signal.signal(signal.SIGINT, signal.SIG_IGN)  # a terminal sends it to all; the other process decides
+    signal.signal(signal.SIGINT, signal.SIG_IGN)  # a terminal sends it to all processes; the other one decides
     signal.signal(signal.SIGIO, signal.SIG_DFL)
     signal.pthread_sigmask(signal.SIG_SETMASK, ())
     fcntl.fcntl(watched, fcntl.F_SETOWN, os.getpid())
-    fcntl.fcntl(watched, fcntl.F_SETFL, os.O_ASYNC)  # SIGIO when it is closed, whatever a library is at
+    fcntl.fcntl(watched, fcntl.F_SETFL, os.O_ASYNC)  # SIGIO when it is closed, whatever a library is doing
     resource.setrlimit(resource.RLIMIT_CORE, (0, 0))
     channel = Channel(socket.socket(fileno=descriptor))
     with contextlib.suppress(EOFError, ConnectionError):
@@ -287,7 +290,7 @@ def _send(channel, answer):
 
 
 def _sendable(error, path):
-    """The exception, or a plain one where the other process could not make it anew."""
+    """The exception, or a plain one if the other process could not recreate it."""
     try:
         return pickle.loads(pickle.dumps(error))
     except Exception:

@@ -1,7 +1,7 @@
 """The module and the stand-in host as ctypes libraries, and the catalogue of the exports.
 
-ctypes.CDLL gives up the interpreter's lock for the time of every call, so calls from several
-Python threads run side by side.
+ctypes.CDLL releases the interpreter's lock during every call, so calls from several Python threads run in
+parallel.
 """
 
 import ctypes
@@ -17,12 +17,12 @@ NAMES = ("qxanalysis.dll", "qxrt.dll") if sys.platform == "win32" else (
 
 
 class NotBuilt(ImportError):
-    """The libraries are not where they are looked for."""
+    """The libraries were not found."""
 
 
 class Library:
-    """Both libraries, loaded once. The host comes first: the module looks for it by name among
-    the libraries of the process."""
+    """Both libraries, loaded once. The host is loaded first, since the module looks for it by name among the
+    libraries of the process."""
 
     def __init__(self, folder, catalogue):
         module_name, host_name = NAMES
@@ -59,8 +59,8 @@ class Library:
 
 
 def folders():
-    """Where the libraries are looked for: QX_LIBRARY_DIR alone if it is set, else beside the
-    package and in the release build of the source tree."""
+    """The folders in which the libraries are looked for: only QX_LIBRARY_DIR if it is set, or else the folder of
+    the package and the release build of the source tree."""
     chosen = os.environ.get("QX_LIBRARY_DIR")
     if chosen:
         return [Path(chosen).resolve()]
@@ -70,11 +70,11 @@ def folders():
 @functools.lru_cache(maxsize=None)
 def library():
     for folder in folders():
-        # Beside the libraries, or where an installation has it.
+        # The catalogue is beside the libraries, or where an installation has it.
         for catalogue in (folder / "catalogue.json",
                           *(prefix / "share/qxanalysis/catalogue.json" for prefix in [*folder.parents][:2])):
             if catalogue.exists() and all((folder / name).exists() for name in NAMES):
                 return Library(folder, catalogue)
     places = ", ".join(str(folder) for folder in folders())
     raise NotBuilt(f"{', '.join(NAMES)} and catalogue.json not found in {places}: build them with "
-                   "./run, or name their folder in QX_LIBRARY_DIR")
+                   "./run, or set QX_LIBRARY_DIR to their folder")

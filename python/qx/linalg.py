@@ -2,8 +2,8 @@
 equations.
 
 Names and arguments are those of `numpy.linalg` and `scipy.linalg`. Matrices may be real or complex, and
-may be stacked: what has more than two dimensions is taken matrix by matrix, in threads. A singular matrix
-is a `numpy.linalg.LinAlgError`; a system that leaves few digits is a warning.
+may be stacked: an array of more than two dimensions is processed matrix by matrix, in threads. A singular
+matrix raises `numpy.linalg.LinAlgError`; a badly conditioned system gives a warning.
 """
 
 from __future__ import annotations
@@ -30,23 +30,23 @@ __all__ = ["Eigen", "GSVD", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD
 core = served("linalg")
 
 EPS = float(np.finfo(float).eps)
-WORST = 1e-4 / EPS  # the condition from which on fewer than four digits are certain
+WORST = 1e-4 / EPS  # the condition number above which fewer than four digits are certain
 
 
 @result
 class LeastSquares(Result):
-    """A least-squares solution; unpacked as that of `numpy.linalg.lstsq`.
+    """A least-squares solution; unpacks like the result of `numpy.linalg.lstsq`.
 
     Attributes
     ----------
     x : ndarray
-        The solution, of smallest norm where there are several.
+        The solution; the one of smallest norm where there are several.
     residuals : ndarray
-        The sums of the squared residuals, one for each right side.
+        The sums of the squared residuals, one for each right-hand side.
     rank : int
         The rank of the matrix.
     singular_values : ndarray
-        Of the matrix, falling.
+        The singular values of the matrix, in descending order.
     """
 
     x: NDArray[Any]
@@ -64,7 +64,7 @@ class Eigen(Result):
     values : ndarray
         The eigenvalues.
     vectors : ndarray
-        The eigenvectors in the columns.
+        The eigenvectors, in columns.
     """
 
     values: NDArray[Any]
@@ -78,11 +78,11 @@ class SVD(Result):
     Attributes
     ----------
     u : ndarray
-        The left singular vectors in the columns.
+        The left singular vectors, in columns.
     s : ndarray
-        The singular values, falling.
+        The singular values, in descending order.
     vh : ndarray
-        The right singular vectors, conjugated, in the rows.
+        The conjugated right singular vectors, in rows.
     """
 
     u: NDArray[Any]
@@ -99,9 +99,9 @@ class QR(Result):
     q : ndarray
         Orthonormal columns.
     r : ndarray
-        An upper triangle.
+        An upper triangular matrix.
     permutation : ndarray or None
-        The order of the columns where they were exchanged.
+        The order of the columns, if they were exchanged.
     """
 
     q: NDArray[Any]
@@ -121,9 +121,9 @@ class LU(Result):
     p : ndarray
         A permutation.
     l : ndarray
-        A lower triangle with ones on the diagonal.
+        A lower triangular matrix with ones on the diagonal.
     u : ndarray
-        An upper triangle.
+        An upper triangular matrix.
     """
 
     p: NDArray[Any]
@@ -133,14 +133,14 @@ class LU(Result):
 
 @result
 class Schur(Result):
-    """A Schur form: a = z t z^H; real ones have blocks of two for conjugate eigenvalues.
+    """A Schur form: a = z t z^H. Real forms have 2-by-2 blocks for pairs of conjugate eigenvalues.
 
     Attributes
     ----------
     t : ndarray
         The (almost) triangular form.
     z : ndarray
-        Unitary.
+        A unitary matrix.
     values : ndarray
         The eigenvalues in the order of the diagonal.
     """
@@ -160,7 +160,7 @@ class QZ(Result):
     s, t : ndarray
         The (almost) triangular forms.
     q, z : ndarray
-        Unitary.
+        A unitary matrix.
     alpha, beta : ndarray
         The eigenvalues are alpha / beta.
     """
@@ -181,9 +181,9 @@ class Hessenberg(Result):
     Attributes
     ----------
     h : ndarray
-        Zero below the first subdiagonal.
+        A matrix that is zero below the first subdiagonal.
     q : ndarray
-        Unitary.
+        A unitary matrix.
     """
 
     h: NDArray[Any]
@@ -201,16 +201,16 @@ def _served(name: Any, *matrices: Any) -> Any:
 def _matrix(function: str, a: ArrayLike, is_square: bool = False, argument: str = "a") -> NDArray[Any]:
     a = as_array(a)
     if a.ndim < 2:
-        refuse(function, argument, f"at least two dimensions are needed; {a.ndim} came", "ErrNotSquare")
+        refuse(function, argument, f"at least two dimensions are needed; got {a.ndim}", "ErrNotSquare")
     if is_square and a.shape[-1] != a.shape[-2]:
-        refuse(function, argument, f"must be square; {a.shape[-2]} by {a.shape[-1]} came", "ErrNotSquare")
+        refuse(function, argument, f"must be square; got {a.shape[-2]} by {a.shape[-1]}", "ErrNotSquare")
     if not a.size:
         refuse(function, argument, "is empty", "ErrEmptyInput")
     return a
 
 
 def _each(function: Any, *stacks: Any) -> Any:
-    """The function of matrices over the stacks of them."""
+    """Applies a function of matrices to stacks of them."""
     for stack in stacks:
         if stack.ndim != 2:
             break
@@ -237,7 +237,7 @@ def _sides(function: str, a: NDArray[Any], b: ArrayLike) -> tuple[NDArray[Any], 
     is_vector = b.ndim == 1 or b.ndim == a.ndim - 1 and b.ndim > 1 and b.shape == a.shape[:-1]
     columns = b[..., None] if is_vector else b
     if columns.ndim < 2 or columns.shape[-2] != a.shape[-2]:
-        refuse(function, "b", f"must have as many rows as a, {a.shape[-2]}; shape {b.shape} came",
+        refuse(function, "b", f"must have as many rows as a, {a.shape[-2]}; got shape {b.shape}",
                "ErrSizeMismatch")
     return columns, is_vector
 
@@ -253,12 +253,12 @@ def _factors(function: Any, a: Any) -> Any:
 def _warn_of(function: Any, condition: Any) -> None:
     if not condition < WORST:
         digits = max(0, math.floor(-math.log10(EPS * condition))) if condition < np.inf else 0
-        warn(QxWarning(f"qx.{function}", 20006, f"qx.{function}: a is badly conditioned, {condition:.1e}: of the "
-                       f"result about {digits} digits are certain"))
+        warn(QxWarning(f"qx.{function}", 20006, f"qx.{function}: a is badly conditioned, {condition:.1e}: about "
+                       f"{digits} digits of the result are certain"))
 
 
 def _largest_column(a: NDArray[Any]) -> Any:
-    """The largest sum of magnitudes of a column."""
+    """The largest column sum of magnitudes."""
     return np.maximum.reduce(np.add.reduce(np.abs(a), 0))
 
 
@@ -269,30 +269,30 @@ def solve(a: ArrayLike, b: ArrayLike,
           assume: Literal["general", "positive", "lower", "upper"] = "general") -> NDArray[Any]:
     """The solution x of a x = b.
 
-    By LU factorisation with row exchanges. Where the condition number leaves fewer than four digits, a
-    `QxWarning` says so.
+    The method is LU factorisation with row exchanges. A `QxWarning` is given where the condition number
+    leaves fewer than four certain digits.
 
     Parameters
     ----------
     a : array_like
         A square matrix, or a stack of them.
     b : array_like
-        A vector, or a matrix with a right side in each column.
+        A vector, or a matrix with one right-hand side in each column.
     assume : {"general", "positive", "lower", "upper"}
-        What a is: anything, symmetric (Hermitian) and positive definite, or a triangle; the other
-        triangle is not read then.
+        The structure of a: none, symmetric (Hermitian) and positive definite, or triangular. The opposite
+        triangle of a triangular matrix is not read.
 
     Returns
     -------
     ndarray
-        Of the shape of b.
+        The same shape as b.
 
     Raises
     ------
     numpy.linalg.LinAlgError
-        If a is not square, singular, or not positive definite.
+        If a is not square, is singular, or is not positive definite as assumed.
     ValueError
-        If b does not fit a, or assume is none of its words.
+        If the shape of b does not match a, or assume is not a valid choice.
 
     Examples
     --------
@@ -321,17 +321,17 @@ def solve(a: ArrayLike, b: ArrayLike,
 
 
 def lstsq(a: ArrayLike, b: ArrayLike, rcond: float | None = None) -> LeastSquares:
-    """The x with the least sum of squares of a x - b, the smallest of them where there are several; by
-    singular values.
+    """The x that minimises the sum of squares of a x - b, of smallest norm where there are several, by the
+    singular value decomposition.
 
     Parameters
     ----------
     a : array_like
         A matrix, real or complex.
     b : array_like
-        A vector, or a matrix with a right side in each column.
+        A vector, or a matrix with one right-hand side in each column.
     rcond : float, optional
-        Singular values up to so many times the largest one count as 0; max(m, n) eps by default.
+        Singular values up to rcond times the largest one count as 0; max(m, n) eps by default.
 
     Returns
     -------
@@ -340,7 +340,7 @@ def lstsq(a: ArrayLike, b: ArrayLike, rcond: float | None = None) -> LeastSquare
     Raises
     ------
     ValueError
-        If b does not fit a, or an element is not finite.
+        If the shape of b does not match a, or an element is not finite.
 
     Examples
     --------
@@ -396,14 +396,14 @@ def inv(a: ArrayLike) -> NDArray[Any]:
 
 
 def pinv(a: ArrayLike, rcond: float | None = None) -> NDArray[Any]:
-    """The pseudo-inverse (E. H. Moore, R. Penrose), by singular values.
+    """The pseudo-inverse (E. H. Moore, R. Penrose), by the singular value decomposition.
 
     Parameters
     ----------
     a : array_like
         A matrix, real or complex.
     rcond : float, optional
-        Singular values up to so many times the largest one count as 0; max(m, n) eps by default.
+        Singular values up to rcond times the largest one count as 0; max(m, n) eps by default.
 
     Returns
     -------
@@ -496,9 +496,9 @@ def norm(a: ArrayLike, ord: int | float | str | None = None) -> float:
     a : array_like
         One or two dimensions.
     ord : int, float or str, optional
-        Of a vector the p of its p-norm, 2 by default. Of a matrix 2 or "spectral", the largest singular
-        value; 1 or inf, the largest sum of a column or a row; "fro", the root of the sum of squares,
-        which is the default.
+        For a vector, the p of its p-norm, 2 by default. For a matrix, 2 or "spectral" for the largest
+        singular value, 1 or inf for the largest column or row sum of magnitudes, or "fro" for the root of
+        the sum of squares, which is the default.
 
     Returns
     -------
@@ -507,7 +507,7 @@ def norm(a: ArrayLike, ord: int | float | str | None = None) -> float:
     Raises
     ------
     ValueError
-        If a is empty, or ord is none of its words.
+        If a is empty, or ord is not a valid choice.
 
     Examples
     --------
@@ -526,14 +526,14 @@ def norm(a: ArrayLike, ord: int | float | str | None = None) -> float:
 
 
 def cond(a: ArrayLike, p: float | Literal["fro"] | None = None) -> float:
-    """The condition number: by how much relative errors of the right side of a system may grow.
+    """The condition number: the factor by which relative errors of the right-hand side of a system may grow.
 
     Parameters
     ----------
     a : array_like
         A matrix, real or complex.
     p : {None, 2, 1, inf, "fro"}
-        The norm; by default 2, the ratio of the singular values.
+        The norm; by default 2, for the ratio of the largest to the smallest singular value.
 
     Returns
     -------
@@ -542,9 +542,9 @@ def cond(a: ArrayLike, p: float | Literal["fro"] | None = None) -> float:
     Raises
     ------
     ValueError
-        If a is empty, or p is none of its words.
+        If a is empty, or p is not a valid choice.
     numpy.linalg.LinAlgError
-        If a is not square, for other norms than 2.
+        If a is not square and the norm is not 2.
 
     Examples
     --------
@@ -589,7 +589,7 @@ def matrix_rank(a: ArrayLike, rcond: float | None = None) -> int:
 
 
 def eig(a: ArrayLike, b: ArrayLike | None = None) -> Eigen:
-    """Eigenvalues and eigenvectors of unit length of a square matrix; with b those of a v = value b v.
+    """Eigenvalues and unit eigenvectors of a square matrix; with b, those of a v = value b v.
 
     Parameters
     ----------
@@ -657,8 +657,8 @@ def eigvals(a: ArrayLike, b: ArrayLike | None = None) -> NDArray[np.complex128]:
 
 
 def eigh(a: ArrayLike) -> Eigen:
-    """Eigenvalues, ascending, and orthonormal eigenvectors of a symmetric or Hermitian matrix, read from
-    its lower triangle.
+    """Eigenvalues in ascending order and orthonormal eigenvectors of a symmetric or Hermitian matrix, of which
+    the lower triangle is read.
 
     Parameters
     ----------
@@ -731,7 +731,7 @@ def svd(a: ArrayLike, full_matrices: bool = True) -> SVD:
     a : array_like
         A matrix, real or complex.
     full_matrices : bool
-        Square u and vh, in place of as many vectors as there are values.
+        Whether u and vh are square, rather than having as many vectors as there are singular values.
 
     Returns
     -------
@@ -756,7 +756,7 @@ def svd(a: ArrayLike, full_matrices: bool = True) -> SVD:
 
 
 def svdvals(a: ArrayLike) -> NDArray[np.float64]:
-    """The singular values, falling.
+    """The singular values in descending order.
 
     Parameters
     ----------
@@ -789,9 +789,9 @@ def qr(a: ArrayLike, mode: Literal["reduced", "complete"] = "reduced", pivoting:
     a : array_like
         A matrix, real or complex.
     mode : {"reduced", "complete"}
-        q with min(m, n) columns, or square.
+        Whether q has min(m, n) columns or is square.
     pivoting : bool
-        Exchange columns so that the diagonal of r falls.
+        Whether to exchange columns so that the diagonal of r descends.
 
     Returns
     -------
@@ -800,7 +800,7 @@ def qr(a: ArrayLike, mode: Literal["reduced", "complete"] = "reduced", pivoting:
     Raises
     ------
     ValueError
-        If a is empty, has an element that is not finite, or mode is none of its words.
+        If a is empty, has an element that is not finite, or mode is not a valid choice.
 
     Examples
     --------
@@ -820,7 +820,7 @@ def qr(a: ArrayLike, mode: Literal["reduced", "complete"] = "reduced", pivoting:
 
 
 def lu(a: ArrayLike) -> LU:
-    """The LU decomposition with row exchanges, a = p l u; also of a singular matrix.
+    """The LU decomposition with row exchanges, a = p l u. The matrix may be singular.
 
     Parameters
     ----------
@@ -857,8 +857,8 @@ def lu(a: ArrayLike) -> LU:
 
 
 def cholesky(a: ArrayLike) -> NDArray[Any]:
-    """The lower triangle l with a = l l^H, of a symmetric (Hermitian) and positive definite matrix read
-    from its lower triangle.
+    """The lower triangular l with a = l l^H, for a symmetric (Hermitian) and positive definite matrix, of
+    which the lower triangle is read.
 
     Parameters
     ----------
@@ -896,7 +896,7 @@ def schur(a: ArrayLike,
     a : array_like
         A square matrix, real or complex.
     sort : {"none", "ascending real", "descending real", "ascending", "descending"}
-        The order of the eigenvalues: as they come, by their real parts, or by their moduli.
+        The order of the eigenvalues: unsorted, by their real parts, or by their moduli.
 
     Returns
     -------
@@ -931,9 +931,9 @@ def qz(a: ArrayLike, b: ArrayLike,
     Parameters
     ----------
     a, b : array_like
-        Square matrices of one shape.
+        Square matrices of the same shape.
     sort : {"none", "ascending real", "descending real", "ascending", "descending"}
-        As of `schur`.
+        As for `schur`.
 
     Returns
     -------
@@ -944,7 +944,7 @@ def qz(a: ArrayLike, b: ArrayLike,
     numpy.linalg.LinAlgError
         If a or b is not square.
     ValueError
-        If they differ in shape, or sort is none of its words.
+        If they differ in shape, or sort is not a valid choice.
 
     Examples
     --------
@@ -1023,12 +1023,12 @@ def expm(a: ArrayLike) -> NDArray[Any]:
 
 
 def _real_of_real(a: NDArray[Any], found: NDArray[Any]) -> NDArray[Any]:
-    """A function of a real matrix, which is real where no imaginary part is left."""
+    """The function of a real matrix; real where no imaginary part is left."""
     return found.real if a.dtype.kind != "c" and not np.any(found.imag) else found
 
 
 def logm(a: ArrayLike) -> NDArray[Any]:
-    """The principal logarithm of a square matrix; of negative eigenvalues with +i pi.
+    """The principal logarithm of a square matrix; negative eigenvalues have the imaginary part +pi.
 
     Parameters
     ----------
@@ -1088,14 +1088,14 @@ def sqrtm(a: ArrayLike) -> NDArray[Any]:
 
 
 def matrix_power(a: ArrayLike, n: int) -> NDArray[Any]:
-    """A whole power of a square matrix; a negative one is of the inverse.
+    """An integer power of a square matrix; a negative power is that of the inverse.
 
     Parameters
     ----------
     a : array_like
         A square matrix, real or complex.
     n : int
-        The power.
+        The exponent.
 
     Returns
     -------
@@ -1104,7 +1104,7 @@ def matrix_power(a: ArrayLike, n: int) -> NDArray[Any]:
     Raises
     ------
     numpy.linalg.LinAlgError
-        If a is not square, or singular and n negative.
+        If a is not square, or is singular and n is negative.
 
     Examples
     --------
@@ -1136,9 +1136,9 @@ def solve_sylvester(a: ArrayLike, b: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     Raises
     ------
     numpy.linalg.LinAlgError
-        If a or b is not square, or eigenvalues of a and -b meet.
+        If a or b is not square, or a and -b have a common eigenvalue.
     ValueError
-        If q does not fit.
+        If the shape of q does not match.
 
     Examples
     --------
@@ -1157,7 +1157,7 @@ def solve_lyapunov(a: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     Parameters
     ----------
     a, q : array_like
-        Square matrices of one order.
+        Square matrices of the same order.
 
     Returns
     -------
@@ -1166,7 +1166,7 @@ def solve_lyapunov(a: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     Raises
     ------
     numpy.linalg.LinAlgError
-        If a matrix is not square, or eigenvalues of a and -a^H meet.
+        If a matrix is not square, or a and -a^H have a common eigenvalue.
     ValueError
         If q does not fit.
 
@@ -1186,7 +1186,7 @@ def solve_discrete_lyapunov(a: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     Parameters
     ----------
     a, q : array_like
-        Square matrices of one order.
+        Square matrices of the same order.
 
     Returns
     -------
@@ -1211,21 +1211,22 @@ def solve_discrete_lyapunov(a: ArrayLike, q: ArrayLike) -> NDArray[Any]:
 
 
 def solve_banded(bands: tuple[int, int], ab: ArrayLike, b: ArrayLike) -> NDArray[Any]:
-    """The solution x of a x = b for a matrix with few diagonals.
+    """The solution x of a x = b for a banded matrix.
 
     Parameters
     ----------
     bands : (int, int)
-        How many diagonals are below and above the main one.
+        The numbers of diagonals below and above the main diagonal.
     ab : array_like
-        The diagonals in rows, the topmost first: a[i, j] is at row u + i - j, column j.
+        The diagonals in rows, the topmost first: a[i, j] is at row u + i - j, column j, with u diagonals
+        above the main one.
     b : array_like
-        A vector, or a matrix with a right side in each column.
+        A vector, or a matrix with one right-hand side in each column.
 
     Returns
     -------
     ndarray
-        Of the shape of b.
+        The same shape as b.
 
     Raises
     ------
@@ -1241,7 +1242,7 @@ def solve_banded(bands: tuple[int, int], ab: ArrayLike, b: ArrayLike) -> NDArray
     array([1., 2.])
     """
     if np.shape(bands) != (2,):
-        refuse("linalg.solve_banded", "bands", f"two numbers are needed, of diagonals below and above; {bands!r} came",
+        refuse("linalg.solve_banded", "bands", f"the numbers of diagonals below and above are needed; got {bands!r}",
                "ErrSizesDisagree")
     below, above = (whole_number("linalg.solve_banded", "bands", one, 0, "ErrNegativeCount") for one in bands)
     ab, b = _matrix("linalg.solve_banded", ab, argument="ab"), as_array(b)
@@ -1251,7 +1252,7 @@ def solve_banded(bands: tuple[int, int], ab: ArrayLike, b: ArrayLike) -> NDArray
 
 
 def charpoly(a: ArrayLike) -> NDArray[Any]:
-    """The coefficients of the characteristic polynomial det(t - a), the constant first.
+    """The coefficients of the characteristic polynomial det(t I - a), the constant first.
 
     Parameters
     ----------
@@ -1279,7 +1280,7 @@ def charpoly(a: ArrayLike) -> NDArray[Any]:
 
 
 def is_positive_definite(a: ArrayLike) -> bool:
-    """Whether a matrix is exactly symmetric (Hermitian) with eigenvalues that are all above 0.
+    """Whether a matrix is exactly symmetric (Hermitian) and all its eigenvalues are above 0.
 
     Parameters
     ----------
@@ -1307,15 +1308,15 @@ def is_positive_definite(a: ArrayLike) -> bool:
 
 
 def is_positive_semidefinite(a: ArrayLike, tolerance: float | None = None) -> bool:
-    """Whether a matrix is symmetric (Hermitian) without eigenvalues below 0, within a tolerance, by
-    symmetric elimination that takes the largest diagonal element first.
+    """Whether a matrix is symmetric (Hermitian) and has no eigenvalue below 0, within a tolerance, by
+    symmetric elimination with diagonal pivoting.
 
     Parameters
     ----------
     a : array_like
         A square matrix, real or complex.
     tolerance : float, optional
-        Relative to the largest diagonal element; 2.2e-16 times the order by default.
+        The tolerance, relative to the largest diagonal element; 2.2e-16 times the order by default.
 
     Returns
     -------
@@ -1336,7 +1337,7 @@ def is_positive_semidefinite(a: ArrayLike, tolerance: float | None = None) -> bo
     """
     a = _matrix("linalg.is_positive_semidefinite", a, True)
     if tolerance is not None and not tolerance >= 0:
-        refuse("linalg.is_positive_semidefinite", "tolerance", f"must not be negative; {tolerance} came",
+        refuse("linalg.is_positive_semidefinite", "tolerance", f"must not be negative; got {tolerance}",
                "ErrNegativeSetting")
     return bool(_served("is_positive_semidefinite", a)(a, -1.0 if tolerance is None else float(tolerance))[0])
 
@@ -1358,7 +1359,7 @@ def from_eigenvalues(values: ArrayLike) -> NDArray[np.float64]:
     Raises
     ------
     ValueError
-        If there is no value.
+        If there are no values.
 
     Examples
     --------
@@ -1370,14 +1371,14 @@ def from_eigenvalues(values: ArrayLike) -> NDArray[np.float64]:
 
 
 def is_symmetric(a: ArrayLike, tolerance: float = 0.0) -> bool:
-    """Whether a matrix is symmetric, a complex one Hermitian, within a tolerance.
+    """Whether a matrix is symmetric (Hermitian, if it is complex) within a tolerance.
 
     Parameters
     ----------
     a : array_like
         A square matrix, real or complex.
     tolerance : float
-        By how much elements may differ.
+        The largest difference allowed between elements.
 
     Returns
     -------
@@ -1402,8 +1403,8 @@ def is_symmetric(a: ArrayLike, tolerance: float = 0.0) -> bool:
 
 
 def balance(a: ArrayLike) -> tuple[NDArray[Any], NDArray[Any]]:
-    """A square matrix balanced for the calculation of eigenvalues: rows and columns exchanged and
-    multiplied by powers of two (B. N. Parlett and C. Reinsch, 1969).
+    """Balances a square matrix for the computation of eigenvalues: rows and columns are permuted and scaled
+    by powers of two (B. N. Parlett and C. Reinsch, 1969).
 
     Parameters
     ----------
@@ -1444,7 +1445,7 @@ class GSVD(Result):
     alpha, beta : ndarray
         The generalised singular values are alpha / beta; alpha^2 + beta^2 = 1.
     u, v, q : ndarray
-        Unitary.
+        A unitary matrix.
     rank : int
         The rank of a and b together.
     """
@@ -1458,7 +1459,7 @@ class GSVD(Result):
 
 
 def gsvd(a: ArrayLike, b: ArrayLike) -> GSVD:
-    """The generalised singular values of two matrices with as many columns.
+    """The generalised singular values of two matrices with the same number of columns.
 
     Parameters
     ----------
@@ -1472,7 +1473,7 @@ def gsvd(a: ArrayLike, b: ArrayLike) -> GSVD:
     Raises
     ------
     ValueError
-        If a matrix is empty, or they differ in columns.
+        If a matrix is empty, or the numbers of columns differ.
 
     Examples
     --------
@@ -1483,7 +1484,7 @@ def gsvd(a: ArrayLike, b: ArrayLike) -> GSVD:
     """
     a, b = _matrix("linalg.gsvd", a), _matrix("linalg.gsvd", b, argument="b")
     if a.shape[-1] != b.shape[-1]:
-        refuse("linalg.gsvd", "b", f"must have as many columns as a, {a.shape[-1]}; {b.shape[-1]} came",
+        refuse("linalg.gsvd", "b", f"must have as many columns as a, {a.shape[-1]}; got {b.shape[-1]}",
                "ErrSizesDisagree")
     _, _, alpha, beta, u, v, q, k, rank_b = _served("gsvd", a, b)(a, b)
     return GSVD(alpha[:k + rank_b], beta[:k + rank_b], u, v, q, k + rank_b)
@@ -1518,14 +1519,14 @@ def kron(a: ArrayLike, b: ArrayLike) -> NDArray[Any]:
 
 
 def toeplitz(c: ArrayLike, r: ArrayLike | None = None) -> NDArray[Any]:
-    """The matrix whose diagonals are constant.
+    """The matrix with constant diagonals.
 
     Parameters
     ----------
     c : array_like
         The first column.
     r : array_like, optional
-        The first row, whose first element is not read; the conjugate of c by default.
+        The first row, of which the first element is not read; the conjugate of c by default.
 
     Returns
     -------
@@ -1555,7 +1556,7 @@ def companion(p: ArrayLike) -> NDArray[Any]:
     Parameters
     ----------
     p : array_like
-        Coefficients, the highest power first, as of `scipy.linalg.companion`.
+        Coefficients, the highest power first, as for `scipy.linalg.companion`.
 
     Returns
     -------

@@ -1,5 +1,5 @@
-"""Tones of recordings of any length (wholes.Whole), with the resolution of the whole: about each line that stands
-out of an averaged spectrum a band is cut out, and the tones are measured in this at a lower rate."""
+"""Tones of recordings of any length (wholes.Whole), with the resolution of the whole recording. A band is cut out
+around each line that stands out of an averaged spectrum, and the tones are measured in it at a lower rate."""
 
 import dataclasses
 import math
@@ -11,25 +11,25 @@ from . import measure, tones, windows
 from .outcomes import QxError
 from .wholes import AveragedSpectrum
 
-SEGMENT = 1 << 20  # samples, of the averaged spectrum
-STANDS_OUT = 3.0  # times the median of a line's neighbours, for what is looked at nearer
-AROUND = 64  # lines to either side that are its neighbours
-BLOCK = 1 << 18  # samples, of which a transform takes the bands
-MOST_KEPT = 1 << 18  # samples of a band, where it becomes no narrower than NARROWEST lines of a block
+SEGMENT = 1 << 20  # samples in a segment of the averaged spectrum
+STANDS_OUT = 3.0  # ratio of a line to the median of its neighbours from which it is examined
+AROUND = 64  # lines on either side that count as neighbours
+BLOCK = 1 << 18  # samples in the transforms that cut out the bands
+MOST_KEPT = 1 << 18  # samples of a band, unless that makes it narrower than NARROWEST lines of a block
 NARROWEST = 512
 WINDOW = "blackman_harris7"
-MOST_PARTS = 16  # in which harmonics are measured
+MOST_PARTS = 16  # parts in which harmonics are measured
 DECIBELS_OF_BIT = 20 * math.log10(2)
 
 
 def strongest(whole, rate, count=5):
-    """The `tones.Tones` that stand out; None where there are none."""
+    """The `tones.Tones` that stand out; None if there are none."""
     return tones.standing_out(lambda: measured(whole, rate, count))
 
 
 def measured(whole, rate, count=5):
-    """Up to `count` tones, the largest first, as tones.tones has them of samples in memory; the residual is
-    NaN (`residual_rms` takes a pass). A QxError where there are none."""
+    """Up to `count` tones, the largest first, as from tones.tones for samples in memory. The residual is NaN
+    (`residual_rms` needs another pass). Raises QxError if there are none."""
     centres = _centres(whole, count)
     found: list[Any] = []
     refusal: Any = None
@@ -47,8 +47,8 @@ def measured(whole, rate, count=5):
 
 
 def spectrum(whole, rate, window=WINDOW):
-    """Frequencies, the amplitudes that lines under the window have, by the mean of the squares over segments, and
-    the resolution."""
+    """Frequencies, the amplitudes of the lines under the window, as root mean squares over segments, and the
+    resolution."""
     found = _scaled(whole, rate, window)
     amplitudes = np.sqrt(2 * found.values)
     amplitudes[[0, -1]] = 0.0, amplitudes[-1] / math.sqrt(2)
@@ -67,14 +67,14 @@ def _scaled(whole, rate, window):
 
 
 def _width(whole):
-    """Lines of a block in a band: a power of two."""
+    """The number of lines of a block in a band: a power of two."""
     factor = 2 ** max(2, math.ceil(math.log2(whole.count / MOST_KEPT)))
     return max(NARROWEST, BLOCK // factor)
 
 
 def _centres(whole, count):
-    """The lines of a block about which bands are taken: the lowest one, and those of lines that stand out. A band
-    at 0 or at half the rate has its mirror image in it, so no other is near these."""
+    """The lines of a block around which bands are taken: the lowest one, and those that stand out. A band at 0 or
+    at half the rate contains its mirror image, so no other band is taken near these."""
     lines = _scaled(whole, 1.0, WINDOW).values
     inner = np.flatnonzero((lines[1:-1] > lines[:-2]) & (lines[1:-1] >= lines[2:])) + 1
     inner = inner[np.argsort(-lines[inner], kind="stable")][:64 * count]
@@ -94,9 +94,10 @@ def _centres(whole, count):
 
 
 def _bands(whole, centres):
-    """The samples of each band, as real ones at a rate that is lower by BLOCK / width; those about a centre are
-    moved to a quarter of that rate, those of half the rate to 0. By transforms of blocks that overlap by half, with
-    a filter as long as this half, whose gain is 1 up to a quarter of the lower rate."""
+    """The samples of each band, as real values at a rate that is lower by the factor BLOCK / width. The centre of a
+    band is shifted to a quarter of that rate; half the original rate is shifted to 0. The method is transforms of
+    blocks that overlap by half, with a filter as long as this half and a gain of 1 up to a quarter of the lower
+    rate."""
     width, half = _width(whole), BLOCK // 2
     order = np.fft.ifftshift(np.arange(-(width // 2), width // 2))
     response = _response(width)[order % BLOCK]
@@ -114,7 +115,7 @@ def _bands(whole, centres):
 
 
 def _response(width):
-    """Of the filter that leaves a band about 0, by the lines of a block."""
+    """The response of the filter that passes a band around 0, at the lines of a block."""
     t = np.arange(-(BLOCK // 4), BLOCK // 4 + 1)
     cut = 0.375 * width / BLOCK  # between the gain of 1 and the limit of the lower rate
     taps = 2 * cut * np.sinc(2 * cut * t) * windows.get(WINDOW, len(t), symmetric=True)
@@ -129,7 +130,7 @@ def _in_band(whole, band, centre, count):
     width = _width(whole)
     factor = BLOCK // width
     found = tones.tones(band, 1.0, count, whole.count)
-    begin = BLOCK // 4  # where the band begins
+    begin = BLOCK // 4  # the sample at which the band begins
     is_image = centre == BLOCK // 2
     moved = 0.0 if centre == 0 or is_image else 0.25
     for f, f_error, a, a_error, phase, significant in zip(
@@ -145,7 +146,7 @@ def _in_band(whole, band, centre, count):
 
 
 def residual_rms(whole, found, rate):
-    """The root mean square of what the tones and a constant leave."""
+    """The root mean square of the residual after the tones and a constant."""
     total, squares, seen = 0.0, 0.0, 0
     for part in whole.parts():
         t, rest = np.arange(len(part)), part - whole.moments.mean
@@ -158,8 +159,8 @@ def residual_rms(whole, found, rate):
 
 
 def harmonics(whole, rate, fundamental, count, full_scale=None):
-    """measure.harmonics by the means of the powers over parts of SEGMENT samples, MOST_PARTS at most, evenly spread;
-    phases are those of the first part, and a bin is one of a part. A QxError where a part has no such tone."""
+    """measure.harmonics from the mean powers over at most MOST_PARTS parts of SEGMENT samples, evenly spread. The
+    phases are those of the first part, and a bin is that of a part. Raises QxError if a part has no such tone."""
     there = whole.count // SEGMENT
     chosen = np.linspace(0, there - 1, min(there, MOST_PARTS)).round().astype(int)
     parts = [measure.harmonics(whole.part(int(i) * SEGMENT, SEGMENT), rate, fundamental, count, full_scale)
@@ -168,7 +169,8 @@ def harmonics(whole, rate, fundamental, count, full_scale=None):
     mean = powers.mean(0)
 
     def beside(name, sign=1):
-        """The fundamental over what is so many decibels below it, or above with the other sign."""
+        """The mean over the parts of a level that each gives in decibels below its fundamental, or above it with
+        sign -1."""
         return sign * 10 * math.log10(mean[0] / np.mean([own[0] / 10**(sign * getattr(one, name) / 10)
                                                          for one, own in zip(parts, powers)]))
 

@@ -1,6 +1,6 @@
-"""Reports on many recordings: a page for each and an index with the main figures. The work goes to
-processes of this machine, or to the workers of a Dask scheduler, and a recording that cannot be read
-costs its own line and nothing else."""
+"""Reports on many recordings: a page for each, and an index with the main figures. The work is done by
+processes on this machine, or by the workers of a Dask scheduler. A recording that cannot be read costs only
+its own line."""
 
 import concurrent.futures
 import contextlib
@@ -20,18 +20,18 @@ from .files import COMPRESSED, InputError, printable
 from .stored import ENDINGS as STORED
 
 TABLES = (".csv", ".txt", ".tsv", ".tab", ".dat", ".asc", ".prn")
-QUIET = "ignore:resource_tracker"  # which tells of semaphores where Ctrl-C had to end this process at once
+QUIET = "ignore:resource_tracker"  # which warns about semaphores when Ctrl-C ends this process immediately
 MAIN = ("Mean", "Root mean square", "Standard deviation", "Strongest part at", "Resolution")
 
 
 @dataclasses.dataclass
 class Outcome:
-    """What becomes of one recording: a page with figures, or the reason why there is none."""
+    """The outcome for one recording: a page with figures, or the reason why there is none."""
 
     name: str
     page: str = ""
-    cells: tuple = ()  # of the table in the index
-    thumbnail: str = ""  # a drawing, as SVG
+    cells: tuple = ()  # cells of the table in the index
+    thumbnail: str = ""  # a small plot, as SVG
     failure: str = ""
 
 
@@ -44,7 +44,7 @@ def is_pattern(path):
 
 
 def is_recording(path):
-    """Whether a file of a folder has the ending of a recording, compressed or not."""
+    """Whether a file of a folder has the extension of a recording, compressed or not."""
     endings = [ending.lower() for ending in path.suffixes[-2:]]
     if endings and endings[-1] in COMPRESSED:
         return endings[-1] == ".zip" or len(endings) > 1 and endings[0] in (*TABLES, *AUDIO, *STORED)
@@ -52,13 +52,13 @@ def is_recording(path):
 
 
 def left_out(paths):
-    """The files of folders that are not read, without the hidden ones."""
+    """The files of folders that are not read, except hidden files."""
     return sorted(str(path) for given in paths if os.path.isdir(given) for path in Path(given).rglob("*")
                   if path.is_file() and not path.name.startswith(".") and not is_recording(path))
 
 
 def files_of(paths):
-    """Pairs of a name and a path: what folders hold, patterns match, or is named itself."""
+    """Pairs of a name and a path, for the files in folders, those that match patterns, and those named directly."""
     found = {}
     for given in paths:
         if os.path.isdir(given):
@@ -70,7 +70,7 @@ def files_of(paths):
             found[given] = Path(given)
     named = {path: "_".join(part for part in name.parts if part not in ("/", ".."))
              for path, name in found.items()}
-    pairs, seen = [], {"index": 1}  # whose page is another
+    pairs, seen = [], {"index": 1}  # the name of the index page
     for path, name in sorted(named.items(), key=lambda pair: (pair[1], pair[0])):
         seen[name] = seen.get(name, 0) + 1
         pairs.append((name if seen[name] == 1 else f"{name} ({seen[name]})", path))
@@ -91,15 +91,15 @@ def report_on(name, path, options):
                        pages.thumbnail(sections_recording.outline(read, "").curves[0]))
     except InputError as error:
         return Outcome(name, failure=str(error))
-    except Exception as error:  # whatever it is, the others go on
+    except Exception as error:  # of any kind: the other recordings go on
         return Outcome(name, failure=printable(f"{path}: {type(error).__name__}: {error}"))
 
 
 @contextlib.contextmanager
 def _local(workers):
-    """Processes that end at once where the work is interrupted, and where this process ends, in
-    whatever way: each watches a pipe whose other end is held here."""
-    if QUIET not in sys.warnoptions:  # of the processes that are started
+    """Processes that end immediately if the work is interrupted, or if this process ends for any reason: each
+    watches a pipe whose other end is held here."""
+    if QUIET not in sys.warnoptions:  # inherited by the processes that are started
         sys.warnoptions.append(QUIET)
     context = multiprocessing.get_context("spawn")
     watched, held = context.Pipe(duplex=False)
@@ -126,8 +126,8 @@ def _end_with(watched):
 
 @contextlib.contextmanager
 def _without_interruption():
-    """Processes that are started meanwhile take no notice of Ctrl-C: it is for this one, and reaches
-    it afterwards."""
+    """Processes that are started meanwhile ignore Ctrl-C. It is meant for this process, and reaches it
+    afterwards."""
     before = signal.pthread_sigmask(signal.SIG_BLOCK, {signal.SIGINT})
     try:
         yield
@@ -136,7 +136,7 @@ def _without_interruption():
 
 
 def outcomes(pairs, options, workers=None, scheduler=None):
-    """The outcomes in the order in which they are ready."""
+    """The outcomes, as they become ready."""
     if scheduler:
         import distributed
         with distributed.Client(scheduler) as client, client.get_executor(pure=False) as executor:
@@ -145,12 +145,12 @@ def outcomes(pairs, options, workers=None, scheduler=None):
     left = []
     with _local(workers) as executor:
         yield from _finished(executor, pairs, options, left)
-    for pair in left:  # a process that died took the others along: these have one each
+    for pair in left:  # a process that died took the others along: now each gets its own
         with _local(1) as executor:
             died = []
             yield from _finished(executor, [pair], options, died)
         for name, path in died:
-            yield Outcome(name, failure=printable(f"{path}: its process died, perhaps for want of memory"))
+            yield Outcome(name, failure=printable(f"{path}: its process died, perhaps for lack of memory"))
 
 
 def _finished(executor, pairs, options, left):
@@ -165,7 +165,7 @@ def _finished(executor, pairs, options, left):
 
 
 def index(found, left=()):
-    """The page that leads to the others."""
+    """The page that links to the others."""
     from . import pages
 
     def escape(text, quote=True):
@@ -181,11 +181,11 @@ def index(found, left=()):
     failed = "".join(f"<li>{escape(outcome.failure)}</li>\n" for outcome in found if outcome.failure)
     others = "".join(f"<li>{escape(path)}</li>\n" for path in left)
     read = sum(not outcome.failure for outcome in found)
-    inner = (f"<p>{read} of {len(found)} recordings were read. A click on the name of a column sorts by it.</p>"
+    inner = (f"<p>{read} of {len(found)} recordings were read. Click on the name of a column to sort by it.</p>"
              f'<div class="wide"><table class="sorted"><thead><tr><th></th>{header}</tr></thead>\n'
              f"<tbody>{rows}</tbody></table></div>"
              + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "")
-             + (f"<h2>Left out by their endings</h2><ul>{others}</ul>" if others else ""))
+             + (f"<h2>Skipped because of their extensions</h2><ul>{others}</ul>" if others else ""))
     return pages.page("report", "Recordings", inner, scripts=pages.own_script("index.js"), kind="index")
 
 
@@ -202,7 +202,7 @@ def _check(pairs, folder, force):
 
 def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outcome: None, start=None,
           force=False):
-    """Writes the pages and the index; `start` is told how many there are, `tell` each outcome. Gives
+    """Writes the pages and the index. `start` is called with their number, `tell` with each outcome. Returns
     the outcomes in the order of their names."""
     pairs = files_of(paths)
     if not pairs:

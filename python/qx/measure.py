@@ -1,8 +1,8 @@
 """Measurements on signals: peaks, levels, pulses and transitions, tones and harmonics, triggers, delays,
 sound levels and octave bands.
 
-Times and places are in seconds from the first sample where the sampling rate `fs` is given in Hz; with its
-default 1.0 they are in samples.
+Times and positions are measured from the first sample, in seconds if the sampling rate `fs` is given in Hz;
+with its default of 1.0 they are in samples.
 """
 
 from __future__ import annotations
@@ -35,20 +35,20 @@ LEVELS = {"histogram": 0, "peak": 1, "auto": 2}
 
 @result
 class Peaks(Result):
-    """Peaks, in the order of time; unpacked, positions and heights.
+    """Peaks in order of time; unpacks into positions and heights.
 
     Attributes
     ----------
     positions : ndarray
-        Their times, between samples by the parabola through the nearest ones.
+        The times of the peaks, interpolated by the parabola through the nearest samples.
     heights : ndarray
-        The values of these parabolas there.
+        The values of these parabolas at the peaks.
     prominences : ndarray
-        How far each stands out of what is around it, up to the next higher one.
+        How far each peak rises above its surroundings, up to the next higher peak.
     widths : ndarray
-        In time, half way down the prominence.
+        The widths in time at half the prominence.
     indices : ndarray of int
-        The samples that are higher than their neighbours; of a plateau its middle.
+        The indices of the samples that are higher than their neighbours; for a plateau, of its middle.
     """
 
     positions: NDArray[Any]
@@ -69,9 +69,10 @@ class Tone(Result):
     Attributes
     ----------
     frequency, amplitude, phase, offset : float
-        In the unit of fs, of the peak, in radians at the first sample, and the constant.
+        The frequency in the unit of fs, the peak amplitude, the phase at the first sample in radians, and
+        the constant offset.
     residual : float
-        The root mean square of what is left.
+        The root mean square of the residuals.
     """
 
     frequency: float
@@ -83,14 +84,15 @@ class Tone(Result):
 
 @result
 class Tones(Result):
-    """Several tones; unpacked, frequencies and amplitudes.
+    """Several tones; unpacks into frequencies and amplitudes.
 
     Attributes
     ----------
     frequencies, amplitudes, phases : ndarray
-        In the unit of fs, of the peaks, and in radians at the first sample.
+        The frequencies in the unit of fs, the peak amplitudes, and the phases at the first sample in
+        radians.
     residual : float
-        The root mean square of what is left.
+        The root mean square of the residuals.
     """
 
     frequencies: NDArray[Any]
@@ -107,15 +109,16 @@ class Harmonics(Result):
     Attributes
     ----------
     frequencies, amplitudes, phases : ndarray
-        Of the fundamental and the harmonics; NaN where one cannot be told from others.
+        Of the fundamental and the harmonics; NaN for a harmonic that cannot be separated from others.
     thd : float
-        The total harmonic distortion, a ratio of amplitudes.
+        The total harmonic distortion, as a ratio of amplitudes.
     sinad, snr, sfdr : float
-        In dB.
+        The signal to noise and distortion ratio, the signal to noise ratio and the spurious-free dynamic
+        range, in dB.
     enob : float
-        Effective bits.
+        The effective number of bits.
     noise_floor : float
-        The noise in a bin of the spectrum, in dB of the fundamental.
+        The noise in a bin of the spectrum, in dB relative to the fundamental.
     """
 
     frequencies: NDArray[Any]
@@ -131,7 +134,7 @@ class Harmonics(Result):
 
 @result
 class Levels(Result):
-    """The two states of a waveform; unpacked, high, low and amplitude.
+    """The two states of a waveform; unpacks into high, low and amplitude.
 
     Attributes
     ----------
@@ -151,15 +154,16 @@ class Pulse(Result):
     Attributes
     ----------
     start, middle, width : float
-        Time of the first edge's crossing of the mid reference, of the pulse's middle, and the width there.
+        The time at which the first edge crosses the middle reference level, the time of the pulse's middle,
+        and the width at that level.
     high, low : float
         The levels of the states.
     rise, fall : float
-        The durations of the edges between the low and the high reference.
+        The durations of the edges between the low and the high reference level.
     slew_rate : float
-        Of the first edge, in units of the signal by time.
+        The slew rate of the first edge, in units of the signal per unit of time.
     overshoot_first, overshoot_second : float
-        Behind each edge, in per cent of the amplitude, in its direction.
+        The overshoot after each edge, in its direction, in per cent of the amplitude.
     """
 
     start: float
@@ -176,12 +180,12 @@ class Pulse(Result):
 
 @result
 class Vertices(Result):
-    """Peaks of a stream.
+    """The peaks found in a stream.
 
     Attributes
     ----------
     positions, heights : ndarray
-        Where the parabolas that are fitted to the samples have their vertices, and their values there.
+        The vertices of the parabolas fitted to the samples, and their values there.
     """
 
     positions: NDArray[Any]
@@ -193,14 +197,14 @@ class Vertices(Result):
 
 @result
 class Triggers(Result):
-    """Where a signal passes a level.
+    """The crossings of a level.
 
     Attributes
     ----------
     positions : ndarray
-        Times, between samples by the line from one to the next.
+        The times of the crossings, by linear interpolation between samples.
     indices : ndarray of int
-        The samples that trigger.
+        The indices of the samples that trigger.
     """
 
     positions: NDArray[Any]
@@ -212,14 +216,14 @@ class Triggers(Result):
 
 @result
 class Bands(Result):
-    """Levels in bands; unpacked, midband frequencies and levels.
+    """Levels in bands; unpacks into midband frequencies and levels.
 
     Attributes
     ----------
     frequencies : ndarray
         The exact midband frequencies, in the unit of fs.
     levels : ndarray
-        In dB of the square of the reference.
+        In dB relative to the square of the reference.
     edges : ndarray
         The lower and the upper edge of each band.
     """
@@ -230,7 +234,7 @@ class Bands(Result):
     _unpacked = ("frequencies", "levels")
 
     def plot(self, axes: Any = None) -> Any:
-        """Draws the levels as bars with matplotlib; returns the axes."""
+        """Plots the levels as bars with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
             axes = pyplot.subplots()[1]
@@ -255,20 +259,22 @@ def peaks(x: ArrayLike, fs: float = 1.0, height: float | None = None, prominence
     fs : float
         The sampling rate.
     height : float, optional
-        Peaks are higher than this, valleys lower.
+        Only peaks above this height are returned; only valleys below it.
     prominence : float, optional
-        Peaks stand out at least as far. Without a height or a prominence those count that stand out from
-        the noise: two fifths of the third most prominent, and at least a fifth of the most prominent.
+        The smallest prominence. Without height and prominence, the peaks that rise out of the noise are
+        returned: those with at least two fifths of the third largest prominence, and at least a fifth of
+        the largest.
     distance : float, optional
-        Of peaks nearer than this, in time, the less prominent ones go.
+        The smallest distance between peaks, in time. Of peaks that are closer, the less prominent are
+        dropped.
     valleys : bool
-        Look for valleys.
+        Whether to look for valleys.
     axis : int
         The axis of time.
 
     Returns
     -------
-    Peaks, or a list of what each channel has
+    Peaks, or a list with one entry for each channel
 
     Raises
     ------
@@ -310,7 +316,7 @@ def _peaks(x: NDArray[Any], fs: float, height: float | None, prominence: float |
 
 
 def _vertices(values: Any, at: Any) -> Any:
-    """The parabolas through each sample and its neighbours; of a plateau the sample itself."""
+    """The vertices of the parabolas through each sample and its neighbours; on a plateau, the sample itself."""
     before, here, behind = values[at - 1], values[at], values[at + 1]
     bend = before - 2 * here + behind
     is_sharp = (bend < 0) & (here >= before) & (here >= behind)
@@ -319,7 +325,7 @@ def _vertices(values: Any, at: Any) -> Any:
 
 
 def _widths(values: Any, at: Any, stand: Any) -> Any:
-    """The widths half way down the prominences, in samples, between samples by straight lines."""
+    """The widths at half the prominences, in samples, by linear interpolation between samples."""
     found = np.zeros(len(at))
     for i, (place, prominence) in enumerate(zip(at.tolist(), stand.tolist())):
         level = values[place] - prominence / 2
@@ -337,16 +343,16 @@ def _widths(values: Any, at: Any, stand: Any) -> Any:
 
 
 class PeakFinder(Stream):
-    """Peaks above a threshold, or valleys below it, in a stream: each block returns the `Vertices` that it
-    has made certain. A parabola is fitted to every window of `width` samples; a place counts from
-    the start of the stream.
+    """Finds the peaks above a threshold, or the valleys below it, in a stream. Each block returns the
+    `Vertices` that have become certain with it. A parabola is fitted to every window of `width` samples.
+    Positions count from the start of the stream.
 
     Parameters
     ----------
     threshold : float
-        Peaks are higher, valleys lower.
+        Peaks are above it, valleys below.
     width : int
-        The samples of a window, at least 3.
+        The number of samples in a window, at least 3.
     fs : float
         The sampling rate.
     valleys : bool
@@ -370,7 +376,7 @@ class PeakFinder(Stream):
         super().__init__()
 
     def _start(self) -> Any:
-        """What is too short for a call, the export's state and buffer, and whether it has begun."""
+        """The samples not yet passed on, the export's state and buffer, and whether it has been called."""
         return np.empty(0), {}, np.empty(0), False
 
     def _run(self, state: Any, block: Any, is_last: Any) -> Any:
@@ -384,7 +390,7 @@ class PeakFinder(Stream):
         block = np.concatenate([state[0], block])
         if len(block) < 2 * self.width:
             return _no_vertices(), (block, *state[1:])
-        # The rest stays in hand, so that a last block is long enough.
+        # The rest is kept back, so that the last block is long enough.
         found, state = self._run(state, block[:-self.width], False)
         return found, (block[-self.width:], *state[1:])
 
@@ -393,7 +399,7 @@ class PeakFinder(Stream):
         return found if isinstance(found, Vertices) else _no_vertices()
 
     def finish(self) -> Any:
-        """The peaks of the last window; begins anew."""
+        """Returns the peaks of the last window. The stream starts afresh."""
         state = self._states[0]
         self.reset()
         if len(state[0]) < self.width:
@@ -418,22 +424,23 @@ def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", 
     x : array_like
         Real samples, of any dimension.
     method : {"auto", "histogram", "peak"}
-        The modes of the histogram, refined by the samples about them; the extremes; or whichever fits.
+        "histogram" uses the modes of the histogram, refined by the samples around them, "peak" the extremes,
+        and "auto" whichever of the two fits the signal.
     bins : int
-        Of the histogram.
+        The number of bins of the histogram.
     axis : int
         The axis of time.
 
     Returns
     -------
-    Levels, or a list of what each channel has
+    Levels, or a list with one entry for each channel
 
     Raises
     ------
     QxError
-        If there are no two states.
+        If the signal does not have two states.
     ValueError
-        If x is empty, or method is none of its words.
+        If x is empty, or method is not a valid choice.
 
     Examples
     --------
@@ -461,18 +468,18 @@ def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = 
     fs : float
         The sampling rate.
     first : {"rising", "falling"}
-        The edge that a pulse begins with.
+        The edge with which a pulse begins.
     axis : int
         The axis of time.
 
     Returns
     -------
-    list of Pulse, or a list of what each channel has
+    list of Pulse, or a list with one entry for each channel
 
     Raises
     ------
     ValueError
-        If x has no channel, or first is none of its words.
+        If x has no channel, or first is not a valid choice.
 
     Examples
     --------
@@ -502,11 +509,11 @@ class Cycles(Result):
     Attributes
     ----------
     starts : ndarray
-        Their times.
+        The times at which the cycles start.
     periods : ndarray
-        Their durations.
+        The durations of the cycles.
     means, rms : ndarray
-        The mean and the root mean square over each.
+        The mean and the root mean square over each cycle.
     """
 
     starts: NDArray[Any]
@@ -519,8 +526,8 @@ class Cycles(Result):
 
 
 def cycles(x: ArrayLike, fs: float = 1.0, axis: int = LAST) -> Any:
-    """Mean and root mean square over each cycle of a waveform, between crossings of the middle of its
-    two levels; up to 1000 cycles.
+    """Mean and root mean square over each cycle of a waveform, up to 1000 cycles. A cycle lies between
+    crossings of the middle of the two levels.
 
     Parameters
     ----------
@@ -533,12 +540,12 @@ def cycles(x: ArrayLike, fs: float = 1.0, axis: int = LAST) -> Any:
 
     Returns
     -------
-    Cycles, or a list of what each channel has
+    Cycles, or a list with one entry for each channel
 
     Raises
     ------
     QxError
-        If there are no two levels.
+        If the waveform does not have two levels.
     ValueError
         If x is empty or fs is not above 0.
 
@@ -568,7 +575,7 @@ def _cycles(x: NDArray[Any], fs: float) -> Cycles:
 
 
 def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float | None = None, axis: int = LAST) -> Any:
-    """The largest tone, or the largest near a frequency, fitted by least squares (IEEE Std 1057).
+    """The largest tone, or the largest tone near a frequency, fitted by least squares (IEEE Std 1057).
 
     Parameters
     ----------
@@ -577,20 +584,20 @@ def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float
     fs : float
         The sampling rate.
     near : float, optional
-        About where it is, in the unit of fs.
+        The approximate frequency of the tone, in the unit of fs.
     within : float, optional
-        How far from there it may be; 2 bins by default.
+        The largest distance of the tone from there; 2 bins by default.
     axis : int
         The axis of time.
 
     Returns
     -------
-    Tone, or a list of what each channel has
+    Tone, or a list with one entry for each channel
 
     Raises
     ------
     QxError
-        If there is no tone.
+        If no tone is found.
     ValueError
         If there are fewer than 4 samples, or one is not finite.
 
@@ -609,7 +616,7 @@ def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float
 
 def tones(x: ArrayLike, fs: float = 1.0, count: int = 5,
           order: Literal["amplitude", "frequency"] = "amplitude", axis: int = LAST) -> Any:
-    """The largest tones, fitted together by least squares; fewer where the rest could be noise.
+    """The largest tones, fitted together by least squares. Tones that could be noise are not returned.
 
     Parameters
     ----------
@@ -618,22 +625,22 @@ def tones(x: ArrayLike, fs: float = 1.0, count: int = 5,
     fs : float
         The sampling rate.
     count : int
-        How many at most.
+        The largest number of tones.
     order : {"amplitude", "frequency"}
-        Falling amplitudes or rising frequencies.
+        Whether to sort by descending amplitude or ascending frequency.
     axis : int
         The axis of time.
 
     Returns
     -------
-    Tones, or a list of what each channel has
+    Tones, or a list with one entry for each channel
 
     Raises
     ------
     QxError
-        If there is no tone.
+        If no tone is found.
     ValueError
-        If there are fewer than 4 samples, one is not finite, or order is none of its words.
+        If there are fewer than 4 samples, one is not finite, or order is not a valid choice.
 
     Examples
     --------
@@ -650,7 +657,7 @@ def tones(x: ArrayLike, fs: float = 1.0, count: int = 5,
 
 def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, count: int = 10,
               full_scale: float | None = None, axis: int = LAST) -> Any:
-    """A tone, its harmonics, and the distortion and noise beside it.
+    """A tone with its harmonics, its distortion and the noise.
 
     Parameters
     ----------
@@ -659,22 +666,22 @@ def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, c
     fs : float
         The sampling rate.
     fundamental : float, optional
-        About where the tone is, in the unit of fs; the largest by default.
+        The approximate frequency of the tone, in the unit of fs; by default, the largest tone is taken.
     count : int
-        Harmonics up to this multiple, or as many as the samples can tell.
+        The highest multiple; fewer harmonics are returned where the samples do not resolve them.
     full_scale : float, optional
-        The amplitude to which effective bits refer; that of the tone by default.
+        The amplitude to which the effective bits refer; by default, that of the tone.
     axis : int
         The axis of time.
 
     Returns
     -------
-    Harmonics, or a list of what each channel has
+    Harmonics, or a list with one entry for each channel
 
     Raises
     ------
     QxError
-        If there is no tone.
+        If no tone is found.
     ValueError
         If there are fewer than 4 samples, or one is not finite.
 
@@ -695,7 +702,7 @@ def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, c
 def trigger(x: ArrayLike, level: float, fs: float = 1.0,
             slope: Literal["rising", "falling", "either"] = "rising", hysteresis: float = 0.0,
             holdoff: float = 0.0, axis: int = LAST) -> Any:
-    """All places where a signal passes a level.
+    """All crossings of a level by a signal.
 
     Parameters
     ----------
@@ -706,22 +713,22 @@ def trigger(x: ArrayLike, level: float, fs: float = 1.0,
     fs : float
         The sampling rate.
     slope : {"rising", "falling", "either"}
-        In which direction.
+        The direction of the crossings.
     hysteresis : float
-        How far beyond the level the signal must have been before.
+        How far beyond the level the signal must have been before a crossing.
     holdoff : float
-        The time after a trigger in which none follows.
+        The time after a trigger during which crossings are ignored.
     axis : int
         The axis of time.
 
     Returns
     -------
-    Triggers, or a list of what each channel has
+    Triggers, or a list with one entry for each channel
 
     Raises
     ------
     ValueError
-        If a sample is not finite, hysteresis or holdoff is negative, or slope is none of its words.
+        If a sample is not finite, hysteresis or holdoff is negative, or slope is not a valid choice.
 
     Examples
     --------
@@ -734,7 +741,7 @@ def trigger(x: ArrayLike, level: float, fs: float = 1.0,
 
 
 class Trigger(Stream):
-    """The stream of `trigger`: each block returns its Triggers, with places and indices from the start of
+    """The stream of `trigger`. Each block returns its Triggers; positions and indices count from the start of
     the stream.
 
     Parameters
@@ -744,11 +751,11 @@ class Trigger(Stream):
     fs : float
         The sampling rate.
     slope : {"rising", "falling", "either"}
-        In which direction.
+        The direction of the crossings.
     hysteresis : float
-        How far beyond the level the signal must have been before.
+        How far beyond the level the signal must have been before a crossing.
     holdoff : float
-        The time after a trigger in which none follows.
+        The time after a trigger during which crossings are ignored.
 
     Examples
     --------
@@ -770,7 +777,7 @@ class Trigger(Stream):
         super().__init__()
 
     def _start(self) -> Any:
-        """The export's state, and the samples so far."""
+        """The export's state, and the number of samples so far."""
         return {}, 0
 
     def _step(self, state: Any, block: Any) -> Any:
@@ -791,20 +798,21 @@ class Trigger(Stream):
         return found if isinstance(found, Triggers) else _no_triggers()
 
     def finish(self) -> Any:
-        """Nothing is left to come; begins anew."""
+        """Returns no triggers, since none are pending. The stream starts afresh."""
         self.reset()
         return _no_triggers()
 
 
 def delay(x: ArrayLike, y: ArrayLike, fs: float = 1.0, most: float | None = None,
           axis: int = LAST) -> Any:
-    """By how much y is later than x: the place of the peak of their cross-correlation, between samples
-    by the correlation's own Fourier series, which is exact where the spectra end below fs / 2.
+    """The delay of y with respect to x: the position of the peak of their cross-correlation. It is
+    interpolated between samples by the Fourier series of the correlation, which is exact for signals
+    band-limited below fs / 2.
 
     Parameters
     ----------
     x, y : array_like
-        Real signals; one channel against several, or channels in pairs.
+        Real signals: one channel and several, or channels in pairs.
     fs : float
         The sampling rate.
     most : float, optional
@@ -815,14 +823,14 @@ def delay(x: ArrayLike, y: ArrayLike, fs: float = 1.0, most: float | None = None
     Returns
     -------
     float or ndarray
-        In time; negative where y is earlier.
+        The delay in time; negative where y is earlier.
 
     Raises
     ------
     ValueError
         If an array is empty or fs is not above 0.
     QxError
-        If there is no correlation.
+        If the signals have no correlation.
 
     Examples
     --------
@@ -839,7 +847,7 @@ def _delay(x: NDArray[Any], y: NDArray[Any], fs: float, most: float | None) -> f
     if not len(x) or not len(y):
         refuse("measure.delay", "x, y", "an array is empty", "ErrEmptyInput")
     x, y = x - x.mean(), y - y.mean()
-    full = core.delay(x, y, 1, 0)  # lag 0 is at the last place of x
+    full = core.delay(x, y, 1, 0)  # lag 0 is at the last index of x
     lags = np.arange(len(full)) - (len(x) - 1)
     inside = np.abs(lags) <= (math.inf if most is None else most * fs)
     if not inside.any() or not np.any(full[inside]):
@@ -849,8 +857,8 @@ def _delay(x: NDArray[Any], y: NDArray[Any], fs: float, most: float | None) -> f
 
 
 def _refined(x: Any, y: Any, lag: Any) -> Any:
-    """The maximum of the correlation's Fourier series near a lag, by Newton's method. Only what both have
-    is correlated, under a Hann window, so that the ends do not pull."""
+    """The maximum of the correlation's Fourier series near a lag, by Newton's method. Only the overlap of
+    both signals is correlated, under a Hann window, so that the ends do not shift the maximum."""
     first, last = max(0, -lag), min(len(x), len(y) - lag)
     window = windows.hann(last - first + 2)[1:-1]
     x, y = ((part - np.average(part, weights=window)) * window
@@ -890,17 +898,17 @@ def weighting(frequencies: ArrayLike, kind: Literal["A", "C", "Z"] = "A") -> Any
     frequencies : array_like
         In Hz.
     kind : {"A", "C", "Z"}
-        Which one; Z is flat.
+        The weighting; Z is flat.
 
     Returns
     -------
     float or ndarray
-        In dB, 0 at 1 kHz.
+        The weighting in dB, 0 at 1 kHz.
 
     Raises
     ------
     ValueError
-        If kind is none of its words.
+        If kind is not a valid choice.
 
     Examples
     --------
@@ -923,15 +931,15 @@ def weighting(frequencies: ArrayLike, kind: Literal["A", "C", "Z"] = "A") -> Any
 
 
 def weighting_filter(fs: float, kind: Literal["A", "C"] = "A") -> filters.Filter:
-    """The A or C weighting as a filter: the poles of IEC 61672-1 by the bilinear transform, 0 dB at 1
-    kHz. Within class 1 up to 16 kHz at rates from 48 kHz on.
+    """The A or C weighting as a filter: the poles of IEC 61672-1 by the bilinear transform, with 0 dB at
+    1 kHz. At rates from 48 kHz on, it is within class 1 up to 16 kHz.
 
     Parameters
     ----------
     fs : float
         The sampling rate in Hz, above 2 kHz.
     kind : {"A", "C"}
-        Which one.
+        The weighting.
 
     Returns
     -------
@@ -940,7 +948,7 @@ def weighting_filter(fs: float, kind: Literal["A", "C"] = "A") -> filters.Filter
     Raises
     ------
     ValueError
-        If fs is not above 2 kHz, or kind is none of its words.
+        If fs is not above 2 kHz, or kind is not a valid choice.
 
     Examples
     --------
@@ -951,7 +959,7 @@ def weighting_filter(fs: float, kind: Literal["A", "C"] = "A") -> filters.Filter
     from . import filters
     kind = chosen("measure.weighting_filter", "kind", kind, {"A": "A", "C": "C"})
     if not fs > 2000:
-        refuse("measure.weighting_filter", "fs", f"must be above 2000 Hz; {fs} came", "ErrAboveNyquist")
+        refuse("measure.weighting_filter", "fs", f"must be above 2000 Hz; got {fs}", "ErrAboveNyquist")
     w1, w2, w3, w4 = (2 * np.pi * f for f in (_F1, _F2, _F3, _F4))
     sections = [([1.0, 0.0, 0.0], (w1, w1)), ([0.0, 0.0, w4 * w4], (w4, w4))]
     if kind == "A":
@@ -972,7 +980,7 @@ def weighting_filter(fs: float, kind: Literal["A", "C"] = "A") -> filters.Filter
 
 def sound_level(x: ArrayLike, fs: float, weighting: Literal["A", "C", "Z"] = "A", reference: float = 2e-5,
                 axis: int = LAST) -> Any:
-    """The equivalent level of a sound pressure.
+    """The equivalent sound level.
 
     Parameters
     ----------
@@ -983,7 +991,7 @@ def sound_level(x: ArrayLike, fs: float, weighting: Literal["A", "C", "Z"] = "A"
     weighting : {"A", "C", "Z"}
         The frequency weighting.
     reference : float
-        The pressure of 0 dB.
+        The pressure at 0 dB.
     axis : int
         The axis of time.
 
@@ -995,7 +1003,7 @@ def sound_level(x: ArrayLike, fs: float, weighting: Literal["A", "C", "Z"] = "A"
     Raises
     ------
     ValueError
-        If x is empty, or weighting is none of its words.
+        If x is empty, or weighting is not a valid choice.
 
     Examples
     --------
@@ -1015,8 +1023,8 @@ def sound_level(x: ArrayLike, fs: float, weighting: Literal["A", "C", "Z"] = "A"
 
 def octave_bands(x: ArrayLike, fs: float, fraction: int = 3, low: float = 25.0,
                  high: float | None = None, reference: float = 1.0, axis: int = LAST) -> Bands:
-    """The levels in bands of an octave or a fraction of one, by Butterworth bandpass filters with the
-    midband frequencies and edges of IEC 61260-1. Low bands are filtered at a lower rate.
+    """The levels in octave or fractional-octave bands, by Butterworth bandpass filters with the midband
+    frequencies and edges of IEC 61260-1. Low bands are filtered at a lower rate.
 
     Parameters
     ----------
@@ -1027,21 +1035,21 @@ def octave_bands(x: ArrayLike, fs: float, fraction: int = 3, low: float = 25.0,
     fraction : int
         1 for octaves, 3 for third octaves, ...
     low, high : float, optional
-        The lowest and the highest midband frequency, in Hz; up to 0.45 fs by default.
+        The lowest and the highest midband frequency, in Hz; by default, up to 0.45 fs.
     reference : float
-        The value of 0 dB, such as 2e-5 for a sound pressure in Pa.
+        The value at 0 dB, such as 2e-5 for a sound pressure in Pa.
     axis : int
         The axis of time.
 
     Returns
     -------
     Bands
-        With the bands along the axis of time.
+        The levels, with the bands along the axis of time.
 
     Raises
     ------
     ValueError
-        If x is empty, there is no band, or the highest ends above fs / 2.
+        If x is empty, there is no band, or the highest band ends above fs / 2.
 
     Examples
     --------
@@ -1094,7 +1102,7 @@ def band_frequencies(fraction: int = 3, low: float = 25.0, high: float = 20000.0
     fraction : int
         1 for octaves, 3 for third octaves, ...
     low, high : float
-        The lowest and the highest, in Hz; a nominal frequency counts as the exact one next to it.
+        The lowest and the highest frequency, in Hz; a nominal frequency stands for the exact one next to it.
 
     Returns
     -------
@@ -1103,7 +1111,7 @@ def band_frequencies(fraction: int = 3, low: float = 25.0, high: float = 20000.0
     Raises
     ------
     ValueError
-        If fraction is below 1, or the bounds are not above 0 and in order.
+        If fraction is below 1, or the bounds are not above 0 and ascending.
 
     Examples
     --------
@@ -1114,7 +1122,7 @@ def band_frequencies(fraction: int = 3, low: float = 25.0, high: float = 20000.0
     """
     fraction = whole_number("measure.band_frequencies", "fraction", fraction, 1)
     if fraction > MOST_BANDS:
-        refuse("measure.band_frequencies", "fraction", f"must be at most {MOST_BANDS}; {fraction} came",
+        refuse("measure.band_frequencies", "fraction", f"must be at most {MOST_BANDS}; got {fraction}",
                "ErrRangeReversed")
     if not 0 < low <= high < math.inf:
         refuse("measure.band_frequencies", "low, high", "must be above 0, finite and in order", "ErrRangeReversed")

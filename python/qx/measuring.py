@@ -1,6 +1,6 @@
 """Peaks, repeated events such as heart beats, and pulses of a recording.
 
-Places are sample numbers with fractions; whoever shows them turns them into times.
+Positions are sample numbers with fractions; the caller converts them to times for display.
 """
 
 import bisect
@@ -14,7 +14,7 @@ from .topical import served
 
 core, smoothing = served("measure"), served("filters")
 
-WHOLE_STREAM = 5  # first and last block
+WHOLE_STREAM = 5  # flags: both first and last block
 AUTOMATIC, BINS = 2, 100
 FALLING, RISING = 0, 1
 REFERENCES = {"high": 90.0, "mid": 50.0, "low": 10.0, "percent": 1}
@@ -27,8 +27,8 @@ class Peaks:
     places: np.ndarray
     values: np.ndarray
     curvatures: np.ndarray  # second derivatives, per sample squared
-    prominences: "np.ndarray | None" = None  # where they were asked for
-    prominence: float = 0.0  # the least that was
+    prominences: "np.ndarray | None" = None  # only if the peaks were chosen by it
+    prominence: float = 0.0  # the smallest prominence that was required
 
 
 def prominences(values, maxima):
@@ -37,16 +37,16 @@ def prominences(values, maxima):
     if not len(maxima):
         return np.zeros(0)
     heights = values[maxima]
-    lowest = np.minimum.reduceat(values, np.r_[0, maxima])  # before, between and behind them
+    lowest = np.minimum.reduceat(values, np.r_[0, maxima])  # before, between and after them
     left = _lowest_before(heights, lowest[:-1])
     right = _lowest_before(heights[::-1], lowest[:0:-1])[::-1]
     return heights - np.maximum(left, right)
 
 
 def _lowest_before(heights, lowest):
-    """The lowest value between each peak and the last one before it that is higher; `lowest` has that
+    """The lowest value between each peak and the last higher peak before it. `lowest` has the lowest values
     between neighbours."""
-    found, higher = [], []  # peaks to which nothing so far is a higher one: height, lowest before it
+    found, higher = [], []  # the peaks with no higher one after them so far: height, lowest value before it
     for height, low in zip(heights.tolist(), lowest.tolist()):
         while higher and higher[-1][0] <= height:
             low = min(low, higher.pop()[1])
@@ -56,8 +56,8 @@ def _lowest_before(heights, lowest):
 
 
 def local_maxima(values):
-    """The indices of what is higher than both neighbours, of a plateau its middle."""
-    starts = np.flatnonzero(np.diff(values, prepend=np.nan))  # of runs of equal values; not the first
+    """The indices of samples that are higher than both neighbours; for a plateau, of its middle."""
+    starts = np.flatnonzero(np.diff(values, prepend=np.nan))  # starts of runs of equal values, without the first
     starts = np.r_[0, starts[starts > 0]]
     ends = np.r_[starts[1:], len(values)] - 1
     level = values[starts]
@@ -66,16 +66,16 @@ def local_maxima(values):
 
 
 def outstanding(found):
-    """The prominence from which on peaks count where nobody says it: two fifths of the third greatest,
-    which one or two disturbances do not raise, and at least a fifth of the greatest, since noise is
-    what the third one is beside one or two peaks."""
+    """The default for the smallest prominence: two fifths of the third greatest, which one or two disturbances
+    do not raise, and at least a fifth of the greatest, since the third one is noise if there are only one or
+    two peaks."""
     greatest = np.sort(found)[:-4:-1]
     return max(0.4 * greatest[-1], 0.2 * greatest[0]) if len(greatest) else 0.0
 
 
 def vertices(values, maxima, frame):
-    """Places, heights and curvatures of the parabolas through `frame` samples around each maximum,
-    where they have their vertex among them; else of the sample."""
+    """Positions, heights and curvatures of the parabolas through `frame` samples around each maximum, if their
+    vertices lie among these samples; otherwise those of the sample."""
     fit = smoothing.savgol_coefficients(2, frame, filters.EMPTY, 1)[1]
     first = np.clip(maxima - frame // 2, 0, len(values) - frame)
     c0, c1, c2 = fit @ np.lib.stride_tricks.sliding_window_view(values, frame)[first].T
@@ -87,8 +87,8 @@ def vertices(values, maxima, frame):
 
 
 def prominent_peaks(values, width, prominence=None):
-    """Peaks of the values, smoothed by parabolas over `width` samples, of this prominence at least; of
-    outstanding() prominence where it is None."""
+    """Peaks of the values, smoothed by parabolas over `width` samples, with at least this prominence; with None,
+    that of outstanding()."""
     frame = width + (width + 1) % 2
     smooth = filters.savgol(values, frame, 2)
     maxima = local_maxima(smooth)
@@ -109,8 +109,8 @@ def peaks_beyond(values, threshold, width, valleys):
 
 
 def peaks(values, threshold=None, width=5, valleys=False, prominence=None):
-    """The peaks above the threshold, or the valleys below it, by parabolas over `width` samples. Without
-    a threshold, or with a prominence, those that stand out."""
+    """The peaks above the threshold, or the valleys below it, by parabolas over `width` samples. Without a
+    threshold, or with a prominence, the peaks are chosen by their prominence."""
     if threshold is not None and prominence is None:
         return peaks_beyond(values, threshold, width, valleys)
     sign = -1.0 if valleys else 1.0
@@ -122,24 +122,24 @@ def peaks(values, threshold=None, width=5, valleys=False, prominence=None):
 
 # Events
 
-EVENT_SECONDS = 0.1  # what lasts about so long, such as the steep part of a heart beat
-EVENT_SAMPLES = 36  # where the rate is not known
+EVENT_SECONDS = 0.1  # the approximate duration of a burst, such as the steep part of a heart beat
+EVENT_SAMPLES = 36  # its duration if the rate is not known
 BLOCK = 1 << 20  # samples of a file in memory at once
-STEPS = 6  # of the activity in that time
-QUIET = 1.5  # bursts stand so far above what lies between them; tones, noise and drifts reach 0.9
-REFRACTORY = 2.5  # events follow each other no faster, in its multiples
+STEPS = 6  # values of the activity in that time
+QUIET = 1.5  # least ratio of bursts to the activity between them; tones, noise and drifts reach 0.9
+REFRACTORY = 2.5  # least distance of events, in multiples of that time
 
 
 def activity(means):
-    """The root mean square slope around every one of the means, by the largest slope."""
+    """The root mean square slope around each of the means, relative to the largest slope."""
     slopes = calculus.derivative(means)
     power = signals.convolve((slopes / (np.abs(slopes).max() or 1.0))**2, np.full(STEPS, 1 / STEPS), method="direct")
-    # A moving mean over an even number: half a step late.
+    # A moving mean over an even number of values is half a step late.
     return np.sqrt(np.maximum(power[STEPS // 2:][:len(slopes)], 0))
 
 
 def separated(places, strengths, apart):
-    """The places without those to which a stronger one is nearer than `apart`."""
+    """The positions, without those that have a stronger one nearer than `apart`."""
     kept = []
     for i in np.argsort(-strengths, kind="stable"):
         at = bisect.bisect(kept, places[i])
@@ -149,26 +149,25 @@ def separated(places, strengths, apart):
 
 
 def _burst(rate):
-    """The samples of a burst, and how many of them become one mean."""
+    """The number of samples in a burst, and the number averaged in each mean."""
     length = max(STEPS, round(EVENT_SECONDS * rate)) if rate else EVENT_SAMPLES
     return length, length // STEPS
 
 
 def events(values, rate):
-    """The places at which the values are farthest from their median within each of the repeated
-    bursts of steep slope, such as the beats of an electrocardiogram; none where there are no three
-    of them."""
+    """The repeated bursts of steep slope, such as the beats of an electrocardiogram: for each, the position at
+    which the values are farthest from their median. Empty if there are fewer than three."""
     length, step = _burst(rate)
     if len(values) < 20 * step * STEPS:
         return np.zeros(0)
     return _events(multirate.decimate(values, step, "average"), length, step, lambda first, last: values[first:last])
 
 
-MOST_MEANS = 1 << 24  # in memory, of a whole recording
+MOST_MEANS = 1 << 24  # means of a whole recording that are held in memory
 
 
 def events_of_whole(whole, rate):
-    """The events of all samples of a file (wholes.Whole); None where its means are too many for the memory."""
+    """The events of all samples of a file (wholes.Whole); None if it has too many means for the memory."""
     length, step = _burst(rate)
     if whole.count // step > MOST_MEANS:
         return None
@@ -179,7 +178,7 @@ def events_of_whole(whole, rate):
 
 
 def _events(means, length, step, part_of):
-    """The events of a signal of which means and parts are there."""
+    """The events of a signal, from its means and from parts of it."""
     strength = activity(means)
     largest = np.sort(strength)[-(len(strength) // 10):]
     level = stats.median(largest) / 2
@@ -201,17 +200,17 @@ def _events(means, length, step, part_of):
 
 @dataclasses.dataclass
 class Pulse:
-    """One pulse; places and times in samples, aberrations in percent of the amplitude."""
-    rises: bool  # begins with a rising edge
+    """One pulse: positions and times in samples, aberrations in per cent of the amplitude."""
+    rises: bool  # whether it begins with a rising edge
     low: float  # the levels of the states
     high: float
-    start: float  # of the first transition
-    end: float  # of the second one
+    start: float  # start of the first transition
+    end: float  # end of the second transition
     first_duration: float
     second_duration: float
     middle: float
-    width: float  # between the crossings of the mid reference
-    slew_rate: float  # of the first transition, per sample
+    width: float  # between the crossings of the middle reference level
+    slew_rate: float  # slew rate of the first transition, per sample
     first_overshoot: float  # beyond the state that the first transition leads to
     second_overshoot: float
     low_error: float = 0.0  # standard uncertainties of the levels
@@ -221,15 +220,15 @@ class Pulse:
 HISTOGRAM = {"method": AUTOMATIC, "bins": BINS}
 
 
-NEAR = 1.5  # bins around a level that its state has at least
-GAIN = 1.1  # of samples, which another doubling of that range must bring
+NEAR = 1.5  # smallest range of a state around its level, in bins
+GAIN = 1.1  # the least ratio by which doubling that range must increase the number of samples
 ROUNDS = 50
 
 
 def state_level(values, level, width, most):
-    """The mean of the samples of the state about a level, and its standard uncertainty from their scatter.
-    The state reaches as far as samples are dense, up to `most`; it is taken anew about the mean until it
-    stays."""
+    """The mean of the samples of the state around a level, and its standard uncertainty from their scatter.
+    The state extends as far as samples are dense, up to `most`. It is determined again around the mean until
+    the mean no longer changes."""
     away, half = np.abs(values - level), NEAR * width
     while 2 * half < most and np.count_nonzero(away <= 2 * half) > GAIN * np.count_nonzero(away <= half):
         half *= 2
@@ -245,9 +244,8 @@ def state_level(values, level, width, most):
 
 
 def levels(values, method=AUTOMATIC, bins=BINS):
-    """High and low level as pairs with their standard uncertainties. Modes of the histogram, which are
-    centres of bins, are refined by the samples about them; extremes, where the waveform has no modes,
-    are what they are."""
+    """The high and the low level, each with its standard uncertainty. Modes of the histogram, which are centres
+    of bins, are refined by the samples around them. Extremes, for a waveform without modes, are not refined."""
     high, low, _ = core.levels(values, 0.0, 1.0, method, bins, 0)
     least, greatest = float(values.min()), float(values.max())
     width = (greatest - least) / bins
@@ -265,7 +263,8 @@ def references(high, low):
 
 
 def transition(values, direction, number, high, low):
-    """slewRate, duration, start, end and the overshoot in its direction, between refined levels."""
+    """The slewRate, duration, start and end of a transition and the overshoot in its direction, between refined
+    levels."""
     found = core.pulses_transition(values, 0.0, 1.0, direction, number, references(high, low), HISTOGRAM, 0)[1:]
     under, over = found[-2:]
     modes = core.levels(values, 0.0, 1.0, AUTOMATIC, BINS, 0)[:2]
@@ -276,7 +275,7 @@ def transition(values, direction, number, high, low):
 
 
 def pulse(values, number=1, direction=RISING):
-    """Pulse `number` that begins with an edge of this direction, or None where there is none."""
+    """Pulse `number` of those that begin with an edge of this direction, or None if there is none."""
     try:
         (high, high_error), (low, low_error) = levels(values)
         width, middle = (core.pulses(values, 0.0, 1.0, direction, 1, number, references(high, low),
@@ -305,8 +304,8 @@ def pulses(values, direction=RISING):
 
 
 def event_pulse(values, places, i):
-    """The pulse of event i, and the part of the values that it was measured in, as a slice: from half
-    way to the event before to half way to the next. None at the ends, and where it has no pulse."""
+    """The pulse of event i, and the part of the values in which it was measured, as a slice from half way to the
+    previous event to half way to the next. None for the first and last event, and if there is no pulse."""
     if not 0 < i < len(places) - 1:
         return None
     part = slice(int((places[i - 1] + places[i]) / 2), int((places[i] + places[i + 1]) / 2))
@@ -316,7 +315,7 @@ def event_pulse(values, places, i):
 
 
 def typical_event(values, places):
-    """The event_pulse of middling height among those that have one, else None."""
+    """The event_pulse of median height among those that have one, else None."""
     heights = np.abs(values[places.astype(int)] - stats.median(values))
     order = np.argsort(np.abs(heights - stats.median(heights)), kind="stable")
     return next(filter(None, (event_pulse(values, places, i) for i in order)), None)

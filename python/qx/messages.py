@@ -1,5 +1,5 @@
-"""Messages between two processes of this machine: what pickle takes, with arrays in shared memory, which is mapped
-and not copied, and open files as their descriptors."""
+"""Messages between two processes on this machine. They carry anything that can be pickled. Arrays are passed in
+shared memory, which is mapped rather than copied, and open files as their descriptors."""
 
 import array
 import contextlib
@@ -10,9 +10,9 @@ import pickle
 import socket
 import struct
 
-IN_LINE = 1 << 16  # bytes of arrays for which shared memory is not worth the while
+IN_LINE = 1 << 16  # bytes of arrays up to which shared memory does not pay off
 HEAD = struct.Struct("<QII?")  # bytes of the pickle, arrays, open files, whether the arrays are in shared memory
-MOST_FILES = 250  # that a message of the system may carry
+MOST_FILES = 250  # open files that one system message may carry
 
 
 class _Pickler(pickle.Pickler):
@@ -21,7 +21,7 @@ class _Pickler(pickle.Pickler):
         super().__init__(file, 5, buffer_callback=lambda buffer: self.buffers.append(buffer.raw()))
 
     def persistent_id(self, value):
-        if not isinstance(value, (io.BufferedRandom, io.FileIO)):  # what tempfile.TemporaryFile gives
+        if not isinstance(value, (io.BufferedRandom, io.FileIO)):  # the types that tempfile.TemporaryFile returns
             return None
         value.flush()
         self.descriptors.append(value.fileno())
@@ -62,8 +62,8 @@ class Channel:
                 self.connection.sendall(buffer)
 
     def receive(self):
-        """The next message. EOFError where the other side has ended; TimeoutError, where the connection has a
-        timeout, only before the first byte of a message."""
+        """The next message. Raises EOFError if the other side has ended. If the connection has a timeout, raises
+        TimeoutError, but only before the first byte of a message."""
         first, descriptors, _, _ = socket.recv_fds(self.connection, 1, MOST_FILES)
         if not first:
             raise EOFError
@@ -95,7 +95,7 @@ class Channel:
 
 
 def _in_memory(buffers):
-    """An open file without a place on a disk that holds the buffers."""
+    """An open file in memory, not on a disk, that holds the buffers."""
     file = os.fdopen(os.memfd_create("qx"), "wb", buffering=0)
     for buffer in buffers:
         rest = memoryview(buffer)
@@ -105,7 +105,7 @@ def _in_memory(buffers):
 
 
 def _mapped(descriptor, size):
-    """The bytes of such a file, which belong to this process alone once it writes to them."""
+    """The bytes of such a file, mapped. A page that this process writes to becomes its private copy."""
     try:
         return mmap.mmap(descriptor, size, mmap.MAP_PRIVATE)
     finally:

@@ -1,10 +1,11 @@
-"""Change of the sampling rate, moving sums and shifts in frequency, of whole signals and of streams.
+"""Changes of the sampling rate, moving sums and frequency shifts, for whole signals and for streams.
 
-Each function has a class of its name's stream: blocks of any size give the bits of one piece.
+Most functions have a stream class, which takes blocks of any size and returns the same bits as a single call.
 """
 
 from __future__ import annotations
 
+import functools
 import math
 from typing import Any, Literal
 
@@ -20,16 +21,16 @@ __all__ = ["Decimator", "FrequencyShift", "InterpolatedFIR", "MovingSum", "Resam
 EMPTY = np.empty(0)
 core = served("multirate")
 
-ATTENUATION = 123.0  # dB by the estimate, 122 by the spectrum of the taps, of what would fold back
-PASSBAND = 0.9  # the part of the lower band that passes unchanged
-OVERSAMPLE, HALF_KERNEL = 256, 32  # entries a sample, and samples to each side, of the kernel of respace
+ATTENUATION = 123.0  # of what would alias, in dB: 123 by the estimate, 122 by the spectrum of the taps
+PASSBAND = 0.9  # the fraction of the lower band that passes unchanged
+OVERSAMPLE, HALF_KERNEL = 256, 32  # of the kernel of respace: entries per sample, samples to each side
 ALL_TYPES = tuple(map(np.dtype, (np.float64, np.complex128, np.float32, np.complex64)))
 
 
 def low_pass(up: int, down: int, attenuation: float = ATTENUATION,
              passband: float = PASSBAND) -> NDArray[np.float64]:
-    """The taps for a change of the rate by up / down: a cardinal sine under a Kaiser window, of odd
-    number and unit sum.
+    """The taps for a change of the rate by up / down: an odd number of samples of a cardinal sine under a
+    Kaiser window, with unit sum.
 
     The estimates of length and shape are those of J. F. Kaiser, "Nonrecursive digital filter design
     using the I0-sinh window function", 1974.
@@ -39,9 +40,9 @@ def low_pass(up: int, down: int, attenuation: float = ATTENUATION,
     up, down : int
         The factors of the rate.
     attenuation : float
-        How far down is, in dB, what would fold back.
+        The attenuation of what would alias, in dB.
     passband : float
-        The part of the lower band that passes unchanged, below 1.
+        The fraction of the lower band that passes unchanged, below 1.
 
     Returns
     -------
@@ -56,13 +57,25 @@ def low_pass(up: int, down: int, attenuation: float = ATTENUATION,
     up, down = (whole_number("multirate.low_pass", name, value, 1, "ErrNotStrictlyPositive")
                 for name, value in (("up", up), ("down", down)))
     if max(up, down) >= 2**31:
-        refuse("multirate.low_pass", "up, down", f"must be below 2^31; {up} and {down} came", "ErrSizesDisagree")
-    edge = 1 / max(up, down)  # of the lower band, 1 being half the rate of the grid
+        refuse("multirate.low_pass", "up, down", f"must be below 2^31; got {up} and {down}", "ErrSizesDisagree")
+    edge = 1 / max(up, down)  # the edge of the lower band; 1 is half the rate of the grid
     width = edge * (1 - passband)
     half = math.ceil((attenuation - 7.95) / (2.285 * math.pi * width) / 2)
     cutoff = edge * (1 + passband) / 2
     taps = np.sinc(cutoff * np.arange(-half, half + 1)) * np.kaiser(2 * half + 1, 0.1102 * (attenuation - 8.7))
     return taps / taps.sum()
+
+
+@functools.lru_cache(maxsize=16)
+def _kept(up: int, down: int) -> NDArray[np.float64]:
+    taps = low_pass(up, down)
+    taps.flags.writeable = False
+    return taps
+
+
+def _taps(up: int, down: int) -> NDArray[np.float64]:
+    """Those of `low_pass`, whose design takes longer than most signals: few of them are kept."""
+    return _kept(up, down) if max(up, down) <= 1000 else low_pass(up, down)
 
 
 def _ratio(function: Any, up: Any, down: Any) -> Any:
@@ -73,22 +86,22 @@ def _ratio(function: Any, up: Any, down: Any) -> Any:
 
 
 class Resampler(Stream):
-    """The stream of `resample`. The first value stays at time 0; `finish()` returns the last values,
-    whose filter reaches beyond the end.
+    """The stream of `resample`. The first value stays at time 0. `finish()` returns the last values, which
+    the filter computes from beyond the end.
 
     Parameters
     ----------
     up, down : int
         The new rate is up / down times the old one.
     channels : int, optional
-        How many channels a block of two dimensions has; without it blocks have one dimension.
+        Number of channels of a two-dimensional block; without it, blocks have one dimension.
     axis : int
-        The axis of time in a block of two dimensions.
+        The axis of time in a two-dimensional block.
     dtype : type
-        Of the samples; `numpy.float32` and `numpy.complex64` stay as they are.
+        The type of the samples; `numpy.float32` and `numpy.complex64` are kept.
     taps : array_like, optional
-        A symmetric filter of odd length and unit sum, at the rate `up` times the old one; that of
-        `low_pass` by default.
+        A symmetric filter of odd length and unit sum, at `up` times the old rate; by default, that of
+        `low_pass`.
 
     Examples
     --------
@@ -104,9 +117,9 @@ class Resampler(Stream):
     def __init__(self, up: int, down: int, channels: int | None = None, axis: int = -1,
                  dtype: DTypeLike = float, taps: ArrayLike | None = None) -> None:
         self.up, self.down = _ratio("multirate.Resampler", up, down)
-        taps = low_pass(self.up, self.down) if taps is None else vector(taps, "multirate.resample", "taps")
+        taps = _taps(self.up, self.down) if taps is None else vector(taps, "multirate.resample", "taps")
         if len(taps) % 2 == 0:
-            refuse("multirate.resample", "taps", f"an odd number is needed; {len(taps)} came", "ErrBadTapCount")
+            refuse("multirate.resample", "taps", f"an odd number is needed; got {len(taps)}", "ErrBadTapCount")
         single = np.dtype(dtype) in (np.float32, np.complex64)
         self.taps = np.asarray(taps, np.float32 if single else float)
         self._run = {"float64": "resample", "complex128": "resample_complex", "float32": "resample_single",
@@ -114,7 +127,7 @@ class Resampler(Stream):
         super().__init__(channels, axis, dtype)
 
     def _start(self) -> Any:
-        """State, delay to be taken off, phase, values read and written."""
+        """State, delay still to be removed, phase, numbers of values read and written."""
         return None, 0, 0, 0, 0
 
     def _step(self, begun: Any, block: Any) -> Any:
@@ -143,25 +156,24 @@ def resample(x: ArrayLike, up: int, down: int = 1, axis: int = LAST,
     Parameters
     ----------
     x : array_like
-        Real or complex values; single precision stays.
+        Real or complex values; single precision is kept.
     up, down : int
         The new rate is up / down times the old one.
     axis : int
         The axis of time.
     taps : array_like, optional
-        A symmetric filter of odd length and unit sum, at the rate `up` times the old one; by default that
-        of `low_pass`, which leaves 90 % of the lower band unchanged and takes 122 dB from what would fold
-        back.
+        A symmetric filter of odd length and unit sum, at `up` times the old rate. By default, that of
+        `low_pass`, which leaves 90 % of the lower band unchanged and attenuates what would alias by 122 dB.
 
     Returns
     -------
     ndarray
-        With n up / down values, rounded up, for n.
+        n up / down values, rounded up, for n values of x.
 
     Raises
     ------
     ValueError
-        If a factor is below 1, or taps are not of odd number.
+        If a factor is below 1, or the number of taps is even.
 
     Examples
     --------
@@ -177,20 +189,20 @@ def resample(x: ArrayLike, up: int, down: int = 1, axis: int = LAST,
         begun = stream(channel)
         return np.concatenate([begun, stream.finish()])
 
-    taps = low_pass(*_ratio("multirate.resample", up, down)) if taps is None else taps
+    taps = _taps(*_ratio("multirate.resample", up, down)) if taps is None else taps
     return along(of_channel, x, axis)
 
 
 def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) -> NDArray[Any]:
-    """The signal at any constant spacing of times, which need not be a ratio of whole numbers: by a
-    cardinal sine under a Kaiser window, read along lines between 256 entries a sample.
+    """The signal at any constant time spacing, which need not be a ratio of whole numbers. The kernel is a
+    cardinal sine under a Kaiser window, interpolated linearly between 256 entries per sample.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     spacing : float
-        The time between the new values, in samples of x; above 1 what would fold back is taken away.
+        The time between the new values, in samples of x. Above 1, what would alias is removed.
     start : float
         The time of the first value, in samples of x.
     axis : int
@@ -199,8 +211,8 @@ def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) 
     Returns
     -------
     ndarray
-        At the times start + k spacing up to that of the last sample. The error is below 5e-5 of
-        the largest value up to 0.4 of the lower rate.
+        The values at the times start + k spacing, up to the time of the last sample. For frequencies up to
+        0.4 of the lower rate, the error is below 5e-5 of the largest value.
 
     Raises
     ------
@@ -217,7 +229,7 @@ def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) 
     name = "multirate.respace"
     if not 0 < spacing < 2**31 or not 0 <= start < math.inf:
         refuse(name, "spacing, start", "must be above 0 and below 2^31, and finite and at least 0; "
-               f"{spacing} and {start} came",
+               f"got {spacing} and {start}",
                "ErrSamplingNotPositive")
     kernel = _kernel()
     design = {"ratio": float(spacing), "mode": 0, "start": float(start), "proto": kernel, "oversample": OVERSAMPLE}
@@ -238,20 +250,20 @@ def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) 
 
 def resample_at(x: ArrayLike, times: ArrayLike, fs: float = 1.0, anti_alias: bool = False,
                 axis: int = LAST) -> NDArray[Any]:
-    """The signal at any times, which need not be evenly spaced, by the kernel of `respace`. Before the first
-    and behind the last sample the signal is 0.
+    """The signal at arbitrary times, which need not be evenly spaced, by the kernel of `respace`. The signal
+    is taken as 0 before the first sample and after the last.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     times : array_like
-        Of the new values, from the first sample, in any order; rising for anti_alias.
+        The times of the new values, from the first sample, in any order; increasing for anti_alias.
     fs : float
         The sampling rate of x.
     anti_alias : bool
-        Take away what would fold back where times are further apart than samples: the kernel is
-        stretched by the gap before each time.
+        Whether to remove what would alias where the times are further apart than the samples. The kernel
+        is stretched by the gap before each time.
     axis : int
         The axis of time.
 
@@ -262,7 +274,7 @@ def resample_at(x: ArrayLike, times: ArrayLike, fs: float = 1.0, anti_alias: boo
     Raises
     ------
     ValueError
-        If x is empty, fs is not above 0, a time is not finite, or times do not rise with anti_alias.
+        If x is empty, fs is not above 0, a time is not finite, or times are not increasing with anti_alias.
 
     Examples
     --------
@@ -274,13 +286,13 @@ def resample_at(x: ArrayLike, times: ArrayLike, fs: float = 1.0, anti_alias: boo
     """
     name = "multirate.resample_at"
     if not fs > 0:
-        refuse(name, "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        refuse(name, "fs", f"must be above 0; got {fs}", "ErrSamplingNotPositive")
     at = vector(times, name, "times") * float(fs)
     if not np.all(np.isfinite(at)):
         refuse(name, "times", "must be finite", "ErrNonFiniteInput")
     gaps = np.diff(at)
     if anti_alias and np.any(gaps <= 0):
-        refuse(name, "times", "must rise for anti_alias", "ErrAbscissaeOrder")
+        refuse(name, "times", "must be increasing for anti_alias", "ErrAbscissaeOrder")
     design = {"mode": 0, "antiAlias": int(anti_alias), "proto": _kernel(), "oversample": OVERSAMPLE}
     stretch = min(max(gaps.max(initial=1.0), 1.0), OVERSAMPLE) if anti_alias else 1.0
     behind = math.ceil(stretch * (HALF_KERNEL + 2)) + 2
@@ -289,7 +301,7 @@ def resample_at(x: ArrayLike, times: ArrayLike, fs: float = 1.0, anti_alias: boo
         if not len(channel):
             refuse(name, "x", "is empty", "ErrEmptyInput")
         is_complex = channel.dtype.kind == "c"
-        # What reads only zeros need not be read: times far away become the next ones that do.
+        # Far from the signal, the kernel reads only zeros: such times are moved to the nearest such place.
         clipped = np.clip(at, -behind, len(channel) - 1 + behind) if not anti_alias else at
         reach = max(math.ceil(clipped.max(initial=0.0)) + behind - len(channel), 0)
         long = np.concatenate([channel, np.zeros(reach, channel.dtype)])
@@ -310,11 +322,11 @@ class InterpolatedFIR(Stream):
     taps : array_like
         The taps, real.
     spacing : int
-        How many samples they are apart.
+        The distance between taps, in samples.
     channels : int, optional
-        How many channels a block of two dimensions has; without it blocks have one dimension.
+        Number of channels of a two-dimensional block; without it, blocks have one dimension.
     axis : int
-        The axis of time in a block of two dimensions.
+        The axis of time in a two-dimensional block.
 
     Examples
     --------
@@ -342,8 +354,8 @@ class InterpolatedFIR(Stream):
 
 
 def interpolated_fir(x: ArrayLike, taps: ArrayLike, spacing: int, axis: int = LAST) -> NDArray[Any]:
-    r"""A filter whose taps are several samples apart: a sharp filter of few taps, whose passband repeats
-    at multiples of 1 / spacing (interpolated FIR filter).
+    r"""An interpolated FIR filter, whose taps are several samples apart: a sharp filter with few taps, whose
+    pass band repeats at multiples of 1 / spacing.
 
     .. math:: y_i = \sum_k h_k x_{i - k L}
 
@@ -356,19 +368,19 @@ def interpolated_fir(x: ArrayLike, taps: ArrayLike, spacing: int, axis: int = LA
     taps : array_like
         The taps, real.
     spacing : int
-        How many samples they are apart.
+        The distance between taps, in samples.
     axis : int
         The axis of time.
 
     Returns
     -------
     ndarray
-        Of the shape of x.
+        The same shape as x.
 
     Raises
     ------
     ValueError
-        If there is no tap, or spacing is below 1.
+        If there are no taps, or spacing is below 1.
 
     Examples
     --------
@@ -385,27 +397,27 @@ def interpolated_fir(x: ArrayLike, taps: ArrayLike, spacing: int, axis: int = LA
 
 
 def _kernel() -> Any:
-    """The table of the kernel: OVERSAMPLE entries a sample, unit sum."""
+    """The table of the kernel: OVERSAMPLE entries per sample, unit sum."""
     t = np.arange(-HALF_KERNEL * OVERSAMPLE, HALF_KERNEL * OVERSAMPLE + 1) / OVERSAMPLE
     kernel = np.sinc(0.9 * t) * np.kaiser(len(t), 0.1102 * (100 - 8.7))
     return kernel / kernel.sum()
 
 
 class Decimator(Stream):
-    """The stream of `decimate` without a filter: every factor-th value, or the means of groups.
+    """The stream of `decimate` without a filter: every factor-th value, or the mean of each group.
 
     Parameters
     ----------
     factor : int
-        How many values become one.
+        The size of a group, from which one value is returned.
     average : bool
-        The mean of each group in place of its first value.
+        Whether to return the mean of each group rather than its first value.
     channels : int, optional
-        How many channels a block of two dimensions has; without it blocks have one dimension.
+        Number of channels of a two-dimensional block; without it, blocks have one dimension.
     axis : int
-        The axis of time in a block of two dimensions.
+        The axis of time in a two-dimensional block.
     dtype : {float, complex}
-        Of the samples.
+        The type of the samples.
 
     Examples
     --------
@@ -433,17 +445,18 @@ class Decimator(Stream):
 
 def decimate(x: ArrayLike, factor: int, method: Literal["filter", "average", "pick"] = "filter",
              axis: int = LAST) -> NDArray[Any]:
-    """Every factor-th value: behind a filter, of means, or as they are.
+    """Every factor-th value, after a filter, averaged over groups, or as it is.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     factor : int
-        How many values become one.
+        The size of a group, from which one value is returned.
     method : {"filter", "average", "pick"}
-        The filter of `resample`, without delay; the means of groups; the first of each group, whatever
-        folds back. The last two drop what is behind the last whole group or keep its first value.
+        "filter" uses the filter of `resample`, without delay. "average" returns the mean of each group and
+        drops an incomplete last group. "pick" returns the first value of each group, including an
+        incomplete last one, without regard to aliasing.
     axis : int
         The axis of time.
 
@@ -454,7 +467,7 @@ def decimate(x: ArrayLike, factor: int, method: Literal["filter", "average", "pi
     Raises
     ------
     ValueError
-        If factor is below 1, or method is none of its words.
+        If factor is below 1, or method is not a valid choice.
 
     Examples
     --------
@@ -479,15 +492,15 @@ class MovingSum(Stream):
     Parameters
     ----------
     width : int
-        How many values a sum has.
+        Number of values in a sum.
     stages : int
-        How many moving sums follow each other.
+        Number of moving sums, one after the other.
     channels : int, optional
-        How many channels a block of two dimensions has; without it blocks have one dimension.
+        Number of channels of a two-dimensional block; without it, blocks have one dimension.
     axis : int
-        The axis of time in a block of two dimensions.
+        The axis of time in a two-dimensional block.
     dtype : {float, complex}
-        Of the samples.
+        The type of the samples.
 
     Examples
     --------
@@ -515,27 +528,27 @@ class MovingSum(Stream):
 
 
 def moving_sum(x: ArrayLike, width: int, stages: int = 1, axis: int = LAST) -> Any:
-    r"""The sums of each value and the width - 1 before it, zeros before the first one.
+    r"""The sums of each value and the width - 1 values before it, with zeros before the first value.
 
     .. math:: y_i = \sum_{j=0}^{w-1} x_{i-j}
 
-    The sums are running ones: each rounding error stays.
+    The sums are updated from value to value, so rounding errors accumulate.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     width : int
-        How many values a sum has.
+        Number of values in a sum.
     stages : int
-        How many moving sums follow each other.
+        Number of moving sums, one after the other.
     axis : int
         The axis of time.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
@@ -553,24 +566,24 @@ def moving_sum(x: ArrayLike, width: int, stages: int = 1, axis: int = LAST) -> A
 
 
 def moving_average(x: ArrayLike, width: int, stages: int = 1, axis: int = LAST) -> Any:
-    """The sums of `moving_sum` over the number of their values, width^stages: before the width-th value,
-    whose sum has fewer, they begin from 0.
+    """The sums of `moving_sum` divided by width^stages. Since zeros are assumed before the first value, the
+    means start from 0 and are too small before the width-th value.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     width : int
-        How many values a mean has.
+        Number of values in a mean.
     stages : int
-        How many moving means follow each other.
+        Number of moving means, one after the other.
     axis : int
         The axis of time.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
@@ -588,18 +601,18 @@ def moving_average(x: ArrayLike, width: int, stages: int = 1, axis: int = LAST) 
 
 def cic_decimate(x: ArrayLike, factor: int, stages: int = 3, differential_delay: int = 1,
                  axis: int = LAST) -> NDArray[np.float64]:
-    """Decimation behind a cascaded integrator-comb filter of unit gain at frequency 0.
+    """Decimation by a cascaded integrator-comb filter with unit gain at frequency 0.
 
     Parameters
     ----------
     x : array_like
         Real values.
     factor : int
-        How many values become one.
+        Number of input values for each output value.
     stages : int
-        How many stages the filter has.
+        Number of stages of the filter.
     differential_delay : int
-        The delay of the combs, in values of the lower rate.
+        The delay of the combs, in samples at the lower rate.
     axis : int
         The axis of time.
 
@@ -624,18 +637,18 @@ def cic_decimate(x: ArrayLike, factor: int, stages: int = 3, differential_delay:
 
 def cic_interpolate(x: ArrayLike, factor: int, stages: int = 3, differential_delay: int = 1,
                     axis: int = LAST) -> NDArray[np.float64]:
-    """Interpolation by a cascaded integrator-comb filter of unit gain at frequency 0.
+    """Interpolation by a cascaded integrator-comb filter with unit gain at frequency 0.
 
     Parameters
     ----------
     x : array_like
         Real values.
     factor : int
-        How many values each one becomes.
+        Number of output values for each input value.
     stages : int
-        How many stages the filter has.
+        Number of stages of the filter.
     differential_delay : int
-        The delay of the combs, in values of the lower rate.
+        The delay of the combs, in samples at the lower rate.
     axis : int
         The axis of time.
 
@@ -659,21 +672,21 @@ def cic_interpolate(x: ArrayLike, factor: int, stages: int = 3, differential_del
 
 
 class FrequencyShift(Stream):
-    """The stream of `shift_frequency`; the blocks of a complex signal join without a jump of the phase,
-    to rounding.
+    """The stream of `shift_frequency`. Successive blocks join without a phase jump; those of a complex
+    signal, to within rounding.
 
     Parameters
     ----------
     frequency : float
-        By how much, in the unit of fs.
+        The shift, in the unit of fs.
     fs : float
         The sampling rate.
     channels : int, optional
-        How many channels a block of two dimensions has; without it blocks have one dimension.
+        Number of channels of a two-dimensional block; without it, blocks have one dimension.
     axis : int
-        The axis of time in a block of two dimensions.
+        The axis of time in a two-dimensional block.
     dtype : {float, complex}
-        Of the samples; what comes out is complex.
+        The type of the samples; the output is complex.
 
     Examples
     --------
@@ -688,7 +701,7 @@ class FrequencyShift(Stream):
     def __init__(self, frequency: float, fs: float = 1.0, channels: int | None = None, axis: int = -1,
                  dtype: type[float] | type[complex] = float) -> None:
         if not fs > 0:
-            refuse("multirate.FrequencyShift", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+            refuse("multirate.FrequencyShift", "fs", f"must be above 0; got {fs}", "ErrSamplingNotPositive")
         self.frequency, self.fs = float(frequency), float(fs)
         super().__init__(channels, axis, dtype)
 
@@ -714,7 +727,7 @@ def shift_frequency(x: ArrayLike, frequency: float, fs: float = 1.0,
     x : array_like
         Real or complex values.
     frequency : float
-        By how much, in the unit of fs.
+        The shift, in the unit of fs.
     fs : float
         The sampling rate.
     axis : int

@@ -1,12 +1,12 @@
-"""Noise of several distributions, repeatable by its seed.
+"""Noise of several distributions, reproducible from a seed.
 
-A function with a seed returns the same values each time; without one a key is drawn from the system. A
-`Generator` goes on from call to call, so that blocks are those of one piece.
+A function with a seed returns the same values each time; without a seed, the key is drawn from the system.
+A `Generator` continues from call to call, so that several blocks have the same values as a single long one.
 
-The numbers come from a counter: J. K. Salmon, M. A. Moraes, R. O. Dror and D. E. Shaw, "Parallel random
-numbers: as easy as 1, 2, 3", 2011. Each value is a function of seed, stream, position and kind of noise, so
-that any position is reached at once, and streams and seeds are independent: for several channels or
-processes take one seed and a stream for each.
+The numbers come from a counter-based generator: J. K. Salmon, M. A. Moraes, R. O. Dror and D. E. Shaw,
+"Parallel random numbers: as easy as 1, 2, 3", 2011. Each value is a function of the seed, the stream, the
+position and the kind of noise. Any position is therefore reached directly, and streams and seeds are
+independent: for several channels or processes, use one seed and a stream for each.
 """
 
 from __future__ import annotations
@@ -31,19 +31,19 @@ MOST_EVENTS = 1e15
 
 
 class Generator:
-    """A source of random numbers that goes on from call to call.
+    """A source of random numbers that continues from call to call.
 
     Parameters
     ----------
     seed : int, optional
-        From 1 to 2^31 - 1, for numbers that can be repeated; without one it is drawn from the system.
+        From 1 to 2^31 - 1, for reproducible numbers; by default, it is drawn from the system.
     stream : int
-        From 0 to 2^31 - 1: independent sequences of the same seed.
+        From 0 to 2^31 - 1; the streams of a seed are independent sequences.
 
     Attributes
     ----------
     position : int
-        How many values have been drawn; may be set, to go anywhere.
+        Number of values drawn so far; set it to move to any position.
 
     Examples
     --------
@@ -63,92 +63,92 @@ class Generator:
         self.stream = whole_number("noise.Generator", "stream", stream, 0)
         for name, value in (("seed", seed or 0), ("stream", self.stream)):
             if value > LARGEST_SEED:
-                refuse("noise.Generator", name, f"must be at most {LARGEST_SEED}; {value} came")
+                refuse("noise.Generator", name, f"must be at most {LARGEST_SEED}; got {value}")
         self.seed = seed
         self.reset()
 
     def reset(self) -> None:
-        """Begins anew: with the same numbers where there is a seed."""
+        """Starts afresh, with the same numbers if a seed was given."""
         self._key = self.seed or 1 + int.from_bytes(os.urandom(8), "little") % LARGEST_SEED
         self.position = 0
-        self._periodic: dict[str, int] = {}  # the state of periodic noise, once there is some
+        self._periodic: dict[str, int] = {}  # the state of periodic noise, after its first call
 
     def copy(self) -> Any:
-        """A generator that gives the same numbers from here on."""
+        """A generator that returns the same numbers from this position on."""
         return copy.deepcopy(self)
 
     def _place(self, n: int) -> tuple[int, int, float]:
-        """Where n values begin; the next ones come after them."""
+        """Seed, stream and position of the next n values; moves the position past them."""
         start = self.position
         self.position += n
         return self._key, self.stream, float(start)
 
     def uniform(self, n: Any, amplitude: Any = 1.0) -> Any:
-        """n values spread evenly between -amplitude and amplitude."""
+        """n values, uniformly distributed between -amplitude and amplitude."""
         n = whole_number("noise.uniform", "n", n, 1)
         return core.uniform(n, float(amplitude), *self._place(n))
 
     def gaussian(self, n: Any, sigma: Any = 1.0) -> Any:
-        """n values of a normal distribution of mean 0 and standard deviation sigma."""
+        """n values of a normal distribution with mean 0 and standard deviation sigma."""
         n = whole_number("noise.gaussian", "n", n, 1)
         return core.gaussian(n, float(sigma), *self._place(n))
 
     def periodic(self, n: Any, amplitude: Any = 1.0) -> Any:
-        """One period of n values of cosines of this amplitude at all whole frequencies, with random
-        phases. The phases come from a generator of their own, that of B. A. Wichmann and I. D. Hill (1982),
-        and neither stream nor position matters."""
+        """One period, of n values, of a sum of cosines of this amplitude at all whole frequencies, with
+        random phases. The phases come from a separate generator, that of B. A. Wichmann and I. D. Hill
+        (1982), and do not depend on stream or position."""
         n = whole_number("noise.periodic", "n", n, 1)
         seed = 0 if self._periodic else self._key
         x, self._periodic = core.periodic(n, float(amplitude), seed, self._periodic)
         return x
 
     def gamma(self, n: Any, order: Any = 1) -> Any:
-        """n values of a gamma distribution of shape `order`: of a whole one, waiting times for so many
-        events of a Poisson process of rate 1."""
+        """n values of a gamma distribution of shape `order`. For a whole order, these are the waiting times
+        for that many events of a Poisson process of rate 1."""
         n = whole_number("noise.gamma", "n", n, 1)
         if not 0 < order < math.inf:
-            refuse("noise.gamma", "order", f"must be above 0 and finite; {order} came", "ErrInvalidSelector")
+            refuse("noise.gamma", "order", f"must be above 0 and finite; got {order}", "ErrInvalidSelector")
         return core.gamma(n, float(order), *self._place(n))
 
     def poisson(self, n: Any, mean: Any = 1.0) -> Any:
-        """n numbers of events whose mean is given, up to 1e15."""
+        """n numbers of events with the given mean, up to 1e15."""
         n = whole_number("noise.poisson", "n", n, 1)
         if not 0 <= mean <= MOST_EVENTS:
-            refuse("noise.poisson", "mean", f"must be from 0 to {MOST_EVENTS:g}; {mean} came")
+            refuse("noise.poisson", "mean", f"must be from 0 to {MOST_EVENTS:g}; got {mean}")
         return core.poisson(n, float(mean), *self._place(n))
 
     def binomial(self, n: Any, trials: Any = 1, p: Any = 0.5) -> Any:
-        """n numbers of successes among trials of probability p, of up to 2^52 trials."""
+        """n numbers of successes in up to 2^52 trials of probability p."""
         n = whole_number("noise.binomial", "n", n, 1)
         trials = whole_number("noise.binomial", "trials", trials, 0, "ErrInvalidSelector")
         if trials > 2**52:
-            refuse("noise.binomial", "trials", f"must be at most 2^52; {trials} came")
+            refuse("noise.binomial", "trials", f"must be at most 2^52; got {trials}")
         if not 0 <= p <= 1:
-            refuse("noise.binomial", "p", f"must be from 0 to 1; {p} came")
+            refuse("noise.binomial", "p", f"must be from 0 to 1; got {p}")
         return core.binomial(n, float(trials), float(p), *self._place(n)).astype(np.int64)
 
     def permutation(self, n: Any) -> Any:
-        """0 to n - 1 in a random order, all orders equally likely."""
+        """The numbers 0 to n - 1 in a random order; all orders are equally likely."""
         n = whole_number("noise.permutation", "n", n, 1)
         return core.permutation(n, *self._place(n))
 
     def shuffle(self, x: Any) -> Any:
-        """The elements of x, along the first axis, in a random order."""
+        """The elements of x along the first axis, in a random order."""
         x = np.asarray(x)
         return x[self.permutation(len(x))]
 
 
 def uniform(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[Any]:
-    """Uniform white noise: values spread evenly between -amplitude and amplitude.
+    """Uniform white noise: values uniformly distributed between -amplitude and amplitude.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     amplitude : float
         The bound, in the unit of the result.
     seed : int, optional
-        From 1 to 2^31 - 1, for values that can be repeated.
+        From 1 to 2^31 - 1, for reproducible values.
 
     Returns
     -------
@@ -169,16 +169,16 @@ def uniform(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[
 
 
 def gaussian(n: int, sigma: float = 1.0, seed: int | None = None) -> NDArray[Any]:
-    """Gaussian white noise of mean 0, by the inverse of the distribution.
+    """Gaussian white noise of mean 0, by the inverse of the distribution function.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     sigma : float
         The standard deviation, in the unit of the result.
     seed : int, optional
-        From 1 to 2^31 - 1, for values that can be repeated.
+        From 1 to 2^31 - 1, for reproducible values.
 
     Returns
     -------
@@ -199,17 +199,17 @@ def gaussian(n: int, sigma: float = 1.0, seed: int | None = None) -> NDArray[Any
 
 
 def periodic(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[Any]:
-    """One period of cosines at 1, 2, ..., (n - 1) / 2 cycles, each of the same amplitude, with random phases: noise
-    whose spectrum is flat over whole numbers of periods.
+    """One period of cosines at 1, 2, ..., (n - 1) / 2 cycles, all of the same amplitude, with random phases.
+    The spectrum of this noise is flat over a whole number of periods.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     amplitude : float
         The amplitude of each cosine.
     seed : int, optional
-        From 1 to 2^31 - 1, for values that can be repeated.
+        From 1 to 2^31 - 1, for reproducible values.
 
     Returns
     -------
@@ -230,16 +230,17 @@ def periodic(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray
 
 
 def gamma(n: int, order: float = 1, seed: int | None = None) -> NDArray[Any]:
-    """Gamma noise: of a whole order, waiting times for so many events of a Poisson process of rate 1.
+    """Gamma noise. For a whole order, the values are the waiting times for that many events of a Poisson
+    process of rate 1.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     order : float
-        The shape, above 0: how many events; mean and variance.
+        The shape, above 0: the number of events, which is also the mean and the variance.
     seed : int, optional
-        From 1 to 2^31 - 1, for values that can be repeated.
+        From 1 to 2^31 - 1, for reproducible values.
 
     Returns
     -------
@@ -265,11 +266,11 @@ def poisson(n: int, mean: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     mean : float
-        The mean number, up to 1e15.
+        The mean number of events, up to 1e15.
     seed : int, optional
-        From 1 to 2^31 - 1, for values that can be repeated.
+        From 1 to 2^31 - 1, for reproducible values.
 
     Returns
     -------
@@ -295,13 +296,13 @@ def binomial(n: int, trials: int = 1, p: float = 0.5, seed: int | None = None) -
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     trials : int
-        How many trials each number counts, up to 2^52.
+        Number of trials behind each value, up to 2^52.
     p : float
-        The probability of a success.
+        The probability of success.
     seed : int, optional
-        From 1 to 2^31 - 1, for values that can be repeated.
+        From 1 to 2^31 - 1, for reproducible values.
 
     Returns
     -------
@@ -322,15 +323,15 @@ def binomial(n: int, trials: int = 1, p: float = 0.5, seed: int | None = None) -
 
 
 def permutation(n: int, seed: int | None = None) -> NDArray[np.int32]:
-    """0 to n - 1 in a random order, all orders equally likely (R. Durstenfeld, "Algorithm 235: Random
-    permutation", 1964).
+    """The numbers 0 to n - 1 in a random order; all orders are equally likely (R. Durstenfeld, "Algorithm
+    235: Random permutation", 1964).
 
     Parameters
     ----------
     n : int
-        How many numbers.
+        Number of elements.
     seed : int, optional
-        From 1 to 2^31 - 1, for an order that can be repeated.
+        From 1 to 2^31 - 1, for a reproducible order.
 
     Returns
     -------
@@ -339,7 +340,7 @@ def permutation(n: int, seed: int | None = None) -> NDArray[np.int32]:
     Raises
     ------
     ValueError
-        If there is no element, or the seed is out of range.
+        If there are no elements, or the seed is out of range.
 
     Examples
     --------
@@ -351,14 +352,14 @@ def permutation(n: int, seed: int | None = None) -> NDArray[np.int32]:
 
 
 def shuffle(x: ArrayLike, seed: int | None = None) -> NDArray[Any]:
-    """The elements of x, along the first axis, in a random order, all orders equally likely.
+    """The elements of x along the first axis, in a random order; all orders are equally likely.
 
     Parameters
     ----------
     x : array_like
-        The elements; x stays as it is.
+        The elements; x is not changed.
     seed : int, optional
-        From 1 to 2^31 - 1, for an order that can be repeated.
+        From 1 to 2^31 - 1, for a reproducible order.
 
     Returns
     -------
@@ -367,7 +368,7 @@ def shuffle(x: ArrayLike, seed: int | None = None) -> NDArray[Any]:
     Raises
     ------
     ValueError
-        If there is no element, or the seed is out of range.
+        If there are no elements, or the seed is out of range.
 
     Examples
     --------

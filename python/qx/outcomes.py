@@ -14,13 +14,14 @@ from .library import library
 
 HOST_FAILURES = (1, 2)  # statuses of the host that some exports pass on
 _PACKAGE = os.path.dirname(os.path.abspath(__file__)) + os.sep
-_NAME = __name__.rpartition(".")[0] + "."  # of the package's modules
+_NAME = __name__.rpartition(".")[0] + "."  # the prefix of the package's modules
 
 
 class QxError(Exception):
-    """A failure: `code`, `name` and `text` as the host has them, `export`, `rule` (what the export's
-    text says of this code), and `results` with what the export left behind. Most failures leave empty
-    arrays and NaN. Failures of one kind are of a class that is also Python's or NumPy's for them."""
+    """A failure of an export. It has the `code`, its `name` and `text`, the `export`, the `rule` (what the
+    export's documentation says about this code), and the `results` that the export returned nevertheless,
+    usually empty arrays and NaN. The subclasses are also the exceptions that Python or NumPy raise in such
+    cases."""
 
     def __init__(self, export, code, results=None, place="", message=None):
         self.export, self.code, self.results, self.place = export, code, results, place
@@ -35,15 +36,15 @@ class QxError(Exception):
 
 
 class ArgumentError(QxError, ValueError):
-    """An argument, or several together, against a rule of the function."""
+    """An argument, or a combination of arguments, that the function does not accept."""
 
 
 class MatrixError(QxError, LinAlgError):
-    """A matrix that is singular, not square, not positive definite or too badly conditioned."""
+    """A matrix that is singular, not square, not positive definite, or too badly conditioned."""
 
 
 class OutOfMemory(QxError, MemoryError):
-    """The host has no memory for a result, or the library none for its work."""
+    """The host has no memory for a result, or the library has none for its work."""
 
 
 _MATRIX = ("ErrSingularMatrix", "ErrNotSquare", "ErrNotPositiveDefinite", "ErrConditionTooHigh")
@@ -54,7 +55,7 @@ _OTHERS = ("ErrIterationLimit", "ErrNoUsableFit", "ErrOverflow", "ErrNonFiniteFu
 
 
 def rule(export, name):
-    """What the text of the export, or of the one whose codes it takes over, says of a code."""
+    """What the documentation of the export, or of the export whose codes it shares, says about a code."""
     entry = library().entries.get(export, {"documentation": "", "inherited": []})
     for text in (entry["documentation"],
                  *(library().entries[other]["documentation"] for other in entry["inherited"])):
@@ -65,7 +66,7 @@ def rule(export, name):
 
 
 def kind_of(name, code=0):
-    """The class of exception for a code."""
+    """The exception class for a code."""
     if name in _MATRIX:
         return MatrixError
     if name in _MEMORY or code in HOST_FAILURES:
@@ -74,12 +75,13 @@ def kind_of(name, code=0):
 
 
 def caller():
-    """The public function of a topic that is at work, such as "fft.rfft"; empty for a call of an export."""
+    """The public function of a topic that is being called, such as "fft.rfft"; empty for a call of an export."""
     found = ""
     frame: Optional[FrameType] = sys._getframe(1)
     while frame and frame.f_code.co_filename.startswith((_PACKAGE, "<qx ")):
         module = frame.f_globals.get("__name__", "").removeprefix(_NAME)
-        parts = getattr(frame.f_code, "co_qualname", frame.f_code.co_name).split(".")  # before Python 3.11 the last one
+        # Before Python 3.11 there is only the last part of the name.
+        parts = getattr(frame.f_code, "co_qualname", frame.f_code.co_name).split(".")
         if "." not in module and parts[0] in frame.f_globals.get("__all__", ()):
             found = ".".join([module, *(part for part in parts[:2] if not part.startswith(("__", "<")))])
         frame = frame.f_back
@@ -87,20 +89,20 @@ def caller():
 
 
 def at(place):
-    """A place in an export's arguments as messages name it, behind the function of a topic that was called."""
+    """A place in the arguments as messages name it, after the topic's function that was called."""
     function = caller()
     return f"qx.{function}: {place}" if function else place
 
 
 def failure(export, code, results=None, place=""):
-    """The exception for a code, of the class that fits it. It names the function of a topic that was called."""
+    """The exception for a code, of the matching class. It names the topic's function that was called."""
     kind, function = kind_of(library().error_name(code), code), caller()
     error = kind(export, code, results, place)
     return kind(export, code, results, place, f"qx.{function}: {error}") if function else error
 
 
 def named(error):
-    """A failure out of a thread, which does not know what was called, under its name."""
+    """A failure from a thread, with the name of the called function, which the thread does not know."""
     function = caller()
     if not function or str(error).startswith("qx."):
         return error
@@ -111,7 +113,7 @@ def named(error):
 
 
 class QxWarning(UserWarning):
-    """A warning: the results stand."""
+    """A warning: the results are valid."""
 
     def __init__(self, export, code, message=None):
         self.export, self.code = export, code
@@ -127,18 +129,18 @@ def is_failure(status):
     return status < 0 or status in HOST_FAILURES
 
 
-_kept = threading.local()  # the warnings of a thread that somebody else decides on
+_kept = threading.local()  # the warnings of a thread that its caller handles
 
 
 def tell(export, status, results, place=""):
-    """Raises a failure; gives a warning at the line that called into the package."""
+    """Raises a failure, or issues a warning at the line that called into the package."""
     if is_failure(status):
         raise failure(export, status, results, place)
     warn(QxWarning(export, status))
 
 
 def warn(warning):
-    """Gives a warning at the line that called into the package, or keeps it under keeping()."""
+    """Issues a warning at the line that called into the package, or keeps it under keeping()."""
     kept = getattr(_kept, "warnings", None)
     if kept is not None:
         kept.append(warning)
@@ -150,7 +152,7 @@ def warn(warning):
 
 
 def keeping(work, *arguments):
-    """The result of work, done for somebody who decides on its warnings, and these warnings."""
+    """The result of work, and its warnings, which the caller handles."""
     before, _kept.warnings = getattr(_kept, "warnings", None), []
     try:
         return work(*arguments), _kept.warnings

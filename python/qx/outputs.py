@@ -1,8 +1,8 @@
-"""What the commands write: whole files only, never over a file of the user's unless they ask for it,
-and never over the file that is being read.
+"""The files that the commands write. Files are complete or not written at all. A user's file is only replaced on
+request, and the file that is being read is never replaced.
 
-A page or drawing of a command carries a mark, MARK and the command's name, near its beginning. A
-file with the mark may be made anew, so that a command can be repeated.
+A page or plot written by a command has a mark, MARK and the command's name, near its beginning. A file with the
+mark may be replaced, so that a command can be repeated.
 """
 
 import contextlib
@@ -15,11 +15,11 @@ MARKED = 4096  # bytes at either end of a file in which a mark is looked for
 
 
 class Exists(ValueError):
-    """A file stands where a command is to write."""
+    """A file already exists where a command is to write."""
 
 
 _unfinished = set()
-UNFINISHED = re.compile(r"\.\d+\.part\.")  # how names begin of what a process that was killed has left behind
+UNFINISHED = re.compile(r"\.\d+\.part\.")  # in the names of files left behind by a process that was killed
 
 
 def mark(command):
@@ -40,12 +40,12 @@ def is_marked(path, command):
 
 
 def _is_file(path):
-    """Whether a regular file stands there; a pipe or a device is written to as it is."""
+    """Whether the path is that of a regular file. Pipes and devices are written to directly."""
     return os.path.exists(path) and stat.S_ISREG(os.stat(path).st_mode)
 
 
 def identity(path):
-    """What all names and links of a file share."""
+    """The identity of a file, the same for all its names and links."""
     status = os.stat(path)
     return status.st_dev, status.st_ino
 
@@ -55,14 +55,13 @@ def identities(paths):
 
 
 def check(path, force=False, command=None, inputs=frozenset()):
-    """Refuses a path that must not be written. `inputs` has the identities of the files that are read:
-    they are never replaced. What stands there already is replaced with `force`, or where it has the
-    mark of `command`."""
+    """Refuses a path that must not be written. `inputs` contains the identities of the files that are read, which
+    are never replaced. Another existing file may be replaced with `force`, or if it has the mark of `command`."""
     path = os.fspath(path)
     if not os.path.exists(path):
         return
     if identity(path) in inputs:
-        raise Exists(f"{path}: is a file that is read, and is never replaced")
+        raise Exists(f"{path}: is an input file, which is never replaced")
     if os.path.isdir(path):
         raise Exists(f"{path}: is a folder")
     if _is_file(path) and not force and not (command and is_marked(path, command)):
@@ -71,9 +70,9 @@ def check(path, force=False, command=None, inputs=frozenset()):
 
 @contextlib.contextmanager
 def whole(path):
-    """The path of a new file beside `path`, which takes its place when the block is left, and is
-    removed where that is by an exception. Its name ends as that of `path` does."""
-    path = os.path.realpath(path)  # a link stays, and what it leads to is replaced
+    """The path of a new file beside `path`, with the same extension. It replaces `path` at the end of the block, and
+    is removed if the block ends with an exception."""
+    path = os.path.realpath(path)  # a link is kept, and its target is replaced
     try:
         if os.path.exists(path) and not _is_file(path):
             yield path
@@ -98,7 +97,7 @@ def forget(part):
 
 
 def forget_all():
-    """Removes what is unfinished, before the process ends at once."""
+    """Removes unfinished files before the process ends immediately."""
     for part in list(_unfinished):
         forget(part)
 
@@ -107,7 +106,7 @@ def make_folder(path):
     try:
         os.makedirs(path, exist_ok=True)
     except OSError as error:
-        raise OSError(f"{path}: cannot be made: {error.strerror}") from None
+        raise OSError(f"{path}: cannot be created: {error.strerror}") from None
 
 
 def write_text(path, text):
@@ -118,5 +117,5 @@ def write_text(path, text):
         file.write(text)
 
 
-def add_force(command, text="replaces files that exist"):
+def add_force(command, text="replaces existing files"):
     command.add_argument("--force", action="store_true", help=text)

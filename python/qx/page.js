@@ -1,5 +1,5 @@
-// Draws the plots of a page with dygraphs: parts of curves in as many points as the window has, marks,
-// levels and images, and one time axis for all plots of a link.
+// Draws the plots of a page with dygraphs: parts of curves, with as many points as the window shows, marks,
+// levels and images, and a common time axis for all plots of a link.
 "use strict";
 
 const colour = name => getComputedStyle(document.documentElement).getPropertyValue("--" + name).trim();
@@ -10,7 +10,7 @@ function numbers(stored) {
   return Float64Array.from(small, value => stored.middle + stored.scale * value);
 }
 
-// Lowest and highest values of the samples from `first` to `last`, in at most `most` groups.
+// The lowest and highest values of the samples from `first` to `last`, in at most `most` groups.
 function reduce(curves, place, first, last, most) {
   const rows = [], group = Math.max(1, Math.ceil((last - first) / most));
   const bands = curves.some(curve => curve.highs);
@@ -35,7 +35,7 @@ function reduce(curves, place, first, last, most) {
   return rows;
 }
 
-// The index of the first of rising numbers that is not below one.
+// The index of the first of ascending numbers that is at least `least`.
 function firstFrom(rising, least) {
   let low = 0, high = rising.length;
   while (low < high) {
@@ -46,8 +46,8 @@ function firstFrom(rising, least) {
   return low;
 }
 
-// The samples of a plot that are in the page. A source has the range of its x axis, and `rows`, which gives
-// the rows of a part in at most `most` groups to the function `then`, at once or later.
+// The samples of a plot that are in the page. A source has the range of its x axis, and `rows`, which passes
+// the rows of a part, in at most `most` groups, to the function `then`, immediately or later.
 class Inside {
   constructor(plot) {
     this.curves = plot.curves.map(curve => ({lows: numbers(curve), highs: curve.highs && numbers(curve.highs)}));
@@ -67,9 +67,9 @@ class Inside {
 
 const figures = [];
 
-// A plot in its element: caption, buttons, legend, axes and a graph of dygraphs. `window` is the part of the x
-// axis that is shown; `asked` is the latest question to the source, whose earlier answers are dropped; `busy`
-// says that the graph is being changed by us, not by the reader.
+// A plot in its element: caption, buttons, legend, axes and a dygraphs graph. `window` is the part of the x
+// axis that is shown. `asked` is the latest request to the source; answers to earlier ones are dropped. `busy`
+// says that the graph is being changed by this script, not by the reader.
 
 class Figure {
   constructor(element, plot, source) {
@@ -84,9 +84,9 @@ class Figure {
     const caption = make("figcaption", "", element);
     make("strong", "", caption, plot.title);
     const tools = make("span", "tools", caption);
-    for (const [text, title, act] of [["+", "nearer", () => this.zoom(0.5)], ["−", "farther", () => this.zoom(2)],
+    for (const [text, title, act] of [["+", "zoom in", () => this.zoom(0.5)], ["−", "zoom out", () => this.zoom(2)],
       ["‹", "earlier", () => this.shift(-0.5)], ["›", "later", () => this.shift(0.5)],
-      ["all", "all of it; so does a double click", () => this.show(this.source.range)]]) {
+      ["all", "show all (or double-click)", () => this.show(this.source.range)]]) {
       const button = make("button", "", tools, text);
       button.type = "button";
       button.title = title;
@@ -138,7 +138,7 @@ class Figure {
     return Math.max(200, this.canvas.clientWidth || 600);
   }
 
-  // New samples for the window, with a margin to either side that is there when it is moved.
+  // Fetches samples for the window, with a margin on either side for when it is moved.
   refresh() {
     if (!this.graph) return;
     const [from, to] = this.window, margin = (to - from) / 2;
@@ -227,35 +227,58 @@ class Figure {
     canvas.textAlign = "center";
     for (const [y] of this.plot.levels) line(canvas, area.x, graph.toDomYCoord(y), area.x + area.w, null, "grey");
     for (const [x] of this.plot.verticals) line(canvas, graph.toDomXCoord(x), area.y, null, area.y + area.h, "warm");
-    const taken = [];  // boxes of labels
-    for (const mark of this.plot.marks) {
-      const [x, y] = graph.toDomCoords(mark.x, mark.y);
-      if (x < area.x - 9 || x > area.x + area.w + 9) continue;
+    const taken = [];  // boxes of marks and labels
+    const marks = this.plot.marks.map(mark => [mark, ...graph.toDomCoords(mark.x, mark.y)])
+      .filter(([, x]) => x >= area.x - 9 && x <= area.x + area.w + 9);
+    for (const [mark, x, y] of marks) {
       canvas.strokeStyle = colour(mark.colour);
       canvas.lineWidth = 1.6;
       canvas.beginPath();
       canvas.arc(x, y, 3.5, 0, 7);
       canvas.stroke();
-      if (mark.label) label(canvas, area, taken, mark.label, x, y);
+      taken.push([x - 4, y - 4, 8, 8]);
     }
+    canvas.strokeStyle = colour("grey");
+    for (const [mark, x, y] of marks) if (mark.label) label(canvas, area, taken, mark.label, x, y);
     canvas.restore();
   }
 }
 
-// Writes the label of a mark above, below, left or right of it, where no other label is; else not at all.
+// The place of a label of the given size for a mark at x, y, which is entered in `taken`: above, below, left or right
+// of the mark if it is free of other marks and labels, or else in a free row beside it, `isAside`. Undefined if there
+// is none.
+function placeOf(area, taken, wide, high, x, y) {
+  const held = (value, from, size, room) => Math.max(from, Math.min(value, from + size - room));
+  const near = [[x - wide / 2, y - 18], [x - wide / 2, y + 6], [x - wide - 5, y - high / 2], [x + 5, y - high / 2]]
+    .map(([left, top]) => ({left: held(left, area.x, area.w, wide), top: held(top, area.y, area.h, high)}));
+  const aside = [0, 1, 2, 3, 4, 5, 6, -1, -2, -3].flatMap(row => [x + 24, x - 24 - wide].map(left =>
+    ({left, top: y - high / 2 + row * high, isAside: true})));
+  const place = [...near, ...aside].find(({left, top}) =>
+    left >= area.x && left + wide <= area.x + area.w && top >= area.y && top + high <= area.y + area.h &&
+    !taken.some(([a, b, w, h]) => left < a + w && a < left + wide && top < b + h && b < top + high));
+  if (place) taken.push([place.left, place.top, wide, high]);
+  return place;
+}
+
+// Writes the label of a mark, with a line to the mark where it is aside.
 function label(canvas, area, taken, text, x, y) {
   const wide = canvas.measureText(text).width + 4, high = 13;
-  for (const [left, top] of [[x - wide / 2, y - 18], [x - wide / 2, y + 6], [x - wide - 5, y - high / 2],
-    [x + 5, y - high / 2]]) {
-    const at = [Math.max(area.x, Math.min(left, area.x + area.w - wide)),
-      Math.max(area.y, Math.min(top, area.y + area.h - high))];
-    if (Math.abs(at[1] - top) > high || taken.some(([a, b, w]) => at[0] < a + w && a < at[0] + wide &&
-        Math.abs(at[1] - b) < high)) continue;
-    taken.push([...at, wide]);
-    canvas.fillStyle = colour("text");
-    canvas.fillText(text, at[0] + wide / 2, at[1] + high - 3);
-    return;
+  const place = placeOf(area, taken, wide, high, x, y);
+  if (!place) return;
+  if (place.isAside) {
+    const side = place.left > x ? 1 : -1;
+    canvas.lineWidth = 0.8;
+    canvas.beginPath();
+    canvas.moveTo(x + 4 * side, y);
+    canvas.lineTo(side > 0 ? place.left : place.left + wide, place.top + high / 2);
+    canvas.stroke();
   }
+  canvas.lineWidth = 3;
+  canvas.strokeStyle = colour("ground");
+  canvas.strokeText(text, place.left + wide / 2, place.top + high - 3);
+  canvas.strokeStyle = colour("grey");
+  canvas.fillStyle = colour("text");
+  canvas.fillText(text, place.left + wide / 2, place.top + high - 3);
 }
 
 function line(canvas, x, y, toX, toY, name) {

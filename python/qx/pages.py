@@ -1,7 +1,7 @@
-"""What all pages share: their style, their plots, and the frame of a page.
+"""The common parts of all pages: their style, their plots, and the frame of a page.
 
-Plots are drawn in the page by dygraphs, from Debian's package libjs-dygraphs, which is put into the page so
-that it needs nothing from elsewhere. Where the package is missing they are drawings that stand still.
+Plots are drawn in the page by dygraphs, from Debian's package libjs-dygraphs, which is included in the page so that
+it needs no other files. If the package is missing, the plots are static drawings.
 """
 
 import functools
@@ -15,8 +15,8 @@ from . import drawing, figures, outputs
 
 HERE = Path(__file__).parent
 DYGRAPHS = Path("/usr/share/javascript/dygraphs")
-POINTS = 300_000  # of all curves of a page, as lowest and highest values four bytes each
-STILL = "The plots stand still: to zoom in them, install Debian's package libjs-dygraphs and make the page anew."
+POINTS = 300_000  # points of all curves of a page, as lowest and highest values of four bytes each
+STILL = "The plots are static: to zoom in them, install Debian's package libjs-dygraphs and create the page again."
 HEAD = ('<meta charset="utf-8"><meta name="viewport" content="width=device-width, initial-scale=1">'
         '<meta http-equiv="Content-Security-Policy" content="default-src \'none\'; style-src \'unsafe-inline\'; '
         'script-src \'unsafe-inline\'; img-src data:; connect-src \'self\'">')
@@ -29,7 +29,7 @@ def style():
 
 @functools.cache
 def dygraphs():
-    """The text of dygraphs and of its style; None where it is not installed."""
+    """The text of dygraphs and of its style; None if it is not installed."""
     try:
         return ((DYGRAPHS / "dygraph.min.js").read_text("utf-8").rpartition("//# sourceMappingURL")[0],
                 (DYGRAPHS / "dygraph.min.css").read_text("utf-8").rpartition("/*# sourceMappingURL")[0])
@@ -38,12 +38,12 @@ def dygraphs():
 
 
 def script(text):
-    """A script as a part of a page, which nothing in it ends early."""
+    """A script element of a page, which no text in the script can end."""
     return "<script>" + text.replace("</script", "<\\/script") + "</script>"
 
 
 def data(value):
-    """A value for the scripts of a page, where no text of it can end the element."""
+    """A value for the scripts of a page, written so that no text in it can end the element."""
     return json.dumps(value, allow_nan=False).replace("<", "\\u003c").replace(">", "\\u003e")
 
 
@@ -52,7 +52,7 @@ def plots_of(sections):
 
 
 def parts(sections):
-    """The sections as HTML, and the plots in them as pages take them; none where they are drawn here."""
+    """The sections as HTML, and their plots in the form that pages take; no plots if they are drawn here."""
     curves = sum(len(plot.curves) for plot in plots_of(sections))
     most = max(1 << 9, min(figures.MOST_POINTS, POINTS // max(1, curves)))
     text, described = [], []
@@ -72,18 +72,18 @@ def parts(sections):
 
 
 def body(sections):
-    """The sections with their plots, and what the page needs to draw them."""
+    """The sections with their plots, and the data that the page needs to draw them."""
     text, described = parts(sections)
     if not described:
         return text
     return (f'{text}\n<script type="application/json" id="plots">{data(described)}</script>'
-            "<noscript><p>The plots are drawn by the browser, whose scripts are switched off.</p></noscript>")
+            "<noscript><p>The plots are drawn by scripts, which this browser has switched off.</p></noscript>")
 
 
 def table(rows):
     if not rows:
         return []
-    # Names of functions may be broken behind a mark.
+    # Names of functions may be broken after a punctuation mark.
     sources = [re.sub(r"([._,(])", r"\1<wbr>", html.escape(row.source)) for row in rows]
     cells = "".join(f'<tr><td>{html.escape(row.label)}</td><td class="value">{html.escape(row.value)}'
                     + (f' <span class="error">± {html.escape(row.error)}</span>' if row.error else "")
@@ -98,8 +98,8 @@ def own_script(name):
 
 
 def page(command, title, inner, sections=None, scripts="", moving=False, kind=""):
-    """A whole page; `inner` is HTML below the title, before the sections; `scripts` are elements for its end, which
-    have plots of their own where it is `moving`; `kind` is a class of the style."""
+    """A whole page. `inner` is HTML below the title, before the sections. `scripts` are elements for its end, which
+    have their own plots if the page is `moving`. `kind` is a class of the style."""
     library = dygraphs()
     made = datetime.now(timezone.utc).strftime("%Y-%m-%d %H:%M UTC")
     drawn = body(sections) if sections is not None else ""

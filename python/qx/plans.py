@@ -1,8 +1,8 @@
-"""The words in which exports keep their plans from call to call.
+"""The words in which exports keep their plans between calls.
 
-A plan slot or an instance word belongs to one call at a time and is made for one length, so each
-thread keeps its own, one for each export and lengths of input. Only the latest are kept. They are
-released when they are dropped, when their thread ends, and at exit.
+A plan slot or an instance word is used by one call at a time and is made for one length. Each thread therefore
+keeps its own words, one for each export and the lengths of its inputs. Only the most recently used are kept.
+Words are released when they are dropped, when their thread ends, and at exit.
 """
 
 import atexit
@@ -19,7 +19,7 @@ _caches: "weakref.WeakSet[Cache]" = weakref.WeakSet()
 
 
 class Word:
-    """One word and how it is released."""
+    """One word, and how it is released."""
 
     def __init__(self, is_instance, is_measurement):
         self.value = ctypes.c_void_p(None)
@@ -40,7 +40,7 @@ class Word:
 class Cache:
     def __init__(self):
         self.words = collections.OrderedDict()
-        self.latest = None  # the last in the order of use
+        self.latest = None  # the most recently used one
         _caches.add(self)
 
     def word(self, key, is_instance, is_measurement):
@@ -77,6 +77,6 @@ def word(key, is_instance=False, is_measurement=False):
 
 @atexit.register
 def release():
-    """Releases every plan that is kept. No call may be running in another thread."""
+    """Releases all plans that are kept. No call may be running in another thread."""
     for cache in list(_caches):
         cache.clear()

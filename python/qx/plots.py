@@ -4,8 +4,8 @@ import numpy as np
 
 
 def curves(x, named, ylim=None, xlabel="x"):
-    """One figure with the curves {name: values over x}. With `ylim` the axis is cut there and what
-    lies far outside, as around a pole, is left open."""
+    """A figure with the curves {name: values over x}. With `ylim`, the axis is limited to that range, and values far
+    outside, as around a pole, are left out."""
     import matplotlib.pyplot as plt
     figure, axes = plt.subplots(figsize=(8, 2.8))
     for name, values in named.items():

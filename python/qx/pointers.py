@@ -1,5 +1,5 @@
-"""Pointers that exports give and take back: only such as came from an export go into one, and none
-that was given back. A made-up address would end the process."""
+"""Pointers that exports return and take back. An export only accepts pointers that came from an export and have
+not been given back, since an invalid address would crash the process."""
 
 import ctypes
 
@@ -10,7 +10,7 @@ GIVES_BACK = {"destroy_oxfft_table"}
 
 
 class Pointer:
-    """What an export gave, of a type that only the library knows."""
+    """A pointer returned by an export, to a type that only the library knows."""
 
     __slots__ = ("type", "address")
 
@@ -28,16 +28,16 @@ class Pointer:
 
 
 def address(value, kind, place, gives_back):
-    """The address behind a Pointer of that type; None is null, and a library that is loaded by
-    ctypes goes where any pointer goes."""
+    """The address of a Pointer of that type. None is null, and a library loaded by ctypes is accepted for any
+    pointer."""
     if value is None:
         return None
     if kind == "void *" and isinstance(value, ctypes.CDLL):
         return value._handle
     if not isinstance(value, Pointer) or value.type != kind:
-        raise TypeError(f"{at(place)}: a {kind} from an export is needed; {shown(value)} came")
+        raise TypeError(f"{at(place)}: a {kind} from an export is needed; got {shown(value)}")
     if value.address is None:
-        raise ValueError(f"{at(place)}: it has been given back before")
+        raise ValueError(f"{at(place)}: it has already been given back")
     found = value.address
     if gives_back:
         value.address = None

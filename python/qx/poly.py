@@ -1,5 +1,5 @@
-"""Polynomials by their coefficients in ascending powers, the constant first, as of `numpy.polynomial`;
-real or complex.
+"""Polynomials, given by their real or complex coefficients in ascending powers, the constant first, as in
+`numpy.polynomial`.
 """
 
 from __future__ import annotations
@@ -17,8 +17,8 @@ __all__ = ["PartialFractions", "Roots", "add", "compose", "derivative", "divide"
 
 core = served("poly")
 
-CLUSTERED = 1e-10  # the relative radius of a root from which on it may be a multiple one
-MOST_STRUCTURED = 100  # the degree up to which the structure of multiple roots is looked for
+CLUSTERED = 1e-10  # the relative error radius from which a root may be a multiple one
+MOST_STRUCTURED = 100  # the highest degree at which multiple roots are looked for
 
 
 def _given(function: Any, *polynomials: Any) -> Any:
@@ -40,7 +40,7 @@ class Roots(Result):
     roots : ndarray of complex128
         Each root once.
     multiplicities : ndarray of int32
-        How often it is one.
+        The multiplicity of each root.
     """
 
     roots: NDArray[Any]
@@ -54,11 +54,11 @@ class PartialFractions(Result):
     Attributes
     ----------
     polynomial : ndarray
-        What is left of the division.
+        The polynomial part: the quotient of the division.
     poles : ndarray of complex128
-        Each as often as it is one, equal ones together.
+        The poles, each repeated by its multiplicity, with equal poles adjacent.
     residues : ndarray of complex128
-        Beside the k-th of equal poles the factor of 1 / (x - pole)^k.
+        For the k-th of several equal poles, the coefficient of 1 / (x - pole)^k.
     """
 
     polynomial: NDArray[Any]
@@ -173,8 +173,8 @@ def divide(p: ArrayLike, q: ArrayLike) -> tuple[NDArray[Any], NDArray[Any]]:
 
 
 def gcd(p: ArrayLike, q: ArrayLike, tolerance: float = 1e-10) -> NDArray[Any]:
-    """The monic divisor of the highest degree of polynomials within a relative distance of p and q (Z.
-    Zeng, "Computing multiple roots of inexact polynomials", 2005).
+    """The monic common divisor of highest degree among polynomials within a relative distance of p and q
+    (Z. Zeng, "Computing multiple roots of inexact polynomials", 2005).
 
     Parameters
     ----------
@@ -219,7 +219,7 @@ def lcm(p: ArrayLike, q: ArrayLike, tolerance: float = 1e-10) -> NDArray[Any]:
     Raises
     ------
     ValueError
-        If one is 0, or a coefficient is not finite.
+        If a polynomial is 0, or a coefficient is not finite.
 
     Examples
     --------
@@ -242,17 +242,17 @@ def evaluate(p: ArrayLike, x: ArrayLike) -> Any:
     p : array_like
         Coefficients.
     x : float, complex or array_like
-        Where, of any shape.
+        The points, of any shape.
 
     Returns
     -------
     float, complex or ndarray
-        Of the shape of x.
+        The same shape as x.
 
     Raises
     ------
     ValueError
-        If there is no coefficient, or one is not finite.
+        If there are no coefficients, or one is not finite.
 
     Examples
     --------
@@ -288,7 +288,7 @@ def evaluate_matrix(p: ArrayLike, a: ArrayLike) -> NDArray[Any]:
     numpy.linalg.LinAlgError
         If a is not square.
     ValueError
-        If there is no coefficient, or one is not finite.
+        If there are no coefficients, or one is not finite.
 
     Examples
     --------
@@ -311,7 +311,7 @@ def derivative(p: ArrayLike, m: int = 1) -> NDArray[Any]:
     p : array_like
         Coefficients.
     m : int
-        Which derivative.
+        The order of the derivative.
 
     Returns
     -------
@@ -320,7 +320,7 @@ def derivative(p: ArrayLike, m: int = 1) -> NDArray[Any]:
     Raises
     ------
     ValueError
-        If m is negative, or there is no coefficient.
+        If m is negative, or there are no coefficients.
 
     Examples
     --------
@@ -350,7 +350,7 @@ def integral(p: ArrayLike, constant: complex = 0.0) -> NDArray[Any]:
     Raises
     ------
     ValueError
-        If there is no coefficient, or one is not finite.
+        If there are no coefficients, or one is not finite.
 
     Examples
     --------
@@ -391,12 +391,12 @@ def compose(p: ArrayLike, q: ArrayLike) -> NDArray[Any]:
 
 
 def from_roots(roots: ArrayLike) -> NDArray[Any]:
-    """The monic polynomial with these roots; real where they are real or come in conjugate pairs.
+    """The monic polynomial with the given roots; real where they are real or form conjugate pairs.
 
     Parameters
     ----------
     roots : array_like
-        Each root as often as it is one.
+        The roots, each repeated by its multiplicity.
 
     Returns
     -------
@@ -425,10 +425,10 @@ def from_roots(roots: ArrayLike) -> NDArray[Any]:
 
 
 def roots(p: ArrayLike) -> NDArray[np.complex128]:
-    """All roots, each as often as its multiplicity, by rising modulus; of a real polynomial real or exact
-    conjugate pairs (D. A. Bini, "Numerical computation of polynomial zeros by means of Aberth's method", 1996).
-    Simple roots are as accurate as the coefficients tell. Where roots lie close together, up to degree 100,
-    `multiple_roots` is asked whether they are one.
+    """All roots, each repeated by its multiplicity, in the order of increasing modulus. The roots of a real
+    polynomial are real or exact conjugate pairs (D. A. Bini, "Numerical computation of polynomial zeros by
+    means of Aberth's method", 1996). Simple roots are as accurate as the coefficients allow. Where roots lie
+    close together, up to degree 100, `multiple_roots` decides whether they are a multiple root.
 
     Parameters
     ----------
@@ -468,7 +468,7 @@ def multiple_roots(p: ArrayLike, tolerance: float = 1e-10) -> Roots:
     p : array_like
         Coefficients.
     tolerance : float
-        By how much coefficients may be changed to make roots multiple.
+        The change of the coefficients, relative for those above 1, that is allowed to make roots multiple.
 
     Returns
     -------
@@ -504,7 +504,7 @@ def partial_fractions(numerator: ArrayLike, denominator: ArrayLike,
     numerator, denominator : array_like
         Coefficients.
     tolerance : float
-        By how much coefficients may be changed to make poles multiple.
+        The change of the coefficients, relative for those above 1, that is allowed to make poles multiple.
 
     Returns
     -------

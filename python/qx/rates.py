@@ -1,8 +1,8 @@
-"""Sampling rates as comments and headers name them: a word that says rate or interval, a number, a unit.
+"""Sampling rates in comments and headers: a word for a rate or an interval, a number, and a unit.
 
-No other number of hertz counts: it may be a corner or a tone. Prefixes and units go by their case, "mHz"
-and "MHz" by a table. A number that may be read in two ways keeps both readings (docs/recordings.md has the
-rules).
+Other numbers of hertz are ignored, since they may be a corner frequency or a tone. Prefixes and units are
+case-sensitive; "mHz" and "MHz" go by a table. An ambiguous number keeps both readings (the rules are in
+docs/recordings.md).
 """
 
 import dataclasses
@@ -23,7 +23,7 @@ SECONDS = {name: scale for scale, names in SECONDS_OF_NAMES.items() for name in 
 PREFIXES = {"": 1.0, "k": 1e3, "K": 1e3, "M": 1e6, "G": 1e9, "m": 1e-3, "µ": 1e-6, "μ": 1e-6, "u": 1e-6}
 HERTZ_WORDS = {"hertz": 1.0, "kilohertz": 1e3, "megahertz": 1e6, "gigahertz": 1e9, "millihertz": 1e-3}
 
-# Number: groups between blanks, or marks that decide() interprets, and an exponent.
+# A number: groups between blanks, or marks that decide() interprets, and an exponent.
 BLANKS = " \u00a0\u2009\u202f"
 NUMBER = (rf"(?:\d{{1,3}}(?:[{BLANKS}]\d{{3}})+(?!\d)(?:[.,]\d+)?|\d+(?:[.,'’]\d+)*|[.,]\d+)"
           r"(?:[eE][-+]?\d+|\s?[x×*·]\s?10\^?[-+]?\d+)?(?![\d'’])")
@@ -87,9 +87,9 @@ SEVERAL_A_LINE = re.compile(rf"(?<![\d.])(\d+)\s+{SAMPLES}\s*(?:/|per|in each|on
 
 @dataclasses.dataclass
 class Habit:
-    """What is known of the marks in the numbers of a file."""
-    decimal: str = ""  # the mark that values show, "," or ".", empty where they show none
-    told: str = ""  # the one that an option names
+    """What is known about the marks in the numbers of a file."""
+    decimal: str = ""  # the decimal mark that values show, "," or ".", or empty
+    told: str = ""  # the decimal mark given by an option
     thousands: bool = False  # whether an option says that single marks group thousands
 
 
@@ -97,8 +97,8 @@ class Habit:
 class Named:
     """A rate that a text names."""
     words: str
-    readings: tuple  # samples per second: several where the text leaves it open, none where it is no number
-    assumed: str = ""  # the unit that the text leaves out
+    readings: tuple  # samples per second: several if the text is ambiguous, empty if it is not a number
+    assumed: str = ""  # the assumed unit, if the text has none
 
 
 def seconds_of(unit):
@@ -107,13 +107,13 @@ def seconds_of(unit):
 
 
 def readings_of(text, habit, small=False, continental=False):
-    """The numbers that a text may be: one, two where a mark may group thousands or begin decimals, none
-    where its groups are none. `small` says that thousands are unlikely, as of kilohertz; `continental` that
-    the words are those of a language with decimal commas."""
+    """The numbers that a text may mean: one; two if a mark may either group thousands or be a decimal mark; none
+    if its groups are invalid. `small` says that thousands are unlikely, as with kilohertz; `continental` that
+    the words are from a language with decimal commas."""
     mantissa, exponent = text, ""
     if match := re.search(r"(?:[eE]|\s?[x×*·]\s?10\^?)([-+]?\d+)$", text):
         mantissa, exponent = text[:match.start()], match[1]
-    scale = float(f"1e{exponent or 0}")  # 0 or infinite perhaps
+    scale = float(f"1e{exponent or 0}")  # may be 0 or infinite
     mantissa = re.sub(rf"[{BLANKS}’]", "'", mantissa.strip())
     marks = [mark for mark in mantissa if mark in ".,'"]
     if not marks:
@@ -138,7 +138,7 @@ def readings_of(text, habit, small=False, continental=False):
 
 
 def _is_measured(value):
-    """Whether a number is one that a rate or an interval can be, and its reciprocal is none beyond all numbers."""
+    """Whether a number can be a rate or an interval, and its reciprocal is finite."""
     return 1e-300 < value < 1e300
 
 
@@ -159,7 +159,7 @@ def _by_habit(mark, large, small_one, habit, small, continental):
 
 
 def _scales(match):
-    """What the unit of a match makes of the number x: x * scale, or 1 / (x * scale) for a unit of time."""
+    """How the unit of a match converts the number x: x * scale, or 1 / (x * scale) for a unit of time."""
     groups = match.groupdict()
     for name in ("t1", "t2", "t3", "t4", "t5"):
         if groups.get(name):
@@ -170,7 +170,7 @@ def _scales(match):
         return [HERTZ_WORDS[groups["word"].lower()]], False
     prefix = groups.get("hertz") or groups.get("sps") or groups.get("bare") or ""
     if prefix == "m" and not match[0].rstrip().endswith("Hz"):
-        return [1e-3, 1e6], False  # in small letters: milli or mega
+        return [1e-3, 1e6], False  # in lower case: milli or mega
     return [PREFIXES[prefix]], False
 
 
@@ -180,7 +180,7 @@ def _unit_in(text):
 
 
 def named_in(text, habit=Habit()):
-    """The rates that a text names (Named), and remarks on what looks like one."""
+    """The rates that a text names (Named), and remarks on other text that looks like one."""
     found, remarks, taken = [], [], []
     for match in KEYED.finditer(text):
         taken.append(match.span())
@@ -209,7 +209,7 @@ def _of_clock(match, words):
 
 
 def _keyed(text, match, habit):
-    """The rate of a match of KEYED or None, and a remark on why it is none, or an empty text."""
+    """The rate of a match of KEYED, or None; and a remark on why there is none, or an empty text."""
     before = text[:match.start()]
     if NOT_THE_RATE.search(before) or text[match.start():match.end()].lower().startswith(("fs", "f_s", "fe")) and (
             FACTOR.search(before)):

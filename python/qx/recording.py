@@ -1,8 +1,8 @@
 """Recordings from text tables, sheets, arrays and audio files.
 
-A recording is read completely or not at all: whatever cannot be understood ends with an InputError of
-one line that says what is wrong and where. What was chosen, and why, is told in `choice`;
-docs/recordings.md has the rules.
+A recording is read completely or not at all: anything that cannot be understood raises an InputError, one
+line that says what is wrong and where. `choice` reports what was chosen, and why. The rules are in
+docs/recordings.md.
 """
 
 import contextlib
@@ -18,24 +18,24 @@ from .envelopes import Envelope
 from .files import InputError, printable
 from .wholes import Whole
 
-WIDEST = 1e307  # with the margins of a plot still a double
-MOST_SAMPLES = 1 << 22  # that are kept of one recording
-MOST_CHANNELS = 64  # that a page shows
+WIDEST = 1e307  # a range that is still a double with the margins of a plot
+MOST_SAMPLES = 1 << 22  # samples of a recording that are kept in memory
+MOST_CHANNELS = 64  # channels that a page shows
 
 
 @dataclasses.dataclass
 class Recording:
-    name: str  # of the file, without its folder
+    name: str  # name of the file, without its folder
     values: np.ndarray
     rate: float | None  # samples per second, None if it is not known
     rate_source: str  # where the rate comes from
-    unit: str  # of the values, empty if it is not known
+    unit: str  # unit of the values, empty if it is not known
     channel: str  # name of the column or channel
     notes: list  # comment lines of the file
     choice: str = ""  # what was taken from the file, and why
-    whole: object = None  # all samples (Whole) where the values are the first of them only
+    whole: object = None  # all samples (Whole), if the values are only the first of them
     envelope: object = None  # the outline of all samples (Envelope), with gaps where values are left out
-    row_rate: float | None = None  # of the outlines, where it may be another than that of the values
+    row_rate: float | None = None  # rate of the outlines, which may differ from that of the values
     others: list = dataclasses.field(default_factory=list)  # the other channels (Channel)
 
     def times(self):
@@ -53,7 +53,7 @@ UNIT = re.compile(r"\[([^\]]+)\]|\(([^)]+)\)|(?:\s/\s*|/ ?)(\S+)$|"
 
 @dataclasses.dataclass
 class Channel:
-    """A channel that is shown beside the one that is analysed: its outline."""
+    """A channel that is shown besides the analysed one: its outline."""
     channel: str
     unit: str
     envelope: object  # Envelope
@@ -62,12 +62,13 @@ class Channel:
 def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time=None, dates=None,
          thousands=False, outline=Envelope, progress=lambda samples: None):
     """Reads a text table, a sheet, arrays or an audio file; "-" is standard input. `rate` overrides what the
-    file says, whose times are not read then; `column` and `time` are names or numbers from 1, `time` "none"
-    where no column is time; `decimal` is "point" or "comma"; `thousands` says that a single mark before three
-    digits groups thousands; `dates` is "dmy" or "mdy" for dates that may be either; `missing` values are
-    refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the values of each
-    channel are added to: the `envelope` of the recording and of the other channels; `progress` is told of each
-    part how many samples it has. The file is read in a process of its own, with limits (qx/isolation.py)."""
+    file says; its times are then not read. `column` and `time` are names or numbers from 1; `time` is "none"
+    if no column is time. `decimal` is "point" or "comma". `thousands` says that a single mark before three
+    digits groups thousands. `dates` is "dmy" or "mdy" for ambiguous dates. `missing` is "skip" or
+    "interpolate"; otherwise missing values are refused. `start` is the number of samples to skip. `outline`
+    creates the object to which the values of each channel are added: the `envelope` of the recording and of
+    the other channels. `progress` is called with the number of samples of each part. The file is read in a
+    separate process with limits (qx/isolation.py)."""
     recording = isolation.read(_read, path, rate, column, decimal, missing, start, time, dates, thousands, outline,
                                told=progress)
     if recording.whole:
@@ -99,7 +100,7 @@ def _read(progress, path, file, rate, column, decimal, missing, start, time, dat
 
 
 def _shown(recording):
-    """The recording with what the file says as texts that may be shown."""
+    """The recording with the texts of the file made printable."""
     for one in (recording, *recording.others):
         one.channel, one.unit = printable(one.channel), printable(one.unit)
     recording.name, recording.choice = printable(recording.name), printable(recording.choice)
@@ -109,7 +110,7 @@ def _shown(recording):
 
 @contextlib.contextmanager
 def opened(path, file):
-    """The contents of a file (files.Source), which messages call `path`. What goes wrong with the file itself is an
+    """The contents of a file (files.Source), which messages call `path`. Problems with the file itself raise an
     InputError."""
     try:
         with files.Source(path, file) as source:
@@ -121,8 +122,8 @@ def opened(path, file):
 
 
 def table_of(source, time, options, *wanted):
-    """The reader of a table: of text, of a sheet, or of arrays. `options` are those of tables.Reader, `wanted`
-    names of columns that it is to have."""
+    """The reader of a table: of text, of a sheet, or of arrays. `options` are those of tables.Reader, and
+    `wanted` the names of columns that it must have."""
     kind = source.kind()
     if kind in stored.READERS:
         reader = stored.READERS[kind](source, [*wanted, time])
@@ -153,8 +154,8 @@ def _of_audio(source, column, start, outline, progress):
 
 
 def _if_longer(whole):
-    """All samples, where the values are a part of them. Where more than half of what is kept is missing, there is too
-    little for the long segments of its spectra."""
+    """All samples, if the values are a part of them. None if more than half of the kept values are missing, since
+    the long segments of the spectra then have too few values."""
     whole.finish()
     return whole if whole.count > MOST_SAMPLES // 2 else None
 
@@ -165,7 +166,8 @@ def _listed(names, most=12):
 
 
 def _part(start, count, there):
-    """What is said where the memory holds a part of a recording only; `there` are `start` samples less than all."""
+    """The remark for a recording of which only a part is in memory. `there` is the number of samples after the
+    first `start`."""
     if there > MOST_SAMPLES:
         return (f"; samples {start + 1} to {start + count} of {start + there} are kept in memory, which holds "
                 f"{MOST_SAMPLES} (--start takes others)")
@@ -205,7 +207,7 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline, progre
 
 
 def _refuse_wrapped(reader, column):
-    """Refuses a table whose lines hold several samples of one signal, where no column is asked for."""
+    """Refuses a table whose lines hold several samples of one signal, unless a column is chosen."""
     for note in reader.notes:
         match = rates.SEVERAL_A_LINE.search(note)
         if match and int(match[1]) > 1 and column is None:
@@ -214,7 +216,7 @@ def _refuse_wrapped(reader, column):
 
 
 def _told_of_columns(reader, values, chosen, time, indices):
-    """What was taken from a table, in parts; the rate is put in later."""
+    """Remarks on what was read from a table; the rate is inserted later."""
     layout = reader.layout
     choice = f"column {chosen + 1} of {layout.width}" + (f", {layout.names[chosen]}"
                                                          if layout.names[chosen] else "")
@@ -240,7 +242,7 @@ def _named(layout, column, is_index):
 
 
 def _roles(reader, time):
-    """The columns that are time and those that count the rows."""
+    """The columns of times, and those that count the rows."""
     layout = reader.layout
     if reader.named_as_time is not None:
         found = [reader.named_as_time]
@@ -273,13 +275,13 @@ def column_called(path, layout, column):
         return bare.index(column)
     if str(column).isdigit() and 1 <= int(column) <= layout.width:
         return int(column) - 1
-    listed = ", ".join(repr(name) for name in layout.names if name) or "none of them has a name"
+    listed = ", ".join(repr(name) for name in layout.names if name) or "none has a name"
     raise InputError(f"{path}: no column {column!r} among its {layout.width}: {listed}")
 
 
 def _column(reader, times, indices, column):
-    """The index of the column to read: the chosen one, else the first of numbers that is neither time
-    nor a count of the rows."""
+    """The index of the column to read: the chosen one, or else the first column of numbers that is neither
+    time nor a count of the rows."""
     layout, path = reader.layout, reader.path
     if column is not None:
         return column_called(path, layout, column)
@@ -300,7 +302,7 @@ def _numeric(reader):
 
 
 def _time_column(reader, times):
-    """The first that has times of day or numbers; a date alone comes after these."""
+    """The first column with times of day or numbers, or else the first with dates alone."""
     dates = [c for c in times if reader.is_clock(c) and not any(
         ":" in cell for cell in reader.layout.sample(c))]
     ordered = [c for c in times if c not in dates] + dates
@@ -316,8 +318,9 @@ def _date_beside(reader, time):
 
 
 def _columns(reader, chosen, time, start, outlines, whole):
-    """The values and the times, or None, from a sample on, the figures of all, and what is to be said of them.
-    `outlines` has the Envelopes of other columns, which are filled; a column that cannot be read goes."""
+    """The values and the times (or None) from a sample on, the figures of all values, and remarks on them.
+    `outlines` contains the Envelopes of other columns, which are filled. A column that cannot be read is
+    dropped."""
     date = _date_beside(reader, time)
     columns = [c for c in dict.fromkeys((chosen, time, date)) if c is not None]
     kept, seen = {c: [] for c in columns}, 0
@@ -347,7 +350,7 @@ def _columns(reader, chosen, time, start, outlines, whole):
 def _without_holes(path, values, seconds, holes, missing):
     count = int(holes.sum())
     if holes.all():
-        raise InputError(f"{path}: no value is left without the missing ones")
+        raise InputError(f"{path}: all values are missing")
     missed = f"{count} missing value{'s' * (count > 1)} "
     if missing == "skip":
         return values[~holes], None if seconds is None else seconds[~holes], missed + "left out"
@@ -358,7 +361,7 @@ def _without_holes(path, values, seconds, holes, missing):
 
 
 def _rate(reader, seconds, time, habit):
-    """The sampling rate and where it comes from; without one, why."""
+    """The sampling rate and where it comes from; None and the reason, if there is none."""
     layout, reasons, named = reader.layout, [], []
     if reader.where == "the file":
         habit = rates.Habit(told=".")
@@ -386,7 +389,7 @@ def _rate(reader, seconds, time, habit):
     return None, "; ".join(reasons)
 
 
-AGREES = 0.01  # relative difference of times and what a comment says of them
+AGREES = 0.01  # relative difference between the rate of the times and that of a comment
 UNSAID = "which names no unit: taken as seconds"
 
 
@@ -395,20 +398,20 @@ def _agrees(rate, named):
 
 
 def _with_comments(rate, source, unit_said, told, named):
-    """The rate of times beside those that comments name: these settle a unit that is not said, and what disagrees
-    is told."""
+    """The rate of the times, compared with the rates in comments. The comments decide on a unit that is not
+    given, and disagreement is reported."""
     if unit_said == UNSAID and named and not any(_agrees(rate, one) for one in named):
         for scale, unit in ((1e-3, "milliseconds"), (1e-6, "microseconds"), (1e-9, "nanoseconds"), (60, "minutes")):
             if agreeing := [one for one in named if _agrees(rate / scale, one)]:
                 rate, unit_said = rate / scale, f"which names no unit: taken as {unit} by '{agreeing[0].words}'"
-                told = ""  # in the other unit
+                told = ""  # which referred to the other unit
                 break
     others = [f"'{one.words}' says otherwise" for one in named if one.readings and not _agrees(rate, one)]
     return rate, "; ".join([source + f", {unit_said}" * bool(unit_said) + told, *dict.fromkeys(others)])
 
 
 def _the_named(path, named):
-    """The one rate that a file names; refuses several, and one that may be read in two ways."""
+    """The rate that a file names. Several rates, and an ambiguous one, are refused."""
     for one in named:
         if not one.readings:
             raise InputError(f"{path}: '{one.words}' names no single number: --rate says what the rate is")
@@ -425,7 +428,7 @@ def _the_named(path, named):
 
 
 def _scale(reader, time, numbers):
-    """The seconds of one unit of the times, and what to say of it; None and why where it is not known."""
+    """The seconds of one unit of the times, and a remark on it; None and the reason, if it is not known."""
     layout = reader.layout
     if reader.is_clock(time):
         return 1.0, ""
@@ -449,7 +452,7 @@ def _scale(reader, time, numbers):
 
 
 def _of_days(name, first, numbers):
-    """Whether times around 45000 are days since 1900, as spreadsheets have them, or seconds."""
+    """Whether times around 45000 are days since 1900, as in spreadsheets, or seconds."""
     step = (numbers[-1] - numbers[0]) / (len(numbers) - 1)
     days = (86400.0, "whose numbers are days of a spreadsheet")
     if re.match(r"dat|fecha", name.strip(), re.IGNORECASE):

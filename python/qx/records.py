@@ -1,4 +1,4 @@
-"""Records of the exports as dictionaries: fields left out are 0 or empty."""
+"""Records of the exports as dictionaries; omitted fields are 0 or empty."""
 
 import ctypes
 import functools
@@ -14,7 +14,7 @@ from .scalars import C_TYPES, COMPLEX, c_number, shown
 
 
 def is_pointer(field):
-    """A pointer into an array of the caller's: the export sets it anew at every call."""
+    """Whether a field is a pointer into an array of the caller, which the export sets in every call."""
     return field["type"].endswith("*") and "array" not in field
 
 
@@ -39,7 +39,7 @@ def record_type(name):
 
 
 class Record:
-    """A record for a call, with the blocks of the arrays in it."""
+    """A record for a call, with the blocks of its arrays."""
 
     def __init__(self, name, contents, place):
         self.record = record_type(name)()
@@ -48,7 +48,7 @@ class Record:
                        if not is_pointer(field)}
         if not isinstance(contents, Mapping):
             raise TypeError(f"{at(place)}: a dictionary with fields of {name} is needed; "
-                            f"{shown(contents)} came")
+                            f"got {shown(contents)}")
         for field in contents:
             if field not in self.fields:
                 raise ValueError(f"{at(place)}: {name} has no field {field!r}; it has "
@@ -72,7 +72,7 @@ class Record:
             setattr(self.record, field, number if element in COMPLEX else number.value)
             return
         if np.shape(value) != (int(count),):
-            raise ValueError(f"{at(place)}: {count} numbers are needed; {shown(value)} came")
+            raise ValueError(f"{at(place)}: {count} numbers are needed; got {shown(value)}")
         for i, one in enumerate(value):
             number = c_number(one, element, place)
             getattr(self.record, field)[i] = number if element in COMPLEX else number.value

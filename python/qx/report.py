@@ -1,7 +1,7 @@
 """The report on a recording: figures in a table, plots in a page. The analysis is done by the topics.
 
-A section is a function that takes a recording and gives a Section (sections.py), or None where the
-recording is too short for it; SECTIONS lists them in the order of the page.
+A section is a function that takes a recording and returns a Section (sections.py), or None if the
+recording is too short for it. SECTIONS lists them in the order of the page.
 """
 
 import html
@@ -41,7 +41,7 @@ def lines(recording, sections):
         yield from (f"  {line}" for line in section.terminal)
 
 
-OF_A_PART = (cleaned, events)  # sections that have no more than the samples in memory
+OF_A_PART = (cleaned, events)  # sections that only use the samples in memory
 
 
 def sections_of(recording):
@@ -53,14 +53,14 @@ def sections_of(recording):
             section = Section(make.__name__.replace("_", " ").capitalize(),
                               f"Not possible for this recording: {error}.")
         if section and recording.whole and make in OF_A_PART:
-            section.text += f" Of the first {len(recording.values)} of these samples."
+            section.text += f" This is about the first {len(recording.values)} of these samples."
         if section:
             found.append(section)
     return found
 
 
 def write(recording, path):
-    """Writes the page and gives the lines for the terminal."""
+    """Writes the page and returns the lines for the terminal."""
     sections = sections_of(recording)
     outputs.write_text(path, page(recording, sections))
     return list(lines(recording, sections))

@@ -1,4 +1,4 @@
-"""Audio files at another sampling rate, in blocks: the memory does not depend on the length."""
+"""Resampling of audio files in blocks, so that the memory does not depend on their length."""
 
 import contextlib
 import dataclasses
@@ -16,13 +16,13 @@ FRAMES_AT_ONCE = 1 << 15
 LARGEST_FACTOR = 1 << 17  # beyond it the taps fill the memory
 FORMATS = {".wav": "WAV", ".wave": "WAV", ".flac": "FLAC", ".aif": "AIFF", ".aiff": "AIFF",
            ".w64": "W64", ".rf64": "RF64"}
-BYTES_OF_32 = 2**32 - 2**16  # where files end that have their length in 32 bits
-REALS = ("FLOAT", "DOUBLE")  # sample formats that hold what lies beyond full scale
+BYTES_OF_32 = 2**32 - 2**16  # the largest file with a length of 32 bits
+REALS = ("FLOAT", "DOUBLE")  # sample formats that hold values beyond full scale
 SAMPLE_BYTES = {"PCM_U8": 1, "PCM_16": 2, "PCM_24": 3, "PCM_32": 4, "FLOAT": 4}
 
 
 class Resampler:
-    """Frames of a file at another rate, one to a row, block by block, and what is said of them afterwards."""
+    """The frames of a file at another rate, one to a row, block by block, and remarks on them."""
 
     def __init__(self, rate, new_rate, channels):
         common = math.gcd(rate, new_rate)
@@ -35,18 +35,18 @@ class Resampler:
         self.sound, self.wrong = None, ""
 
     def put(self, frames):
-        """The frames at the new rate that these and those before make whole."""
+        """Takes frames and returns those at the new rate that are now complete."""
         self.read += len(frames)
         return self.stream(frames)
 
     def end(self):
-        """The last frames, whose filter reaches beyond the end."""
+        """The last frames, which the filter computes from beyond the end."""
         return self.stream.finish()
 
 
 @dataclasses.dataclass
 class Sound:
-    """What the header of an audio file says."""
+    """The contents of the header of an audio file."""
     samplerate: int
     channels: int
     frames: int
@@ -54,8 +54,8 @@ class Sound:
 
 
 def _read(tell, path, file):
-    """Tells the Sound and then its frames, block by block. What is wrong with the lengths that the file announces is
-    the result."""
+    """Passes the Sound and then its frames, block by block, to `tell`. Returns what is wrong with the lengths that the
+    file announces."""
     if not os.path.exists(file):
         raise InputError(f"{path}: no such file")
     read = 0
@@ -72,7 +72,7 @@ def _read(tell, path, file):
 
 
 def format_for(target, source, rate):
-    """The format and the sample format of the new file; a ValueError where there is none."""
+    """The format and the sample format of the new file; raises ValueError if there is none."""
     ending = os.path.splitext(target)[1].lower()
     if ending not in FORMATS:
         raise ValueError(f"{target}: the name must end in one of {', '.join(FORMATS)}")
@@ -81,16 +81,16 @@ def format_for(target, source, rate):
                  * SAMPLE_BYTES.get(source.subtype, 8))
     if bytes_due > BYTES_OF_32 and kind in ("WAV", "AIFF"):
         if kind == "AIFF":
-            raise ValueError(f"{target}: an AIFF file cannot be so long; .w64 and .rf64 can")
+            raise ValueError(f"{target}: an AIFF file cannot be this long; .w64 and .rf64 can")
         kind = "RF64"
     if soundfile.check_format(kind, source.subtype):
         return kind, source.subtype
-    # FLAC has no more than 24 bits; what is lost otherwise is a coding, such as that of Vorbis.
+    # FLAC has at most 24 bits. Otherwise, only a coding is lost, such as that of Vorbis.
     return kind, "PCM_24" if SAMPLE_BYTES.get(source.subtype, 0) > 2 or source.subtype in REALS else "PCM_16"
 
 
 class _Resampled:
-    """The new file, written as the blocks of the old one come; it appears when it is whole."""
+    """The new file, written as the blocks of the old one arrive. It appears when it is complete."""
 
     def __init__(self, target, rate, begun, progress, stack):
         self._target, self._rate, self._begun, self._progress = target, rate, begun, progress
@@ -99,7 +99,7 @@ class _Resampled:
         self.resampler: Any = None
 
     def take(self, told):
-        """The Sound, then its blocks."""
+        """Takes the Sound, then its blocks."""
         if self._out is None:
             self._begin(told)
         else:
@@ -130,10 +130,11 @@ class _Resampled:
 
 
 def resample_file(source, target, rate, progress=lambda frames: None, begun=lambda sound: None):
-    """Writes the sound of the file `source` to `target`, in the format that its ending names and the same sample
-    format if that has it; the file appears when it is whole. `begun` is told the Sound, `progress` of frames as
-    they are read. The stream that did it is the result: its `sound`, what is `wrong` with the lengths that the file
-    announces, and how many samples were `clipped`, the farthest at `highest` times full scale."""
+    """Writes the sound of the file `source` to `target`, in the format that its extension names, and in the same
+    sample format if that format has it. The file appears when it is complete. `begun` is called with the Sound,
+    `progress` with numbers of frames as they are read. Returns the stream, with its `sound`, what is `wrong` with
+    the lengths that the file announces, and the number of samples that were `clipped`, the farthest at `highest`
+    times full scale."""
     with contextlib.ExitStack() as stack:
         made = _Resampled(target, rate, begun, progress, stack)
         wrong = isolation.read(_read, source, told=made.take)

@@ -1,4 +1,4 @@
-"""Numbers as ctypes takes them, refused where they would lose anything but precision."""
+"""Converts numbers for ctypes, and refuses those that would lose anything but precision."""
 
 import ctypes
 from typing import Any
@@ -33,7 +33,7 @@ def whole(value, element, place):
         number = operator.index(value)
     except TypeError:
         if not (isinstance(value, float) and value.is_integer()):
-            raise TypeError(f"{at(place)}: a whole number is needed; {shown(value)} came") from None
+            raise TypeError(f"{at(place)}: a whole number is needed; got {shown(value)}") from None
         number = int(value)
     lowest, highest = LIMITS[element]
     if not lowest <= number <= highest:
@@ -42,12 +42,12 @@ def whole(value, element, place):
 
 
 def chosen(value, values, place):
-    """An int that is one of the values, a dictionary with a text for each."""
+    """An int that is one of the values, which are the keys of a dictionary with a text for each."""
     number = whole(value, "I32", place)
     if number not in values:
         known = "; ".join(f"{value} {textwrap.shorten(text, 60, placeholder=' ...')}".rstrip()
                           for value, text in values.items())
-        raise ValueError(f"{at(place)}: {shown(number)} is none of its values, which are {known}")
+        raise ValueError(f"{at(place)}: {shown(number)} is not one of its values, which are {known}")
     return number
 
 
@@ -57,7 +57,7 @@ def real(value, place):
             return float(value)
     except (TypeError, ValueError):
         pass
-    raise TypeError(f"{at(place)}: a number is needed; {shown(value)} came")
+    raise TypeError(f"{at(place)}: a number is needed; got {shown(value)}")
 
 
 def complex_parts(value, element, place):
@@ -67,7 +67,7 @@ def complex_parts(value, element, place):
             return C_TYPES[element](number.real, number.imag)
     except (TypeError, ValueError):
         pass
-    raise TypeError(f"{at(place)}: a complex number is needed; {shown(value)} came")
+    raise TypeError(f"{at(place)}: a complex number is needed; got {shown(value)}")
 
 
 def c_number(value, element, place):

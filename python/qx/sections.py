@@ -1,4 +1,4 @@
-"""What the sections of pages are made of: rows of figures, numbers as texts, units and axes."""
+"""The building blocks of the sections of pages: rows of figures, numbers as texts, units and axes."""
 
 import dataclasses
 import math
@@ -9,7 +9,7 @@ class Row:
     label: str
     value: str
     unit: str
-    source: str  # the function behind the number, and what else went into it
+    source: str  # the function that computed the number, and what else it depends on
     error: str = ""  # the standard uncertainty, in the unit of the value
 
 
@@ -23,16 +23,16 @@ class Section:
 
 
 def number(value, digits=6):
-    return f"{value:.{digits}g}" if math.isfinite(value) else "beyond all numbers"
+    return f"{value:.{digits}g}" if math.isfinite(value) else "out of range"
 
 
 def resolved(values, step):
-    """The values as texts with the digits that a difference of `step` needs."""
+    """The values as texts, with enough digits to resolve a difference of `step`."""
     values = [float(value) for value in values]
     largest = max((abs(value) for value in values), default=0.0)
     if not (step > 0 and math.isfinite(step) and math.isfinite(largest)):
         return [number(value) for value in values]
-    place = math.floor(math.log10(step)) - 1  # of the last digit, one finer than the step
+    place = math.floor(math.log10(step)) - 1  # the place of the last digit, one finer than the step
     if 1e-4 <= max(largest, step) < 1e7:
         return [f"{value:.{min(17, max(0, -place))}f}" for value in values]
     digits = max(1, math.floor(math.log10(largest)) - place) if largest else 1
@@ -40,7 +40,7 @@ def resolved(values, step):
 
 
 def uncertain(value, error):
-    """A value and its standard uncertainty as texts: the digits that hold, and two of the uncertainty."""
+    """A value and its standard uncertainty as texts: the significant digits, and two of the uncertainty."""
     value, error = float(value), float(error)
     if not (math.isfinite(value) and math.isfinite(error) and error > 1e-15 * abs(value)):
         return number(value, 12), number(error, 2) if error > 0 or not math.isfinite(error) else ""
@@ -60,7 +60,7 @@ def quantity(recording):
 
 
 def time_axis(recording):
-    """The label of an axis of times, with the distance of the samples."""
+    """The label of an axis of times, with the distance between samples."""
     if recording.rate:
         return f"Time (s), a sample every {number(1 / recording.rate, 3)} s"
     return "Time (samples)"

@@ -1,4 +1,4 @@
-"""The section of the report that takes mains hum and baseline wander out of a recording that has them, with
+"""The section of the report that removes mains hum and baseline wander from a recording that has them, with
 filters designed for its rate."""
 
 import contextlib
@@ -12,10 +12,10 @@ from .sections import Row, Section, number, uncertain
 from .sections_recording import over_time
 
 MAINS = (50.0, 60.0)  # Hz
-NOTCH = 1.0  # Hz to either side of the hum
-WANDER = 0.5  # Hz; slower parts are wander
-NOTABLE = 0.2  # of the deviation; less is no wander to speak of
-LEAST_RATE = 100.0  # Hz, of a signal in which the two can be told from the rest
+NOTCH = 1.0  # Hz on either side of the hum
+WANDER = 0.5  # Hz; slower components are wander
+NOTABLE = 0.2  # part of the standard deviation; less wander is ignored
+LEAST_RATE = 100.0  # Hz; below it, hum and wander cannot be separated from the signal
 LEAST_SECONDS = 8.0
 STANDS_OUT = 6.0  # times the median of its neighbours; noise hardly reaches 4
 SHOWN = 5.0  # seconds
@@ -25,11 +25,11 @@ SHOWN = 5.0  # seconds
 class Hum:
     mains: float
     amplitude: float
-    excess: float  # over the median of its neighbours
+    excess: float  # ratio to the median of its neighbours
 
 
 def lines_of(recording):
-    """The spectrum up to the highest frequency that is looked at: its frequencies and amplitudes."""
+    """The spectrum up to the highest frequency of interest: its frequencies and amplitudes."""
     found = spectra.periodogram(recording.values, recording.rate, "hann", scaling="spectrum")
     count = int(np.searchsorted(found.frequencies, MAINS[-1] + 6 * NOTCH))
     return found.frequencies[:count].copy(), np.sqrt(2 * found.values[:count])
@@ -43,7 +43,7 @@ def line_at(recording, frequency, spectrum):
     line = lines[away <= NOTCH].max(initial=0.0)
     around = lines[(away > NOTCH) & (away <= 5 * NOTCH)]
     floor = np.median(around) if len(around) else 0.0
-    if not line > STANDS_OUT * floor > 0:  # the tone behind the line is of no interest
+    if not line > STANDS_OUT * floor > 0:  # the tone at the line does not matter
         return line, line / floor if floor > 0 else 0.0
     with contextlib.suppress(QxError):
         return measure.tone(recording.values, recording.rate, frequency, NOTCH).amplitude, line / floor
@@ -51,7 +51,7 @@ def line_at(recording, frequency, spectrum):
 
 
 def hum_of(recording):
-    """The hum of the mains; None where neither frequency stands out."""
+    """The hum of the mains; None if neither frequency stands out."""
     spectrum = lines_of(recording)
     found = [Hum(mains, *line_at(recording, mains, spectrum)) for mains in MAINS if mains + 5 * NOTCH < recording.rate / 2]
     return max((one for one in found if one.excess > STANDS_OUT), key=lambda one: one.excess, default=None)
@@ -64,8 +64,8 @@ def filters_for(rate, mains):
 
 
 def wander_of(values, highpass):
-    """What the highpass takes out. It runs over what a straight line leaves, continued by its mirror image:
-    turned about the end points it would take their noise for wander."""
+    """What the highpass removes. It is applied to the values less a straight line, continued by their mirror
+    image. A continuation by point reflection would take the noise of the end points for wander."""
     t = np.arange(len(values)) - (len(values) - 1) / 2
     line = values.mean() + t * (t @ values / (t @ t))
     rest = values - line
@@ -79,7 +79,7 @@ def is_fit(recording):
 
 
 def cleaned(recording):
-    """None where there is nothing to take out."""
+    """The section; None if there is nothing to remove."""
     if not is_fit(recording):
         return None
     hum = hum_of(recording)
@@ -93,8 +93,8 @@ def cleaned(recording):
     source = "Filter.zero_phase"
     share = wander_rms / deviation
     rows = [Row(f"Wander below {WANDER:g} Hz, RMS", number(wander_rms, 4), unit, source + ", stats.std")]
-    text = (f"What is slower than {WANDER:g} Hz has {100 * share:.2g} % of the standard deviation, so a Butterworth "
-            "highpass removes it. ")
+    text = (f"Components below {WANDER:g} Hz have {100 * share:.2g} % of the standard deviation, so a Butterworth "
+            "highpass removes them. ")
     if hum:
         after = bandstop.zero_phase(after)
         left = dataclasses.replace(recording, values=after)
@@ -103,14 +103,14 @@ def cleaned(recording):
         rows += [Row(f"Hum at {hum.mains:g} Hz, before", before[0], unit, "measure.tone", before[1]),
                  Row(f"Hum at {hum.mains:g} Hz, after", number(rest, 4), unit, source + ", measure.tone")]
         text += (f"At {hum.mains:g} Hz a line is {hum.excess:.3g} times as high as its neighbours, so a Butterworth "
-                 "bandstop removes the hum of the mains. ")
+                 "bandstop removes the mains hum. ")
     else:
-        text += "No hum of the mains stands out of the spectrum, so none is removed. "
-    rows.append(Row("RMS of what is left", number(stats.rms(after), 6), unit, source + ", stats.rms"))
+        text += "No mains hum stands out of the spectrum, so none is removed. "
+    rows.append(Row("RMS of the rest", number(stats.rms(after), 6), unit, source + ", stats.rms"))
     used = highpass if bandstop is None else highpass * bandstop
     if recording.whole:
-        text += f"Hum and wander are those of the {len(values)} samples in memory. "
-    return Section("Without hum and wander", text + "The filters run forward and backward over a signal that is "
+        text += f"Hum and wander are measured in the {len(values)} samples in memory. "
+    return Section("Without hum and wander", text + "The filters are applied forward and backward to the signal, "
                    "continued at its ends, so that nothing is delayed.", rows,
                    [traces(recording, after, wander), response(rate, used)])
 

@@ -8,7 +8,7 @@ from .sections_recording import over_time
 
 
 def scale_of(recording):
-    """The time of a sample, and its unit."""
+    """The time between samples, and its unit."""
     return (1 / recording.rate, "s") if recording.rate else (1.0, "samples")
 
 
@@ -20,7 +20,7 @@ def marked(recording, found):
 
 
 def measured(recording, pulse, part):
-    """One pulse with its levels and where its transitions begin and end."""
+    """One pulse with its levels and the ends of its transitions."""
     step, _ = scale_of(recording)
     values = recording.values[part]
     ends = np.array([pulse.start, pulse.start + pulse.first_duration,
@@ -67,12 +67,12 @@ def pulse_rows(recording, pulse):
             Row("Width at half height", number(pulse.width * step, 4), unit,
                 "measure.pulses"),
             Row("Overshoot", number(pulse.first_overshoot, 3), "%", "measure.pulses"),
-            Row("Overshoot behind it", number(pulse.second_overshoot, 3), "%",
+            Row("Overshoot after it", number(pulse.second_overshoot, 3), "%",
                 "measure.pulses")]
 
 
 def places_of(recording):
-    """The events of all samples, or of those in memory where that is not possible, and what is said of them."""
+    """The events of all samples, or of those in memory if there are too many, and a sentence about this."""
     whole = recording.whole
     places = measuring.events_of_whole(whole, recording.rate) if whole else None
     if places is not None:
@@ -93,6 +93,6 @@ def events(recording):
     if one:
         rows += pulse_rows(recording, one[0])
         figures.append(measured(recording, *one))
-    return Section("Repeated events", "Where bursts of steep slope stand out, such as the beats "
-                   "of an electrocardiogram; each is placed at the sample that is farthest from "
+    return Section("Repeated events", "Bursts of steep slope, such as the beats "
+                   "of an electrocardiogram. Each is placed at the sample that is farthest from "
                    "the median around it." + of, rows, figures)

@@ -8,11 +8,11 @@ import numpy as np
 from . import figures, stats
 from .sections import Row, Section, number, power_unit, quantity, resolved, time_axis
 
-TIME = "time"  # the link of all plots over time
+TIME = "time"  # the name that links all plots over time
 
 
 def bins_for(n):
-    """Twice the cube root of the number of samples, within what a plot can show."""
+    """Twice the cube root of the number of samples, within the limits of a plot."""
     return int(min(120, max(5, round(2 * n ** (1 / 3)))))
 
 
@@ -23,7 +23,7 @@ def over_time(recording, title, **more):
 
 
 def outline(recording, title, channel=None):
-    """The whole of a recording, or of another of its channels, that may be longer than what is kept."""
+    """A plot of the whole recording, or of another of its channels, which may be longer than what is in memory."""
     channel = channel or recording
     of_rows = dataclasses.replace(recording, rate=recording.row_rate or recording.rate)
     plot = over_time(of_rows, title)
@@ -40,7 +40,7 @@ def outline(recording, title, channel=None):
 
 
 def count_of(recording):
-    """How many samples the recording has, those included that are not in memory."""
+    """The number of samples of the recording, including those that are not in memory."""
     return recording.whole.count if recording.whole else len(recording.values)
 
 
@@ -58,7 +58,7 @@ def overview(recording):
     if unit:
         text += f" Values in {unit}."
     if recording.others:
-        text += f" The other sections have the first of {len(shown)} channels."
+        text += f" The other sections are about the first of {len(shown)} channels."
     return Section("Recording", text, figures=shown)
 
 
@@ -74,7 +74,7 @@ def statistics(recording):
         moments = {order: stats.moment(x, order) for order in (2, 3, 4)}
         extremes = float(x.min()), float(x.max())
         shown = [stats.mean(x), stats.rms(x), stats.median(x), *stats.mode(x, bins)[:4]]
-    # Digits for a thousandth of the range, and no less than six.
+    # Enough digits for a thousandth of the range, and at least six.
     lowest, highest, mean_, rms, median, *modes = (max(pair, key=len) for pair in zip(
         map(number, [*extremes, *shown]), resolved([*extremes, *shown], 1e-3 * (extremes[1] - extremes[0]))))
     rows = [Row("Mean", mean_, unit, "stats.mean"), Row("Root mean square", rms, unit, "stats.rms"),
@@ -85,7 +85,7 @@ def statistics(recording):
                  "stats.moment") for order, moment in moments.items()]
     deviation = math.sqrt(moments[2])
     rows.append(Row("Standard deviation", number(deviation), unit, "√ moment 2"))
-    if 1e-77 < deviation < 1e77:  # whose fourth power is a number
+    if 1e-77 < deviation < 1e77:  # its fourth power is in range
         rows.append(Row("Skewness", number(moments[3] / deviation**3), "",
                         "moment 3 / deviation³"))
         rows.append(Row("Kurtosis", number(moments[4] / deviation**4), "",

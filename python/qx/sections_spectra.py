@@ -10,10 +10,10 @@ from .sections import (Row, Section, frequency_axis, frequency_unit, number, pow
                        uncertain)
 from .sections_recording import TIME
 
-LONGEST = 1 << 17  # segment of an averaged spectrum
-SEGMENTS = 4  # without overlap, of a short one
-COLUMNS, LEVELS = 800, 80.0  # of the spectrum over time; decibels
-SQUARES = (1e-140, 1e140)  # values whose squares are numbers
+LONGEST = 1 << 17  # samples of the longest segment of an averaged spectrum
+SEGMENTS = 4  # number of segments of a short recording, without overlap
+COLUMNS, LEVELS = 800, 80.0  # of the spectrum over time: columns, and its range in decibels
+SQUARES = (1e-140, 1e140)  # the range of values whose squares are in range
 
 
 def is_constant(recording):
@@ -33,7 +33,7 @@ def amplitudes(recording, window="blackman_harris"):
     if n < 8:
         return None
     if is_constant(recording):
-        return Section("Amplitude spectrum", "The recording is constant: it has no parts above 0.")
+        return Section("Amplitude spectrum", "The recording is constant: it has no component above frequency 0.")
     rate, whole = recording.rate or 1.0, recording.whole
     if whole:
         frequencies, shown, resolution = long_tones.spectrum(whole, rate, window)
@@ -51,7 +51,7 @@ def amplitudes(recording, window="blackman_harris"):
             at = f"{f} ± {f_error}" if f_error else f
             rows.append(Row(f"Tone at {at} {unit}", a, recording.unit, "measure.tones", a_error))
         marks = list(zip(found.frequencies, found.amplitudes))
-        text = "Tones that stand out of the noise around them, with standard uncertainties."
+        text = "The tones that stand out of the noise around them, with standard uncertainties."
     else:
         peaks = local_maxima(shown)
         text = "No tone stands out of the noise around it."
@@ -92,8 +92,8 @@ def power(recording, window="hann"):
     else:
         largest = float(np.abs(x - x.mean()).max())
     if not SQUARES[0] < largest < SQUARES[1]:
-        what = (f"The squares of values around {largest:.2g} leave the range of numbers, so there is no "
-                "power spectrum." if largest else "The recording is constant: it has no power beside its "
+        what = (f"The squares of values around {largest:.2g} are out of range, so there is no "
+                "power spectrum." if largest else "The recording is constant: it has no power besides its "
                 "mean.")
         return Section("Averaged power spectrum", what)
     rate = recording.rate or 1.0
@@ -122,7 +122,7 @@ def power(recording, window="hann"):
 
 
 def over_time(recording, window="hann"):
-    """The density of power by time and frequency, in decibels."""
+    """The power density by time and frequency, in decibels."""
     whole = recording.whole
     n = whole.count if whole else len(recording.values)
     largest = (max(-whole.moments.least, whole.moments.greatest) if whole else
@@ -149,7 +149,7 @@ def over_time(recording, window="hann"):
 
 
 def _columns(parts, rate, length, window):
-    """Decibels by frequency and time, each column the mean of the segments of a part."""
+    """Decibels by frequency and time; each column is the mean of the segments of a part."""
     columns, resolution = [], 0.0
     for part in parts:
         if len(part) >= length:

@@ -1,11 +1,11 @@
-"""The server of `view`: the pages of the recordings that were named, on the loopback address.
+"""The server of `view`, which serves the pages of the given recordings on the loopback address.
 
-aiohttp, from Debian, rather than the standard library's http.server, whose documentation advises against it
-beyond tests: it serves several windows at once, ends with its process, and keeps to limits of requests. What
-takes time is done in threads, in which the library runs side by side.
+It uses aiohttp, from Debian, rather than the standard library's http.server, whose documentation advises against
+it except for tests. aiohttp serves several windows at once, ends with its process, and limits the size of requests.
+Long computations are done in threads, in which the library runs in parallel.
 
-A request is served with the token in its path and the server's own name in its Host header, so that neither
-another user of the machine, nor a page of another site that a browser has open, gets at a recording.
+A request is only served if it has the token in its path and the server's own name in its Host header, so that
+neither another user of the machine nor another site's page in the browser can access a recording.
 """
 
 import asyncio
@@ -26,11 +26,11 @@ MOST_POINTS = 20_000
 
 
 class Refused(ValueError):
-    """A request that cannot be served, in words for the reader."""
+    """A request that cannot be served, with a message for the reader."""
 
 
 def application(opened, token, ports):
-    """The application; `ports` has the port once the server listens."""
+    """The application; `ports` contains the port when the server listens."""
     @web.middleware
     async def guard(request, handler):
         hosts = {f"{name}:{port}" for name in ("127.0.0.1", "localhost") for port in ports}
@@ -62,13 +62,13 @@ def application(opened, token, ports):
         try:
             await asyncio.to_thread(one.read)
         except (InputError, QxError) as error:
-            trouble = f"{error}; this is what was read before."
+            trouble = f"{error}; the page shows what was read before."
         return web.Response(text=page_of(one, opened.index(one), trouble), content_type="text/html")
 
     async def data(request):
         one, query = of(request), request.query
         if query.get("version") != str(one.version):
-            raise Refused("the file has been read anew: reload this page")
+            raise Refused("the file has been read again: reload this page")
         channel = _whole(query.get("channel", "0"), len(one.channels))
         return web.json_response(await asyncio.to_thread(
             one.data, channel, _number(query["from"]), _number(query["to"]),
@@ -98,14 +98,14 @@ def application(opened, token, ports):
 def _whole(text, below=None):
     value = int(text) if text.isascii() and text.isdigit() and len(text) < 10 else -1
     if value < 0 or below is not None and value >= below:
-        raise Refused(f"{text[:20]!r} is no number that there is")
+        raise Refused(f"{text[:20]!r} is not a valid number")
     return value
 
 
 def _number(text):
     value = float(text)
     if not math.isfinite(value) or abs(value) > 1e15:
-        raise Refused(f"{text[:20]!r} is no time")
+        raise Refused(f"{text[:20]!r} is not a time")
     return value
 
 
@@ -120,14 +120,14 @@ def choices_of(query, channels):
         raise Refused(f"a {kind} needs {needed} edge{'s' * (needed > 1)}")
     order = _whole(query.get("order", "4"))
     if not 1 <= order <= 20:
-        raise Refused("the order is from 1 to 20")
+        raise Refused("the order must be from 1 to 20")
     end = query.get("to")
     return viewing.Choices(_whole(query.get("channel", "0"), channels), _number(query.get("from") or "0"),
                            _number(end) if end else math.inf, window, kind, edges, order)
 
 
 def page_of(one, index, trouble=""):
-    """The page of a recording: its channels, and a form for what is analysed."""
+    """The page of a recording: its channels, and a form for the analysis."""
     def options(name, values):
         return (f'<select name="{name}">' + "".join(
             f'<option value="{html.escape(value)}">{html.escape(text)}</option>' for value, text in values) + "</select>")
@@ -138,7 +138,7 @@ def page_of(one, index, trouble=""):
             f"<label>channel {options('channel', [(str(i), c[0]) for i, c in enumerate(one.channels)])}</label>"
             f'<label>from <input name="from" size="9" inputmode="decimal"> {unit}</label>'
             f'<label>to <input name="to" size="9" inputmode="decimal"> {unit}</label>'
-            f'<button type="button" id="shown">what is shown</button>'
+            f'<button type="button" id="shown">use visible part</button>'
             f"<label>window {options('window', [(w, w.replace('_', '-')) for w in viewing.WINDOWS])}</label>"
             f"<label>filter {options('kind', [(k, k) for k in viewing.KINDS])}</label>"
             f'<label>edge <input name="low" size="7" inputmode="decimal"> {frequency}</label>'
@@ -156,7 +156,7 @@ def page_of(one, index, trouble=""):
 
 
 async def serve(opened, port, ready):
-    """Serves until it is interrupted; `ready` is called with the address."""
+    """Serves pages until it is interrupted; `ready` is called with the address."""
     token, ports = secrets.token_urlsafe(18), set()
     runner = web.AppRunner(application(opened, token, ports), access_log=None)
     await runner.setup()

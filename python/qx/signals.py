@@ -1,4 +1,4 @@
-"""Waves, pulses and patterns, and what is done to whole signals: trends, scales, convolution and
+"""Waveforms, pulses and patterns, and operations on whole signals: detrending, scaling, convolution and
 correlation.
 
 Frequencies are in the unit of the sampling rate `fs`, phases in radians.
@@ -25,18 +25,18 @@ core = served("signals")
 EMPTY = np.empty(0)
 NORMALIZATIONS = {"none": 0, "unbiased": 1, "biased": 2}
 METHODS = {"direct": 0, "fft": 1}
-DIRECT = 64  # up to the shorter length direct sums are faster than transforms
+DIRECT = 64  # up to this length of the shorter sequence, direct sums are faster than transforms
 
 
 def _wave(name: Any, n: Any, frequency: Any, fs: Any, amplitude: Any, phase: Any, *more: Any) -> Any:
     n = whole_number(f"signals.{name}", "n", n, 1)
     if not fs > 0:
-        refuse(f"signals.{name}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        refuse(f"signals.{name}", "fs", f"must be above 0; got {fs}", "ErrSamplingNotPositive")
     return getattr(core, name)(n, float(amplitude), frequency / fs, math.degrees(phase), *more)[0]
 
 
 def _of_times(name: Any, t: Any, *arguments: Any) -> Any:
-    """A pulse at times of the caller's, of any shape."""
+    """A pulse at the caller's times, of any shape."""
     times = _times(name, t)
     return getattr(core, name)(times.ravel(), 0, *arguments).reshape(times.shape)
 
@@ -57,7 +57,7 @@ def sine(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     frequency : float
         In the unit of fs.
     fs : float
@@ -92,7 +92,7 @@ def square(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0, ph
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     frequency : float
         In the unit of fs.
     fs : float
@@ -102,7 +102,7 @@ def square(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0, ph
     phase : float
         The phase of the first value, in radians.
     duty : float
-        The part of a period that is high, from 0 to 1.
+        The fraction of a period during which the wave is high, from 0 to 1.
 
     Returns
     -------
@@ -124,12 +124,12 @@ def square(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0, ph
 
 def triangle(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
              phase: float = 0.0) -> NDArray[np.float64]:
-    """A triangle wave, which begins as a sine does: up from 0.
+    """A triangle wave that starts like a sine, rising from 0.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     frequency : float
         In the unit of fs.
     fs : float
@@ -159,13 +159,13 @@ def triangle(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
 
 def sawtooth(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
              phase: float = 0.0) -> NDArray[np.float64]:
-    """A sawtooth wave: up from 0 to amplitude in half a period, and from -amplitude to 0 in the other
-    half.
+    """A sawtooth wave. It rises from 0 to amplitude in the first half of a period, and from -amplitude to 0
+    in the second.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     frequency : float
         In the unit of fs.
     fs : float
@@ -195,24 +195,24 @@ def sawtooth(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
 
 def arbitrary(n: int, table: ArrayLike, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
               phase: float = 0.0, interpolate: bool = True) -> NDArray[np.float64]:
-    """A wave whose period is in a table.
+    """A wave whose period is given by a table.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     table : array_like
-        One period.
+        The values of one period.
     frequency : float
         In the unit of fs.
     fs : float
         The sampling rate.
     amplitude : float
-        What the table is multiplied by.
+        The factor by which the table is multiplied.
     phase : float
         The phase of the first value, in radians.
     interpolate : bool
-        Lines between the values of the table in place of steps.
+        Whether to interpolate linearly between the values of the table rather than hold each value.
 
     Returns
     -------
@@ -234,14 +234,14 @@ def arbitrary(n: int, table: ArrayLike, frequency: float, fs: float = 1.0, ampli
 
 
 def chirp(n: int, f0: float, f1: float, fs: float = 1.0, amplitude: float = 1.0) -> NDArray[np.float64]:
-    r"""A sine whose frequency rises evenly from f0 at the first value to f1 one behind the last.
+    r"""A sine whose frequency changes linearly from f0 at the first value to f1 one step after the last.
 
     .. math:: x_i = A \sin\left(2\pi i \left(f_0 + \frac{f_1 - f_0}{2n} i\right) / f_s\right)
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     f0, f1 : float
         The frequencies, in the unit of fs.
     fs : float
@@ -266,21 +266,21 @@ def chirp(n: int, f0: float, f1: float, fs: float = 1.0, amplitude: float = 1.0)
     """
     n = whole_number("signals.chirp", "n", n, 1)
     if not fs > 0:
-        refuse("signals.chirp", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        refuse("signals.chirp", "fs", f"must be above 0; got {fs}", "ErrSamplingNotPositive")
     return core.chirp(n, float(amplitude), f0 / fs, f1 / fs)
 
 
 def pulse(n: int, delay: int, width: int, amplitude: float = 1.0) -> NDArray[np.float64]:
-    """A rectangle: `width` values of amplitude from `delay` on, the others 0.
+    """A rectangular pulse: `width` values of amplitude starting at index `delay`, the others 0.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     delay : int
-        How many values come before.
+        Number of values before the pulse.
     width : int
-        How many values are high.
+        Number of values in the pulse.
     amplitude : float
         The largest magnitude.
 
@@ -291,7 +291,7 @@ def pulse(n: int, delay: int, width: int, amplitude: float = 1.0) -> NDArray[np.
     Raises
     ------
     ValueError
-        If n is below 1, or the pulse is not inside.
+        If n is below 1, or the pulse does not fit into the n values.
 
     Examples
     --------
@@ -304,14 +304,14 @@ def pulse(n: int, delay: int, width: int, amplitude: float = 1.0) -> NDArray[np.
 
 
 def impulse(n: int, delay: int = 0, amplitude: float = 1.0) -> NDArray[np.float64]:
-    """One value of amplitude, the others 0.
+    """An impulse: one value of amplitude, the others 0.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     delay : int
-        Where it is.
+        The index of the impulse.
     amplitude : float
         The largest magnitude.
 
@@ -322,7 +322,7 @@ def impulse(n: int, delay: int = 0, amplitude: float = 1.0) -> NDArray[np.float6
     Raises
     ------
     ValueError
-        If n is below 1, or delay is not inside.
+        If n is below 1, or delay is not from 0 to n - 1.
 
     Examples
     --------
@@ -341,11 +341,11 @@ def ramp(n: int, start: float, stop: float, endpoint: bool = True,
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     start, stop : float
         The first and the last value.
     endpoint : bool
-        Whether stop is the last value, or would be the next one.
+        Whether stop is the last value, rather than the value that would come next.
     scale : {"linear", "geometric"}
         Equal steps or equal ratios.
 
@@ -356,7 +356,7 @@ def ramp(n: int, start: float, stop: float, endpoint: bool = True,
     Raises
     ------
     ValueError
-        If n is below 1, 1 with different ends, or an end is not above 0 on a geometric scale.
+        If n is below 1, n is 1 with different ends, or an end is not above 0 on a geometric scale.
 
     Examples
     --------
@@ -370,14 +370,14 @@ def ramp(n: int, start: float, stop: float, endpoint: bool = True,
 
 
 def sinc(n: int, dt: float = 1.0, delay: float = 0.0, amplitude: float = 1.0) -> NDArray[np.float64]:
-    r"""The cardinal sine.
+    r"""The cardinal sine (sinc).
 
     .. math:: x_i = A \frac{\sin \pi t}{\pi t},\quad t = i\,\Delta t - d
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     dt : float
         The time between values.
     delay : float
@@ -417,11 +417,11 @@ def gauss_pulse(t: ArrayLike, fc: float, bandwidth: float = 0.5, level: float = 
     t : array_like
         Times.
     fc : float
-        The frequency of the cosine, by the unit of time.
+        The frequency of the cosine, in cycles per unit of time.
     bandwidth : float
-        The width of the spectrum as a part of fc.
+        The width of the spectrum as a fraction of fc.
     level : float
-        Where that width is taken: so many dB, negative, below the top.
+        The level relative to the peak at which the width is taken, in dB; negative.
     amplitude : float
         The largest magnitude.
 
@@ -432,7 +432,7 @@ def gauss_pulse(t: ArrayLike, fc: float, bandwidth: float = 0.5, level: float = 
     Raises
     ------
     ValueError
-        If t is empty, fc or bandwidth is not above 0, or level not below.
+        If t is empty, fc or bandwidth is not above 0, or level is not below 0.
 
     Examples
     --------
@@ -441,7 +441,7 @@ def gauss_pulse(t: ArrayLike, fc: float, bandwidth: float = 0.5, level: float = 
     array([ 1.      , -0.799918])
     """
     if not level < 0:
-        refuse("signals.gauss_pulse", "level", f"must be below 0 dB; {level} came", "ErrNotStrictlyPositive")
+        refuse("signals.gauss_pulse", "level", f"must be below 0 dB; got {level}", "ErrNotStrictlyPositive")
     return _of_times("gauss_pulse", t, float(amplitude), 0.0, 1.0, float(fc), float(bandwidth), -float(level))
 
 
@@ -455,7 +455,7 @@ def gauss_monopulse(t: ArrayLike, fc: float, amplitude: float = 1.0) -> NDArray[
     t : array_like
         Times.
     fc : float
-        The frequency of the most power, by the unit of time.
+        The frequency of the greatest power, in cycles per unit of time.
     amplitude : float
         The largest magnitude.
 
@@ -480,16 +480,16 @@ def gauss_monopulse(t: ArrayLike, fc: float, amplitude: float = 1.0) -> NDArray[
 
 def triangle_pulse(t: ArrayLike, width: float = 1.0, skew: float = 0.5,
                    amplitude: float = 1.0) -> NDArray[np.float64]:
-    """One triangle about t = 0.
+    """A triangular pulse about t = 0.
 
     Parameters
     ----------
     t : array_like
         Times.
     width : float
-        Its width, in the unit of time.
+        The width, in the unit of time.
     skew : float
-        Where the peak is, as a part of the width, from 0 to 1.
+        The position of the peak as a fraction of the width, from 0 to 1.
     amplitude : float
         The largest magnitude.
 
@@ -500,7 +500,7 @@ def triangle_pulse(t: ArrayLike, width: float = 1.0, skew: float = 0.5,
     Raises
     ------
     ValueError
-        If t is empty, width is not above 0, or skew not from 0 to 1.
+        If t is empty, width is not above 0, or skew is not from 0 to 1.
 
     Examples
     --------
@@ -512,7 +512,7 @@ def triangle_pulse(t: ArrayLike, width: float = 1.0, skew: float = 0.5,
 
 
 def periodic_sinc(t: ArrayLike, order: int, amplitude: float = 1.0) -> NDArray[np.float64]:
-    r"""The periodic cardinal sine (Dirichlet).
+    r"""The periodic cardinal sine (Dirichlet kernel).
 
     .. math:: x = A \frac{\sin(N t / 2)}{N \sin(t / 2)}
 
@@ -545,7 +545,7 @@ def periodic_sinc(t: ArrayLike, order: int, amplitude: float = 1.0) -> NDArray[n
 
 
 def phase_modulated(x: ArrayLike, fc: float, fs: float = 1.0) -> NDArray[np.float64]:
-    r"""A sine of frequency fc whose phase moves by x.
+    r"""A sine of frequency fc whose phase is shifted by x.
 
     .. math:: y_i = \sin(2\pi f_c (i + 1) / f_s + x_i)
 
@@ -565,7 +565,7 @@ def phase_modulated(x: ArrayLike, fc: float, fs: float = 1.0) -> NDArray[np.floa
     Raises
     ------
     ValueError
-        If x has another number of dimensions than one, or fs is not above 0.
+        If x does not have one dimension, or fs is not above 0.
 
     Examples
     --------
@@ -597,7 +597,7 @@ def frequency_modulated(x: ArrayLike, fc: float, fs: float = 1.0) -> NDArray[np.
     Raises
     ------
     ValueError
-        If x has another number of dimensions than one, or fs is not above 0.
+        If x does not have one dimension, or fs is not above 0.
 
     Examples
     --------
@@ -610,31 +610,31 @@ def frequency_modulated(x: ArrayLike, fc: float, fs: float = 1.0) -> NDArray[np.
 
 def _modulated(name: Any, x: Any, fc: Any, fs: Any) -> Any:
     if not fs > 0:
-        refuse(f"signals.{name}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        refuse(f"signals.{name}", "fs", f"must be above 0; got {fs}", "ErrSamplingNotPositive")
     return getattr(core, name)(len(x), 1 / fs, float(fc), np.asarray(x, float), 0.0, 0.0)[1]
 
 
 def detrend(x: ArrayLike, type: Literal["linear", "constant"] | int = "linear", axis: int = LAST) -> Any:
-    """The values without their mean, line, or polynomial of least squares.
+    """The values less their mean, least-squares line or least-squares polynomial.
 
     Parameters
     ----------
     x : array_like
         Real values.
     type : {"linear", "constant"} or int
-        What is taken away; a number is the order of a polynomial, up to 25.
+        What is subtracted; a number is the order of a polynomial, up to 25.
     axis : int
         The axis along which to work.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
     ValueError
-        If x is too short for the order, or type is none of its words.
+        If x is too short for the order, or type is not a valid choice.
 
     Examples
     --------
@@ -648,7 +648,7 @@ def detrend(x: ArrayLike, type: Literal["linear", "constant"] | int = "linear", 
 
     def of_channel(channel: Any) -> Any:
         if len(channel) <= order:
-            refuse("signals.detrend", "x", f"more than {order} values are needed; {len(channel)} came",
+            refuse("signals.detrend", "x", f"more than {order} values are needed; got {len(channel)}",
                    "ErrPolynomialOrderTooHigh")
         t = np.linspace(-1, 1, len(channel)) if len(channel) > 1 else np.zeros(1)
         if not order:
@@ -659,21 +659,21 @@ def detrend(x: ArrayLike, type: Literal["linear", "constant"] | int = "linear", 
 
 
 def unwrap(x: ArrayLike, period: float = 2 * math.pi, axis: int = LAST) -> Any:
-    """Phases without jumps: each moved by whole periods to within half a one of its neighbour.
+    """Phases without jumps: each is shifted by whole periods to within half a period of its predecessor.
 
     Parameters
     ----------
     x : array_like
         Phases.
     period : float
-        A turn: 2 pi, 360, 1, ...
+        The period of the phases: 2 pi, 360, 1, ...
     axis : int
         The axis along which to work.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
@@ -695,7 +695,7 @@ def unwrap(x: ArrayLike, period: float = 2 * math.pi, axis: int = LAST) -> Any:
 
 
 def standardize(x: ArrayLike, axis: int = LAST) -> Any:
-    """Values with the mean 0 and the standard deviation 1.
+    """The values shifted and scaled to mean 0 and standard deviation 1.
 
     Parameters
     ----------
@@ -706,8 +706,8 @@ def standardize(x: ArrayLike, axis: int = LAST) -> Any:
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x; NaN where all values are equal.
+    ndarray, or the pandas type of x
+        The same shape as x; NaN where all values are equal.
 
     Raises
     ------
@@ -724,7 +724,7 @@ def standardize(x: ArrayLike, axis: int = LAST) -> Any:
 
 
 def rescale(x: ArrayLike, low: float = -1.0, high: float = 1.0, axis: int = LAST) -> Any:
-    """Values moved and stretched so that the least is low and the greatest high.
+    """The values shifted and scaled so that the least is low and the greatest is high.
 
     Parameters
     ----------
@@ -737,8 +737,8 @@ def rescale(x: ArrayLike, low: float = -1.0, high: float = 1.0, axis: int = LAST
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
@@ -788,10 +788,10 @@ def convolve(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"] 
     x, y : array_like
         Real or complex values.
     mode : {"full", "same", "valid"}
-        All nx + ny - 1 values; as many as x has, in the middle; those to which all of the shorter one
-        contributes.
+        "full" returns all nx + ny - 1 values, "same" the middle nx values, and "valid" the values to which
+        all of the shorter sequence contributes.
     method : {"auto", "direct", "fft"}
-        Direct sums, exact to rounding, or transforms, faster for long sequences.
+        Direct sums, which are exact to rounding, or transforms, which are faster for long sequences.
 
     Returns
     -------
@@ -800,7 +800,7 @@ def convolve(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"] 
     Raises
     ------
     ValueError
-        If an array is empty or has another number of dimensions than one, or a word is none of its words.
+        If an array is empty or does not have one dimension, or an option is not a valid choice.
 
     Examples
     --------
@@ -826,11 +826,11 @@ def correlate(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"]
     x, y : array_like
         Real or complex values.
     mode : {"full", "same", "valid"}
-        As of `convolve`; in the full result lag 0 is at ny - 1.
+        As for `convolve`; in the full result lag 0 is at ny - 1.
     method : {"auto", "direct", "fft"}
-        As of `convolve`.
+        As for `convolve`.
     normalization : {"none", "unbiased", "biased"}
-        Nothing; each lag by the number of its terms; all by the greater length.
+        What each lag is divided by: nothing, the number of its terms, or the greater length.
 
     Returns
     -------
@@ -839,7 +839,7 @@ def correlate(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"]
     Raises
     ------
     ValueError
-        As of `convolve`.
+        As for `convolve`.
 
     Examples
     --------
@@ -856,14 +856,14 @@ def correlate(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"]
 
 def autocorrelate(x: ArrayLike, normalization: Literal["none", "unbiased", "biased"] = "none",
                   axis: int = LAST) -> NDArray[np.float64]:
-    """The autocorrelation of real values, 2 n - 1 of them with lag 0 in the middle.
+    """The autocorrelation of n real values: 2 n - 1 lags, with lag 0 in the middle.
 
     Parameters
     ----------
     x : array_like
         Real values.
     normalization : {"none", "unbiased", "biased"}
-        As of `correlate`.
+        As for `correlate`.
     axis : int
         The axis along which to work.
 
@@ -874,7 +874,7 @@ def autocorrelate(x: ArrayLike, normalization: Literal["none", "unbiased", "bias
     Raises
     ------
     ValueError
-        If x is empty, or normalization is none of its words.
+        If x is empty, or normalization is not a valid choice.
 
     Examples
     --------
@@ -899,9 +899,9 @@ def correlation_matrix(x: ArrayLike, max_lag: int, y: ArrayLike | None = None,
     max_lag : int
         The largest lag, at least 0 and below the number of values.
     y : array_like, optional
-        As many values; x by default, which makes the matrix symmetric (Hermitian).
+        The same number of values; x by default, which makes the matrix symmetric (Hermitian).
     normalization : {"none", "unbiased", "biased"}
-        As of `correlate`.
+        As for `correlate`.
 
     Returns
     -------
@@ -910,8 +910,8 @@ def correlation_matrix(x: ArrayLike, max_lag: int, y: ArrayLike | None = None,
     Raises
     ------
     ValueError
-        If the arrays are empty or differ in length, max_lag is out of range, or normalization is none of
-        its words.
+        If the arrays are empty or differ in length, max_lag is out of range, or normalization is not a
+        valid choice.
 
     Examples
     --------
@@ -927,12 +927,12 @@ def correlation_matrix(x: ArrayLike, max_lag: int, y: ArrayLike | None = None,
 
 
 def deconvolve(xy: ArrayLike, y: ArrayLike) -> NDArray[np.float64]:
-    """The sequence whose convolution with y is xy; a remainder stays in it.
+    """The sequence whose convolution with y is xy. A remainder of the division stays in the result.
 
     Parameters
     ----------
     xy, y : array_like
-        Real values; y not longer than xy.
+        Real values; y is not longer than xy.
 
     Returns
     -------
@@ -958,7 +958,7 @@ def deconvolve(xy: ArrayLike, y: ArrayLike) -> NDArray[np.float64]:
 def _matrices(function: Any, x: Any, y: Any, method: Any) -> Any:
     x, y = as_array(x), as_array(y)
     if x.ndim != 2 or y.ndim != 2:
-        refuse(function, "x, y", f"two dimensions are needed; {x.ndim} and {y.ndim} came", "ErrSizesDisagree")
+        refuse(function, "x, y", f"two dimensions are needed; got {x.ndim} and {y.ndim}", "ErrSizesDisagree")
     if method == "auto":
         method = "fft" if y.size > DIRECT else "direct"
     return x, y, chosen(function, "method", method, METHODS), "c" in x.dtype.kind + y.dtype.kind
@@ -975,8 +975,8 @@ def convolve2(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"]
     x, y : array_like
         Matrices, real or complex.
     mode : {"full", "same", "valid"}
-        All values; the size of x, from row and column half of those of y on; those where y is wholly on
-        x.
+        "full" returns all values, "same" the size of x, starting half of y's rows and columns in, and
+        "valid" the values where y lies wholly within x.
     method : {"auto", "direct", "fft"}
         Direct sums or transforms.
 
@@ -987,7 +987,7 @@ def convolve2(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"]
     Raises
     ------
     ValueError
-        If a matrix is empty, y exceeds x with mode "valid", or a word is none of its words.
+        If a matrix is empty, y exceeds x in mode "valid", or an option is not a valid choice.
 
     Examples
     --------
@@ -1002,7 +1002,8 @@ def convolve2(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"]
 
 
 def correlate2(x: ArrayLike, y: ArrayLike, method: Literal["auto", "direct", "fft"] = "auto") -> NDArray[Any]:
-    r"""The cross-correlation of two matrices, all lags; lag 0 is in the last row and column of y.
+    r"""The cross-correlation of two matrices at all lags. Lag 0 is at the index of the last row and column
+    of y.
 
     .. math:: z_{rc} = \sum_i \sum_j x_{ij}\, \overline{y_{i - r + m - 1,\, j - c + n - 1}}
 
@@ -1020,7 +1021,7 @@ def correlate2(x: ArrayLike, y: ArrayLike, method: Literal["auto", "direct", "ff
     Raises
     ------
     ValueError
-        If a matrix is empty, or method is none of its words.
+        If a matrix is empty, or method is not a valid choice.
 
     Examples
     --------

@@ -1,5 +1,5 @@
-"""Special functions, of numbers and of arrays of any shape, with the names and the order of arguments of
-`scipy.special`. Outside of their domain they are NaN; docs/accuracy has the measured errors.
+"""Special functions of numbers and of arrays of any shape, with the names and the order of arguments of
+`scipy.special`. Outside their domain they return NaN. The measured errors are in docs/accuracy.
 
 M. Abramowitz and I. A. Stegun, "Handbook of mathematical functions", 1964, has the definitions.
 """
@@ -46,7 +46,7 @@ def gamma(x: ArrayLike) -> Any:
 
 
 def gammaln(x: ArrayLike) -> Any:
-    """The logarithm of the gamma function, x at least 0.
+    """The logarithm of the gamma function, for x of at least 0.
 
     Parameters
     ----------
@@ -67,8 +67,8 @@ def gammaln(x: ArrayLike) -> Any:
 
 
 def _incomplete(a: Any, x: Any, direct: Any, large: Any, what: int) -> Any:
-    """An incomplete gamma function; for large a as the chi-square distribution, which costs some times as much
-    and keeps the digits."""
+    """An incomplete gamma function. For large a, it is computed as the chi-square distribution, which costs
+    several times as much and keeps the digits."""
     a, x = np.broadcast_arrays(np.asarray(a, float), np.asarray(x, float))
     value = np.asarray(direct(a, x))
     is_large = (a > 100) & (a < 5e24) & (x >= 0) & (x < 8e307)
@@ -309,7 +309,7 @@ def erf(x: ArrayLike) -> Any:
 
 
 def erfc(x: ArrayLike) -> Any:
-    """The complementary error function, 1 - erf x without loss of digits.
+    """The complementary error function, 1 - erf x, without loss of digits.
 
     Parameters
     ----------
@@ -400,7 +400,7 @@ def shichi(x: ArrayLike) -> tuple[Any, Any]:
 
 
 def spence(x: ArrayLike) -> Any:
-    r"""The dilogarithm of 1 - x, as of `scipy.special.spence`.
+    r"""The dilogarithm of 1 - x, as in `scipy.special.spence`.
 
     .. math:: \mathrm{Li}_2(1 - x) = -\int_1^x \frac{\ln t}{t - 1} dt
 
@@ -470,7 +470,7 @@ def fresnel(x: ArrayLike) -> tuple[Any, Any]:
 
 
 def ellipk(m: ArrayLike) -> Any:
-    r"""The complete elliptic integral of the first kind by its parameter m = k^2.
+    r"""The complete elliptic integral of the first kind, as a function of the parameter m = k^2.
 
     .. math:: K(m) = \int_0^{\pi/2} (1 - m \sin^2 t)^{-1/2} dt
 
@@ -566,7 +566,7 @@ def ellipeinc(phi: ArrayLike, m: ArrayLike) -> Any:
 
 
 def ellipj(u: ArrayLike, m: ArrayLike) -> tuple[Any, Any, Any, Any]:
-    """The Jacobian elliptic functions sn, cn, dn, and the amplitude.
+    """The Jacobian elliptic functions sn, cn and dn, and the amplitude.
 
     Parameters
     ----------
@@ -589,7 +589,7 @@ def ellipj(u: ArrayLike, m: ArrayLike) -> tuple[Any, Any, Any, Any]:
 
 
 def hyp2f1(a: ArrayLike, b: ArrayLike, c: ArrayLike, x: ArrayLike) -> Any:
-    r"""Gauss's hypergeometric function, for x to 1.
+    r"""Gauss's hypergeometric function, for x up to 1.
 
     .. math:: {}_2F_1 = \sum_k \frac{(a)_k (b)_k}{(c)_k k!} x^k
 
@@ -673,7 +673,7 @@ def jv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by :math:`e^{-|\operatorname{Im} z|}`, so that nothing overflows.
+        Whether to multiply by :math:`e^{-|\operatorname{Im} z|}`, which avoids overflow.
 
     Returns
     -------
@@ -682,7 +682,7 @@ def jv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -707,7 +707,7 @@ def yv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by :math:`e^{-|\operatorname{Im} z|}`, so that nothing overflows.
+        Whether to multiply by :math:`e^{-|\operatorname{Im} z|}`, which avoids overflow.
 
     Returns
     -------
@@ -716,7 +716,7 @@ def yv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -741,7 +741,7 @@ def iv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by :math:`e^{-|\operatorname{Re} z|}`, so that nothing overflows.
+        Whether to multiply by :math:`e^{-|\operatorname{Re} z|}`, which avoids overflow.
 
     Returns
     -------
@@ -750,7 +750,7 @@ def iv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -764,7 +764,7 @@ def iv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
 
 
 def kn(n: ArrayLike, x: ArrayLike) -> Any:
-    """The modified Bessel function K of whole order.
+    """The modified Bessel function K of integer order.
 
     Parameters
     ----------
@@ -798,7 +798,7 @@ def kv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by exp(z), so that nothing underflows.
+        Whether to multiply by exp(z), which avoids underflow.
 
     Returns
     -------
@@ -807,7 +807,7 @@ def kv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -829,7 +829,7 @@ def hankel1(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by exp(-i z), so that nothing overflows.
+        Whether to multiply by exp(-i z), which avoids overflow.
 
     Returns
     -------
@@ -838,7 +838,7 @@ def hankel1(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -859,7 +859,7 @@ def hankel2(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by exp(i z), so that nothing overflows.
+        Whether to multiply by exp(i z), which avoids overflow.
 
     Returns
     -------
@@ -868,7 +868,7 @@ def hankel2(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -939,8 +939,8 @@ def airy(z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply Ai and Ai' by :math:`e^\zeta`, Bi and Bi' by :math:`e^{-|\operatorname{Re} \zeta|}`, with
-        :math:`\zeta = \frac23 z^{3/2}`.
+        Whether to multiply Ai and Ai' by :math:`e^\zeta`, and Bi and Bi' by
+        :math:`e^{-|\operatorname{Re} \zeta|}`, with :math:`\zeta = \frac23 z^{3/2}`.
 
     Returns
     -------
@@ -949,7 +949,7 @@ def airy(z: ArrayLike, scaled: bool = False) -> Any:
     Raises
     ------
     QxError
-        Of complex arguments: if one is not finite, beyond 2^31, or the result exceeds the range.
+        For complex arguments, if one is not finite or beyond 2^31, or the result exceeds the range.
 
     Examples
     --------
@@ -963,7 +963,7 @@ def airy(z: ArrayLike, scaled: bool = False) -> Any:
 
 
 def kelvin(n: ArrayLike, x: ArrayLike) -> tuple[Any, Any, Any, Any]:
-    """The Kelvin functions ber, bei, ker, kei of whole order.
+    """The Kelvin functions ber, bei, ker and kei of integer order.
 
     Parameters
     ----------

@@ -1,8 +1,8 @@
-r"""Spectra of measured signals, in units: densities, transfer functions and coherence, spectrograms,
-envelopes.
+r"""Spectra of measured signals in physical units: power densities, transfer functions, coherence,
+spectrograms and envelopes.
 
-Arguments have the names, order and defaults of `scipy.signal`. Segments of `nperseg` values, each under a
-window, follow each other with `noverlap` values in common.
+Arguments have the names, order and defaults of `scipy.signal`. A signal is cut into segments of `nperseg`
+values; neighbouring segments share `noverlap` values, and each is multiplied by a window.
 """
 
 from __future__ import annotations
@@ -22,7 +22,7 @@ __all__ = ["CrossSpectrum", "Spectrogram", "Spectrum", "TransferFunction", "anal
 
 core = served("spectra")
 
-AT_ONCE = 1 << 20  # values of segments in hand
+AT_ONCE = 1 << 20  # number of values in the segments that are processed together
 DETRENDS = {"constant": "constant", "linear": "linear", "none": None, False: None}
 SCALINGS = {"density": "density", "spectrum": "spectrum"}
 AVERAGES = {"mean": "mean", "median": "median"}
@@ -30,18 +30,18 @@ AVERAGES = {"mean": "mean", "median": "median"}
 
 @result
 class Spectrum(Result):
-    """A spectrum of power; unpacked, frequencies and values.
+    """A power spectrum; unpacks into frequencies and values.
 
     Attributes
     ----------
     frequencies : ndarray
         In the unit of fs.
     values : ndarray
-        The square of the unit of x by the unit of fs, or without the latter with scaling "spectrum".
+        In the squared unit of x per unit of fs; with scaling "spectrum", in the squared unit of x.
     resolution : float
         The equivalent noise bandwidth of a line, in the unit of fs.
     segments : int
-        How many segments were averaged.
+        Number of segments that were averaged.
     scaling : str
         "density" or "spectrum".
     """
@@ -52,11 +52,11 @@ class Spectrum(Result):
     segments: int
     scaling: str
     _unpacked = ("frequencies", "values")
-    _axis = -1  # of the frequencies in the values
+    _axis = -1  # the axis of the frequencies in the values
 
     @property
     def amplitude(self) -> Any:
-        """The square root of the values: unit of x by the root of that of fs for a density."""
+        """The square root of the values; for a density, in the unit of x per root of the unit of fs."""
         return np.sqrt(self.values)
 
     @property
@@ -66,16 +66,16 @@ class Spectrum(Result):
             return 10 * np.log10(self.values)
 
     def power(self, low: Any = -np.inf, high: Any = np.inf) -> Any:
-        """The power between two frequencies, the lines at both included: of the whole density the mean
-        square of what was detrended."""
+        """The power between two frequencies, including the lines at both. Over the whole density, this is
+        the mean square of the detrended signal."""
         if self.scaling != "density":
-            refuse("spectra.Spectrum.power", "self", "only a density has a power in a band")
+            refuse("spectra.Spectrum.power", "self", "must be a density to have a power in a band")
         inside = (self.frequencies >= low) & (self.frequencies <= high)
         width = abs(self.frequencies[1] - self.frequencies[0]) if len(self.frequencies) > 1 else 1.0
         return np.compress(inside, self.values, self._axis).sum(self._axis) * width
 
     def plot(self, axes: Any = None) -> Any:
-        """Draws the values in decibels with matplotlib; returns the axes."""
+        """Plots the values in decibels with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
             axes = pyplot.subplots()[1]
@@ -87,18 +87,18 @@ class Spectrum(Result):
 
 @result
 class CrossSpectrum(Result):
-    """A cross spectrum; unpacked, frequencies and complex values.
+    """A cross spectrum; unpacks into frequencies and complex values.
 
     Attributes
     ----------
     frequencies : ndarray
         In the unit of fs.
     values : ndarray of complex128
-        The mean of conj(X) Y, in the units of x and y by that of fs.
+        The mean of conj(X) Y, in the product of the units of x and y per unit of fs.
     resolution : float
         The equivalent noise bandwidth of a line, in the unit of fs.
     segments : int
-        How many segments were averaged.
+        Number of segments that were averaged.
     """
 
     frequencies: NDArray[Any]
@@ -110,20 +110,20 @@ class CrossSpectrum(Result):
 
 @result
 class TransferFunction(Result):
-    """What is between an input and an output; unpacked, frequencies and complex gains.
+    """The transfer function from an input to an output; unpacks into frequencies and complex gains.
 
     Attributes
     ----------
     frequencies : ndarray
         In the unit of fs.
     values : ndarray of complex128
-        The gain, in units of y by units of x.
+        The gain, in units of y per unit of x.
     coherence : ndarray
-        From 0 to 1, the part of the output's power that the input explains.
+        The fraction of the output's power that the input explains, from 0 to 1.
     resolution : float
         The equivalent noise bandwidth of a line, in the unit of fs.
     segments : int
-        How many segments were averaged.
+        Number of segments that were averaged.
     """
 
     frequencies: NDArray[Any]
@@ -137,21 +137,21 @@ class TransferFunction(Result):
     def error(self) -> Any:
         r"""The relative standard error of the magnitude,
         :math:`\sqrt{(1 - \gamma^2) / (2 n \gamma^2)}` for n independent segments (J. S. Bendat and A. G.
-        Piersol, "Random data", 1971); overlapping segments count in full here."""
+        Piersol, "Random data", 1971). Overlapping segments are counted as independent here."""
         with np.errstate(divide="ignore", invalid="ignore"):
             return np.sqrt((1 - self.coherence) / (2 * self.segments * self.coherence))
 
 
 @result
 class Spectrogram(Result):
-    """Spectra of segments; unpacked, frequencies, times and values.
+    """Spectra of segments; unpacks into frequencies, times and values.
 
     Attributes
     ----------
     frequencies : ndarray
         In the unit of fs.
     times : ndarray
-        The middles of the segments.
+        The centres of the segments.
     values : ndarray
         One column for each time.
     resolution : float
@@ -165,7 +165,7 @@ class Spectrogram(Result):
     _unpacked = ("frequencies", "times", "values")
 
     def plot(self, axes: Any = None) -> Any:
-        """Draws the values in decibels as colours with matplotlib; returns the axes."""
+        """Plots the values in decibels as colours with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
             axes = pyplot.subplots()[1]
@@ -176,7 +176,7 @@ class Spectrogram(Result):
 
 
 class _Segments:
-    """How a signal is cut, and what a line of its spectra is worth."""
+    """How a signal is cut into segments, and the scale of a line of its spectra."""
 
     def __init__(self, function: Any, n: Any, fs: Any, window: Any, nperseg: Any, noverlap: Any, nfft: Any,
                  detrend: Any, scaling: Any, is_complex: Any) -> None:
@@ -188,12 +188,12 @@ class _Segments:
         self.length = min(whole_number(function, "nperseg", nperseg, 1), n)
         noverlap = self.length // 2 if noverlap is None else whole_number(function, "noverlap", noverlap, 0)
         if noverlap >= self.length:
-            refuse(function, "noverlap", f"must be below the length of a segment, {self.length}; {noverlap} "
-                   "came", "ErrSizesDisagree")
+            refuse(function, "noverlap", f"must be below the length of a segment, {self.length}; got "
+                   f"{noverlap}", "ErrSizesDisagree")
         self.step = self.length - noverlap
         self.size = self.length if nfft is None else whole_number(function, "nfft", nfft, 1)
         if self.size < self.length:
-            refuse(function, "nfft", f"must be at least the length of a segment, {self.length}; {nfft} came",
+            refuse(function, "nfft", f"must be at least the length of a segment, {self.length}; got {nfft}",
                    "ErrSizesDisagree")
         self.count = (n - noverlap) // self.step
         self.detrend = chosen(function, "detrend", detrend, DETRENDS)
@@ -205,7 +205,7 @@ class _Segments:
         self.is_complex, self.fs = is_complex, fs
         self.frequencies = (np.fft.fftfreq if is_complex else np.fft.rfftfreq)(self.size, 1 / fs)
         self.times = (np.arange(self.count) * self.step + self.length / 2) / fs
-        if not is_complex:  # the negative frequencies count with the positive ones
+        if not is_complex:  # the positive frequencies include the power at the negative ones
             self.scale = np.full(len(self.frequencies), 2 * self.scale)
             self.scale[0] /= 2
             if self.size % 2 == 0 and self.size > 1:
@@ -221,7 +221,7 @@ class _Segments:
         return rows
 
     def spectra(self, x: Any) -> Any:
-        """The transforms of the segments, some rows at a time."""
+        """The transforms of the segments, a few rows at a time."""
         x = np.ascontiguousarray(x, complex if self.is_complex else float)
         cut = np.lib.stride_tricks.sliding_window_view(x, self.length)[::self.step]
         rows_at_once = max(1, AT_ONCE // self.size)
@@ -240,8 +240,8 @@ class _Segments:
         return np.concatenate([found.real**2 + found.imag**2 for found in self.spectra(x)])
 
     def mean_power(self, x: Any) -> Any:
-        """The mean of the powers. Of real values two segments go through one transform, as real and
-        imaginary part: its power at k and n - k is that of both together."""
+        """The mean of the powers. For real values, each transform takes two segments, as its real and
+        imaginary parts: its power at k and n - k is the sum of the powers of both."""
         cut = np.lib.stride_tricks.sliding_window_view(x, self.length)[::self.step]
         n, total = self.size, np.zeros(self.size)
         rows_at_once = max(2, AT_ONCE // n & ~1)
@@ -276,7 +276,7 @@ def _is_complex(x: Any) -> Any:
 
 
 def _median_bias(n: Any) -> Any:
-    """The mean of the median of n values of an exponential distribution of mean 1."""
+    """The expected median of n values from an exponential distribution of mean 1."""
     k = 2 * np.arange(1.0, (n - 1) // 2 + 1)
     return 1 + np.sum(1 / (k + 1) - 1 / k)
 
@@ -286,33 +286,33 @@ def welch(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLi
           detrend: Literal["constant", "linear", "none"] = "constant",
           scaling: Literal["density", "spectrum"] = "density", average: Literal["mean", "median"] = "mean",
           axis: int = LAST) -> Spectrum:
-    r"""The density of power by the mean over overlapping segments.
+    r"""The power spectral density, averaged over overlapping segments.
 
     .. math:: P_k = \frac{2}{f_s \sum w^2} \Big\langle |X_k|^2 \Big\rangle
 
-    with the factor 2 for real values at all frequencies but 0 and fs / 2. P. D. Welch, "The use of fast
+    with the factor 2 for real values at all frequencies except 0 and fs / 2. P. D. Welch, "The use of fast
     Fourier transform for the estimation of power spectra", 1967.
 
     Parameters
     ----------
     x : array_like
-        Real or complex values; complex ones have a two-sided spectrum in the order of `qx.fft.fft`.
+        Real or complex values. Complex values have a two-sided spectrum in the order of `qx.fft.fft`.
     fs : float
         The sampling rate.
     window : str, tuple or array_like
-        As of `qx.windows.get`.
+        As for `qx.windows.get`.
     nperseg : int, optional
-        Values in a segment; 256, or as many as there are.
+        Number of values in a segment; by default 256, or all values if there are fewer.
     noverlap : int, optional
-        Values that neighbours have in common; half a segment by default.
+        Number of values shared by neighbouring segments; half a segment by default.
     nfft : int, optional
-        Length of the transforms, with zeros behind the segments.
+        Length of the transforms; the segments are zero-padded to it.
     detrend : {"constant", "linear", "none"}
-        What is taken from each segment: its mean, its line, nothing.
+        What is subtracted from each segment: its mean, its least-squares line, or nothing.
     scaling : {"density", "spectrum"}
-        Power by frequency, or the power of a line: of a tone its mean square.
+        Power per unit of frequency, or the power of a line, which for a tone is its mean square.
     average : {"mean", "median"}
-        Over the segments; the median, corrected for its bias, ignores a few disturbed ones.
+        How the segments are averaged. The median, corrected for its bias, ignores a few disturbed segments.
     axis : int
         The axis of time.
 
@@ -323,7 +323,7 @@ def welch(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLi
     Raises
     ------
     ValueError
-        If x is empty, noverlap is not below nperseg, nfft is, or a word is none of its words.
+        If x is empty, noverlap is not below nperseg, nfft is below it, or an option is not a valid choice.
 
     Examples
     --------
@@ -351,7 +351,7 @@ def welch(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLi
 def periodogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "boxcar",
                 nfft: int | None = None, detrend: Literal["constant", "linear", "none"] = "constant",
                 scaling: Literal["density", "spectrum"] = "density", axis: int = LAST) -> Spectrum:
-    """The density of power of all values at once: `welch` with one segment.
+    """The power spectral density of all values as one segment: `welch` with a single segment.
 
     Parameters
     ----------
@@ -360,13 +360,13 @@ def periodogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | A
     fs : float
         The sampling rate.
     window : str, tuple or array_like
-        As of `qx.windows.get`.
+        As for `qx.windows.get`.
     nfft : int, optional
-        Length of the transform, with zeros behind the values.
+        Length of the transform; the values are zero-padded to it.
     detrend : {"constant", "linear", "none"}
-        What is taken from the values before.
+        What is subtracted from the values before the transform.
     scaling : {"density", "spectrum"}
-        Power by frequency, or the power of a line.
+        Power per unit of frequency, or the power of a line.
     axis : int
         The axis of time.
 
@@ -377,7 +377,7 @@ def periodogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | A
     Raises
     ------
     ValueError
-        As of `welch`.
+        As for `welch`.
 
     Examples
     --------
@@ -420,12 +420,12 @@ def power(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
 
 def _pair(function: Any, x: Any, y: Any, fs: Any, window: Any, nperseg: Any, noverlap: Any, nfft: Any,
           detrend: Any, axis: Any) -> Any:
-    """The segments of two signals and their sums, channel by channel."""
+    """The segments of two signals and the sums of their spectra, channel by channel."""
     if axis is LAST and is_pandas(x):
         axis = 0
     x, y = (one.to_numpy() if is_pandas(one) else as_array(one) for one in (x, y))
     if x.shape != y.shape:
-        refuse(function, "x, y", f"must have one shape; {x.shape} and {y.shape} came", "ErrSizeMismatch")
+        refuse(function, "x, y", f"must have the same shape; got {x.shape} and {y.shape}", "ErrSizeMismatch")
     is_complex = x.dtype.kind == "c" or y.dtype.kind == "c"
     n = count_of(x, axis)
     cut = _Segments(function, n, fs, window, nperseg, noverlap, nfft, detrend, "density", is_complex)
@@ -436,24 +436,24 @@ def _pair(function: Any, x: Any, y: Any, fs: Any, window: Any, nperseg: Any, nov
 def csd(x: ArrayLike, y: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "hann",
         nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
         detrend: Literal["constant", "linear", "none"] = "constant", axis: int = LAST) -> CrossSpectrum:
-    r"""The cross density of power: the mean of :math:`\overline{X_k} Y_k`, scaled as that of `welch`.
+    r"""The cross power spectral density: the mean of :math:`\overline{X_k} Y_k`, scaled like `welch`.
 
     Parameters
     ----------
     x, y : array_like
-        Two signals of one shape.
+        Two signals of the same shape.
     fs : float
         The sampling rate.
     window : str, tuple or array_like
-        As of `qx.windows.get`.
+        As for `qx.windows.get`.
     nperseg : int, optional
-        Values in a segment; 256, or as many as there are.
+        Number of values in a segment; by default 256, or all values if there are fewer.
     noverlap : int, optional
-        Values that neighbours have in common; half a segment by default.
+        Number of values shared by neighbouring segments; half a segment by default.
     nfft : int, optional
         Length of the transforms.
     detrend : {"constant", "linear", "none"}
-        What is taken from each segment.
+        What is subtracted from each segment.
     axis : int
         The axis of time.
 
@@ -464,7 +464,7 @@ def csd(x: ArrayLike, y: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ..
     Raises
     ------
     ValueError
-        As of `welch`, and if x and y differ in shape.
+        As for `welch`, and if x and y differ in shape.
 
     Examples
     --------
@@ -491,21 +491,21 @@ def transfer_function(x: ArrayLike, y: ArrayLike, fs: float = 1.0,
     Parameters
     ----------
     x, y : array_like
-        Input and output, of one shape.
+        Input and output, of the same shape.
     fs : float
         The sampling rate.
     window : str, tuple or array_like
-        As of `qx.windows.get`.
+        As for `qx.windows.get`.
     nperseg : int, optional
-        Values in a segment; 256, or as many as there are.
+        Number of values in a segment; by default 256, or all values if there are fewer.
     noverlap : int, optional
-        Values that neighbours have in common; half a segment by default.
+        Number of values shared by neighbouring segments; half a segment by default.
     nfft : int, optional
         Length of the transforms.
     detrend : {"constant", "linear", "none"}
-        What is taken from each segment.
+        What is subtracted from each segment.
     estimator : {"H1", "H2"}
-        Without bias by noise at the output, or by noise at the input.
+        "H1" is not biased by noise at the output, "H2" is not biased by noise at the input.
     axis : int
         The axis of time.
 
@@ -516,7 +516,7 @@ def transfer_function(x: ArrayLike, y: ArrayLike, fs: float = 1.0,
     Raises
     ------
     ValueError
-        As of `welch`, and if x and y differ in shape.
+        As for `welch`, and if x and y differ in shape.
 
     Examples
     --------
@@ -539,25 +539,25 @@ def transfer_function(x: ArrayLike, y: ArrayLike, fs: float = 1.0,
 def coherence(x: ArrayLike, y: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "hann",
               nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
               detrend: Literal["constant", "linear", "none"] = "constant", axis: int = LAST) -> Spectrum:
-    """The coherence of two signals: from 0 to 1, the part of the power of one that the other explains
-    linearly; unpacked, frequencies and values. With a single segment it is 1.
+    """The coherence of two signals: the fraction, from 0 to 1, of the power of one that is linearly explained
+    by the other. It unpacks into frequencies and values. With a single segment it is 1.
 
     Parameters
     ----------
     x, y : array_like
-        Two signals of one shape.
+        Two signals of the same shape.
     fs : float
         The sampling rate.
     window : str, tuple or array_like
-        As of `qx.windows.get`.
+        As for `qx.windows.get`.
     nperseg : int, optional
-        Values in a segment; 256, or as many as there are.
+        Number of values in a segment; by default 256, or all values if there are fewer.
     noverlap : int, optional
-        Values that neighbours have in common; half a segment by default.
+        Number of values shared by neighbouring segments; half a segment by default.
     nfft : int, optional
         Length of the transforms.
     detrend : {"constant", "linear", "none"}
-        What is taken from each segment.
+        What is subtracted from each segment.
     axis : int
         The axis of time.
 
@@ -568,7 +568,7 @@ def coherence(x: ArrayLike, y: ArrayLike, fs: float = 1.0, window: str | tuple[A
     Raises
     ------
     ValueError
-        As of `welch`, and if x and y differ in shape.
+        As for `welch`, and if x and y differ in shape.
 
     Examples
     --------
@@ -585,7 +585,7 @@ def spectrogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | A
                 nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
                 detrend: Literal["constant", "linear", "none"] = "constant",
                 scaling: Literal["density", "spectrum"] = "density", axis: int = LAST) -> Spectrogram:
-    """The densities of power of segments, one after the other.
+    """The power spectral densities of successive segments.
 
     Parameters
     ----------
@@ -594,17 +594,17 @@ def spectrogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | A
     fs : float
         The sampling rate.
     window : str, tuple or array_like
-        As of `qx.windows.get`.
+        As for `qx.windows.get`.
     nperseg : int, optional
-        Values in a segment; 256, or as many as there are.
+        Number of values in a segment; by default 256, or all values if there are fewer.
     noverlap : int, optional
-        Values that neighbours have in common; an eighth of a segment by default.
+        Number of values shared by neighbouring segments; an eighth of a segment by default.
     nfft : int, optional
         Length of the transforms.
     detrend : {"constant", "linear", "none"}
-        What is taken from each segment.
+        What is subtracted from each segment.
     scaling : {"density", "spectrum"}
-        Power by frequency, or the power of a line.
+        Power per unit of frequency, or the power of a line.
     axis : int
         The axis of time; frequencies and times are the last two axes of the result.
 
@@ -615,7 +615,7 @@ def spectrogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | A
     Raises
     ------
     ValueError
-        As of `welch`.
+        As for `welch`.
 
     Examples
     --------
@@ -639,7 +639,7 @@ def spectrogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | A
 
 
 def analytic(x: ArrayLike, axis: int = LAST) -> NDArray[np.complex128]:
-    """The analytic signal: x and, as imaginary part, its Hilbert transform.
+    """The analytic signal: x plus i times its Hilbert transform.
 
     Parameters
     ----------
@@ -667,7 +667,7 @@ def analytic(x: ArrayLike, axis: int = LAST) -> NDArray[np.complex128]:
 
 
 def envelope(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
-    """The envelope: the magnitude of the analytic signal, about the mean of x.
+    """The envelope: the magnitude of the analytic signal of x less its mean.
 
     Parameters
     ----------
@@ -679,7 +679,7 @@ def envelope(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     Returns
     -------
     ndarray of float64
-        What is to be added to the mean at each time.
+        The magnitude at each time, measured from the mean.
 
     Raises
     ------
@@ -701,7 +701,7 @@ def _about_mean(channel: Any) -> Any:
 
 
 def instantaneous_phase(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
-    """The phase of the analytic signal about the mean of x, in radians, without jumps.
+    """The unwrapped phase, in radians, of the analytic signal of x less its mean.
 
     Parameters
     ----------
@@ -729,7 +729,7 @@ def instantaneous_phase(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
 
 
 def instantaneous_frequency(x: ArrayLike, fs: float = 1.0, axis: int = LAST) -> NDArray[np.float64]:
-    """The slope of the instantaneous phase, over two intervals around each value and over one at the ends.
+    """The slope of the instantaneous phase, over the two intervals around each value, and over one at the ends.
 
     Parameters
     ----------

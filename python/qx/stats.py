@@ -1,7 +1,7 @@
-"""Statistics of samples, distributions, tables of counts and analyses of variance.
+"""Statistics of samples, distributions, contingency tables and analyses of variance.
 
-Functions of samples take the last axis, not all values at once as NumPy's do; of a pandas table the
-columns.
+Functions of samples work along the last axis, rather than on all values like those of NumPy. For a pandas
+table, they return one result per column.
 """
 
 from __future__ import annotations
@@ -24,14 +24,14 @@ core = served("stats")
 
 @result
 class Histogram(Result):
-    """Counts of samples in bins; unpacked, counts and edges, as of `numpy.histogram`.
+    """Counts of samples in bins; unpacks into counts and edges, like the result of `numpy.histogram`.
 
     Attributes
     ----------
     counts : ndarray of int32
-        How many samples each bin has.
+        The number of samples in each bin.
     edges : ndarray
-        The edges, one more than bins.
+        The edges of the bins, one more than there are bins.
     centres : ndarray
         The centres of the bins.
     """
@@ -44,14 +44,14 @@ class Histogram(Result):
 
 @result
 class Test(Result):
-    """A test; unpacked, the statistic and the probability.
+    """The result of a test; unpacks into the statistic and the probability.
 
     Attributes
     ----------
     statistic : float
-        What is compared.
+        The test statistic.
     p : float
-        The probability of a larger one by chance.
+        The probability of a larger statistic by chance.
     dof : tuple
         The degrees of freedom.
     """
@@ -64,24 +64,24 @@ class Test(Result):
 
 @result
 class Anova(Result):
-    """An analysis of variance, one row of the table in each array.
+    """An analysis of variance; each array has one element for each row of the table.
 
     Attributes
     ----------
     sources : tuple of str
-        What the rows are.
+        The names of the rows.
     sums : ndarray
         Sums of squares.
     dof : ndarray
         Degrees of freedom.
     means : ndarray
-        Means of squares.
+        Mean squares.
     f : ndarray
-        Ratios of variances; NaN where there is none.
+        Ratios of variances; NaN for rows without one.
     p : ndarray
-        Probabilities of larger ones by chance.
+        Probabilities of larger ratios by chance.
     critical : ndarray
-        What f exceeds by chance with the probability `significance`.
+        The values that f exceeds by chance with probability `significance`.
     """
 
     sources: tuple[str, ...]
@@ -108,10 +108,10 @@ class Anova(Result):
 
 
 class Distribution:
-    """A distribution with its functions and its quantiles; made by this module: `norm`, `t`, `chi2` and `f`,
-    with degrees of freedom behind the argument, as of `scipy.stats`; they need not be whole.
+    """A distribution with its functions and quantiles. This module has `norm`, `t`, `chi2` and `f`. As in
+    `scipy.stats`, the degrees of freedom follow the argument; they need not be whole numbers.
 
-    Small probabilities keep their digits in either tail: take `sf` and `isf` for the upper one.
+    Small probabilities keep their digits in either tail: use `sf` and `isf` for the upper tail.
 
     Examples
     --------
@@ -128,7 +128,7 @@ class Distribution:
     def _degrees(self, dof: Any) -> Any:
         if len(dof) != len(self.parameters):
             refuse(f"stats.{self.name}", ", ".join(self.parameters) or "dof",
-                   f"{len(self.parameters)} are needed; {len(dof)} came", "ErrTooFewForParameters")
+                   f"{len(self.parameters)} are needed; got {len(dof)}", "ErrTooFewForParameters")
         return dof
 
     def _value(self, x: Any, dof: Any, what: int) -> Any:
@@ -138,7 +138,7 @@ class Distribution:
         return np.asarray(getattr(core, f"{self.name}_point")(p, tail, *self._degrees(dof)))[()]
 
     def cdf(self, x: Any, *dof: Any) -> Any:
-        """The probability of a value of at most x."""
+        """The probability of a value less than or equal to x."""
         return self._value(x, dof, 0)
 
     def sf(self, x: Any, *dof: Any) -> Any:
@@ -154,7 +154,7 @@ class Distribution:
         return self._value(x, dof, 3)
 
     def pdf(self, x: Any, *dof: Any) -> Any:
-        """The density."""
+        """The probability density."""
         return self._value(x, dof, 4)
 
     def ppf(self, p: Any, *dof: Any) -> Any:
@@ -187,7 +187,7 @@ def mean(x: ArrayLike, axis: int = LAST) -> Any:
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
@@ -204,7 +204,7 @@ def mean(x: ArrayLike, axis: int = LAST) -> Any:
 
 
 def rms(x: ArrayLike, axis: int = LAST) -> Any:
-    """The root of the mean square, of real or complex values.
+    """The root mean square of real or complex values.
 
     Parameters
     ----------
@@ -215,7 +215,7 @@ def rms(x: ArrayLike, axis: int = LAST) -> Any:
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
@@ -241,13 +241,13 @@ def moment(x: ArrayLike, order: int, axis: int = LAST) -> Any:
     x : array_like
         Real values.
     order : int
-        The power m.
+        The order m.
     axis : int
         The axis along which to work.
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
@@ -274,16 +274,16 @@ def var(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
     axis : int
         The axis along which to work.
     ddof : int
-        The sum of squares is divided by n - ddof; 1 for the variance of what the samples are drawn from.
+        The sum of squares is divided by n - ddof; use 1 to estimate the variance of the population.
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
     ValueError
-        If x is empty, or has not more than ddof values.
+        If x is empty, or does not have more than ddof values.
 
     Examples
     --------
@@ -294,7 +294,7 @@ def var(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
     def of_channel(channel: Any) -> Any:
         n = len(channel)
         if n and n <= ddof:
-            refuse("stats.var", "ddof", f"must be below the number of values, {n}; {ddof} came", "ErrSizesDisagree")
+            refuse("stats.var", "ddof", f"must be below the number of values, {n}; got {ddof}", "ErrSizesDisagree")
         return core.moment(channel, 2) * (n / (n - ddof) if n else 1.0)
 
     return along(of_channel, x, axis)
@@ -310,16 +310,16 @@ def std(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
     axis : int
         The axis along which to work.
     ddof : int
-        As of `var`.
+        As for `var`.
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
     ValueError
-        If x is empty, or has not more than ddof values.
+        If x is empty, or does not have more than ddof values.
 
     Examples
     --------
@@ -331,8 +331,8 @@ def std(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
 
 
 def _standardized(channel: NDArray[Any], order: int) -> float:
-    """The central moment by that power of the standard deviation; NaN where all values are equal, since what
-    the mean is rounded by is no spread."""
+    """The central moment divided by the same power of the standard deviation. It is NaN where all values are
+    equal: the rounding error of their mean is not a spread."""
     if len(channel) and channel.min() == channel.max():
         return math.nan
     moment, variance = np.float64(core.moment(channel, order)), np.float64(core.moment(channel, 2))
@@ -341,7 +341,8 @@ def _standardized(channel: NDArray[Any], order: int) -> float:
 
 
 def skew(x: ArrayLike, axis: int = LAST) -> Any:
-    """The skewness: the third central moment by the power 3/2 of the second; NaN where all values are equal.
+    """The skewness: the third central moment divided by the second to the power 3/2; NaN where all values are
+    equal.
 
     Parameters
     ----------
@@ -352,7 +353,7 @@ def skew(x: ArrayLike, axis: int = LAST) -> Any:
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
@@ -369,7 +370,8 @@ def skew(x: ArrayLike, axis: int = LAST) -> Any:
 
 
 def kurtosis(x: ArrayLike, axis: int = LAST, fisher: bool = True) -> Any:
-    """The kurtosis: the fourth central moment by the square of the second; NaN where all values are equal.
+    """The kurtosis: the fourth central moment divided by the square of the second; NaN where all values are
+    equal.
 
     Parameters
     ----------
@@ -378,11 +380,11 @@ def kurtosis(x: ArrayLike, axis: int = LAST, fisher: bool = True) -> Any:
     axis : int
         The axis along which to work.
     fisher : bool
-        Less the 3 of a normal distribution.
+        Whether to subtract 3, the kurtosis of a normal distribution.
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
@@ -410,12 +412,12 @@ def median(x: ArrayLike, axis: int = LAST) -> Any:
 
     Returns
     -------
-    float or ndarray, or of a pandas table a Series
+    float or ndarray; for a pandas table, a Series
 
     Raises
     ------
     ValueError
-        If x is empty or has NaN.
+        If x is empty or contains NaN.
 
     Examples
     --------
@@ -427,19 +429,19 @@ def median(x: ArrayLike, axis: int = LAST) -> Any:
 
 
 def mode(x: ArrayLike, intervals: int = 0) -> NDArray[np.float64]:
-    """The most frequent values, rising.
+    """The most frequent values, in ascending order.
 
     Parameters
     ----------
     x : array_like
         Real values.
     intervals : int
-        With a number above 0, the centres of the fullest of so many bins of equal width.
+        If above 0, the number of bins of equal width; the centres of the fullest bins are returned.
 
     Returns
     -------
     ndarray of float64
-        Empty where nothing is there twice.
+        Empty where no value occurs twice.
 
     Raises
     ------
@@ -461,7 +463,7 @@ def mse(x: ArrayLike, y: ArrayLike) -> float:
     Parameters
     ----------
     x, y : array_like
-        Real values of one length.
+        Real values, of the same length.
 
     Returns
     -------
@@ -480,19 +482,19 @@ def mse(x: ArrayLike, y: ArrayLike) -> float:
     """
     x, y = as_array(x).ravel(), as_array(y).ravel()
     if x.shape != y.shape:
-        refuse("stats.mse", "x, y", f"must be of one length; {len(x)} and {len(y)} came", "ErrSizeMismatch")
+        refuse("stats.mse", "x, y", f"must have the same length; got {len(x)} and {len(y)}", "ErrSizeMismatch")
     return core.mse(x, y)
 
 
 def histogram(x: ArrayLike, bins: ArrayLike = 10) -> Histogram:
-    """Counts in bins of equal width from the least to the greatest value, or in bins of one's own.
+    """Counts in bins of equal width from the least to the greatest value, or in bins with given edges.
 
     Parameters
     ----------
     x : array_like
         Real values.
     bins : int or array_like
-        How many bins, or their edges, rising; the last bin includes its upper edge.
+        The number of bins, or their edges in ascending order; the last bin includes its upper edge.
 
     Returns
     -------
@@ -501,7 +503,7 @@ def histogram(x: ArrayLike, bins: ArrayLike = 10) -> Histogram:
     Raises
     ------
     ValueError
-        If x is empty, or the edges do not rise.
+        If x is empty, or the edges are not in ascending order.
 
     Examples
     --------
@@ -516,7 +518,7 @@ def histogram(x: ArrayLike, bins: ArrayLike = 10) -> Histogram:
         return Histogram(counts, np.linspace(np.nanmin(x), np.nanmax(x), bins + 1), centres)
     edges = as_array(bins).astype(float)
     if edges.ndim != 1 or len(edges) < 2 or np.any(np.diff(edges) < 0):
-        refuse("stats.histogram", "bins", "the edges must be two or more and rise", "ErrRangeReversed")
+        refuse("stats.histogram", "bins", "must be at least two edges in ascending order", "ErrRangeReversed")
     intervals = [(low, high, 0) for low, high in zip(edges[:-1], edges[1:])]
     intervals[-1] = (edges[-2], edges[-1], 2)
     return Histogram(core.histogram_intervals(x, intervals)[0], edges, (edges[1:] + edges[:-1]) / 2)
@@ -553,14 +555,14 @@ def contingency(table: ArrayLike) -> Test:
 
 
 def anova(*samples: ArrayLike, significance: float = 0.05) -> Anova:
-    """The analysis of variance of samples of one factor: whether their means differ.
+    """The one-way analysis of variance: whether the means of several samples differ.
 
     Parameters
     ----------
     *samples : array_like
-        The values at each level.
+        The values at each level of the factor.
     significance : float
-        For the critical values.
+        The probability to which the critical values refer.
 
     Returns
     -------
@@ -579,14 +581,14 @@ def anova(*samples: ArrayLike, significance: float = 0.05) -> Anova:
     """
     groups = [as_array(one).astype(float).ravel() for one in samples]
     if len(groups) < 2:
-        refuse("stats.anova", "samples", f"at least two are needed; {len(groups)} came", "ErrAnovaFewLevels")
+        refuse("stats.anova", "samples", f"at least two samples are needed; got {len(groups)}", "ErrAnovaFewLevels")
     for i, group in enumerate(groups):
         if not len(group):
             refuse("stats.anova", "samples", f"sample {i} is empty", "ErrEmptyInput")
         if not np.all(np.isfinite(group)):
             refuse("stats.anova", "samples", f"sample {i} has a value that is not finite", "ErrNaNInData")
     if len(groups) == sum(map(len, groups)):
-        refuse("stats.anova", "samples", "one of them must have two values", "ErrAnovaFewLevels")
+        refuse("stats.anova", "samples", "at least one of them must have two values", "ErrAnovaFewLevels")
     y = np.concatenate(groups) if groups else np.empty(0)
     labels = np.repeat(np.arange(len(groups), dtype=np.int32), [len(one) for one in groups])
     between, mean_between, ratio, p, error, mean_error, total, critical = core.anova(
@@ -598,20 +600,20 @@ def anova(*samples: ArrayLike, significance: float = 0.05) -> Anova:
 
 
 def _coded(function: Any, y: Any, labels: Any, random: Any) -> Any:
-    """y, the labels as numbers, and the counts of levels, negative for random factors as the exports have
-    them."""
+    """y, the labels as numbers, and the numbers of levels, which the exports take as negative for random
+    factors."""
     y = as_array(y).astype(float).ravel()
     codes, levels = [], []
     for labels_of_one, is_random in zip(labels, random):
         found, code = np.unique(as_array(labels_of_one).ravel(), return_inverse=True)
         if len(code) != len(y):
-            refuse(function, "labels", f"must be as many as values, {len(y)}; {len(code)} came",
+            refuse(function, "labels", f"must be as many as the values, {len(y)}; got {len(code)}",
                    "ErrSizeMismatch")
         codes.append(code.astype(np.int32))
         levels.append(-len(found) if is_random else len(found))
     cells = math.prod(abs(level) for level in levels)
     if not cells or len(y) % cells:
-        refuse(function, "y", f"must have as many values in each of the {cells} cells; {len(y)} came",
+        refuse(function, "y", f"must have the same number of values in each of the {cells} cells; got {len(y)}",
                "ErrAnovaCountMismatch")
     return y, codes, levels, len(y) // cells
 
@@ -627,23 +629,23 @@ def _table(sources: Any, found: Any) -> Any:
 
 def anova2(y: ArrayLike, a: ArrayLike, b: ArrayLike, random: tuple[bool, bool] = (False, False),
            significance: float = 0.05) -> Anova:
-    """The analysis of variance of two factors, with as many values in each cell.
+    """The analysis of variance of two factors, with the same number of values in each cell.
 
     Parameters
     ----------
     y : array_like
         The values.
     a, b : array_like
-        The level of each factor for each value: numbers or words.
+        The level of each factor for each value, as numbers or words.
     random : (bool, bool)
-        Whether the levels of a factor are drawn at random from many.
+        Whether the levels of each factor are a random sample from many.
     significance : float
         For the critical values.
 
     Returns
     -------
     Anova
-        With the rows A, B, AB, error and total.
+        The table, with the rows A, B, AB, error and total.
 
     Raises
     ------
@@ -663,23 +665,23 @@ def anova2(y: ArrayLike, a: ArrayLike, b: ArrayLike, random: tuple[bool, bool] =
 
 def anova3(y: ArrayLike, a: ArrayLike, b: ArrayLike, c: ArrayLike,
            random: tuple[bool, bool, bool] = (False, False, False), significance: float = 0.05) -> Anova:
-    """The analysis of variance of three factors, with as many values in each cell.
+    """The analysis of variance of three factors, with the same number of values in each cell.
 
     Parameters
     ----------
     y : array_like
         The values.
     a, b, c : array_like
-        The level of each factor for each value: numbers or words.
+        The level of each factor for each value, as numbers or words.
     random : (bool, bool, bool)
-        Whether the levels of a factor are drawn at random from many.
+        Whether the levels of each factor are a random sample from many.
     significance : float
         For the critical values.
 
     Returns
     -------
     Anova
-        With the rows A, B, C, AB, AC, BC, ABC, error and total.
+        The table, with the rows A, B, C, AB, AC, BC, ABC, error and total.
 
     Raises
     ------
@@ -701,14 +703,14 @@ def anova3(y: ArrayLike, a: ArrayLike, b: ArrayLike, c: ArrayLike,
 
 @result
 class Summary(Result):
-    """What is known of the values so far.
+    """Statistics of the values so far.
 
     Attributes
     ----------
     count : int
-        How many.
+        The number of values.
     mean, std, rms, least, greatest : float or ndarray
-        Their mean, population standard deviation, root mean square, least and greatest.
+        The mean, the population standard deviation, the root mean square, the least and the greatest value.
     """
 
     count: int
@@ -720,13 +722,13 @@ class Summary(Result):
 
 
 class Running(Stream):
-    """Statistics of a stream: each block returns the `Summary` of all values so far, with the bits of one
-    piece.
+    """Statistics of a stream. Each block returns the `Summary` of all values so far, with the same bits as for
+    all values in a single block.
 
     Parameters
     ----------
     channels : int, optional
-        How many channels a block of two dimensions has; without it blocks have one dimension.
+        Number of channels of a two-dimensional block; without it, blocks have one dimension.
     axis : int
         The axis of time in a block of two dimensions.
 
@@ -744,14 +746,15 @@ class Running(Stream):
         super().__init__(channels, axis)
 
     def _start(self) -> Any:
-        """Count, first value, sums of differences from it and of their squares, least, greatest."""
+        """The count, the first value, the sums of the differences from it and of their squares, the least and
+        the greatest value."""
         return 0, 0.0, 0.0, 0.0, math.inf, -math.inf
 
     def _step(self, state: Any, block: Any) -> Any:
         count, first, total, squares, least, greatest = state
         first = first if count else float(block[0])
         away = block - first
-        # Sums from the first value to the last, whatever the blocks are.
+        # The values are summed one after the other, so that the division into blocks does not matter.
         total = float(np.cumsum(np.concatenate([[total], away]))[-1])
         squares = float(np.cumsum(np.concatenate([[squares], away * away]))[-1])
         return np.empty(0), (count + len(block), first, total, squares, min(least, float(block.min())),
@@ -762,7 +765,7 @@ class Running(Stream):
         return self.summary()
 
     def summary(self) -> Any:
-        """The Summary so far; NaN where there was no value."""
+        """The Summary so far; NaN where there were no values."""
         parts = []
         for count, first, total, squares, least, greatest in self._states:
             n = count or math.nan
@@ -775,7 +778,7 @@ class Running(Stream):
         return Summary(self._states[0][0], *columns)
 
     def finish(self) -> Any:
-        """The Summary of all; begins anew."""
+        """The Summary of all values. The stream starts afresh."""
         found = self.summary()
         self.reset()
         return found

@@ -1,7 +1,7 @@
-"""Recordings that are stored as arrays or sheets: what other programs keep, by the readers that Debian has.
+"""Recordings stored as arrays or sheets by other programs, read by libraries that Debian has.
 
-NumPy's files need nothing else. The others need a package each, which is loaded only for them; where it is
-missing the refusal names it.
+NumPy's files need no other package. Each of the other formats needs one, which is loaded only for it. If the
+package is missing, the error names it.
 """
 
 import contextlib
@@ -22,7 +22,7 @@ RATE_NAMES = {"rate", "sr", "fs", "sfreq", "srate", "samplerate", "sample_rate",
 
 
 def rate_in(note):
-    """The rate (rates.Named) of a number whose name says nothing else, or None."""
+    """The rate (rates.Named) in a note that has only a name and a number, or None."""
     name, _, value = note.partition(" = ")
     number = re.fullmatch(r"(\d[\d.e+-]*)( Hz)?", value)
     if name.lower() not in RATE_NAMES or not number or float(number[1]) <= 0:
@@ -32,7 +32,7 @@ def rate_in(note):
 
 @contextlib.contextmanager
 def reading(path, what=""):
-    """What a reader raises is an InputError: of a broken file that may be an exception of any kind."""
+    """Turns an exception of a reader into an InputError. A broken file can cause exceptions of any kind."""
     try:
         yield
     except (InputError, MemoryError):
@@ -43,7 +43,7 @@ def reading(path, what=""):
 
 
 class Arrays:
-    """Columns of arrays with the face of a tables.Reader. A column is a function of a slice."""
+    """Columns of arrays with the interface of a tables.Reader. A column is a function of a slice."""
 
     where = "the file"
 
@@ -91,7 +91,7 @@ class Arrays:
 
 
 class Column:
-    """Numbers of one name; `data` is anything that is cut by slices, `pick` takes the column out of a slice."""
+    """The numbers of one name. `data` is anything that can be sliced; `pick` takes the column out of a slice."""
 
     def __init__(self, name, data, length, pick=lambda part: part, unit=""):
         self.name, self.length, self.unit = name, length, unit
@@ -110,7 +110,7 @@ class Column:
 
 
 def columns_of(path, name, data, unit=""):
-    """The columns of one array: fields of records, the shorter side of a matrix, or itself."""
+    """The columns of one array: the fields of records, the shorter side of a matrix, or the array itself."""
     dtype, shape = data.dtype, [n for n in data.shape]
     if dtype.names:
         return [Column(field, data, shape[0], lambda part, field=field: part[field], unit) for field in dtype.names
@@ -128,14 +128,14 @@ def columns_of(path, name, data, unit=""):
         return columns_of(path, name, np.atleast_1d(data), unit)
     if 1 in shape:
         return [Column(name, np.asarray(data).reshape(-1), max(shape), unit=unit)]
-    across = shape[1] > shape[0]  # a row is a channel
+    across = shape[1] > shape[0]  # whether a row is a channel
     data = _Turned(data) if across else data
     named = [f"{name}[{i + 1}]" if name else "" for i in range(min(shape))]
     return [Column(one, data, max(shape), lambda part, i=i: part[:, i], unit) for i, one in enumerate(named)]
 
 
 class _Turned:
-    """A matrix whose rows are channels, cut along them."""
+    """A matrix whose rows are channels, sliced along them."""
 
     def __init__(self, data):
         self.data = data
@@ -145,7 +145,7 @@ class _Turned:
 
 
 def assembled(source, arrays, notes, wanted):
-    """The table of the columns of one length: those among which a wanted column is, else the longest. `arrays`
+    """A table of columns of the same length: those that include a wanted column, or else the longest. `arrays`
     are triples of name, array and unit."""
     path, columns = source.path, []
     with reading(path):
@@ -216,7 +216,7 @@ def _contents_of_hdf5(h5py, source):
     def visit(name, item):
         if name.startswith("#") or any(value in (b"char", "char") for kind, value in item.attrs.items()
                                        if kind.endswith("_class")):
-            return  # references and texts of other programs
+            return  # references and texts
         notes.extend(_attributes(item))
         if isinstance(item, h5py.Dataset) and item.dtype.kind in "iufbcV":
             unit = item.attrs.get("units", item.attrs.get("unit", ""))
@@ -229,7 +229,7 @@ def _contents_of_hdf5(h5py, source):
 
 
 def _attributes(item):
-    """The attributes of a group or data set that are one number or one text."""
+    """The attributes of a group or data set that are a single number or text."""
     for name, value in item.attrs.items():
         value = value.decode(errors="replace") if isinstance(value, bytes) else value
         if isinstance(value, str):
@@ -278,7 +278,7 @@ def read_edf(source, wanted):
     import tempfile
     with tempfile.TemporaryDirectory(prefix="qx-") as folder:
         kind = "bdf" if head[:1] == b"\xff" else "edf"
-        path = os.path.join(folder, f"recording.{kind}")  # its reader goes by the ending
+        path = os.path.join(folder, f"recording.{kind}")  # its reader goes by the extension
         shutil.copy(source.local(), path)
         with reading(source.path, "EDF or BDF"):
             raw = getattr(mne.io, f"read_raw_{kind}")(path, preload=True, verbose="error")
@@ -287,7 +287,7 @@ def read_edf(source, wanted):
     return assembled(source, arrays, [f"sampling rate = {raw.info['sfreq']:.17g} Hz"], wanted)
 
 
-# Sheets become text with tabs, so that header, time and units are found as in any table.
+# Sheets are converted to text with tabs, so that header, time and units are found as in any table.
 
 def _cell(value):
     if value is None or value != value:
@@ -341,7 +341,7 @@ SHEETS = {"xlsx": _sheets_xlsx, "xls": _sheets_xls, "ods": _sheets_ods}
 
 
 class _Text:
-    """The text of a sheet as a source for tables.Reader."""
+    """The text of a sheet, as a source for tables.Reader."""
 
     def __init__(self, source, text):
         self.path, self.name, self.head = source.path, source.name, text[:1 << 16]

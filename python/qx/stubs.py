@@ -2,9 +2,9 @@
 
     python3 -m qx.stubs [FOLDER | --check]
 
-`__init__.pyi`, of the package, and `exports.pyi`, with every export. Without a folder they go beside the
-modules, with a sentence on each export instead of its text, which changes more often than the arguments.
-With --check nothing is written, and the status is 0 if those are up to date.
+The files are `__init__.pyi`, for the package, and `exports.pyi`, with every export. Without a folder, they are
+written beside the modules, with one sentence on each export instead of its full text, which changes more often than
+the arguments. With --check, nothing is written, and the status is 0 if the files are up to date.
 """
 
 import re

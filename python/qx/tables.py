@@ -1,8 +1,8 @@
-"""Delimited text as columns of numbers. pandas cuts and converts; what stands here is which lines
-are data, what the columns are, and where something is wrong (docs/recordings.md has the rules).
+"""Delimited text as columns of numbers. pandas splits the lines and converts the cells; this module determines
+which lines are data, what the columns are, and where something is wrong (docs/recordings.md has the rules).
 
-The head of the file decides on the layout. The body is read in parts, so memory is needed only for
-the columns that are asked for.
+The head of the file determines the layout. The body is read in parts, so memory is needed only for the
+requested columns.
 """
 
 import collections
@@ -22,7 +22,7 @@ from .times import CLOCK, ONLY_DIGITS, SLASHED, TIME_OF_DAY, TWO_FIELDS, Format
 HEAD_LINES = 400
 LINES_AT_ONCE = 200_000
 COMMENTS = ("#", "%", "//")
-# What spreadsheets write where a formula failed; it begins like a comment and is none.
+# What spreadsheets write where a formula failed. It begins like a comment, but is not one.
 ERROR = re.compile(r"#(?:N/A|NV|NA|DIV/0!|VALUE!|VALEUR!|WERT!|REF!|BEZUG!|NAME\?|NOM\?|NUM!|NOMBRE!|ZAHL!|"
                    r"NULL!|NUL!)(?=\s*(?:$|[;,\t|\"])|(?:\s+[-+\d.,eE]+|\s+#\S+)+\s*$)", re.IGNORECASE)
 MISSING = {"", "-", "--", "?", "na", "n/a", "nan", "-nan", "null", "none", "nil", "missing"}
@@ -30,7 +30,7 @@ MISSING = {"", "-", "--", "?", "na", "n/a", "nan", "-nan", "null", "none", "nil"
 EXPONENT = r"([eEdD][-+]?\d+)?"
 NUMBER = re.compile(rf"[-+]?(\d+\.?\d*|\.\d+){EXPONENT}|[-+]?(nan|inf(inity)?)", re.IGNORECASE)
 DECIMAL_COMMA = re.compile(rf"[-+]?(\d+,?\d*|,\d+){EXPONENT}")
-# Thousands in groups: between blanks or apostrophes, with a decimal mark or without; by commas; by points.
+# Thousands, grouped by blanks or apostrophes, with or without a decimal mark; by commas; by points.
 SPACED = re.compile(rf"[-+]?[1-9]\d{{0,2}}(?:[ '’\u00a0\u2009\u202f]\d{{3}})+([.,]\d*)?{EXPONENT}")
 COMMA_GROUPS = re.compile(rf"[-+]?[1-9]\d{{0,2}}(,\d{{3}})+(\.\d*)?{EXPONENT}")
 POINT_GROUPS = re.compile(rf"[-+]?[1-9]\d{{0,2}}(\.\d{{3}})+(,\d*)?{EXPONENT}")
@@ -42,7 +42,7 @@ TIME_NAME = re.compile(
     r"(?P<stem>time[ _]?stamps?|date[ _-]?time|time|zeit(?:stempel|punkt)?|date|datum|uhrzeit|clock|elapsed|uptime|"
     r"seconds?|secs?|msecs?|millis(?:econds)?|micros(?:econds)?|heure|horodatage|tiempo|fecha|temps|ts|epoch|"
     r"unix|utc|m?jd|t|s|ms|us|µs)(?=$|[\s_/(\[,:.-])", re.IGNORECASE)
-WEAK_NAMES = {"temps", "ts", "epoch", "unix", "utc", "jd", "mjd", "us"}  # which mean other things, too
+WEAK_NAMES = {"temps", "ts", "epoch", "unix", "utc", "jd", "mjd", "us"}  # which also mean other things
 NO_UNIT = {"in", "utc", "gmt", "local", "unix", "epoch", "since", "start", "from", "time", "date", "of", "day",
            "elapsed", "relative", "absolute", "heure", "uhrzeit", "zeit", "stamp", "iso", "iso8601"}
 INDEX_NAME = re.compile(r"#|no\.?|nr\.?|n|i|id|idx|index|row|line|sample|samples|count|unnamed: 0|",
@@ -58,18 +58,18 @@ class Layout:
     first: int  # number of the first line of data
     names: list
     units: list
-    notes: list  # lines before the data that are no header
+    notes: list  # lines before the data that are not a header
     body: list  # the cells of the first lines of data
     on_one_line: bool = False
-    thousands: str = ""  # the mark that groups them, beside blanks and apostrophes
-    shown: str = ""  # the decimal mark, where numbers of the head show one
+    thousands: str = ""  # the mark that groups them, besides blanks and apostrophes
+    shown: str = ""  # the decimal mark, if numbers of the head have one
 
     @property
     def width(self):
         return len(self.names)
 
     def label(self, column):
-        """How a message names a column."""
+        """The name of a column in messages."""
         name = self.names[column]
         return f"column {column + 1}" + (f", {name}" if name else "")
 
@@ -81,7 +81,7 @@ class Layout:
 
 
 def encoding_of(path, start):
-    """The encoding of a text by its first bytes, and whether these are text at all."""
+    """The encoding of a text by its first bytes. A file that is not a text is refused."""
     if start[:2] in (b"\xff\xfe", b"\xfe\xff"):
         return "utf-16"
     control = start.translate(None, bytes(set(range(256)) - set(range(32)) | {9, 10, 12, 13}))
@@ -92,7 +92,7 @@ def encoding_of(path, start):
     try:
         start.decode("utf-8")
     except UnicodeDecodeError as error:
-        if error.start < len(start) - 4:  # no letter that the sample cuts
+        if error.start < len(start) - 4:  # not a character cut off at the end of the sample
             return "cp1252"
     return "utf-8-sig"
 
@@ -122,7 +122,7 @@ def number(cell, decimal, thousands=""):
         cell = cell.replace(",", ".")
     try:
         return float(cell)
-    except ValueError:  # Fortran's exponent
+    except ValueError:  # the exponent may be Fortran's
         return float(re.sub("[dD]", "e", cell))
 
 
@@ -143,14 +143,14 @@ def is_value(cell):
 
 
 def _separator(lines, decimal):
-    """The mark that cuts the later lines into most values; None for one column."""
+    """The mark that splits the later lines into the most values; None for one column."""
     later = lines[len(lines) // 2:]
     best, found = (False, sum(is_value(cells_of(line, None)[0]) for line in later) / len(later), 0), None
     if decimal == "point" and any("," in line for line in later):
         best = (False, 0.0, 0)
     for order, separator in enumerate((";", "\t", "|", ",", " ")):
         if found in (";", "\t", "|"):
-            break  # these stand in no number
+            break  # these marks do not occur in numbers
         if separator == " " and best[1] == 1 and _is_one_column(lines):
             break  # blanks group digits
         rows = [cells_of(line, separator) for line in later]
@@ -166,7 +166,7 @@ def _separator(lines, decimal):
 
 
 def _agrees_with_names(lines, separator, width):
-    """Whether the mark cuts the line above the values into as many cells, none of them a value."""
+    """Whether the mark splits the line above the values into the same number of cells, none of them a value."""
     rows = [cells_of(line, separator) for line in lines[:len(lines) // 2 + 1]]
     above = list(itertools.takewhile(lambda row: not any(map(is_value, row)), rows))
     return bool(above) and len(above[-1]) == width
@@ -202,13 +202,13 @@ def _commas_belong_to_numbers(path, lines, decimal, thousands):
             return True
         if len(parts) > 2 and [part[0] for part in parts] == [
                 str(int(parts[0][0] or 0) + i) for i in range(len(parts))]:
-            return False  # they count from line to line
+            return False  # the numbers before the commas count the lines
     raise InputError(f"{path}: {shown(later[0])} may be one number with a decimal comma or two "
                      "numbers: --decimal comma or --decimal point says which")
 
 
 def _marks(path, columns, decimal, thousands):
-    """The decimal mark, the mark of thousands or an empty text, and the decimal mark that cells show."""
+    """The decimal mark, the thousands separator or an empty text, and the decimal mark that cells show."""
     decimals, groups, in_doubt = set(), set(), {}
     for cells in columns:
         for cell in cells:
@@ -252,8 +252,8 @@ def _both_readings(cell, mark):
 
 
 def _whole_below(column):
-    """Whether a column holds whole numbers below a thousand and nothing else but groups of three digits: thousands
-    are written so."""
+    """Whether a column holds only whole numbers below a thousand and groups of three digits, as where
+    thousands are grouped."""
     whole = [cell for cell in column if re.fullmatch(r"[-+]?\d{1,3}", cell)]
     return any(cell.lstrip("+-") != "0" for cell in whole) and all(
         OPEN.fullmatch(cell) or cell in whole for cell in column if not is_missing(cell))
@@ -265,7 +265,7 @@ def _is_unit(cell):
 
 
 def _names(rows, width):
-    """Names, units and what else stands before the data, of its rows of cells."""
+    """Names, units and other notes from the rows of cells before the data."""
     header = [row for row in rows if len(row) == width]
     names, units = [""] * width, [""] * width
     if len(header) > 1 and all(map(_is_unit, header[-1])) and not all(map(_is_unit, header[-2])):
@@ -276,7 +276,7 @@ def _names(rows, width):
 
 
 def layout_of(path, lines, decimal=None, thousands=False):
-    """The layout of a table by its first lines, pairs of number and text without comments."""
+    """The layout of a table by its first lines, given as pairs of number and text, without comments."""
     texts = [text for _, text in lines]
     if not texts:
         raise InputError(f"{path}: holds no numbers")
@@ -297,13 +297,13 @@ def layout_of(path, lines, decimal=None, thousands=False):
     valued = [c for c in range(width) if any(row[c] for row in later) and 2 * sum(
         is_value(row[c]) for row in later) >= sum(not is_missing(row[c]) for row in later)]
     first = next((i for i, row in enumerate(rows) if is_data(row, valued)), None)
-    if first is None:  # a lower half that is no data, as of one value and one word
+    if first is None:  # the lower half is not data, as with one value and one word
         valued = list(range(width))
         first = next((i for i, row in enumerate(rows) if is_data(row, valued)), None)
     if first is None:
         raise InputError(f"{path}: holds no numbers")
     while first > 0 and len(rows[first - 1]) == width and all(_is_failed(rows[first - 1][c]) for c in valued):
-        first -= 1  # a missing value is no name
+        first -= 1  # a missing value is not a name
     body = [row for row in rows[first:] if len(row) == width]
     mark, groups, shown_mark = _marks(path, list(zip(*body)), decimal, thousands)
     names, units, other = _names(rows[:first], width)
@@ -320,14 +320,14 @@ def shown(cell):
 
 
 class Reader:
-    """A table as columns of numbers, part by part."""
+    """A table as columns of numbers, read part by part."""
 
     where = "a comment of the file"
 
     def __init__(self, source, decimal=None, missing=None, dates=None, thousands=False):
         self.source, self.path, self.name = source, source.path, source.name
         self.missing, self.dates = missing, dates
-        self.named_as_time = None  # the number of a column that is time whatever its name is
+        self.named_as_time = None  # the number of a column that is time regardless of its name
         with source.open() as file:
             start = file.read(1 << 20)
         if not start:
@@ -351,7 +351,7 @@ class Reader:
         self.notes = self.comments + self.layout.notes
 
     def _name_by(self, comment):
-        """Takes the names of columns from the comment above the data, where it looks like a row of names."""
+        """Takes the names of columns from the comment above the data, if it looks like a row of names."""
         attempts = [cells_of(comment, mark) for mark in (self.layout.separator, ",", ";", "\t")]
         attempts.append(re.findall(r"[^\s\[(]+(?:\s*[\[(][^\])]*[\])])?", comment))  # each with its unit
         for cells in attempts:
@@ -368,10 +368,10 @@ class Reader:
                                   errors="strict" if self.encoding != "cp1252" else "replace") as file:
                 yield file
         except UnicodeError:
-            raise InputError(f"{self.path}: is no text in {self.encoding} throughout") from None
+            raise InputError(f"{self.path}: is not {self.encoding} text throughout") from None
 
     def _parts_of_lines(self):
-        """The line numbers and texts of the lines of data, part by part, and how they are cut."""
+        """The line numbers and texts of the lines of data, part by part, and how they are split."""
         if self.layout.on_one_line:
             yield [self.layout.first] * len(self.layout.body), [row[0] for row in self.layout.body], None, 1
             return
@@ -383,8 +383,8 @@ class Reader:
                 yield *part, self.layout.separator, self.layout.width
 
     def parts(self, columns, beside=()):
-        """For each part of the body a dictionary of the columns, NaN where a value is missing, and
-        the line number of each row. The columns `beside` are None in a part that has what is no number there."""
+        """For each part of the body, a dictionary of the columns, with NaN where a value is missing, and the
+        line number of each row. A column of `beside` is None in a part where it has cells that are not numbers."""
         for column in filter(self.is_clock, columns):
             self._settle(column)
         for numbers, lines, separator, width in self._parts_of_lines():
@@ -394,7 +394,7 @@ class Reader:
             yield values, at
 
     def _or_none(self, numbers, lines, column, separator, width):
-        before, self.missing = self.missing, "skip"  # what is missing is a gap
+        before, self.missing = self.missing, "skip"  # missing values are gaps
         try:
             return self._converted(numbers, lines, [column], separator, width)[0][column]
         except InputError:
@@ -431,7 +431,7 @@ class Reader:
         return values, np.array(numbers)
 
     def _of_long_numbers(self, found, lines, column, separator, width):
-        """Whole numbers beyond the digits of a double as what they exceed the first one by, for times."""
+        """Times as whole numbers with more digits than a double holds, as differences from the first."""
         if not time_unit(self.layout, column, self.named_as_time)[0]:
             return found
         try:
@@ -453,7 +453,7 @@ class Reader:
         import pandas
         try:
             cells = self._read(lines, column, separator, width, str)
-        except pandas.errors.ParserError as error:  # of quotation marks
+        except pandas.errors.ParserError as error:  # of unbalanced quotation marks
             raise InputError(f"{self.path}: cannot be cut into cells: {error}") from None
         return [str(cell).strip().strip('"').strip() for cell in cells]
 
@@ -473,7 +473,7 @@ class Reader:
                              f"the other lines have {width}")
 
     def _examined(self, numbers, cells, column):
-        """The numbers of cells among which some are none."""
+        """The numbers of cells, some of which are not numbers."""
         values = np.empty(len(cells))
         layout = self.layout
         for i, cell in enumerate(cells):
@@ -500,7 +500,7 @@ class Reader:
         return self._is_of_digits(column, sample)
 
     def _is_of_digits(self, column, sample):
-        """Whether a column has dates and times as 20240131115930."""
+        """Whether a column has dates and times like 20240131115930."""
         if not sample or not all(map(ONLY_DIGITS.fullmatch, sample)):
             return False
         is_time, unit = time_unit(self.layout, column, self.named_as_time)
@@ -509,14 +509,14 @@ class Reader:
                                                                     self.layout.names[column], re.IGNORECASE))
 
     def _settle(self, column):
-        """Chooses how the times of a column are read, by all of them where the first ones leave it open."""
+        """Chooses how the times of a column are read. If the first times are ambiguous, all are examined."""
         if column in self.formats:
             return
         beside = any(c != column and self.is_clock(c) and not any(":" in cell for cell in self.layout.sample(c))
                      for c in range(self.layout.width))
         form = Format(self.dates, beside, f"{self.layout.names[column]} {self.layout.units[column]}")
         if form.is_open(self.layout.sample(column)):
-            kept = {}  # what decides, in the order of the file
+            kept = {}  # the texts that decide, in the order of the file
             for numbers, lines, separator, width in self._parts_of_lines():
                 for cell in self._cells(lines, column, separator, width):
                     match = SLASHED.match(cell) or TWO_FIELDS.fullmatch(cell)
@@ -527,13 +527,13 @@ class Reader:
         self.formats[column] = form
 
     def _clock(self, numbers, cells, column):
-        """Seconds of dates and times of day since the first."""
+        """The seconds of dates and times of day since the first."""
         nanoseconds, wrong = self.formats[column].parse(cells)
         if wrong is not None:
             cell = cells[wrong]
             hint = "; --time none or --rate reads the values without it"
             raise InputError(f"{self.path}:{numbers[wrong]}: {self.layout.label(column)}: "
-                             f"{shown(cell)} is no time{' like those before' * (wrong > 0)}{hint}")
+                             f"{shown(cell)} is not a time{' like those before' * (wrong > 0)}{hint}")
         origin = self.origins.setdefault(column, int(nanoseconds[0]))
         return (nanoseconds - origin) / 1e9
 
@@ -544,8 +544,8 @@ class Reader:
 
 
 def time_unit(layout, column, named=None):
-    """Whether the name of a column says that it is time, and the unit that it or the row of units
-    says, or an empty text. `named` is the number of a column that is time whatever its name is."""
+    """Whether the name of a column says that it is time, and the unit from the name or from the row of units,
+    or an empty text. `named` is the number of a column that is time regardless of its name."""
     name, unit = layout.names[column].strip(), layout.units[column]
     match = TIME_NAME.match(name)
     if named == column:
@@ -559,24 +559,24 @@ def time_unit(layout, column, named=None):
     if not unit:
         unit = next((word for word in reversed(words) if seconds_of(word) is not None), "")
     if not unit and words and re.search(r"[(\[/]", rest):
-        unit = words[-1]  # one that is not known stays one
+        unit = words[-1]  # an unknown unit is kept
     if not unit and seconds_of(stem) is not None and stem.lower() != "s":
         unit = stem
-    if stem in ("T", "S", "s"):  # temperature, path and others have these letters, too
+    if stem in ("T", "S", "s"):  # also used for temperature, distance and others
         sure = re.search(r"[(\[/\s]", rest) or layout.units[column] or (
             stem == "s" and layout.width > 1 and all(
                 UNITS_ALONE.fullmatch(other) for i, other in enumerate(layout.names) if i != column))
         if not sure or not (stem == "s" and not rest and not unit) and seconds_of(unit) is None:
             return False, ""
     elif stem.lower() in ("t", "ms") and (unit or rest) and seconds_of(unit) is None:
-        return False, ""  # t of something
+        return False, ""  # t of something else
     if stem.lower() in WEAK_NAMES and not layout_rises(layout, column):
         return False, ""
     return True, unit or ("d" if stem.lower() in ("jd", "mjd") else "s" if stem == "s" else "")
 
 
 def layout_rises(layout, column):
-    """Whether the first values of a column are times or rise from each to the next."""
+    """Whether the first values of a column are times or are increasing."""
     sample = layout.sample(column)
     values = [layout.number(cell) for cell in sample]
     if None in values:

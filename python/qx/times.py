@@ -1,7 +1,7 @@
-"""Dates and times of day as texts have them, and the sampling rate of a column of times.
+"""Dates and times of day in texts, and the sampling rate of a column of times.
 
-Texts become nanoseconds since 1970, or since midnight where there is no date. What order day and month have,
-and whether two fields are minutes and seconds, is decided by all texts of a column (Format.settle)."""
+Texts are converted to nanoseconds since 1970, or since midnight if there is no date. The order of day and
+month, and whether two fields are minutes and seconds, are decided by all texts of a column (Format.settle)."""
 
 import contextlib
 import datetime
@@ -20,7 +20,7 @@ SLASHED_DAY = r"\d\d?/\d\d?/(?:\d{4}|\d\d)|\d\d?-\d\d?-\d{4}"
 NAMED_DAY = r"\d\d?(?:\.\s?|[\s-])[^\W\d_]{3,9}\.?[\s-](?:\d{4}|\d\d)|[^\W\d_]{3,9}\.?\s\d\d?,?\s\d{4}"
 DAY = rf"(?:{ISO_DAY}|{DOTTED_DAY}|{SLASHED_DAY}|{NAMED_DAY})"
 OF_DAY = rf"\d\d?:\d\d(?::\d\d{FRACTION})?{AMPM}"
-MINUTES = r"\d+:\d\d[.,]\d+"  # and seconds with decimals
+MINUTES = r"\d+:\d\d[.,]\d+"  # minutes, and seconds with decimals
 DURATION = rf"\d+\s?(?:days?|d|Tage?|jours?),?\s+\d\d?:\d\d:\d\d{FRACTION}"
 COMPACT = rf"\d{{8}}T\d{{4}}(?:\d\d{FRACTION})?"
 CLOCK = re.compile(rf"{DAY}(?:(?:T|,?\s+){OF_DAY}{ZONE})?|{OF_DAY}{ZONE}|{MINUTES}|{DURATION}|{COMPACT}{ZONE}")
@@ -48,7 +48,7 @@ PARTS = re.compile(
 
 @functools.lru_cache(maxsize=4096)
 def _days(text, order):
-    """The days since 1970 of a date; ValueError where it is none."""
+    """The days since 1970 of a date; ValueError if it is not a date."""
     if match := re.fullmatch(r"(\d{4})[-/.]?(\d\d?)[-/.]?(\d\d?)", text):
         year, month, day = map(int, match.groups())
     elif match := re.fullmatch(r"(\d\d?)\.\s?(\d\d?)\.\s?(\d+)", text):
@@ -74,27 +74,27 @@ class Format:
 
     def __init__(self, order=None, beside_date=False, name=""):
         self.order = order  # "dmy", "mdy" or None, which settle() may change
-        self.fields = ""  # of clocks with two of them: "m" where they are minutes and seconds
+        self.fields = ""  # for clocks with two fields: "m" if they are minutes and seconds
         if re.search(r"m+:s+", name, re.IGNORECASE) and not re.search(r"h+:m+", name, re.IGNORECASE):
             self.fields = "m"
         elif beside_date or re.search(r"h+:m+|uhr|clock|heure|time of day|utc|local", name, re.IGNORECASE):
             self.fields = "h"
 
     def is_open(self, cells):
-        """Whether cells are among those that only the whole column explains."""
+        """Whether some of the cells can only be understood from the whole column."""
         return (any(TWO_FIELDS.fullmatch(cell) for cell in cells) and not self.fields
                 or any(SLASHED.match(cell) for cell in cells) and not self.order)
 
     def settle(self, cells):
         """Decides on the order of days and months, and on clocks with two fields, by all texts of a column.
-        Gives what is in doubt in words, or an empty text."""
+        Returns a description of what is ambiguous, or an empty text."""
         dates = {match.groups(): match[0] for cell in cells if (match := SLASHED.match(cell))}
         if dates and not self.order:
             self.order = ("dmy" if any(int(first) > 12 for first, _, _ in dates) else
                           "mdy" if any(int(second) > 12 for _, second, _ in dates) else self._rising(dates))
             either = {date: text for date, text in dates.items() if int(date[0]) and int(date[1])}
             if not self.order and not either:
-                self.order = "dmy"  # in which they are no dates, either
+                self.order = "dmy"  # in this order they are not dates either
             if not self.order:
                 text = next(iter(either.values()))
                 day, month, _ = next(iter(either))
@@ -107,7 +107,7 @@ class Format:
             if max(hours) > 23:
                 self.fields = "m"
             elif any(later < sooner for sooner, later in zip(hours, hours[1:])):
-                self.fields = "h"  # over midnight
+                self.fields = "h"  # hours and minutes that pass midnight
             else:
                 return (f"'{clocks[0][0]}' may be minutes and seconds or hours and minutes: mm:ss or hh:mm in the "
                         "name of the column says which; --time none or --rate reads the values without it")
@@ -115,19 +115,19 @@ class Format:
 
     @staticmethod
     def _rising(dates):
-        """The only order in which dates do not fall, any for one date, None where both are possible."""
+        """The only order in which the dates never decrease, either order for one date, None if both are possible."""
         if len(dates) == 1:
             return "dmy"
         rising = []
         for order in ("dmy", "mdy"):
-            with contextlib.suppress(ValueError):  # where one is no date in this order
+            with contextlib.suppress(ValueError):  # if one is not a date in this order
                 days = [_days(text, order) for text in dates.values()]
                 if all(sooner < later for sooner, later in zip(days, days[1:])):
                     rising.append(order)
         return rising[0] if len(rising) == 1 else None
 
     def nanoseconds(self, cell):
-        """Since 1970 or since midnight, and None where the cell is no time."""
+        """The nanoseconds since 1970 or since midnight; None if the cell is not a time."""
         match = PARTS.fullmatch(cell.strip())
         if not match or not cell.strip():
             return None
@@ -144,7 +144,7 @@ class Format:
         hours, minutes = int(part["h"] or part["hc"]), int(part["m"] or part["mc"])
         seconds, fraction = int(part["s"] or part["sc"] or 0), part["f"] or part["fc"]
         if part["h"] and part["s"] is None and not day and (fraction or self.fields == "m"):
-            hours, minutes, seconds = 0, hours, minutes  # minutes of any number
+            hours, minutes, seconds = 0, hours, minutes  # any number of minutes
         elif minutes > 59 or day and hours > 24:
             return None
         if part["half"]:
@@ -160,7 +160,7 @@ class Format:
         return total if abs(total) < 1 << 62 else None
 
     def parse(self, cells):
-        """The nanoseconds of cells, and the index of the first that is no time or None."""
+        """The nanoseconds of cells, and the index of the first cell that is not a time, or None."""
         if ISO.fullmatch(cells[0]):
             import pandas
             times = pandas.to_datetime([cell.replace(",", ".") if ISO.fullmatch(cell) else "" for cell in cells],
@@ -175,7 +175,7 @@ class Format:
 
 
 def over_midnight(seconds):
-    """Times of day with a day added wherever they fall back by most of one, and how often they do."""
+    """Times of day, with a day added after each fall by more than half a day, and the number of such falls."""
     falls = np.flatnonzero(np.diff(seconds) < -43200)
     if len(falls):
         seconds = seconds.copy()
@@ -186,14 +186,14 @@ def over_midnight(seconds):
 
 # The rate of times
 
-LEAST_ROUNDED = 8  # times, so that an even line through all of them is no accident
-# Digits between the extremes off the line of rounded times: 1 off the best line of all, more off that by least
-# squares; 1.36 holds for 999 of 1000 series of 8 to 400 times with random steps.
+LEAST_ROUNDED = 8  # least number of times, so that an even line through all of them is not an accident
+# The spread of rounded times about their line, in units of the last digit: 1 about the best possible line, more
+# about the least-squares line; 1.36 holds for 999 of 1000 series of 8 to 400 times with random steps.
 ROUNDED_WITHIN = 1.36
 
 
 def rate_of(times, scale=1.0):
-    """The rate of times, and in words what is uneven in them; None where they give no rate."""
+    """The rate of times, and a description of their unevenness. The rate is None if the times have none."""
     steps = np.diff(times)
     if not np.isfinite(steps).all():
         return None, "are not all there"
@@ -213,7 +213,7 @@ def rate_of(times, scale=1.0):
         step, _, doubt = _line(times)
         jitter = spread / mean
         said = f", whose steps differ by up to {100 * jitter:.2g} %" if jitter > 1e-4 else ""
-        # Doubt of the numbers themselves: of doubles, and of the last digit where it is a rounded one.
+        # The uncertainty of the numbers themselves: that of doubles, and of the last digit if it is rounded.
         last = max(np.spacing(np.abs(times).max()), digit if spread > 1e-9 * mean else 0.0)
         coarse = last / (times[-1] - times[0])
         return _with_doubt(step * scale, max(doubt / step, coarse), said)
@@ -229,9 +229,9 @@ def rate_of(times, scale=1.0):
 
 
 def _line(times):
-    """The slope of the line by least squares through all times over their numbers, how far those off it are apart,
-    and twice the standard deviation of the slope, where values on one side of the line count as one. In blocks, for
-    long recordings."""
+    """The slope of the least-squares line through all times over their indices, the spread of the times about it,
+    and twice the standard deviation of the slope. Successive values on one side of the line count as one. Long
+    recordings are processed in blocks."""
     n, block = len(times), 1 << 16
     power = n * (n * n - 1.0) / 12
     total = moment = 0.0
@@ -248,13 +248,13 @@ def _line(times):
         above = part > 0
         crossings += int(np.count_nonzero(above[1:] != above[:-1])) + (at > 0 and bool(above[0]) != (last > 0))
         last = part[-1]
-    runs = max(1.0, n / (2 * crossings + 1))  # values of one sign in a row, where independent ones have two
+    runs = max(1.0, n / (2 * crossings + 1))  # length of runs of one sign, relative to 2, that of independent values
     return step, high - low, 2 * math.sqrt(squares / n / power * runs)
 
 
 def _gaps(steps, digit):
-    """The places of long steps among equal ones, and whether all others are equal. Rounding makes long steps,
-    too: at even distances."""
+    """The positions of long steps among equal ones, and whether all others are equal. Rounding also causes long
+    steps, at even distances."""
     step = float(np.median(steps))
     usual = np.abs(steps - step) <= 0.01 * step + (1.01 * digit if digit < 0.5 * step else 0.0)
     gaps = np.flatnonzero(~usual & (steps > 1.5 * step))
@@ -267,7 +267,7 @@ def _gaps(steps, digit):
 
 
 def _with_doubt(step, doubt, said):
-    """The rate of a step, and what is said of it with the relative doubt of the line."""
+    """The rate of a step, and a remark that includes the relative uncertainty of the line."""
     rate = rounded(1 / step, doubt)
     if said:
         width = doubt / step
@@ -277,8 +277,8 @@ def _with_doubt(step, doubt, said):
 
 
 def rounded(rate, doubt):
-    """The rate, or its reciprocal where it is below 1, with the fewest decimals, up to three, that a relative doubt
-    allows."""
+    """The rate, or its reciprocal if it is below 1, rounded to the fewest decimals, up to three, within the
+    relative uncertainty."""
     if rate < 1:
         return 1 / rounded(1 / rate, doubt)
     width = max(doubt, 1e-9) * rate
@@ -286,7 +286,7 @@ def rounded(rate, doubt):
 
 
 def last_digit(times):
-    """The unit of the last decimal digit with which times are written, 0 if it is too fine."""
+    """The unit of the last decimal digit of the times, 0 if it is too fine."""
     some = np.abs(times[:2000])
     for digits in range(0, 10):
         scaled = some * 10**digits

@@ -1,4 +1,4 @@
-"""Tones of a recording with their uncertainties, and the harmonics and noise beside the largest one."""
+"""Tones of a recording with their uncertainties, and the harmonics and noise of the largest one."""
 
 import dataclasses
 import math
@@ -10,36 +10,36 @@ from .outcomes import QxError
 from .sections import frequency_axis
 
 WINDOW = "blackman_harris7"  # side lobes below -160 dB
-LEAST_DB = -300  # of the largest line; nothing below is drawn
-AROUND = 8  # bins to either side of a tone, whose noise is taken for that at the tone
-FREE = 10  # lines among them that are independent under the window, each of two degrees of freedom
-FALSE = 0.01  # chance that noise alone has a tone that counts
+LEAST_DB = -300  # relative to the largest line; nothing below is drawn
+AROUND = 8  # bins on either side of a tone from which the noise at the tone is estimated
+FREE = 10  # lines among them that are independent under the window, each with two degrees of freedom
+FALSE = 0.01  # probability that noise alone has a significant tone
 
 
 @dataclasses.dataclass
 class Tones:
-    """Tones, the largest first; errors are standard uncertainties. A tone is significant where it is more than
-    the noise about it would have."""
+    """Tones, the largest first; errors are standard uncertainties. A tone is significant if it exceeds what the
+    noise around it can explain."""
     frequencies: np.ndarray
     frequency_errors: np.ndarray
     amplitudes: np.ndarray
     amplitude_errors: np.ndarray
-    phases: np.ndarray  # of cosines, at the first sample
+    phases: np.ndarray  # phases of cosines, at the first sample
     significant: np.ndarray
     residual_rms: float
     resolution: float  # one over the length of the recording
 
 
 def tones(values, rate=1.0, count=5, lines_of=None):
-    """Up to `count` tones, fewer where the rest could be noise; a QxError where all values are equal.
+    """Up to `count` tones, fewer if the rest could be noise; raises QxError if all values are equal.
 
-    The uncertainties are the least that an unbiased estimate from n samples has, with the density of the
-    noise about the tone, S, in place of that of white noise: sqrt(S fs / n) of the amplitude A, and
-    sqrt(3 S fs / (n (n^2 - 1))) fs / (pi A) of the frequency (D. C. Rife and R. R. Boorstyn, "Single-tone
-    parameter estimation from discrete-time observations", 1974). What a tone has about it that is no
-    tone, such as a changing amplitude, counts as noise. A tone is significant where the ratio of its line to the mean of
-    those around it has a chance below FALSE in noise, by the F distribution and for n / 2 lines, or those of
-    `lines_of` samples of which the values are a band."""
+    The uncertainties are the least possible for an unbiased estimate from n samples, with the density S of the
+    noise around the tone in place of that of white noise: sqrt(S fs / n) for the amplitude A, and
+    sqrt(3 S fs / (n (n^2 - 1))) fs / (pi A) for the frequency (D. C. Rife and R. R. Boorstyn, "Single-tone
+    parameter estimation from discrete-time observations", 1974). Deviations from a tone, such as a changing
+    amplitude, count as noise. A tone is significant if the ratio of its line to the mean of those around it has
+    a probability below FALSE in noise, by the F distribution and for n / 2 lines, or for those of `lines_of`
+    samples if the values are a band of them."""
     n = len(values)
     scale = float(np.abs(values).max()) or 1.0
     x = values / scale
@@ -60,12 +60,12 @@ def tones(values, rate=1.0, count=5, lines_of=None):
 
 
 def strongest(values, rate, count=5):
-    """The `tones` that stand out; None where there are none."""
+    """The `tones` that stand out; None if there are none."""
     return standing_out(lambda: tones(values, rate, count))
 
 
 def standing_out(measure_them):
-    """The significant ones of measured tones; None where there are none."""
+    """The significant tones among the measured ones; None if there are none."""
     try:
         found = measure_them()
     except QxError as error:
@@ -78,7 +78,7 @@ def standing_out(measure_them):
 
 
 def spectrum(values, rate=1.0, window=WINDOW):
-    """Frequencies, the amplitudes that lines under the window have, and the resolution."""
+    """Frequencies, the amplitudes of the lines under the window, and the resolution."""
     scale = float(np.abs(values).max()) or 1.0
     found = spectra.periodogram(values / scale, rate, window, scaling="spectrum")
     amplitudes = np.sqrt(2 * found.values)
@@ -89,7 +89,8 @@ def spectrum(values, rate=1.0, window=WINDOW):
 
 
 def plot(recording, found, analysis, drawn):
-    """The spectrum in dB of the largest tone, with the tones and the harmonics; `drawn` is what `spectrum` returns."""
+    """The spectrum in dB relative to the largest tone, with the tones and the harmonics; `drawn` is the result of
+    `spectrum`."""
     frequencies, amplitudes, resolution = drawn
     largest = found.amplitudes[0]
 
@@ -105,5 +106,5 @@ def plot(recording, found, analysis, drawn):
               for h in np.flatnonzero(seen)]
     return figures.Plot(
         f"Tones of {recording.name}: SINAD {analysis.sinad:.1f} dB, {analysis.enob:.2f} bits; harmonics by number",
-        frequency_axis(recording, resolution)[1], "Amplitude (dB of the largest tone)",
+        frequency_axis(recording, resolution)[1], "Amplitude (dB relative to the largest tone)",
         [figures.Curve("spectrum", lines, figures.GREY)], step=frequencies[1], marks=marks, y_range=(bottom, 15))

@@ -1,5 +1,5 @@
-// The page of `view`: samples come from the server as they are needed, and the sections are made anew for
-// the part, the filter and the window that are chosen.
+// The page of `view`. It fetches samples from the server as they are needed, and updates the sections for the
+// chosen part, filter and window.
 "use strict";
 
 const form = document.querySelector("form.choices"), state = document.getElementById("state");
@@ -16,7 +16,7 @@ function tell(text) {
   state.textContent = text;
 }
 
-// The samples of a channel, of which the server has the levels of detail.
+// The samples of a channel, at the levels of detail that the server has.
 class Remote {
   constructor(plot, channel) {
     Object.assign(this, {plot, channel, range: [0, Math.max(1, plot.count - 1) * plot.step]});
@@ -52,7 +52,7 @@ async function analyse() {
   }
 }
 
-// Only the fields that the chosen filter has are shown; what is disabled is not sent.
+// Shows only the fields that the chosen filter has; disabled fields are not sent.
 function showFields() {
   const kind = form.elements.kind.value, edges = kind === "none" ? 0 : kind.startsWith("band") ? 2 : 1;
   for (const [name, used] of [["low", edges > 0], ["high", edges > 1], ["order", edges > 0]]) {
@@ -78,12 +78,12 @@ document.getElementById("shown").addEventListener("click", () => {
 setInterval(async () => {
   try {
     const found = await ask("state", {});
-    if (found.state === "gone") tell("The file is gone; this is what was read of it.");
+    if (found.state === "gone") tell("The file no longer exists. The page shows what was read from it.");
     else if (found.state === "changed" || String(found.version) !== form.dataset.version) {
-      tell("The file has changed: reload the page to read it anew.");
+      tell("The file has changed: reload the page to read it again.");
     }
   } catch (error) {
-    tell("The server does not answer: it may have been ended.");
+    tell("The server does not answer: it may have been stopped.");
   }
 }, 1000);
 

@@ -1,5 +1,5 @@
-"""Recordings as `view` has them: all samples of all channels on the disk, with levels of detail, and the
-sections of a part of them, with the filter and the window that are chosen."""
+"""Recordings for `view`: all samples of all channels on disk, with levels of detail, and the sections for a part of
+them, with a chosen filter and window."""
 
 import contextlib
 import dataclasses
@@ -16,15 +16,15 @@ from .sections import Section, number
 from .sections_filtering import filtered
 from .sections_measuring import events
 
-BLOCK = 64  # samples, and blocks, in a block of the next level
+BLOCK = 64  # number of samples, or of blocks, in a block of the next level
 WINDOWS = ("hann", "hamming", "blackman", "blackman_harris", "flattop", "boxcar")
 KINDS = ("none", "lowpass", "highpass", "bandpass", "bandstop")
-MOST = 1 << 22  # samples of which sections are made
+MOST = 1 << 22  # most samples in the sections
 
 
 class Levels:
-    """The samples of a channel in a file, and the lowest and highest of blocks. Filled part by part, as an
-    Envelope is. The file has no name, so its room is free again when the process ends, in whatever way."""
+    """The samples of a channel in a file, and the lowest and highest values of blocks. It is filled part by part,
+    like an Envelope. The file has no name, so its space is freed however the process ends."""
 
     def __init__(self):
         self._file = tempfile.TemporaryFile()
@@ -55,8 +55,8 @@ class Levels:
         self._parts, self._rest = [], np.empty(0)
 
     def seen(self, first, last, most):
-        """From `first` to `last`, in no more than about `most` groups: the first index, the samples in a
-        group, and the lowest and the highest values, or the samples and None."""
+        """The samples from `first` to `last`, in at most about `most` groups: the first index, the number of samples
+        in a group, and the lowest and the highest values, or the samples themselves and None."""
         first, last = max(0, first), min(self.count, last)
         group = max(1, -(-(last - first) // max(1, most)))
         for samples, lows, highs in reversed(self._blocks):
@@ -72,9 +72,9 @@ class Levels:
 
 @dataclasses.dataclass
 class Choices:
-    """What of a recording is analysed, and how."""
+    """Which part of a recording is analysed, and how."""
     channel: int = 0
-    start: float = 0.0  # in the unit of its times
+    start: float = 0.0  # in the unit of the recording's times
     end: float = float("inf")
     window: str = "hann"
     kind: str = "none"
@@ -83,7 +83,7 @@ class Choices:
 
 
 class Opened:
-    """A recording that is shown; read anew when its file has changed."""
+    """A recording that is shown, and read again when its file has changed."""
 
     def __init__(self, path, options):
         self.path, self.options = path, options
@@ -94,7 +94,7 @@ class Opened:
         self.read()
 
     def state(self):
-        """"same", "changed" or "gone", by the file as it is now."""
+        """"same", "changed" or "gone", depending on the file's present state."""
         found = self._status()
         return "same" if found == self._seen else "changed" if found else "gone"
 
@@ -105,7 +105,7 @@ class Opened:
         return None
 
     def read(self):
-        """Reads the file where it is another than before; what was read stays where that fails."""
+        """Reads the file again if it has changed. If that fails, the earlier contents are kept."""
         with self._lock:
             status = self._status()
             if status == self._seen and self.version:
@@ -123,7 +123,7 @@ class Opened:
             read, rate=read.row_rate or read.rate, others=[], whole=None, envelope=None), channels
 
     def plots(self):
-        """The plots of the channels, whose samples are asked for as they are needed."""
+        """The plots of the channels. Their samples are requested as they are needed."""
         for name, unit, levels in self.channels:
             shown = dataclasses.replace(self.recording, channel=name, unit=unit)
             plot = figures.described(sections_recording.over_time(shown, name, curves=[
@@ -131,7 +131,7 @@ class Opened:
             yield {**plot, "count": levels.count}
 
     def data(self, channel, start, end, points):
-        """A part of a channel as the page takes it."""
+        """A part of a channel, in the form that the page takes."""
         levels = self.channels[channel][2]
         rate = self.recording.rate or 1.0
         first, group, lows, highs = levels.seen(int(np.floor(start * rate)), int(np.ceil(end * rate)) + 1, points)
@@ -139,7 +139,7 @@ class Opened:
                 "highs": None if highs is None else figures.numbers(highs)}
 
     def sections(self, choices):
-        """The sections, and those of their plots that go over time where the part is."""
+        """The sections, with their plots over time shifted to the position of the part."""
         name, unit, levels = self.channels[choices.channel]
         rate = self.recording.rate or 1.0
         first = min(max(0, round(choices.start * rate)), levels.count - 1)
@@ -149,20 +149,20 @@ class Opened:
         said = ""
         if last - first > MOST:
             last = first + MOST
-            said = f" The first {MOST} samples of the part."
+            said = f" Only the first {MOST} samples of the part are analysed."
         values = np.array(levels.values[first:last])
         there = np.isfinite(values)
         if there.sum() < 2:
             raise InputError("the part has fewer than two samples")
         part = dataclasses.replace(self.recording, channel=name, unit=unit, values=values[there])
-        known = part  # what statistics are made of; the rest needs even times
+        known = part  # used for the statistics; the other sections need even times
         if not there.all():
             at = np.arange(len(values))
             part = dataclasses.replace(part, values=np.interp(at, at[there], values[there]))
             said += (f" {len(values) - there.sum()} missing values are left out of statistics and histogram, and "
                      "interpolated elsewhere.")
         unit_ = part.time_unit
-        found = [Section("What is analysed", f"{name}: {len(values)} samples from {number(first / rate, 9)} to "
+        found = [Section("Analysed part", f"{name}: {len(values)} samples from {number(first / rate, 9)} to "
                          f"{number((last - 1) / rate, 9)} {unit_}.{said}")]
         if choices.kind != "none":
             section, after = filtered(part, choices.kind, choices.edges, choices.order)

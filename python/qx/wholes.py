@@ -1,5 +1,5 @@
-"""Figures of a recording of any length: what one pass gives is summed up while the file is read; the samples
-go to a temporary file of which further passes take blocks, so the memory does not depend on the length."""
+"""Figures of a recording of any length. Those that need one pass are computed while the file is read. The samples
+are written to a temporary file, which further passes read in blocks, so the memory does not depend on the length."""
 
 import functools
 import tempfile
@@ -11,14 +11,14 @@ from . import spectra, stats
 from .envelopes import Envelope
 
 BLOCK = 1 << 20  # samples in memory at once
-FINE = 120 * 512  # bins of which those of histograms are sums
-SELECTED = 1 << 22  # samples among which a rank is found by sorting
+FINE = 120 * 512  # fine bins, from which those of histograms are summed
+SELECTED = 1 << 22  # most samples among which a rank is found by sorting
 
 
 class Moments:
-    """Count, mean, sums of powers of the differences from it, and extremes, part by part. The first value is taken
-    from all, so that nothing is lost of a small spread far from zero. Parts are joined by the
-    formulas of P. Pébay, "Formulas for robust, one-pass parallel computation of covariances and arbitrary-order
+    """Count, mean, sums of powers of the differences from it, and extremes, computed part by part. The first value is
+    subtracted from all, so that a small spread far from zero is not lost. Parts are combined by the formulas of
+    P. Pébay, "Formulas for robust, one-pass parallel computation of covariances and arbitrary-order
     statistical moments", 2008."""
 
     def __init__(self):
@@ -58,7 +58,7 @@ class Moments:
 
 
 class AveragedSpectrum:
-    """The spectrum of spectra.welch by segments that overlap by half, part by part."""
+    """The spectrum of spectra.welch, with half-overlapped segments, computed part by part."""
 
     def __init__(self, segment, window="hann", scaling="density"):
         self.segment, self.window, self.scaling = segment, window, scaling
@@ -67,7 +67,7 @@ class AveragedSpectrum:
     def add(self, values):
         values = np.concatenate([self._rest, values])
         half = self.segment // 2
-        count = len(values) // half - 1  # segments that are complete
+        count = len(values) // half - 1  # number of complete segments
         if count > 0:
             found = self._welch(values[:(count + 1) * half], 1.0)
             self._sum += found.values * found.segments
@@ -80,7 +80,7 @@ class AveragedSpectrum:
         return spectra.welch(values, rate, self.window, self.segment, self.segment // 2, scaling=self.scaling)
 
     def result(self, rate):
-        """A spectra.Spectrum; there is a segment at least."""
+        """A spectra.Spectrum, of at least one segment."""
         one = self._welch(np.zeros(self.segment), rate)
         mean = self._sum / self._segments
         return spectra.Spectrum(one.frequencies, mean / rate if self.scaling == "density" else mean, one.resolution,
@@ -88,17 +88,17 @@ class AveragedSpectrum:
 
 
 class Whole:
-    """All samples of a file. Of one that is not longer than `kept` samples only the outline is made: whoever
-    analyses it has the samples. Missing ones are gaps of the outline and left out of the figures, or filled in by
-    straight lines, as numpy.interp does it, where `fill` says so. `progress` is called with the number of samples of
-    each block that is read or passed; it does not go with a Whole to another process."""
+    """All samples of a file. For a file of up to `kept` samples, only the outline is made, since its samples are in
+    memory. Missing samples are gaps of the outline and are left out of the figures; with `fill` they are
+    interpolated linearly, as by numpy.interp. `progress` is called with the number of samples of each block that is
+    read or passed; it is not sent to another process with a Whole."""
 
     def __init__(self, kept, outline=Envelope, progress=lambda samples: None, fill=False):
         self.progress, self._fill = progress, fill
-        self.kept, self.rows = kept, 0  # rows of the file, those without a value included
+        self.kept, self.rows = kept, 0  # rows of the file, including those without a value
         self.envelope, self.moments = outline(), Moments()
-        self._waiting = []  # until there are more than are kept
-        self._last, self._gap = None, 0  # the last value, and how many are missing behind it
+        self._waiting = []  # parts that wait until there are more samples than are kept
+        self._last, self._gap = None, 0  # the last value, and the number of missing values after it
         self._file: Any = None
 
     def add(self, values):
@@ -119,14 +119,14 @@ class Whole:
     def _take(self, values):
         self.envelope.add(values)
         self._waiting.append(values)
-        if self.rows > self.kept and isinstance(self.envelope, Envelope):  # others keep all samples themselves
+        if self.rows > self.kept and isinstance(self.envelope, Envelope):  # other outlines keep all samples themselves
             for part in self._waiting:
                 self._sum_up(part)
             self._waiting = []
 
     @property
     def count(self):
-        """How many samples the figures have."""
+        """The number of samples in the figures."""
         return self.moments.count
 
     def _sum_up(self, values):
@@ -142,7 +142,8 @@ class Whole:
         return {**self.__dict__, "progress": None, "_waiting": []}
 
     def _filled(self, values):
-        """The values without gaps, those of a gap that the part before ends with first; a gap at the end waits."""
+        """The values without gaps, starting with those for a gap at the end of the previous part. A gap at the end
+        of this part waits for the next one."""
         at, before = np.flatnonzero(~np.isnan(values)), self._gap
         if len(at) == len(values) and not before:
             self._last = values[-1]
@@ -158,12 +159,12 @@ class Whole:
         return np.interp(ends, at, known)
 
     def part(self, first, count):
-        """Samples from one on, fewer at the end."""
+        """`count` samples from `first` on; fewer at the end."""
         self._file.seek(8 * first)
         return np.fromfile(self._file, float, min(count, self.count - first))
 
     def parts(self, hop=None, length=None):
-        """Blocks that begin `hop` samples apart, and are longer where `length` says so."""
+        """Blocks that start `hop` samples apart; `length` can make them longer."""
         hop = hop or BLOCK
         for first in range(0, self.count, hop):
             found = self.part(first, length or hop)
@@ -179,7 +180,7 @@ class Whole:
         return counts
 
     def histogram(self, bins):
-        """The counts of equal bins between the extremes, 120 of them or a divisor of that, and their centres."""
+        """The counts and centres of equal bins between the extremes; `bins` is 120 or a divisor of it."""
         low, high = self.moments.least, self.moments.greatest
         return (self._counts.reshape(bins, -1).sum(1), low + (np.arange(bins) + 0.5) * ((high - low) / bins))
 
@@ -189,7 +190,7 @@ class Whole:
         return upper if self.count % 2 else (upper + self._of_rank(self.count // 2 - 1)) / 2
 
     def _of_rank(self, rank):
-        """The sample that `rank` others are not above."""
+        """The sample of the given rank in ascending order."""
         low, high, counts = self.moments.least, self.moments.greatest, self._counts
         while low < high:
             below = np.cumsum(counts)
@@ -221,7 +222,7 @@ class Whole:
 
 
 def _places(values, low, high):
-    """The bins of values, of FINE between two limits; the last one has the upper limit."""
+    """The bins of values, out of FINE bins between two limits; the last bin includes the upper limit."""
     if not low < high:
         return np.full(len(values), FINE - 1)
     return np.minimum((values - low) * (FINE / (high - low)), FINE - 1).astype(np.int64)

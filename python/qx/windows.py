@@ -1,9 +1,9 @@
-r"""Windows, by functions of their names or by words.
+r"""Windows, as one function for each or by name.
 
-A window of n values is symmetric, :math:`w_i = w_{n-1-i}`, for filters, or periodic,
-:math:`w_i = w_{n-i}`, for spectra: then it is the first n values of the symmetric one of n + 1. The
-functions give the symmetric form by default, as those of `scipy.signal.windows` and of NumPy;
-`get` and `apply`, which spectra use, the periodic one.
+A window of n values is either symmetric, :math:`w_i = w_{n-1-i}`, for filters, or periodic,
+:math:`w_i = w_{n-i}`, for spectra. The periodic form is the first n values of the symmetric window of
+n + 1 values. The functions return the symmetric form by default, as those of `scipy.signal.windows` and of
+NumPy do; `get` and `apply`, which the spectra use, return the periodic one.
 
 F. J. Harris, "On the use of windows for harmonic analysis with the discrete Fourier transform", 1978,
 defines most of them.
@@ -40,15 +40,15 @@ ONE_FORM = ("force", "exponential")  # neither symmetric nor periodic
 
 
 def _described(window: Any) -> Any:
-    """The name of a window that is given by a word, or by a word with a parameter, and the parameter."""
+    """The name and the parameter of a window that is given by a word, or by a word and a parameter."""
     word, *parameters = window if isinstance(window, tuple) else (window,)
     name = chosen("windows.get", "window", word, WORDS)
     if name in PLAIN:
         if parameters:
-            refuse("windows.get", "window", f"{name} has no parameter; {parameters} came")
+            refuse("windows.get", "window", f"{name} takes no parameter; got {parameters}")
         return name, 0.0
     if not parameters and name not in DEFAULTS or len(parameters) > 1:
-        refuse("windows.get", "window", f"{name} has one parameter: give ({name!r}, value)")
+        refuse("windows.get", "window", f"{name} takes one parameter: pass ({name!r}, value)")
     return name, float(parameters[0] if parameters else DEFAULTS[name])
 
 
@@ -56,14 +56,14 @@ def _windowed(call: Any, x: Any, name: Any, parameter: Any, symmetric: Any) -> A
     """x times a window."""
     n = len(x)
     code = PLAIN.get(name, WITH_PARAMETER.get(name))
-    if name == "tukey":  # the export has it in symmetric form; whole, it is the periodic Hanning window
+    if name == "tukey":  # the export has the symmetric form; fully tapered, it is the periodic Hann window
         if parameter >= 1:
             code = 1
         elif not symmetric:
             return x * _windowed(core.get, np.ones(n + 1), name, parameter, True)[:n]
         else:
             symmetric = False
-    elif name == "gaussian":  # the export counts in lengths
+    elif name == "gaussian":  # the export takes the deviation in units of the length
         parameter /= n if symmetric else n + 1
     return call(x, code, parameter, 0, int(symmetric and name not in ONE_FORM))
 
@@ -74,12 +74,12 @@ def get(window: str | tuple[Any, ...] | ArrayLike, n: int, symmetric: bool = Fal
     Parameters
     ----------
     window : str, tuple or array_like
-        The name of a function of this module, for those with a parameter as a tuple, such as
+        The name of a function of this module; a tuple for windows with a parameter, such as
         ``("kaiser", 8.6)``; or n values, which are returned.
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -88,7 +88,7 @@ def get(window: str | tuple[Any, ...] | ArrayLike, n: int, symmetric: bool = Fal
     Raises
     ------
     ValueError
-        If n is below 1, window is none of its words, or as many values as n were not given.
+        If n is below 1, the name is unknown, or the number of values given is not n.
 
     Examples
     --------
@@ -100,35 +100,35 @@ def get(window: str | tuple[Any, ...] | ArrayLike, n: int, symmetric: bool = Fal
     if not isinstance(window, (str, tuple)):
         values = vector(window, "windows.get", "window").astype(float)
         if len(values) != n:
-            refuse("windows.get", "window", f"{n} values are needed; {len(values)} came", "ErrSizesDisagree")
+            refuse("windows.get", "window", f"{n} values are needed; got {len(values)}", "ErrSizesDisagree")
         return values
     name, parameter = _described(window)
     return _windowed(core.get, np.ones(n), name, parameter, symmetric)
 
 
 def apply(x: ArrayLike, window: str | tuple[Any, ...], axis: int = LAST, symmetric: bool = False) -> Any:
-    """Values times a window.
+    """The values multiplied by a window.
 
     Parameters
     ----------
     x : array_like
         Real or complex values.
     window : str or tuple
-        As of `get`.
+        As for `get`.
     axis : int
-        The axis along which the window goes.
+        The axis along which the window is applied.
     symmetric : bool
-        The symmetric form in place of the periodic one.
+        Whether to use the symmetric form rather than the periodic one.
 
     Returns
     -------
-    ndarray, or what x is of pandas
-        Of the shape of x.
+    ndarray, or the pandas type of x
+        The same shape as x.
 
     Raises
     ------
     ValueError
-        If x is empty, or window is none of its words.
+        If x is empty, or the name is unknown.
 
     Examples
     --------
@@ -144,7 +144,7 @@ def apply(x: ArrayLike, window: str | tuple[Any, ...], axis: int = LAST, symmetr
 
 @result
 class Constants(Result):
-    """What a window does to noise and tones.
+    """The effect of a window on noise and tones.
 
     Attributes
     ----------
@@ -167,9 +167,9 @@ def constants(window: str | tuple[Any, ...] | ArrayLike, n: int = 1024) -> Const
     Parameters
     ----------
     window : str, tuple or array_like
-        As of `get`; or the values of a window.
+        As for `get`; or the values of a window.
     n : int
-        How many values a window has that is given by its name.
+        Number of values of a window that is given by its name.
 
     Returns
     -------
@@ -178,7 +178,7 @@ def constants(window: str | tuple[Any, ...] | ArrayLike, n: int = 1024) -> Const
     Raises
     ------
     ValueError
-        If the window is empty or none of the words.
+        If the window is empty, or the name is unknown.
 
     Examples
     --------
@@ -195,20 +195,20 @@ def constants(window: str | tuple[Any, ...] | ArrayLike, n: int = 1024) -> Const
 
 
 def cosine_sum(n: int, coefficients: ArrayLike, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window as a sum of cosines of one's own.
+    r"""A window as a sum of cosines with given coefficients.
 
     .. math:: w_i = \sum_k (-1)^k a_k \cos\frac{2\pi k i}{n - 1}
 
-    and over n in the periodic form.
+    with n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     coefficients : array_like
         The coefficients :math:`a_k`.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -217,7 +217,7 @@ def cosine_sum(n: int, coefficients: ArrayLike, symmetric: bool = True) -> NDArr
     Raises
     ------
     ValueError
-        If n is below 1, or there is no coefficient.
+        If n is below 1, or there are no coefficients.
 
     Examples
     --------
@@ -233,16 +233,16 @@ def cosine_sum(n: int, coefficients: ArrayLike, symmetric: bool = True) -> NDArr
 
 
 def boxcar(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: the rectangle: all ones.
+    r"""The rectangular window: all ones.
 
     .. math:: w_i = 1
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -263,18 +263,18 @@ def boxcar(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def hann(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: the raised cosine.
+    r"""The Hann window: the raised cosine.
 
     .. math:: w_i = \frac12 - \frac12 \cos\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -295,18 +295,18 @@ def hann(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def hamming(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: the raised cosine on a pedestal, with a low first side lobe.
+    r"""The Hamming window: the raised cosine on a pedestal, with a low first side lobe.
 
     .. math:: w_i = 0.54 - 0.46 \cos\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -327,18 +327,18 @@ def hamming(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def blackman(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: three terms.
+    r"""The Blackman window: a cosine sum of three terms.
 
     .. math:: w_i = 0.42 - 0.5 \cos\theta_i + 0.08 \cos 2\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -359,18 +359,18 @@ def blackman(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def blackman_exact(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: three terms, with zeros on the third and fourth side lobe.
+    r"""The exact Blackman window: a cosine sum of three terms, with zeros at the third and fourth side lobes.
 
     .. math:: w_i = \tfrac{7938}{18608} - \tfrac{9240}{18608} \cos\theta_i + \tfrac{1430}{18608} \cos 2\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -391,18 +391,18 @@ def blackman_exact(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def blackman_harris3(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: three terms, side lobes 67 dB down.
+    r"""The Blackman-Harris window of three terms, with side lobes 67 dB down.
 
     .. math:: w_i = 0.42323 - 0.49755 \cos\theta_i + 0.07922 \cos 2\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -423,18 +423,18 @@ def blackman_harris3(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def blackman_harris(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: four terms, side lobes 92 dB down.
+    r"""The Blackman-Harris window of four terms, with side lobes 92 dB down.
 
     .. math:: w_i = 0.35875 - 0.48829 \cos\theta_i + 0.14128 \cos 2\theta_i - 0.01168 \cos 3\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -455,18 +455,18 @@ def blackman_harris(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def blackman_harris7(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: seven terms, side lobes more than 160 dB down.
+    r"""The Blackman-Harris window of seven terms, with side lobes more than 160 dB down.
 
     .. math:: w_i = \sum_{k=0}^{6} (-1)^k a_k \cos k\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -487,18 +487,18 @@ def blackman_harris7(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def blackman_nuttall(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: four terms, side lobes 98 dB down.
+    r"""The Blackman-Nuttall window: a cosine sum of four terms, with side lobes 98 dB down.
 
     .. math:: w_i = 0.3635819 - 0.4891775 \cos\theta_i + 0.1365995 \cos 2\theta_i - 0.0106411 \cos 3\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -519,18 +519,18 @@ def blackman_nuttall(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def flattop(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: five terms with a flat top: the amplitude of a tone between bins is read right.
+    r"""The flat-top window: a cosine sum of five terms. The amplitude of a tone between bins is read correctly.
 
     .. math:: w_i = \sum_{k=0}^{4} (-1)^k a_k \cos k\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -551,18 +551,18 @@ def flattop(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def low_sidelobe(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: five terms with low side lobes.
+    r"""A cosine sum of five terms with low side lobes.
 
     .. math:: w_i = \sum_{k=0}^{4} (-1)^k a_k \cos k\theta_i
 
-    with :math:`\theta_i = 2\pi i / (n-1)`, over n in the periodic form.
+    with :math:`\theta_i = 2\pi i / (n-1)`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -583,18 +583,18 @@ def low_sidelobe(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def triangle(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: the triangle with zeros at the ends (Bartlett).
+    r"""The triangular window with zeros at the ends (Bartlett).
 
     .. math:: w_i = 1 - |u_i|
 
-    with :math:`u_i = 2i / (n-1) - 1`, over n in the periodic form.
+    with :math:`u_i = 2i / (n-1) - 1`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -615,18 +615,18 @@ def triangle(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def bartlett_hann(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: triangle and cosine.
+    r"""The Bartlett-Hann window: a triangle plus a cosine.
 
     .. math:: w_i = 0.62 - 0.24 |u_i| + 0.38 \cos \pi u_i
 
-    with :math:`u_i = 2i / (n-1) - 1`, over n in the periodic form.
+    with :math:`u_i = 2i / (n-1) - 1`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -647,18 +647,18 @@ def bartlett_hann(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def bohman(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: two half cosines, convolved.
+    r"""The Bohman window: two half cosines, convolved.
 
     .. math:: w_i = (1 - |u_i|) \cos \pi |u_i| + \tfrac1\pi \sin \pi |u_i|
 
-    with :math:`u_i = 2i / (n-1) - 1`, over n in the periodic form.
+    with :math:`u_i = 2i / (n-1) - 1`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -679,18 +679,18 @@ def bohman(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def parzen(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: a cubic spline.
+    r"""The Parzen window: a cubic spline.
 
     .. math:: w_i = 1 - 6 u_i^2 + 6 |u_i|^3\ (|u_i| \le \tfrac12),\quad 2 (1 - |u_i|)^3
 
-    with :math:`u_i = 2i / (n-1) - 1`, over n in the periodic form.
+    with :math:`u_i = 2i / (n-1) - 1`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -711,18 +711,18 @@ def parzen(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def welch(n: int, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: the parabola.
+    r"""The Welch window: a parabola.
 
     .. math:: w_i = 1 - u_i^2
 
-    with :math:`u_i = 2i / (n-1) - 1`, over n in the periodic form.
+    with :math:`u_i = 2i / (n-1) - 1`, or n in place of n - 1 in the periodic form.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -743,22 +743,22 @@ def welch(n: int, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def kaiser(n: int, beta: float, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""The window of Kaiser, near the best energy in the main lobe.
+    r"""The Kaiser window, whose main lobe holds nearly the largest possible part of the energy.
 
     .. math:: w_i = \frac{I_0(\beta \sqrt{1 - u_i^2})}{I_0(\beta)}
 
-    with :math:`u_i = 2i / (n-1) - 1`, over n in the periodic form.
+    with :math:`u_i = 2i / (n-1) - 1`, or n in place of n - 1 in the periodic form.
 
     The Bessel series has 25 terms: the window is off by 6e-10 at beta 20 and by 3e-5 at 30.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     beta : float
-        How high the main lobe is: 0 gives a rectangle, 8.6 side lobes 70 dB down.
+        The shape: 0 gives a rectangle, 8.6 gives side lobes 70 dB down.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -779,16 +779,16 @@ def kaiser(n: int, beta: float, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def chebyshev(n: int, attenuation: float = 60.0, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""The window of Dolph and Chebyshev, with the narrowest main lobe for side lobes that are down by as much.
+    r"""The Dolph-Chebyshev window, which has the narrowest main lobe for a given level of the side lobes.
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     attenuation : float
         How far all side lobes are down, in dB.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -809,18 +809,18 @@ def chebyshev(n: int, attenuation: float = 60.0, symmetric: bool = True) -> NDAr
 
 
 def gaussian(n: int, std: float, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: the bell curve.
+    r"""The Gaussian window.
 
     .. math:: w_i = e^{-(i - (n-1)/2)^2 / (2 \sigma^2)}
 
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     std : float
         The standard deviation in samples.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -841,7 +841,7 @@ def gaussian(n: int, std: float, symmetric: bool = True) -> NDArray[np.float64]:
 
 
 def tukey(n: int, alpha: float = 0.5, symmetric: bool = True) -> NDArray[np.float64]:
-    r"""A window: a rectangle with cosine tapers at both ends.
+    r"""The Tukey window: a rectangle with cosine tapers at both ends.
 
     .. math:: w_i = \sin^2\frac{\pi i}{2m},\quad m = \lfloor \alpha n / 2 \rfloor
 
@@ -850,11 +850,11 @@ def tukey(n: int, alpha: float = 0.5, symmetric: bool = True) -> NDArray[np.floa
     Parameters
     ----------
     n : int
-        How many values.
+        Number of values.
     alpha : float
-        The part of the values that is tapered: 0 gives a rectangle, 1 a Hann window.
+        The fraction of the values that is tapered: 0 gives a rectangle, 1 a Hann window.
     symmetric : bool
-        The symmetric form, for filters, in place of the periodic one, for spectra.
+        Whether to return the symmetric form, for filters, rather than the periodic one, for spectra.
 
     Returns
     -------
@@ -875,14 +875,14 @@ def tukey(n: int, alpha: float = 0.5, symmetric: bool = True) -> NDArray[np.floa
 
 
 def force(n: int, percent: float = 50.0) -> NDArray[np.float64]:
-    """A window: ones at the beginning, zeros behind: for the force of a hammer.
+    """The force window: ones followed by zeros, for the force of an impact hammer.
 
     Parameters
     ----------
     n : int
-        How many values, at least 2.
+        Number of values, at least 2.
     percent : float
-        Per cent of the values that are kept.
+        The percentage of values that are 1.
 
     Returns
     -------
@@ -903,12 +903,12 @@ def force(n: int, percent: float = 50.0) -> NDArray[np.float64]:
 
 
 def exponential(n: int, final: float = 0.1) -> NDArray[np.float64]:
-    """A window: an exponential from 1 at the first value to `final` at the last: for vibrations that die away.
+    """The exponential window, from 1 at the first value to `final` at the last, for decaying vibrations.
 
     Parameters
     ----------
     n : int
-        How many values, at least 2.
+        Number of values, at least 2.
     final : float
         The last value, above 0.
 

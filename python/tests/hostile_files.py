@@ -1,10 +1,10 @@
-"""Recordings of every kind that is read, spoilt at random, and what becomes of them.
+"""Reads recordings of every supported kind that are corrupted at random, and reports what happens.
 
     hostile_files.py [--each 10000] [--seed 0] [--keep FOLDER] [KIND...]
 
-A line for each kind: how many files were read and refused, how many refusals came from a limit or a crash of a
-library, the longest time and the largest memory; then every failure that is no refusal of one line, which is a fault
-of ours. The test beside it (test_hostile.py) takes a few of each kind.
+It prints a line for each kind: how many files were read and refused, how many refusals came from a limit or a crash
+of a library, the longest time and the largest memory. Then it prints every failure that is not a refusal in one line,
+which is a fault of this package. The test beside it (test_hostile.py) uses a few files of each kind.
 """
 
 import argparse
@@ -119,7 +119,7 @@ def numpys(save, *arrays, **more):
 
 
 TABLE = np.rec.fromarrays([RAMP, RAMP.astype("<i2")], names="a,b")
-# By kind: the ending, the module that reading needs, and what makes a file.
+# By kind: the extension, the module that reading needs, and the function that makes a file.
 KINDS = {
     "text": ("csv", "pandas", lambda: TEXT),
     "dates": ("csv", "pandas", lambda: DATED),
@@ -151,7 +151,7 @@ KINDS = {
 
 
 def rezipped(rng, content):
-    """The archive with one of its files spoilt, and its sums right."""
+    """The archive with one of its files corrupted, and with correct checksums."""
     out = io.BytesIO()
     with zipfile.ZipFile(io.BytesIO(content)) as old, zipfile.ZipFile(out, "w", zipfile.ZIP_DEFLATED) as new:
         names = old.namelist()
@@ -197,7 +197,7 @@ def spoilt(rng, content):
 
 
 def memory(process):
-    """The largest memory that a process has had, in bytes."""
+    """The largest memory that a process has used, in bytes."""
     with contextlib.suppress(OSError), open(f"/proc/{process.pid}/status") as file:
         found = re.search(r"VmHWM:\s*(\d+)", file.read())
         return int(found[1]) << 10 if found else 0
@@ -218,7 +218,7 @@ class Tally:
             self.counts["refused"] += 1
             text = str(error)
             if end := re.search(r"crashed \(\w+\)|takes more than .* of (?:processor time|memory)|has done nothing|"
-                                r"was ended", text):
+                                r"was terminated", text):
                 self.ends[re.sub(r"\d+", "n", end[0])] += 1
             if not text.startswith(str(path)) or "\n" in text:
                 self.faults.append(f"no line of ours: {text!r}")
@@ -235,7 +235,7 @@ class Tally:
 
 
 def attack(kind, count, seed, folder, keep=None):
-    """The Tally of a kind; None where its files cannot be made or read here."""
+    """The Tally of a kind; None if its files cannot be made or read here."""
     ending, module, make = KINDS[kind]
     if importlib.util.find_spec(module) is None:
         return None
@@ -245,7 +245,7 @@ def attack(kind, count, seed, folder, keep=None):
     rng, tally = random.Random(f"{kind} {seed}"), Tally(kind)
     path = folder / f"spoilt.{ending}"
     path.write_bytes(content)
-    recording.read(path)  # what is not spoilt is read
+    recording.read(path)  # the intact file can be read
     for i in range(count):
         path.write_bytes(data := spoilt(rng, content))
         faults, ends = len(tally.faults), tally.ends.total()

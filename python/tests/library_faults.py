@@ -1,4 +1,4 @@
-"""What a library may do over a hostile file: functions for the workers of qx/isolation.py."""
+"""What a library may do while reading a hostile file: functions for the workers of qx/isolation.py."""
 
 import ctypes
 import os
@@ -31,7 +31,7 @@ def takes(tell, path, file, size):
 
 
 def crashes_later(tell, path, file):
-    """Dies where the worker has read another file before."""
+    """Dies if the worker has read another file before."""
     if os.environ.get("QX_TEST_READ"):
         os.abort()
     os.environ["QX_TEST_READ"] = "yes"

@@ -73,10 +73,10 @@ class Arrays(unittest.TestCase):
         for other in (whole[1:], whole[:-1], whole[::-1], whole.copy(), whole.astype(np.float32)):
             self.assertIsNot(kind.given(other, "x"), whole.base)
         self.assertIsNot(kind.given(whole, "x", reuse=False), whole.base)
-        # A square turned about its diagonal has the shape and the address of its block, too.
+        # A transposed square matrix also has the shape and the address of its block.
         square = qx.DCT_2DH(np.arange(10_000.0).reshape(100, 100), 0, 0)
         self.assertIsNot(arrays.kind("DBL", 2).given(square.T, "x"), square.base)
-        square.shape = (50, 200)  # in place: no longer what the block says
+        square.shape = (50, 200)  # in place: no longer the shape of the block
         self.assertIsNot(arrays.kind("DBL", 2).given(square, "x"), square.base)
         square.shape = (100, 100)
         np.testing.assert_allclose(qx.InvDCT_2DH(square.T), np.arange(10_000.0).reshape(100, 100).T,
@@ -95,7 +95,7 @@ class Arrays(unittest.TestCase):
             self.assertEqual(caught.exception.results["out"].size, 0)
         self.assertEqual(qx.CxConvolution([1j, 2], [3], 0, 0, 0).tolist(), [3j, 6])
         with self.assertRaises(qx.QxError) as caught:
-            qx.CxConvolution([], [3], 0, 0, 0)  # which leaves its output alone
+            qx.CxConvolution([], [3], 0, 0, 0)  # which does not change its output
         self.assertEqual(caught.exception.results["out"].size, 0)
         kept = arrays.kind("DBL", 1).kept
         for n in range(1, 3 * arrays.KEPT_SHAPES):
@@ -105,7 +105,7 @@ class Arrays(unittest.TestCase):
 
     def test_records_with_arrays_in_them(self):
         lower = np.array([[2.0, 0, 0], [1, 3, 0], [4, 5, 6]])
-        columns = np.triu_indices(3)  # of the transposed, which are packed by columns
+        columns = np.triu_indices(3)  # of the transposed matrix, since the packing is by columns
         packed = {"packed": lower.T[columns], "triangle": 0}
         right = np.array([2.0, 4.0, 3.0])
         np.testing.assert_array_equal(qx.Compact_to_Matrix_head(packed), lower)
@@ -117,8 +117,8 @@ class Arrays(unittest.TestCase):
         for given, error, reason in (
                 ({"paked": [1.0]}, ValueError, "TriLinEqs_head: a: PackedTriangle has no field 'paked'"),
                 ({"packed": [1j]}, TypeError, r"a\.packed: elements of float64"),
-                ({"triangle": "low"}, TypeError, r"a\.triangle: a whole number is needed; 'low'"),
-                (3, TypeError, "a dictionary with fields of PackedTriangle is needed; 3"),
+                ({"triangle": "low"}, TypeError, r"a\.triangle: a whole number is needed; got 'low'"),
+                (3, TypeError, "a dictionary with fields of PackedTriangle is needed; got 3"),
                 ([], TypeError, "a dictionary with fields of PackedTriangle is needed")):
             self.assertRaisesRegex(error, reason, qx.TriLinEqs_head, given, right)
         for given in (3.0, [3.0], [(0.0, 1.0)], [(0.0, 1.0, 2), 5], np.array([3.0])):
@@ -128,17 +128,17 @@ class Arrays(unittest.TestCase):
         masked = np.ma.array([1.0, 2.0], mask=[False, True])
         for name, values, error, reason in (
                 ("Mean_head", [[[1.0]]], ValueError, "Mean_head: x: an array of 1 dimension"),
-                ("Mean_head", [3.0], ValueError, "1 dimension is needed; '3.0'"),
-                ("Mean_head", [[1j]], TypeError, "elements of float64 are needed; complex128 came"),
+                ("Mean_head", [3.0], ValueError, "1 dimension is needed; got '3.0'"),
+                ("Mean_head", [[1j]], TypeError, "elements of float64 are needed; got complex128"),
                 ("Mean_head", [["a"]], TypeError, "elements of float64 are needed"),
                 ("Mean_head", [masked], ValueError, "Mean_head: x: 1 elements are masked"),
-                ("Moment_head", [[1.0], 1.5], TypeError, "order: a whole number is needed; 1.5"),
-                ("Moment_head", [[1.0], "2"], TypeError, r"whole number is needed; '2' \(str\)"),
+                ("Moment_head", [[1.0], 1.5], TypeError, "order: a whole number is needed; got 1.5"),
+                ("Moment_head", [[1.0], "2"], TypeError, r"whole number is needed; got '2' \(str\)"),
                 ("Moment_head", [[1.0], 2**31], ValueError, "Moment_head: order: .* outside"),
                 ("Contingency_head", [[[1, 2], [3, 2**31]]], ValueError, "outside"),
                 ("Mean_head", [np.broadcast_to(0.0, 2**31)], ValueError, "more than an array"),
-                ("AllWinH", [[1.0], 1, "0.5", 0, 0], TypeError, "number is needed; '0.5'"),
-                ("AllWinH", [[1.0], 1, [0.5], 0, 0], TypeError, "number is needed; \\[0.5"),
+                ("AllWinH", [[1.0], 1, "0.5", 0, 0], TypeError, "number is needed; got '0.5'"),
+                ("AllWinH", [[1.0], 1, [0.5], 0, 0], TypeError, "number is needed; got \\[0.5"),
                 ("NormDist_head", ["a"], TypeError, "NormDist_head: x: a number is needed"),
                 ("Moment_head", [[1.0]], TypeError, r"Moment_head\(\) missing .* argument: 'order'"),
                 ("Moment_hed", [[1.0], 2], LookupError, "did you mean Moment_head")):
@@ -151,7 +151,7 @@ class Arrays(unittest.TestCase):
         self.assertTrue(plan)
         self.assertFalse(qx.create_oxfft_table(0))
         qx.destroy_oxfft_table(plan)
-        self.assertRaisesRegex(ValueError, "given back before", qx.destroy_oxfft_table, plan)
+        self.assertRaisesRegex(ValueError, "already been given back", qx.destroy_oxfft_table, plan)
         for wrong in (12345, 0.5, "x", object()):
             self.assertRaisesRegex(TypeError, "from an export", qx.destroy_oxfft_table, wrong)
         self.assertRaisesRegex(TypeError, "from an export", qx.SetQXRTModule, 4096, 0)
@@ -168,7 +168,7 @@ class Outcomes(unittest.TestCase):
         self.assertIn(error.text, str(error))
         self.assertTrue(np.isnan(error.results["mean"]))
         with self.assertRaises(qx.QxError) as caught:
-            qx.call("CxRMS_head", [])  # this one returns its code
+            qx.call("CxRMS_head", [])  # this export returns its code
         self.assertEqual(caught.exception.code, -20003)
         with self.assertWarns(qx.QxWarning) as caught:
             self.assertEqual(qx.call("MSE_head", [1.0, 2.0], [1.0]), 0.0)
@@ -313,7 +313,7 @@ class Plans(unittest.TestCase):
         before = h.copy()
         first = qx.call("InvReOXFFTHCH", h)
         np.testing.assert_array_equal(h, before)
-        view = qx.call("DCT_1DH", h, 0)  # a view of a block that an input would take as it is
+        view = qx.call("DCT_1DH", h, 0)  # a view of a block that would be passed as an input without a copy
         before = view.copy()
         qx.call("SpectrumH", view)
         np.testing.assert_array_equal(view, before)
@@ -342,7 +342,7 @@ class Scalars(unittest.TestCase):
         by_shape = {shape: x.reshape(shape) for shape in ((12,), (3, 4), (1, 1, 12))}
         for values in (*by_shape.values(), x[::-1], x[::2], x.astype(np.float32), x.astype(">f8")):
             expected = [qx.QX_BesselJr(0.5, float(v)) for v in values.ravel()]
-            for _ in range(2):  # the second call has the memory of the first
+            for _ in range(2):  # the second call uses the memory of the first
                 found = qx.QX_BesselJr(0.5, values)
                 self.assertEqual(found.tolist(), np.reshape(expected, values.shape).tolist())
         first = qx.QX_BesselJr(0.5, x)
@@ -392,10 +392,10 @@ class Scalars(unittest.TestCase):
 
 
 class Selectors(unittest.TestCase):
-    """Arguments that take few values, which the headers tell."""
+    """Arguments that take a few values, which the headers list."""
 
     REFUSED = {"ErrInvalidSelector", "ErrMeasureTooManyChannels"}
-    NOT_REFUSED = {"Rxy80: algorithm", "RampPtrn85: scale"}  # by the code, which takes them for others
+    NOT_REFUSED = {"Rxy80: algorithm", "RampPtrn85: scale"}  # by the code, which treats them like other values
     GIVEN = {"fs": 8.0, "fl": 1.0, "fh": 2.0, "hist": {"method": 2, "bins": 10}, "iterations": 9,
              "request": {"width": 3, "data": np.arange(8.0)}, "bins": 10, "tolerance": 1e-3,
              "pulseNumber": 1, "number": 1, "cycleNumber": 1, "scaled": 0, "symmetric": 0, "n": 8,
@@ -415,7 +415,7 @@ class Selectors(unittest.TestCase):
         return {} if argument["kind"] == "record" else 1
 
     def names_of_codes(self, entry, argument):
-        """What the export says to values of the argument, past the check of the package."""
+        """The export's answers to values of the argument, without the check of the package."""
         plain, given = copy.deepcopy(entry), {}
         for other in plain["arguments"]:
             values = dict(other.pop("values", {}))
@@ -455,16 +455,16 @@ class Selectors(unittest.TestCase):
                 (lambda: qx.StateLevels(x, 0, 1, 9, 9, 0), "method: 9 .*; 1 minimum and maximum; 2 the histogram"),
                 (lambda: qx.NumerIntegration2D_2017_head(np.eye(9), x, 4), "0; 1; 2; 3$")):
             self.assertRaisesRegex(ValueError, reason, call)
-        hist = {"method": 9, "bins": 9}  # a field, which only the code refuses
+        hist = {"method": 9, "bins": 9}  # a field, which only the code checks
         with self.assertRaisesRegex(qx.QxError, "method of the measurement is unknown.*unknown method"):
             qx.PulseMeasEx([0.0, 1, 1, 0, 1], 0, 1, 1, 1, 1, {"high": 90, "mid": 50, "low": 10, "percent": 1}, hist, 0)
-        self.assertRaisesRegex(TypeError, "algorithm: a whole number is needed; 0.5", qx.Rxy80, x, x, 0.5, 0)
+        self.assertRaisesRegex(TypeError, "algorithm: a whole number is needed; got 0.5", qx.Rxy80, x, x, 0.5, 0)
         np.testing.assert_allclose(qx.Rxy80(x, x, np.int64(1), 0.0), qx.Rxy80(x, x, 0, 0))
 
     def test_every_one_that_a_code_refuses_is_told(self):
         silent = {name for name, entry in library().entries.items() if "ErrInvalidSelector" in entry["codes"]
                   and not any("values" in argument for argument in entry["arguments"])}
-        # Fields of records and amounts; others are those of a twin that has the argument.
+        # Fields of records and amounts; the others are arguments of a twin export.
         self.assertEqual(silent, {"QZ_head", "CxQZ_head", "TriLinEqs_head", "CxTriLinEqs_head",
                                   "Tri_InvMatrix_head", "CxTri_InvMatrix_head", "CoordRotationEuler_head",
                                   "Euler2Direction_head", "Sylvester_head", "CxSylvester_head",
@@ -504,10 +504,10 @@ class Functions(unittest.TestCase):
         self.assertIn("width (int32_t): samples of a window, from 3\n", qx.PeakD.__doc__)
         self.assertNotIn("fitMatrix", qx.PeakD.__doc__, "no field for callers")
         self.assertRegex(qx.PeakD.__doc__, r"QXPeakFlags\. The bits.*\n    1 starts .*\n    4 scans the last window")
-        self.assertRegex(qx.StateLevels.__doc__, r"QXLevelMethod\. How .*\n(    .*\n)+    2 the histogram where")
+        self.assertRegex(qx.StateLevels.__doc__, r"QXLevelMethod\. How .*\n(    .*\n)+    2 the histogram if")
 
     def test_a_star_that_begins_a_line_is_kept(self):
-        self.assertIn("The code is in\n*err;", qx.IIR_Filter2.__doc__)
+        self.assertIn("The code is in\n*err and is", qx.PeriodNoise.__doc__)
 
     def test_the_version_is_the_projects(self):
         project = (PYTHON.parent / "CMakeLists.txt").read_text("utf-8")
@@ -530,7 +530,7 @@ class Functions(unittest.TestCase):
         self.assertRaisesRegex(AttributeError, "did you mean .*Mean_head", getattr, qx, "mean_hed")
 
     def test_a_call_does_no_work_that_it_does_not_need(self):
-        """Counts the lines of Python that run, which is what a call costs beside the export."""
+        """Counts the lines of Python that run, which are the cost of a call besides the export."""
         for name, arguments, most in (("Mean_head", (np.ones(10),), 30),
                                       ("ReOXFFTH80", (np.ones(10), 0, 10, 0), 60)):
             function = getattr(qx, name)

@@ -1,4 +1,4 @@
-"""What all commands have in common: examples that run, files that are not replaced, Ctrl-C."""
+"""What all commands share: examples that run, files that are not replaced, Ctrl-C."""
 
 import argparse
 import contextlib
@@ -26,7 +26,7 @@ from qx import outputs  # noqa: E402
 
 
 def commands():
-    """The parsers by the names of their commands."""
+    """The parsers by the names of the commands."""
     actions = command.parser()._actions
     return next(a.choices for a in actions if isinstance(a, argparse._SubParsersAction))
 
@@ -47,7 +47,7 @@ class InAFolder(unittest.TestCase):
 
 
 async def served(opened, port, ready):
-    """In place of the server of `view`, which would go on."""
+    """Replaces the server of `view`, which would not end."""
     ready(f"http://127.0.0.1:{port}/")
 
 
@@ -70,7 +70,7 @@ class Examples(InAFolder):
 
 
 ECG = "examples/data/ecg_208_360hz.csv"
-WRITING = (  # arguments, what is written, whether the command replaces what it wrote itself
+WRITING = (  # arguments, the file that is written, whether the command replaces a file of its own
     (("report", ECG), "out/report.html", True),
     (("report", "many", "--workers", "1", "--output", "pages"), "pages/index.html", True),
     (("design", "bessel", "lowpass", "0.1"), "out/design.json", True),
@@ -106,7 +106,7 @@ class Outputs(InAFolder):
                 self.assertNotEqual(path.read_bytes(), b"mine")
                 self.assertEqual(self.run_command(*arguments)[0], 0 if own else 2)
         self.assertFalse([*Path().rglob("*.part*")])
-        for name in ("pages/a.csv.html", "out/design.html"):  # beside one that was theirs
+        for name in ("pages/a.csv.html", "out/design.html"):  # beside a page of the report
             Path(name).write_text("mine")
         self.assertIn("pages/a.csv.html: exists", self.run_command("report", "many", "--output", "pages")[1])
         self.assertIn("out/design.html: exists", self.run_command("design", "bessel", "lowpass", "0.1")[1])
@@ -125,7 +125,7 @@ class Outputs(InAFolder):
                 with self.subTest(name=name, command=before[0]):
                     code, text = self.run_command(*before, name, *after, "--force")
                     self.assertEqual(code, 2)
-                    self.assertIn("is a file that is read", text)
+                    self.assertIn("is an input file", text)
                     self.assertEqual(Path(source).read_bytes(), content)
 
     def test_a_file_appears_when_it_is_whole(self):
@@ -144,7 +144,7 @@ class Outputs(InAFolder):
 
 
 def alive(group):
-    """The processes of a group that run."""
+    """The running processes of a group."""
     found = []
     for entry in Path("/proc").glob("[0-9]*/stat"):
         with contextlib.suppress(OSError):
@@ -164,7 +164,7 @@ class Interruption(InAFolder):
         return process
 
     def ends(self, process, before):
-        """Waits until the whole group has ended, and fails where that takes too long."""
+        """Waits until the whole group has ended, and fails if that takes too long."""
         _, text = process.communicate(timeout=30)
         while alive(process.pid) and time.monotonic() - before < self.SECONDS:
             time.sleep(0.01)
@@ -189,12 +189,12 @@ class Interruption(InAFolder):
         return process
 
     def test_a_batch_ends_with_one_line(self):
-        for tell in (os.killpg, os.kill):  # as a terminal does it, and the one process alone
+        for tell in (os.killpg, os.kill):  # as a terminal does it, and only the one process
             with self.subTest(tell.__name__):
                 process, before = self.batch(), time.monotonic()
                 tell(process.pid, signal.SIGINT)
                 self.assertEqual(self.ends(process, before).split("\n"), ["qx: interrupted", ""])
-                self.assertEqual(process.returncode, -signal.SIGINT)  # what ends a shell's loop
+                self.assertEqual(process.returncode, -signal.SIGINT)  # which ends a shell's loop
                 self.assertFalse([*Path("pages").glob("*.part*")])
 
     def test_workers_do_not_outlive_the_process_that_started_them(self):

@@ -32,7 +32,7 @@ class Filters(unittest.TestCase):
                 self.assertTrue(done.filter.is_stable and done.filter.is_iir)
                 self.assertLess(abs(gain(done, passed) - 1), 0.2, (family, kind))
                 self.assertLess(gain(done, stopped), 0.01, (family, kind))
-                # Sections of fourth order are the same filter.
+                # Sections of fourth order give the same filter.
                 z = np.exp(-2j * np.pi * passed / 360)
                 a, b = (np.reshape(done.numbers[name], (-1, n)) for name, n in (("a", 4), ("b", 5)))
                 value = np.prod([np.polyval(above[::-1], z) / (1 + z * np.polyval(below[::-1], z))
@@ -96,7 +96,7 @@ class Command(unittest.TestCase):
         with tempfile.TemporaryDirectory() as folder:
             code, text = self.run_in(folder, "chebyshev", "lowpass", "40", "--rate", "360", "--ripple", "0.5")
             self.assertEqual(code, 0, text)
-            self.assertRegex(text, r"Group delay of what passes +\S+ to \S+ ms")
+            self.assertRegex(text, r"Group delay in the pass band +\S+ to \S+ ms")
             page = Path(folder, "design.html").read_text("utf-8")
             for part in ("Magnitude", "Phase, without jumps", "Group delay", "Impulse response", "Step response",
                          "Poles and zeros", "sos = [[", "IIR_Filter2(x, &amp;form", "qx::host::check",
@@ -155,10 +155,10 @@ class Cleaning(unittest.TestCase):
     def test_takes_no_hum_where_none_stands_out(self):
         self.assertIsNone(sections_cleaning.hum_of(recorded(self.noise)))
         section = sections_cleaning.cleaned(recorded(self.pulses + self.noise + np.sin(0.3 * self.t)))
-        self.assertIn("No hum", section.text)
+        self.assertIn("No mains hum", section.text)
         self.assertEqual(len(section.rows), 2)
         self.assertIsNone(sections_cleaning.cleaned(recorded(self.noise)))
-        ramp = 0.5 * self.t - 3  # which stays a ramp up to its ends
+        ramp = 0.5 * self.t - 3  # which remains a ramp up to its ends
         wander = sections_cleaning.wander_of(ramp + self.noise, sections_cleaning.filters_for(360.0, None)[0])
         self.assertLess(np.abs(wander - ramp).max(), 0.01)
 

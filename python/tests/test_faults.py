@@ -1,7 +1,7 @@
-"""Faults of the machine: a command ends with one clear line, and nothing half-written is taken for whole.
+"""Faults of the machine: a command ends with one clear line, and no incomplete file looks complete.
 
-Small disks are mounted in a namespace of their own, which the machine must allow; where it does not, these tests say
-that they have not run.
+Small disks are mounted in a separate namespace, which the machine must allow. Where it does not, these tests report
+that they were skipped.
 """
 
 import functools
@@ -25,7 +25,7 @@ MOUNTING = ["unshare", "-m"] if os.geteuid() == 0 else ["unshare", "-rm"]
 
 @functools.lru_cache(maxsize=None)
 def disks():
-    """Why there are no small disks here, or an empty text."""
+    """The reason why small disks cannot be mounted here, or an empty text."""
     try:
         ran = subprocess.run([*MOUNTING, "mount", "-t", "tmpfs", "tmpfs", "/mnt"], capture_output=True, text=True)
     except OSError as error:
@@ -47,7 +47,7 @@ class Faults(unittest.TestCase):
                               env={**self.environment, "QX": f"{sys.executable} -m qx", "ECG": str(ECG), **environment})
 
     def on_a_full_disk(self, script, **environment):
-        """Runs a script in the folder of a disk of 64 KB, and lists what is there afterwards."""
+        """Runs a script in the folder of a 64 KB disk, and lists the files there afterwards."""
         if why := disks():
             self.skipTest(f"NOT TESTED: no disk can be mounted here: {why}")
         inner = f"mount -t tmpfs -o size=64k tmpfs {self.disk} && cd {self.disk} && {{ {script}; }}; s=$?; ls -A; exit $s"
@@ -65,7 +65,7 @@ class Faults(unittest.TestCase):
             self.fails(self.on_a_full_disk(f"$QX generate {arguments}"), rf"{self.disk}/long.\w+: {full}")
 
     def test_the_last_samples_of_an_audio_file_on_a_full_disk(self):
-        """Of which libsndfile says nothing."""
+        """The last samples of a FLAC file, about which libsndfile reports nothing."""
         script = (f"import os, numpy as np, soundfile; from qx import audio, outputs\n"
                   f"x = np.random.default_rng(1).normal(size=60_000) / 9\n"
                   f"def size(n, kind):\n"
@@ -95,8 +95,8 @@ class Faults(unittest.TestCase):
         self.fails(self.shell("$QX list variance > /dev/full"),
                    "standard output: cannot be written: No space left on device")
         (self.folder / "a").write_text("no folder")
-        for path, reason in (("/proc/pages/a.html", "/proc/pages: cannot be made: No such file or directory"),
-                             (self.folder / "a/b/c.html", "a/b: cannot be made: Not a directory"),
+        for path, reason in (("/proc/pages/a.html", "/proc/pages: cannot be created: No such file or directory"),
+                             (self.folder / "a/b/c.html", "a/b: cannot be created: Not a directory"),
                              ("/proc/a.html", "/proc/a.html: cannot be written: No such file or directory")):
             with self.assertRaisesRegex(OSError, reason):
                 outputs.write_text(path, "text")

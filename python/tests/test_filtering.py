@@ -1,4 +1,4 @@
-"""The section on a filter that was asked for."""
+"""The section on a chosen filter."""
 
 import sys
 import unittest

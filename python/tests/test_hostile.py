@@ -1,4 +1,4 @@
-"""Files that are broken, or made to do harm: whatever a library does over one costs a refusal of one line."""
+"""Files that are broken or malicious: whatever a library does with one, it is refused in one line."""
 
 import gzip
 import io
@@ -22,7 +22,7 @@ import hostile_files  # noqa: E402
 import library_faults as faults  # noqa: E402
 from qx import audio, files, isolation, recording, viewing  # noqa: E402
 
-EACH = 8  # of each kind
+EACH = 8  # files of each kind
 
 
 class Isolation(unittest.TestCase):
@@ -40,7 +40,7 @@ class Isolation(unittest.TestCase):
     def test_crashes_hangs_and_floods_are_refusals(self):
         self.refused(r"crashed \(SIGSEGV\)", faults.writes_nowhere)
         self.refused(r"crashed \(SIGABRT\)", faults.crashes, signal.SIGABRT)
-        self.refused(r"want of memory \(SIGKILL\)", faults.crashes, signal.SIGKILL)
+        self.refused(r"lack of memory \(SIGKILL\)", faults.crashes, signal.SIGKILL)
         self.refused("reading takes more than 1074 MB of memory; QX_READ_MB allows more", faults.takes, 3 << 30)
         with mock.patch.object(isolation, "STILL", 1):
             self.refused("done nothing for 1 s", faults.sleeps)
@@ -61,7 +61,7 @@ class Isolation(unittest.TestCase):
             found = isolation.read(faults.gives, self.path, count, told=told.append)
             self.assertEqual([part[-1] for part in told], [0, 1, 2])
             self.assertEqual((found["path"], found["folder"]), (str(self.path), []))
-            found["big"] += 1  # it is the caller's own
+            found["big"] += 1  # it belongs to the caller
             self.assertEqual(found["big"][-1], count)
             with found["file"] as kept:
                 kept.seek(0)
@@ -144,8 +144,8 @@ class Files(unittest.TestCase):
 
     def test_what_has_once_got_through(self):
         text = hostile_files.TEXT
-        self.refuses("a.csv", text + b"\xff\xfe", "is no text in utf-8")
-        self.refuses("b.csv", b"\xff\xfe" + "1\n2\n".encode("utf-16-le") + b"\x00", "is no text in utf-16 throughout")
+        self.refuses("a.csv", text + b"\xff\xfe", "is not utf-8(-sig)? text")
+        self.refuses("b.csv", b"\xff\xfe" + "1\n2\n".encode("utf-16-le") + b"\x00", "is not utf-16 text throughout")
         self.refuses("c.csv", b'a,b\n1,2\n3,"4\n', "cannot be cut into cells|cell where")
         whole = hostile_files.archive("a.csv", text)
         at = whole.rindex(b"PK\x01\x02")
@@ -154,7 +154,7 @@ class Files(unittest.TestCase):
         self.refuses("e.npy", npy.replace(b"}", b"("), "cannot be read")
         for date in ("00/00/2024", "00/02/2024", "01/01/9999"):
             days = "".join(f"{date if i == 7 else f'{i + 1:02}/02/2024'},11:59:00,{i}\n" for i in range(12))
-            self.refuses("d.csv", f"Date,Time,u\n{days}".encode(), "may be|is no time")
+            self.refuses("d.csv", f"Date,Time,u\n{days}".encode(), "may be|is not a time")
         path = self.folder / "a.au"
         path.write_bytes(hostile_files.KINDS["AU"][2]()[:11])
         self.assertIn("cut off", audio.wrong_length(path, 0))

@@ -48,7 +48,7 @@ class Many(unittest.TestCase):
         self.assertIn("3 of 4 recordings were read", index)
         self.assertRegex(index, r'<a href="deep_c%24.csv.html">deep_c\$.csv</a></td><td class="value">40'
                                 r'</td><td class="value">200</td>')
-        self.assertRegex(index, "<h2>Left out by their endings</h2><ul><li>.*notes.md</li>")
+        self.assertRegex(index, "<h2>Skipped because of their extensions</h2><ul><li>.*notes.md</li>")
         self.assertIn("wrong.csv:3: column 1, u: &#x27;x&#x27; is not a number", index)
         self.assertEqual([bool(outcome.failure) for outcome in found], [False, False, False, True])
         ran = subprocess.run([sys.executable, "-m", "qx", "report", self.source, "--workers", "2", "--output",
@@ -56,7 +56,7 @@ class Many(unittest.TestCase):
         self.assertEqual(ran.returncode, 0, ran.stderr)
         self.assertRegex(ran.stderr, r"\Aqx: .*wrong.csv:3: .*\n\Z")
         self.assertRegex(ran.stdout, r"^3 of 4 recordings were read: .*index.html\n"
-                                     r"left out by their endings: .*notes.md\n$")
+                                     r"skipped because of their file name extensions: .*notes.md\n$")
         self.assertEqual(self.pages(self.folder / "two"), pages)
 
     def test_the_workers_of_a_cluster(self):

@@ -33,7 +33,7 @@ def beats(rate, places, height=1.0):
 
 class Peaks(unittest.TestCase):
     def test_a_stream_in_blocks(self):
-        """A record with pointers and an array by its address, from call to call."""
+        """A record with pointers, and an array passed by its address, from call to call."""
         x = np.sin(0.1 * np.arange(1000))
         state, buffer, places = {}, [], []
         for i, block in enumerate(np.split(x, [100, 107, 600])):
@@ -48,7 +48,7 @@ class Peaks(unittest.TestCase):
         x = np.array([3, 0, 2, 1, 5, 4, 6, 2, 4, 4, 4, 1, 2.0])
         maxima = measuring.local_maxima(x)
         np.testing.assert_array_equal(maxima, [2, 4, 6, 9])
-        # Of 2: to 0 before 3, and to 1 before 5. Of 6, the highest: to 0 and to 1.
+        # The peak 2 falls to 0 before 3, and to 1 before 5; the highest, 6, to 0 and to 1.
         np.testing.assert_array_equal(measuring.prominences(x, maxima), [1, 1, 5, 2])
         for x in (np.zeros(9), np.arange(9.0), np.ones(1)):
             self.assertEqual(measuring.prominences(x, measuring.local_maxima(x)).size, 0)
@@ -152,7 +152,7 @@ class Commands(unittest.TestCase):
         with contextlib.redirect_stdout(io.StringIO()) as out, contextlib.redirect_stderr(io.StringIO()) as err:
             try:
                 code = command.main([*map(str, arguments)])
-            except SystemExit as refused:  # of arguments
+            except SystemExit as refused:  # for wrong arguments
                 code = refused.code
         return subprocess.CompletedProcess(arguments, code, out.getvalue(), err.getvalue())
 
@@ -168,7 +168,7 @@ class Commands(unittest.TestCase):
         head, rows = self.written()
         self.assertEqual((head, rows.shape), (["time (s)", "mV"], (58, 2)))
         # The 58 beats, and a burst of noise as high as they are.
-        self.assertIn(": 59 peaks that stand out by", self.run_command("peaks", RECORDING).stdout)
+        self.assertIn(": 59 peaks with a prominence of at least", self.run_command("peaks", RECORDING).stdout)
         ran = self.run_command("peaks", RECORDING, "--threshold", "1.2", "--width", "9", "--csv", self.table,
                                "--force")
         head, rows = self.written()

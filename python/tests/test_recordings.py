@@ -1,4 +1,4 @@
-"""How recordings are read: what people write (data/recordings.txt), and what instruments and programs keep."""
+"""How recordings are read: files written by people (data/recordings.txt), and by instruments and programs."""
 
 import bz2
 import contextlib
@@ -29,12 +29,12 @@ from qx import __main__ as command  # noqa: E402
 from qx import isolation, recording  # noqa: E402
 from qx.commands import reading  # noqa: E402
 
-HERE = mock.patch.object(isolation, "AVAILABLE", False)  # files are read in this process, with what is put into it
+HERE = mock.patch.object(isolation, "AVAILABLE", False)  # files are read in this process, with its patches
 CASES = Path(__file__).resolve().parent / "data/recordings.txt"
 
 
 def cases():
-    """Name, statements and text of each case."""
+    """The name, the statements and the text of each case."""
     for part in re.split(r"^== ", CASES.read_text("utf-8"), flags=re.MULTILINE)[1:]:
         head, _, text = part.partition("\n---\n")
         name, *lines = head.split("\n")
@@ -43,7 +43,7 @@ def cases():
 
 
 def repeated(line):
-    """A line, or the lines that "@COUNT RATE TEXT" stands for."""
+    """A line, or the lines that "@COUNT RATE TEXT" represents."""
     if not (match := re.match(r"@(\d+) (\S+) (.*\n)", line)):
         return line
     return "".join(_formatted(match[3], i, i / float(match[2])) for i in range(int(match[1])))
@@ -57,7 +57,7 @@ def _formatted(text, i, t):
 
 
 def read(path, *options):
-    """A recording read with options of the command line."""
+    """A recording, read with options of the command line."""
     return recording.read(path, **reading.of(command.arguments(["report", str(path), *options])))
 
 
@@ -172,7 +172,7 @@ class WhatProgramsKeep(InFolder):
         np.savez(path, t=RAMP / 250, x=RAMP, odd=np.ones(7))
         self.holds(path, 250, says=["time from column 1, t", "of other lengths: odd (7 samples)"])
         self.holds(path, None, "--column", "odd", values=np.ones(7))
-        np.savez_compressed(path, x=RAMP, fs=44.125)  # with three decimals, which group nothing here
+        np.savez_compressed(path, x=RAMP, fs=44.125)  # with three decimals, which are not a group of thousands here
         self.holds(path, 44.125, says=["'fs = 44.125', taken as hertz"])
         when = np.datetime64("2024-01-01T00:00:00") + np.arange(100) * np.timedelta64(2, "ms")
         np.savez(path, when=when, x=RAMP)
@@ -271,9 +271,9 @@ class WhatProgramsKeep(InFolder):
         data = whole.index(b"data") + 4
         streamed = whole[:data] + b"\xff\xff\xff\xff" + whole[data + 4:]
         for content, count, says in ((whole, 100, ""), (whole[:-100], 50, "is cut off: 100 of 200 bytes"),
-                                     (streamed, 100, "leaves the length open"),
+                                     (streamed, 100, "does not give the length"),
                                      (whole[:data] + struct.pack("<I", 100) + whole[data + 4:], 50,
-                                      "at the end of the file belong to no part"),
+                                      "at the end of the file belong to no chunk"),
                                      (whole + bytes(50), 100, "header")):
             with self.subTest(says):
                 path.write_bytes(content)

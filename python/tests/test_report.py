@@ -23,7 +23,7 @@ from qx import __main__ as command  # noqa: E402
 from qx import audio, isolation, measuring, pages, recording, report, sections, sections_measuring  # noqa: E402
 from qx import sections_recording, sections_spectra, tables, wholes  # noqa: E402
 
-HERE = mock.patch.object(isolation, "AVAILABLE", False)  # files are read in this process, with what is put into it
+HERE = mock.patch.object(isolation, "AVAILABLE", False)  # files are read in this process, with its patches
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
 
@@ -43,7 +43,7 @@ class InFolder(unittest.TestCase):
         self.folder = Path(folder.name)
 
     def drawn(self, text):
-        """What the page's plots are made of; each has its place in the page."""
+        """The data of the page's plots, each of which has an element in the page."""
         plots = json.loads(re.search(r'<script type="application/json" id="plots">(.*?)</script>', text, re.DOTALL)[1])
         self.assertEqual(re.findall(r'data-plot="(\d+)"', text), [str(i) for i in range(len(plots))])
         return plots
@@ -68,7 +68,7 @@ class Reading(InFolder):
         return recording.read(self.file(text, name), **options)
 
     def holds(self, text, values, rate=None, said="", name="data.csv", **options):
-        """What is read, and a part of what is said of it."""
+        """Checks the values that are read, and a part of the remarks on them."""
         with self.subTest(text=text[:60], **options):
             read = self.read(text, name, **options)
             np.testing.assert_allclose(read.values[:len(values)], values)
@@ -113,7 +113,7 @@ class Reading(InFolder):
                              ("timestamp", 0.5), ("Zeit (us)", 500000), ("ms", 500), ("seconds", 0.5),
                              ("elapsed time (s)", 0.5)):
             self.holds(f"{header},u\n0,4\n2,5\n4,7\n", [4, 5, 7], rate, f"time from column 1, {header}; ")
-        for header in ("T (°C)", "temp", "s1", "total"):  # which are no time
+        for header in ("T (°C)", "temp", "s1", "total"):  # which are not time
             self.holds(f"{header},u\n0,4\n2,5\n4,7\n", [0, 2, 4], None, "others: u")
         for text, values, rate, said in (
                 ("Time (ticks),u\n0,4\n2,5\n4,7\n", [4, 5, 7], None, "unit of the times, ticks, is not"),
@@ -133,7 +133,7 @@ class Reading(InFolder):
                  "rounded to 0.1 s"),
                 ("t,u\n" + "".join(f"{i + 7 * (i > 30) + 5 * (i > 60)},{i}\n" for i in range(99)), [0, 1],
                  1, "2 gaps are closed, the longest of 8 s after sample 31")):
-            if rate == 100.1:  # as exact as the last time
+            if rate == 100.1:  # as exact as the last time allows
                 self.assertAlmostEqual(self.read(text).rate, 100, delta=0.2)
                 continue
             self.holds(text, values, rate, said)
@@ -157,7 +157,7 @@ class Reading(InFolder):
             self.assertNotIn("first", self.read(text, missing=missing).choice)
         with self.assertRaisesRegex(recording.InputError, ":3: column 2, u: '' where a value is needed"):
             self.read(text)
-        self.assertRaisesRegex(recording.InputError, "no value is left", self.read, "u\n1\n-\n",
+        self.assertRaisesRegex(recording.InputError, "all values are missing", self.read, "u\n1\n-\n",
                                missing="skip", start=1)
 
     def test_long_tables_and_recordings_are_read_in_parts(self):
@@ -306,7 +306,7 @@ class Reading(InFolder):
                 read = self.read(wav(samples, form, bits), "a.wav")
                 self.assertEqual((read.values.tolist(), read.rate), ([0, 0.5, -1], 8000))
         stereo = wav([struct.pack("<hh", 0, 16384)] * 2, channels=2)
-        read = self.read(stereo, column="2")  # by its content, whatever the name says
+        read = self.read(stereo, column="2")  # by its content, regardless of the name
         self.assertEqual(read.values.tolist(), [0.5, 0.5])
         self.assertEqual(read.choice, "channel 2 of 2; 8000 samples per second, from the header of the "
                                       "file; others: channel 1")
@@ -326,7 +326,7 @@ class Reading(InFolder):
                 ("t,u\n0,1\n1,2\n2\n", ":4: 1 cell where the other lines have 2"),
                 ("1,5\n2,5\n", "'2,5' may be one number with a decimal comma or two"),
                 ("1.234,5\n1.235,6\n", "may be one number with a decimal comma or two"),
-                ("t,u\n12:00:00,1\n12:00:01,2\n13h,3\n", ":4: column 1, t: '13h' is no time"),
+                ("t,u\n12:00:00,1\n12:00:01,2\n13h,3\n", ":4: column 1, t: '13h' is not a time"),
                 (b"\x01\x02\0\0", ":1: neither"), (b"1\n2\n\x00\n", ":3: neither"),
                 (b"RIFF\0\0\0\0WAVE", "cannot be read as audio"), (wav([]), "no samples"),
                 (wav([b"\0\0"], form=85), "cannot be read as audio"),
@@ -373,7 +373,7 @@ class Report(InFolder):
         for value, error, shown in ((50.4999998, 0.00121, ("50.5000", "0.0012")), (1.5050411, 0.005, ("1.5050", "0.0050")),
                                     (-1234.5, 28, ("-1234", "28")), (2.6e8, 3.2e7, ("2.60e+08", "3.2e+07")),
                                     (0.1, 0, ("0.1", "")), (1 / 3, 1e-18, ("0.333333333333", "1e-18")),
-                                    (5, float("inf"), ("5", "beyond all numbers"))):
+                                    (5, float("inf"), ("5", "out of range"))):
             self.assertEqual(sections.uncertain(value, error), shown)
 
     def test_figures_beyond_all_numbers_have_a_plain_sentence(self):
@@ -384,7 +384,7 @@ class Report(InFolder):
                 self.assertIsNone(re.search(r"\b(inf|nan)\b", "\n".join(lines)))
                 self.assertGreaterEqual(len(self.drawn(page)), 2)
             if values.max() > 1e100:
-                self.assertTrue(any("leave the range of numbers" in line for line in lines))
+                self.assertTrue(any("are out of range" in line for line in lines))
 
     def test_names_are_shown_as_they_stand(self):
         name, channel, unit = "a $x_1^{ 温度 <i>.csv", "温度 $y^{ & <b>", "m$/s^{"
@@ -517,7 +517,7 @@ class Catalogue(unittest.TestCase):
         self.assertEqual(code, 0)
         for part in ("moment = qx.Moment_head(x, order)", "-20021  ErrOrderNotPositive", "qx/basic_statistics.h"):
             self.assertIn(part, out)
-        # What a twin takes over from others comes with it, and so does the header's introduction.
+        # The text that a twin shares with others is included, and so is the header's introduction.
         code, out, _ = run("show", "InvCxOXFFTH")
         for part in ("As InvCxOXFFTH80, of", "InvCxOXFFTH80: The inverse transform x[j] = 1/n sum",
                      "-20003  ErrEmptyInput", "Fourier transforms of any length"):

@@ -42,7 +42,7 @@ class Resample(unittest.TestCase):
         with contextlib.redirect_stdout(io.StringIO()) as out, contextlib.redirect_stderr(io.StringIO()) as err:
             try:
                 code = command.main(["resample", *map(str, arguments)])
-            except SystemExit as refused:  # of arguments
+            except SystemExit as refused:  # for wrong arguments
                 code = refused.code
         return subprocess.CompletedProcess(arguments, code, out.getvalue(), err.getvalue())
 
@@ -59,7 +59,7 @@ class Resample(unittest.TestCase):
                 self.assertEqual(soundfile.info(self.target).subtype, "DOUBLE")
                 self.assertEqual(len(sound), -(-n * new_rate // rate))
                 self.assertIn(f"{len(sound)} frames at {new_rate} Hz", ran.stdout)
-                edge = 200 * max(1, new_rate // rate)  # where the windows meet both ends
+                edge = 200 * max(1, new_rate // rate)  # where the windows reach beyond the ends
                 difference = sound - tone(frequency, new_rate, len(sound))
                 self.assertLess(decibel(difference[edge:-edge]), -118)
 
@@ -145,7 +145,7 @@ class Resample(unittest.TestCase):
             ran = self.command(self.source, self.target, "--rate", "44100", "--force")
             sound, _ = soundfile.read(self.target)
             self.assertEqual((ran.returncode, np.abs(sound).max() > 1), (0, not clipped))
-            if not clipped:  # as many as there would be beyond full scale
+            if not clipped:  # the number of samples that would be beyond full scale
                 self.assertEqual(ran.stderr, "")
                 beyond = np.abs(sound)
                 self.assertAlmostEqual(told[0], np.count_nonzero(beyond > 1), delta=20)

@@ -1,8 +1,8 @@
-"""SciPy's own tests, as installed with it, on the functions of the topics whose meaning agrees.
+"""SciPy's own tests, as installed with it, applied to the functions of the topics that have the same meaning.
 
-In the namespaces of SciPy's test modules the names of its functions are replaced by adapters, which only take
-the arguments that both have: a test that needs another one is skipped there. What is left out beside, and why,
-is in EXCLUDED.
+In the namespaces of SciPy's test modules, the names of its functions are replaced by adapters, which only take the
+arguments that both have. A test that needs another argument is skipped. Further excluded tests, with the reasons, are
+in EXCLUDED.
 """
 
 import collections
@@ -27,14 +27,14 @@ from qx import calculus, fft, filters, interpolate, linalg, signals, special, sp
 
 
 class Adapter:
-    """A function of a topic under SciPy's name: what it does not take skips the test."""
+    """A function of a topic under SciPy's name. An argument that it does not take skips the test."""
 
     def __init__(self, function, neutral=()):
         self.function, self.neutral, self.calls = function, dict(neutral), 0
         self.name = self.__name__ = function.__name__
 
     def __call__(self, *given, **named):
-        for name, value in self.neutral.items():  # arguments that change nothing, or have this value only
+        for name, value in self.neutral.items():  # arguments that change nothing, or are only taken with this value
             other = named.pop(name, None)
             if other is not None and not (np.isscalar(other) and other == value):
                 pytest.skip(f"{name}: another value than {value!r}")
@@ -120,7 +120,7 @@ def density(function):
 def with_estimate(function):
     @adapter()
     def called(a, disp=True):
-        return function(a) if disp else (function(a), 0.0)  # an estimate of the error that no test reads
+        return function(a) if disp else (function(a), 0.0)  # an error estimate, which no test reads
     return called
 
 
@@ -245,7 +245,7 @@ def named(module, *names):
 
 
 def renamed(window):
-    """A window under SciPy's name, which calls the symmetric form sym."""
+    """A window under SciPy's name, with SciPy's argument sym for the symmetric form."""
     def called(*given, **named):
         named["symmetric"] = named.pop("sym", True)
         if len(given) == count:
@@ -261,7 +261,7 @@ def renamed(window):
 
 
 class Replaced(types.SimpleNamespace):
-    """A module of which some names are replaced."""
+    """A module with some of its names replaced."""
 
     def __init__(self, module, **replaced):
         super().__init__(**replaced)
@@ -271,8 +271,8 @@ class Replaced(types.SimpleNamespace):
         return getattr(self.module, name)
 
 
-# The file of tests, what is put into its namespace, what is run of it (all by default), and how many tests
-# that call an adapter pass at least.
+# The file of tests, the names replaced in its namespace, the tests that are run (all by default), and the least number
+# of tests that call an adapter and pass.
 FILES = {
     "signal/tests/test_czt.py": ({"czt": plain(fft.czt), "zoom_fft": zoom_fft}, (), 145),
     "signal/tests/test_savitzky_golay.py": ({"savgol_filter": savgol_filter}, ("test_sg_filter",), 2),
@@ -341,8 +341,8 @@ FILES = {
         ("TestGamma", "TestErf", "TestEllip", "TestBessel", "TestHyper", "TestAiry", "TestBeta", "TestFresnel"), 40),
 }
 
-# Tests that fail, and the difference that they show. A test that fails for no reason given here is a fault, and
-# so is a reason without a test.
+# Tests that fail, and the difference that they show. A test that fails without a reason given here is a fault, and so
+# is a reason that matches no test.
 EXCLUDED = {
     "errors are of another type or text": (
         "test_czt.py::test_empty_input", "test_czt.py::test_0_rank_input", "test_nonsense_size",
@@ -390,7 +390,7 @@ EXCLUDED = {
 
 
 class Plugin:
-    """Selects the tests, puts the adapters in place, and keeps what comes of it."""
+    """Selects the tests, installs the adapters, and records the outcomes."""
 
     def __init__(self, replaced, selected):
         self.replaced, self.selected, self.found, self.before = replaced, selected, {}, 0

@@ -1,5 +1,5 @@
-"""Ten engineering tasks, each with this library and with SciPy: the results agree with the truth at least as
-well, in no more lines."""
+"""Ten engineering tasks, each solved with this library and with SciPy. This library's results must agree with the
+truth at least as well, in no more lines."""
 
 import inspect
 import sys
@@ -21,10 +21,10 @@ FS = 1000.0
 T = np.arange(4000) / FS
 
 
-# A task has two ways, `ours` and `theirs`, and the `error` of a result against the truth.
+# A task has two solutions, `ours` and `theirs`, and the `error` of a result with respect to the truth.
 
 class DesignAndApply:
-    """A lowpass without delay: a slow wave stays, a disturbance at 200 Hz goes, an offset and a ramp stay."""
+    """A lowpass without delay: it removes a disturbance at 200 Hz, and keeps a slow wave, an offset and a ramp."""
     t = np.arange(4001) / FS  # the disturbance is 0 at both ends
     truth = 5 + 0.3 * t + np.sin(2 * np.pi * 2 * t)
     x = truth + 0.5 * np.sin(2 * np.pi * 200 * t)
@@ -41,7 +41,7 @@ class DesignAndApply:
 
 
 class ResampleAudio:
-    """A tone at 48 kHz to 44.1 kHz."""
+    """Resamples a tone from 48 kHz to 44.1 kHz."""
     x = np.sin(2 * np.pi * 5000 * np.arange(48000) / 48000)
 
     def ours(self):
@@ -166,7 +166,7 @@ class Delay:
 
 
 class StreamingFilter:
-    """Blocks as they come, with the result of the whole."""
+    """Filters a signal block by block, with the result for the whole signal."""
     x = RNG.normal(size=4000)
     blocks = np.split(x, [10, 1000, 1001, 3500])
 
@@ -187,10 +187,10 @@ class StreamingFilter:
         return np.abs(found - whole).max()
 
 
-# How large the error of a result may be.
+# The largest allowed error of a result.
 TASKS = {DesignAndApply: 6e-3, ResampleAudio: 2e-6, FindPeaks: 2e-3, BoundedExponential: 3.5, Solve: 1e-10,
          Eigenvalues: 1e-12, WindowedSpectrum: 3e-3, Displacement: 1e-2, Delay: 1e-2, StreamingFilter: 1e-10}
-AS_GOOD = 1.02  # times the error of the other one, and rounding
+AS_GOOD = 1.02  # allowed ratio to the error of the other solution, because of rounding
 
 
 def lines_of(function):

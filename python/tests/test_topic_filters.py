@@ -1,4 +1,4 @@
-"""qx.filters, qx.windows and qx.fft beside SciPy and NumPy, and the streams of filters."""
+"""qx.filters, qx.windows and qx.fft compared with SciPy and NumPy, and the streams of filters."""
 
 import pickle
 import sys
@@ -25,7 +25,7 @@ def close(found, expected, rtol=1e-9, atol=1e-12):
     np.testing.assert_allclose(found, expected, rtol=rtol, atol=atol)
 
 
-# The same cases in each run, and no folder of earlier ones.
+# The same cases in each run, without a database of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")
 
@@ -108,9 +108,9 @@ class Designs(unittest.TestCase):
         for call, pattern, name in (
                 (lambda: filters.butterworth(0, 0.1), "order: must be at least 1", "ErrOrderNotPositive"),
                 (lambda: filters.butterworth(2, 600, fs=1000), "cutoff: must be between 0 and half the sampling "
-                 "rate, 500; 600", "ErrAboveNyquist"),
-                (lambda: filters.butterworth(2, 40), "give fs for frequencies", "ErrAboveNyquist"),
-                (lambda: filters.butterworth(2, (90, 40), "bandpass", 1000), "must rise", "ErrBadCutoff"),
+                 "rate, 500; got 600", "ErrAboveNyquist"),
+                (lambda: filters.butterworth(2, 40), "pass fs for frequencies", "ErrAboveNyquist"),
+                (lambda: filters.butterworth(2, (90, 40), "bandpass", 1000), "must be increasing", "ErrBadCutoff"),
                 (lambda: filters.butterworth(2, (40, 90), fs=1000), "needs one frequency", "ErrSizesDisagree"),
                 (lambda: filters.chebyshev1(2, -1, 0.1), "ripple: must be above 0", "ErrRippleNotPositive"),
                 (lambda: filters.elliptic(2, 3, 2, 0.1), "below the attenuation", "ErrRippleAboveAttenuation"),
@@ -150,7 +150,7 @@ class ZeroPhase(unittest.TestCase):
                 gain = f.response([0.0]).magnitude[0]**2
                 close(f.zero_phase(x), gain * x, 1e-6, 1e-6)
         self.assertEqual(filters.butterworth(2, 0.1).zero_phase([5.0]).round(9), [5.0])
-        unstable = filters.from_ba([1.0], [1.0, -1.0])  # an integrator has no rest
+        unstable = filters.from_ba([1.0], [1.0, -1.0])  # an integrator has no steady state
         self.assertTrue(np.isfinite(unstable.zero_phase(t)).all())
 
 
@@ -190,11 +190,11 @@ class Streams(unittest.TestCase):
         for call in (lambda: f.stream(2)(np.zeros(5)), lambda: f.stream(2)(np.zeros((3, 5))),
                      lambda: f.stream(0), lambda: f.stream(axis=3), lambda: f.stream(dtype=np.float32)):
             self.assertRaises(ValueError, call)
-        self.assertRaisesRegex(TypeError, "complex128 came", f.stream(), [1j])
+        self.assertRaisesRegex(TypeError, "got complex128", f.stream(), [1j])
 
 
 class ComplexCoefficients(unittest.TestCase):
-    """A passband on one side of 0."""
+    """A pass band on one side of 0."""
 
     b, a = np.array(scipy.signal.butter(4, 0.2)) * np.exp(0.6j * np.pi * np.arange(5))
     f = filters.from_ba(b, a)
@@ -265,7 +265,7 @@ class Windows(unittest.TestCase):
             expected = sum((-1)**k * a * np.cos(k * theta) for k, a in enumerate(terms))
             close(getattr(windows, name)(33), expected, atol=1e-14)
             close(windows.cosine_sum(33, terms), expected, atol=1e-14)
-        ramp = np.sin(np.pi * np.arange(4) / 8)**2  # floor(0.3 * 32 / 2) values to each end
+        ramp = np.sin(np.pi * np.arange(4) / 8)**2  # floor(0.3 * 32 / 2) values at each end
         close(windows.tukey(32, 0.3), np.r_[ramp, np.ones(24), ramp[::-1]], atol=1e-15)
         close(windows.get(("tukey", 0.3), 31), windows.tukey(32, 0.3)[:-1], 0)
         close(windows.tukey(9, 1), windows.hann(9), 0)
@@ -320,7 +320,7 @@ class Transforms(unittest.TestCase):
                 close(qx.fft.idct(x, n, norm=norm), scipy.fft.idct(x, 2, n, norm=norm))
                 close(qx.fft.dst(x, n, norm=norm), scipy.fft.dst(x, 1, n, norm=norm))
                 close(qx.fft.idst(x, n, norm=norm), scipy.fft.idst(x, 1, n, norm=norm))
-        for n in (32768, 32769, 40000):  # where the half-complex form is taken
+        for n in (32768, 32769, 40000):  # where the half-complex form is used
             y = RNG.normal(size=n)
             close(qx.fft.rfft(y), np.fft.rfft(y), 1e-9, 1e-8)
         close(qx.fft.hilbert(x), scipy.signal.hilbert(x).imag)

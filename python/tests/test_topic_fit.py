@@ -1,4 +1,4 @@
-"""qx.fit, qx.stats and qx.measure beside SciPy, and their streams."""
+"""qx.fit, qx.stats and qx.measure compared with SciPy, and their streams."""
 
 import concurrent.futures
 import pickle
@@ -44,7 +44,7 @@ def interrupted(x, p):
     raise KeyboardInterrupt
 
 
-# The same cases in each run, and no folder of earlier ones.
+# The same cases in each run, without a database of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")
 
@@ -73,7 +73,7 @@ class Fits(unittest.TestCase):
     def test_uncertainty_is_carried_on(self):
         x = np.linspace(0, 3, 60)
         found = fit.exponential(x, 2 * np.exp(-0.7 * x) + 0.02 * RNG.normal(size=60))
-        # Samples of the parameters scatter as the errors say.
+        # The scatter of fitted parameters agrees with their errors.
         drawn = RNG.multivariate_normal(*found, 20000).T
         for f in (lambda a, b, c: -np.log(2) / b, lambda a, b, c: np.array([a + c, a * b])):
             value, error = found.derived(f)
@@ -82,7 +82,7 @@ class Fits(unittest.TestCase):
         close(found.derived(lambda a, b, c: b)[1], found.errors["b"], 1e-6)
         fixed = fit.exponential(x, 2 * np.exp(-0.7 * x), bounds={"c": (0, 0)})
         self.assertLess(fixed.derived(lambda a, b, c: c)[1], 1e-12)
-        # The bounds of the curve are those of its value, times the quantile of Student's distribution.
+        # The bounds of the curve are the standard error of its value, times the quantile of Student's distribution.
         low, high = found.confidence(1.5)
         factor = scipy.stats.t.ppf(0.975, found.dof)
         close((high - low) / 2, factor * found.derived(lambda a, b, c: a * np.exp(b * 1.5) + c)[1], 1e-6)
@@ -163,7 +163,7 @@ class Fits(unittest.TestCase):
         again = pickle.loads(pickle.dumps(found))
         close(again.predict(x[:3]), found.values[:3])
         self.assertEqual(found.confidence(x[:4])[0].shape, (4,))
-        # From several threads at once, and within a model.
+        # From several threads simultaneously, and within a model.
         with concurrent.futures.ThreadPoolExecutor(4) as threads:
             every = [*threads.map(lambda _: fit.nonlinear(model_of_rows, x, y, [1, 2])["p1"], range(8))]
         self.assertEqual(len(set(every)), 1)
@@ -185,7 +185,7 @@ class Fits(unittest.TestCase):
         self.assertEqual(len(calls), 3)
         with self.assertRaises(KeyboardInterrupt):
             fit.nonlinear(interrupted, x, x, [1])
-        with self.assertRaisesRegex(ValueError, "model: values of shape .5,. are needed; .2,. came"):
+        with self.assertRaisesRegex(ValueError, "model: values of shape .5,. are needed; got .2,."):
             exports.NonlinearFit2026(x, x, [], lambda x, p: [1, 2], None, None, [1], [], [], 0, 1, 0, 0)
         with self.assertRaisesRegex(TypeError, "jacobian: a function is needed"):
             exports.NonlinearFit2026(x, x, [], model, 3, None, [1], [], [], 0, 1, 0, 0)
@@ -201,9 +201,9 @@ class Fits(unittest.TestCase):
     def test_what_cannot_be_is_refused(self):
         x = np.arange(5.0)
         for call, words in (
-                (lambda: fit.line(x, x[1:]), "x, y: must be of one length"),
+                (lambda: fit.line(x, x[1:]), "x, y: must have the same length"),
                 (lambda: fit.line(x, x, sigma=0), "sigma"), (lambda: fit.power(x, x), "x: must be above 0"),
-                (lambda: fit.line(x, x, bounds={"k": (0, 1)}), "'k' is none of 'a', 'b'"),
+                (lambda: fit.line(x, x, bounds={"k": (0, 1)}), "'k' is not one of 'a', 'b'"),
                 (lambda: fit.line(x, x, bounds={"a": (1, 0)}), "above its upper"),
                 (lambda: fit.exponential(x, x, guess={"a": 1}), "has no value for b, c"),
                 (lambda: fit.polynomial(x, x, 26), "at most 25"), (lambda: fit.line(x, x, method="l1"), "l1"),
@@ -242,7 +242,7 @@ class Statistics(unittest.TestCase):
         close(stats.std(x, ddof=1), x.std(1, ddof=1))
         close(stats.rms(1j * x[0]), stats.rms(x[0]))
         close(stats.moment(x, 3), scipy.stats.moment(x, 3, 1))
-        for constant in (0.1, -0.27829495, 3.0):  # whose mean is rounded, or not
+        for constant in (0.1, -0.27829495, 3.0):  # with and without rounding of the mean
             self.assertTrue(np.isnan([stats.skew([constant] * 10), stats.kurtosis([constant] * 10)]).all())
         self.assertFalse(np.isfinite(stats.skew([0, 1e150, 3e150])))
         table = pandas.DataFrame(x.T, columns=[*"abc"])
@@ -266,14 +266,14 @@ class Statistics(unittest.TestCase):
             close(ours.ppf([1e-9, 0.5, 0.95], *dof), theirs.ppf([1e-9, 0.5, 0.95], *dof), 1e-9, 1e-12)
             close(ours.isf([1e-4, 0.5, 0.95], *dof), theirs.isf([1e-4, 0.5, 0.95], *dof), 1e-9, 1e-12)
         close(stats.t.sf(2.0, 2.5), scipy.stats.t.sf(2.0, 2.5), 1e-12)
-        self.assertRaisesRegex(ValueError, "dof: 1 are needed; 0 came", stats.t.cdf, 1.0)
+        self.assertRaisesRegex(ValueError, "dof: 1 are needed; got 0", stats.t.cdf, 1.0)
         table = [[10, 20, 5], [20, 10, 9]]
         expected = scipy.stats.chi2_contingency(table, correction=False)
         close([*stats.contingency(table)], expected[:2])
         groups = [RNG.normal(size=n) + n / 20 for n in (8, 12, 9)]
         found = stats.anova(*groups)
         close([found.f[0], found.p[0]], scipy.stats.f_oneway(*groups), 1e-8)
-        for samples, rule in (([[1.0, 2.0]], "at least two are needed"), ([[1.0], [2.0]], "must have two values"),
+        for samples, rule in (([[1.0, 2.0]], "at least two samples are needed"), ([[1.0], [2.0]], "must have two values"),
                               ([[1.0, 2.0], []], "sample 1 is empty"),
                               ([[1.0, np.nan], [2.0]], "sample 0 has a value that is not finite")):
             with self.assertRaisesRegex(ValueError, "qx.stats.anova: samples: .*" + rule):
@@ -388,7 +388,7 @@ class Peaks(unittest.TestCase):
 
 
 class Channels(unittest.TestCase):
-    """What is found in each of several channels."""
+    """The results for each of several channels."""
 
     turns = np.multiply.outer([5.3, 11.1, 20.0], np.arange(2000) / 1000) + np.array([0, 0.2])[:, None, None]
     x = np.sin(2 * np.pi * turns) + 0.1 * np.sin(4 * np.pi * turns)

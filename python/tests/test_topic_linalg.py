@@ -1,4 +1,4 @@
-"""qx.linalg, qx.poly, qx.interpolate, qx.calculus, qx.special and qx.coordinates beside NumPy and SciPy."""
+"""qx.linalg, qx.poly, qx.interpolate, qx.calculus, qx.special and qx.coordinates compared with NumPy and SciPy."""
 
 import sys
 import unittest
@@ -32,7 +32,7 @@ def some(*shape, is_complex=False):
     return a + 1j * RNG.normal(size=shape) if is_complex else a
 
 
-# The same cases in each run, and no folder of earlier ones.
+# The same cases in each run, without a database of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")
 
@@ -294,7 +294,7 @@ class Interpolation(unittest.TestCase):
             ours = interpolate.CubicSpline(x, y, *given)
             for derivative in range(3):
                 close(ours(at, derivative), theirs(at, derivative), 1e-7, 1e-7)
-        self.assertRaisesRegex(ValueError, "must rise", interpolate.CubicSpline, [1, 0], [1, 2])
+        self.assertRaisesRegex(ValueError, "must be increasing", interpolate.CubicSpline, [1, 0], [1, 2])
         self.assertEqual(interpolate.CubicSpline([1.0], [5.0])(3.0), 5.0)
 
     def test_polynomials_and_rationals(self):

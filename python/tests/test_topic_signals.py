@@ -1,4 +1,4 @@
-"""qx.spectra, qx.signals, qx.noise and qx.multirate beside SciPy and NumPy, and their streams."""
+"""qx.spectra, qx.signals, qx.noise and qx.multirate compared with SciPy and NumPy, and their streams."""
 
 import pickle
 import sys
@@ -22,7 +22,7 @@ def close(found, expected, rtol=1e-9, atol=1e-12):
     np.testing.assert_allclose(found, expected, rtol=rtol, atol=atol)
 
 
-# The same cases in each run, and no folder of earlier ones.
+# The same cases in each run, without a database of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")
 
@@ -72,7 +72,7 @@ class Spectra(unittest.TestCase):
                          < 6 * first.error[:, 1:-1]).all())
         close(spectra.csd(x[0], 1j * y[0], 10, **given).values,
               scipy.signal.csd(x[0], 1j * y[0], 10, return_onesided=False, **given)[1])
-        self.assertRaisesRegex(ValueError, "x, y: must have one shape", spectra.csd, x, y[0])
+        self.assertRaisesRegex(ValueError, "x, y: must have the same shape", spectra.csd, x, y[0])
         tables = [pandas.DataFrame(one.T) for one in (x, y)]
         close(spectra.csd(*tables, 10, **given).values.T, spectra.csd(x, y, 10, **given).values)
         found = spectra.welch(tables[0], 10)
@@ -239,7 +239,7 @@ class Multirate(unittest.TestCase):
             inner = slice(len(due) // 6, -len(due) // 6)
             close(found[1][inner], 2 * due[inner], 0, 1e-4)
             close(multirate.respace(x.real, spacing, 2.25), found[0].real, 1e-9, 1e-12)
-        high = np.cos(2 * np.pi * 0.4 * np.arange(3000))  # would fold back
+        high = np.cos(2 * np.pi * 0.4 * np.arange(3000))  # would alias
         self.assertLess(np.abs(multirate.respace(high, 2.0)[300:-300]).max(), 1e-3)
         self.assertEqual(multirate.respace([1.0, 2.0], 1.0, 5.0).size, 0)
         for wrong in ({"spacing": 0}, {"spacing": 1, "start": -1}):
@@ -259,11 +259,11 @@ class Multirate(unittest.TestCase):
             close(multirate.resample_at(given.T, times / 10, 10, axis=0), due.T, 0, 5e-5)
         close(multirate.resample_at(x.imag, np.arange(5.5, 390)), multirate.respace(x.imag, 1.0, 5.5)[:, :385], 0, 1e-12)
         self.assertEqual(multirate.resample_at(x[0], [-1e300, 1e6]).tolist(), [0, 0])
-        # Only what is below half the new rate stays.
+        # Only frequencies below half the new rate remain.
         sparse = np.arange(100, 300, 4.0)
         close(multirate.resample_at(x, sparse, anti_alias=True)[0], at(sparse)[0], 0, 1e-4)
         self.assertLess(np.abs(multirate.resample_at(x, sparse, anti_alias=True)[1:]).max(), 2e-4)
-        for times, reason in (([1.0, np.nan], "finite"), ([[1.0]], "one dimension"), ([2.0, 1.0], "must rise")):
+        for times, reason in (([1.0, np.nan], "finite"), ([[1.0]], "one dimension"), ([2.0, 1.0], "must be increasing")):
             self.assertRaisesRegex(ValueError, reason, multirate.resample_at, x, times, anti_alias=True)
 
     def test_taps_apart(self):
@@ -307,7 +307,7 @@ class Multirate(unittest.TestCase):
             parts.append(stream(part))
             stream = stream.copy()
         found = np.concatenate([*parts, stream.finish()], axis)
-        if which == "shift":  # its rotation begins anew with each block
+        if which == "shift":  # its rotation is restarted with each block
             close(found, whole(), 1e-11)
         else:
             self.assertEqual(found.tobytes(), whole().tobytes())

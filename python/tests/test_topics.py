@@ -1,4 +1,4 @@
-"""What all topics share: places of names, axes, threads, pandas, words and refusals, results, streams."""
+"""What all topics share: where names are found, axes, threads, pandas, words and errors, results, streams."""
 
 import ast
 import doctest
@@ -31,7 +31,7 @@ TOPICS = {name: importlib.import_module(f"qx.{name}") for name in newest.TOPICS}
 SERVED = {export for keys in newest.NEWEST.values() for export in keys.values()}
 SECTIONS = ("Parameters\n", "Returns\n", "Examples\n")
 
-# The same cases in each run, and no folder of earlier ones.
+# The same cases in each run, without a database of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")
 
@@ -61,7 +61,7 @@ class Names(unittest.TestCase):
                 (lambda: qx.fft.rfft([]), ValueError, r"qx\.fft\.rfft: .*\(ErrEmptyInput"),
                 (lambda: qx.fft.rfft(np.zeros((2, 0))), ValueError, r"qx\.fft\.rfft: .*\(ErrEmptyInput"),
                 (lambda: qx.fft.rfft(1.0), ValueError, r"qx\.fft\.rfft: x: an array of at least one dimension"),
-                (lambda: qx.fft.fft(column, axis=2), ValueError, r"qx\.fft\.fft: axis: 2 is none of"),
+                (lambda: qx.fft.fft(column, axis=2), ValueError, r"qx\.fft\.fft: axis: 2 is out of bounds"),
                 (lambda: qx.fft.fft(column, axis=0.5), TypeError, r"qx\.fft\.fft: axis: a whole number"),
                 (lambda: qx.stats.skew([1j, 2]), TypeError, r"qx\.stats\.skew: .* elements of float64"),
                 (lambda: qx.stats.median(rows), TypeError, r"qx\.stats\.median: .* elements of float64"),
@@ -83,7 +83,7 @@ class Names(unittest.TestCase):
                 (lambda: qx.fit.curve(3, [1.0], [1.0], [1]), TypeError, r"qx\.fit\.curve: f: a function is needed"),
                 (lambda: qx.fit.nonlinear("f", [1.0], [1.0], [1]), TypeError, r"nonlinear: f: a function is needed"),
                 (lambda: qx.calculus.quad(None, 0, 1), TypeError, r"qx\.calculus\.quad: f: a function is needed"),
-                (lambda: qx.linalg.solve_banded(1, column, [1.0]), ValueError, r"bands: two numbers are needed"),
+                (lambda: qx.linalg.solve_banded(1, column, [1.0]), ValueError, r"bands: the numbers of diagonals"),
                 (lambda: qx.linalg.solve_banded((0, -1), column, [1.0]), ValueError, r"bands: must be at least 0"),
                 (lambda: qx.measure.delay([], [1.0]), ValueError, r"qx\.measure\.delay: x, y: an array is empty"),
                 (lambda: qx.linalg.toeplitz(3), ValueError, r"qx\.linalg\.toeplitz: c: one dimension")):
@@ -114,7 +114,7 @@ class Names(unittest.TestCase):
             for place in places:
                 topic, *names = place.split(".")
                 self.assertIn(names[0], TOPICS[topic].__all__, f"{export}: {place}")
-                functools.reduce(getattr, names, TOPICS[topic])  # methods, too
+                functools.reduce(getattr, names, TOPICS[topic])  # also methods
             if places and export not in SERVED:
                 self.assertIn("(elder, for comparison)", text, export)
 
@@ -124,7 +124,7 @@ class Names(unittest.TestCase):
                  for elder, revision in re.findall(r"(?m)^\| (`[^|]*) \| (`[^|]*) \|", page)]
         self.assertGreaterEqual(len(pairs), 40)
         elders = {elder: revisions for names, revisions in pairs for elder in names if revisions}
-        # Trends over [-1, 1], where the elder has all digits and is the faster one.
+        # Trends over [-1, 1], where the elder revision has all digits and is faster.
         scaled = {("signals", "detrend"), ("calculus", "velocity")}
         for topic, keys in newest.NEWEST.items():
             for key, export in keys.items():
@@ -132,7 +132,7 @@ class Names(unittest.TestCase):
                     self.assertNotIn(export, elders, f"{topic}.{key}: {elders.get(export)}")
 
     def test_every_key_of_the_table_is_used(self):
-        """By `core.KEY`, or by its name in a text, whole or in two parts, without "_complex" and the like."""
+        """Keys are used as `core.KEY`, or by name in a text, whole or in two parts, without "_complex" and the like."""
         for topic, keys in newest.NEWEST.items():
             files = [TOPICS[topic].__file__, *[measuring.__file__] * (topic == "measure")]
             nodes = [node for file in files for node in ast.walk(ast.parse(Path(file).read_text("utf-8")))]
@@ -167,7 +167,7 @@ class Names(unittest.TestCase):
 
 
 def calls_of(work):
-    """How many Python functions a call enters."""
+    """The number of Python functions that a call enters."""
     count = 0
 
     def seen(frame, event, _):
@@ -191,7 +191,7 @@ class Axes(unittest.TestCase):
                                 (lambda: qx.stats.median(x), lambda: qx.exports.Median_head(x)),
                                 (lambda: qx.special.erf(0.5), lambda: qx.exports.QX_Erf(0.5)),
                                 (lambda: f(x), lambda: qx.exports.IIR_Filter2(x, 0, f._a, f._b, [], 0))):
-            topical(), export()  # written at the first call
+            topical(), export()  # generated at the first call
             self.assertLessEqual(calls_of(topical) - calls_of(export), 3)
 
     @hypothesis.given(strategies.lists(strategies.integers(1, 5), min_size=1, max_size=4), strategies.data())
@@ -277,13 +277,13 @@ class Refusals(unittest.TestCase):
     def test_words_are_listed(self):
         with self.assertRaises(ValueError) as caught:
             qx.filters.butterworth(4, 0.1, "lowpas")
-        self.assertEqual(str(caught.exception), "qx.filters.butterworth: kind: 'lowpas' is none of 'lowpass', "
+        self.assertEqual(str(caught.exception), "qx.filters.butterworth: kind: 'lowpas' is not one of 'lowpass', "
                          "'highpass', 'bandpass', 'bandstop'; did you mean 'lowpass'? (ErrInvalidSelector)")
         self.assertEqual((caught.exception.name, caught.exception.code), ("ErrInvalidSelector", -20061))
         self.assertIsInstance(caught.exception, qx.QxError)
         again = pickle.loads(pickle.dumps(caught.exception))
         self.assertEqual((str(again), again.code), (str(caught.exception), -20061))
-        with self.assertRaisesRegex(ValueError, "0 is none of 'lowpass'"):
+        with self.assertRaisesRegex(ValueError, "0 is not one of 'lowpass'"):
             qx.filters.butterworth(4, 0.1, 0)
 
     def test_whole_numbers(self):
@@ -294,7 +294,7 @@ class Refusals(unittest.TestCase):
 
 @result
 class Sample(Result):
-    """For the tests."""
+    """A result for the tests."""
     places: np.ndarray
     count: int
     level: float

@@ -1,4 +1,4 @@
-"""What type checkers and editors see of the package, used as the README says first: from the tree."""
+"""What type checkers and editors see of the package when it is used from the tree, as the README suggests first."""
 
 import os
 import re
@@ -30,7 +30,7 @@ except qx.QxError as error:
     print(error.name)
 """
 
-# Each line with what is wrong in it.
+# Lines of a program, each with the error in it.
 WRONG = {
     'qx.filters.butterworth(4, 40, "lowpas")': "Literal.'lowpas'",
     "qx.filters.butterworth()": "Missing positional argument",
@@ -44,7 +44,7 @@ WRONG = {
 
 
 def checked(text):
-    """The lines of what a strict mypy finds in a program."""
+    """The lines of the output of mypy --strict for a program."""
     with tempfile.TemporaryDirectory() as name:
         program = Path(name) / "program.py"
         program.write_text(text, "utf-8")

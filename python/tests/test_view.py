@@ -25,7 +25,7 @@ FLAGS = ("--headless --no-sandbox --disable-gpu --disable-quic --no-first-run --
 
 
 class Served:
-    """A server of its own for some files, in a thread."""
+    """A separate server for some files, in a thread."""
 
     def __init__(self, *paths, **options):
         self.opened = [viewing.Opened(str(path), options) for path in paths]
@@ -154,7 +154,7 @@ class Server(InFolder):
         served = self.served(path)
         _, found = served.ask("sections", kind="lowpass", low=100, to=10, window="flattop")
         self.assertRegex(found["html"], r"Tone at 50\.5\d* ")
-        self.assertRegex(found["html"], r"what is left</td><td class=\"value\">0\.70\d+<")
+        self.assertRegex(found["html"], r"Standard deviation of the result</td><td class=\"value\">0\.70\d+<")
         self.assertIn("flattop", "".join(plot["title"] for plot in found["plots"]))
         _, found = served.ask("sections", channel=1, **{"from": 6, "to": 8})
         self.assertRegex(found["html"], r"Mean</td><td class=\"value\">3<")
@@ -180,7 +180,7 @@ class InABrowser(InFolder):
             "width": width, "height": 900, "deviceScaleFactor": 1, "mobile": False})
         self.browser.execute_cdp_cmd("Emulation.setEmulatedMedia", {
             "features": [{"name": "prefers-color-scheme", "value": "dark" if dark else "light"}]})
-        self.browser.get("about:blank")  # an earlier page may ask its server to the last
+        self.browser.get("about:blank")  # an earlier page may still send requests to its server
         self.browser.get_log("browser")
         self.browser.get(address)
         self.until("return document.querySelectorAll('figure.plot canvas').length > 0 || !window.figures")
@@ -220,10 +220,10 @@ class InABrowser(InFolder):
         self.no_complaints()
 
     def test_what_files_say_stays_text(self):
-        """A file, its columns, its notes and its unit are called by what would run if it were taken for a page."""
+        """The names of a file, its columns, its notes and its unit are scripts that must not run in a page."""
         attack = "<img src=x onerror=window.attacked=1>"
         ends = "</script></title><script>window.attacked=1</script>"
-        path = self.folder / f"{attack}&'\".csv"  # a name has no slash
+        path = self.folder / f"{attack}&'\".csv"  # a file name has no slash
         path.write_text(f"# {ends} {attack}\ntime (s);{attack} (<b>);{ends}{attack}\n"
                         + "".join(f"{i / 10};{i % 7};{i % 5}\n" for i in range(99)))
         served = self.served(path, ECG)
@@ -257,7 +257,7 @@ class InABrowser(InFolder):
             "return figures[0].graph.file_.filter(row => row[0] >= 10 && row[0] < 10.5).map(row => row[1])")
         x = np.loadtxt(ECG, skiprows=2)
         np.testing.assert_allclose(values, x[3600:3780], atol=1e-6)
-        self.browser.find_element("css selector", "button[title^='all of it']").click()
+        self.browser.find_element("css selector", "button[title^='show all']").click()
         self.assertGreater(self.until("const r = figures[0].graph.xAxisRange(); return r[1] - r[0]"), 29)
         log = self.browser.find_element("css selector", ".tools input")
         log.click()
@@ -273,11 +273,18 @@ class InABrowser(InFolder):
             "one => one.getBoundingClientRect().right <= 390)"))
         self.show(self.page())
         self.assertTrue(self.browser.execute_script("""
-            const taken = [], canvas = document.createElement("canvas").getContext("2d");
+            const canvas = document.createElement("canvas").getContext("2d");
             canvas.font = "11px sans-serif";
-            for (let i = 0; i < 6; i++) label(canvas, {x: 0, y: 0, w: 300, h: 200}, taken, "90%", 100 + i, 100);
-            return taken.length > 1 && taken.length < 6 && taken.every(([x, y, w], i) => taken.every(([a, b, v], k) =>
-              i === k || x >= a + v || a >= x + w || Math.abs(y - b) >= 13));"""))
+            const labels = marks => {
+              const taken = marks.map(([x, y]) => [x - 4, y - 4, 8, 8]);
+              for (const [x, y] of marks) label(canvas, {x: 0, y: 0, w: 300, h: 200}, taken, "5.00", x, y);
+              const found = taken.slice(marks.length);
+              return found.every(one => one[0] >= 0 && taken.every(other => one === other || one[0] >= other[0] + other[2]
+                || other[0] >= one[0] + one[2]
+                || one[1] >= other[1] + other[3] || other[1] >= one[1] + one[3])) && found.length;
+            };
+            const crowd = labels(Array.from({length: 60}, (_, i) => [100 + i / 10, 100]));
+            return labels([[1, 8], [2, 11], [5, 14]]) === 3 && crowd > 3 && crowd < 60;"""))
         self.no_complaints()
 
     def test_the_index_sorts(self):
@@ -309,7 +316,7 @@ class InABrowser(InFolder):
                                    np.sin(2 * np.pi * 50.5 * np.array([row[0] for row in seen])), atol=1e-5)
         first = self.browser.current_window_handle
         self.browser.switch_to.new_window("tab")
-        self.show(served.address, dark=True)  # beside the other, with choices of its own
+        self.show(served.address, dark=True)  # beside the other window, with its own choices
         self.browser.execute_script(
             "for (const [name, value] of [['kind', 'highpass'], ['low', '200'], ['from', '2'], ['to', '4']])"
             "  form.elements[name].value = value;"
@@ -328,13 +335,13 @@ class InABrowser(InFolder):
         self.browser.refresh()
         self.until(sections + ".includes('201000 samples')")
         path.unlink()
-        self.until("return state.textContent.includes('is gone')")
+        self.until("return state.textContent.includes('no longer exists')")
         self.browser.refresh()
         self.until("return document.body.textContent.includes('no such file')")
         self.until(sections + ".includes('201000 samples')")
 
     def test_the_picture_of_the_readme(self):
-        """docs/page.png is the page of the example; QX_PICTURE=1 makes it anew."""
+        """docs/page.png shows the page of the example; QX_PICTURE=1 writes it again."""
         import base64
         import io
 
@@ -352,7 +359,7 @@ class InABrowser(InFolder):
         kept = Image.open(PICTURE)
         self.assertEqual(kept.size, made.size)
         away = np.abs(np.asarray(kept.convert("RGB"), float) - np.asarray(made.convert("RGB"), float))
-        self.assertLess(away.mean(), 6)  # of 255; another version of the browser draws letters otherwise
+        self.assertLess(away.mean(), 6)  # of 255; other versions of the browser draw letters differently
 
 
 if __name__ == "__main__":

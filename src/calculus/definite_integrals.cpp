@@ -8,7 +8,7 @@ namespace qx {
 
 namespace {
 
-// Panels of a rule, from the sample at `first` on, each a sum in the stated order.
+// The sum of the panels of a rule from sample `first` on; each panel is summed in the stated order.
 template <class Panel>
 double SumOfPanels(const DBL *x, int32_t first, int32_t panels, int32_t width, const Panel &panel) {
     double sum = 0.0;
@@ -24,7 +24,7 @@ double BodePanel(const DBL *x) {
     return 14.0 * x[0] + 64.0 * x[1] + 24.0 * x[2] + 64.0 * x[3] + 14.0 * x[4];
 }
 
-// The whole panels behind the first `from` samples.
+// The integral over the whole panels after the first `from` intervals.
 double Panels(const DBL *x, int32_t n, double h, int32_t rule, int32_t from) {
     const int32_t width = rule + 1;
     const int32_t panels = (n - 1 - from) / width;
@@ -48,7 +48,7 @@ double TrapezoidSum(const DBL *x, int32_t n, double h) {
     return SumBetween(x, 1, n - 1, (x[n - 1] + x[0]) * 0.5 + 0.0) * h;
 }
 
-// The last `rest` intervals by the trapezoid, Simpson's or the 3/8 rule.
+// The integral over the last `rest` intervals by the trapezoidal, Simpson's or the 3/8 rule.
 double AtEnd(const DBL *last, int32_t rest, double h) {
     switch (rest) {
     case 1:
@@ -62,7 +62,7 @@ double AtEnd(const DBL *last, int32_t rest, double h) {
     }
 }
 
-// The first `rest` intervals by the interpolating polynomial of the rule's own order.
+// The integral over the first `rest` intervals by the interpolating polynomial of the rule's order.
 double AtStart(const DBL *x, int32_t rule, int32_t rest, double h) {
     if (rest == 0)
         return 0.0;
@@ -79,7 +79,7 @@ double AtStart(const DBL *x, int32_t rule, int32_t rest, double h) {
     return (27.0 * x[0] + 102.0 * x[1] + 72.0 * x[2] + 42.0 * x[3] - 3.0 * x[4]) * h / 80.0;
 }
 
-// kept: with formulas at the start the count is checked first, also against a rule that does not
+// kept: with formulas at the start the count is checked before the rule, even if the rule does not
 // exist.
 ErrorCode CheckSamples(std::ptrdiff_t n, int32_t rule, Remainder remainder) {
     if (remainder == Remainder::LowerRuleAtEnd)
@@ -133,7 +133,7 @@ ErrorCode DefiniteIntegral2D(const ConstRealMatrix &x, ConstRealVector dts, int3
     return DefiniteIntegral({ofRows.data(), x.rows()}, dts[1], rule, remainder, result);
 }
 
-// kept: the last dimension counts the planes, whatever its place in the block.
+// kept: the last dimension is the number of planes, whatever its position in the block.
 ErrorCode DefiniteIntegral3D(const Volume &x, ConstRealVector dts, int32_t rule,
                              Remainder remainder, double *result) {
     if (const ErrorCode bad =

@@ -7,7 +7,7 @@ namespace qx {
 
 enum DifferentiationRule : int32_t { CentralSecondOrder, CentralFourthOrder, Forward, Backward };
 
-// `out` may be x. The values beyond the data are at least as many as the rule looks at.
+// `out` may be x. There must be at least as many values beyond the data as the rule reads.
 void Differentiate(ConstRealVector x, double dt, ConstRealVector initial, ConstRealVector final,
                    DifferentiationRule rule, RealVector out);
 

@@ -19,7 +19,7 @@ enum IntegrationRule : int32_t {
 // the data, or by a formula of the rule's order at its start.
 enum class Remainder { LowerRuleAtEnd, OwnOrderAtStart };
 
-// Elements that a block of three dimensions holds.
+// The elements of a block of three dimensions.
 struct Volume {
     const DBL *data;
     int32_t rows, cols, planes;
@@ -28,8 +28,8 @@ struct Volume {
     }
 };
 
-// include/qx/calculus.h has what they compute and their codes, of which only ErrEmptyInput and
-// ErrSamplingNotPositive are the frames'.
+// include/qx/calculus.h documents what they compute and their codes, of which only ErrEmptyInput
+// and ErrSamplingNotPositive come from the frames of the exports.
 ErrorCode DefiniteIntegral(ConstRealVector x, double dt, int32_t rule, Remainder remainder,
                            double *result);
 ErrorCode DefiniteIntegral2D(const ConstRealMatrix &x, ConstRealVector dts, int32_t rule,
@@ -37,8 +37,8 @@ ErrorCode DefiniteIntegral2D(const ConstRealMatrix &x, ConstRealVector dts, int3
 ErrorCode DefiniteIntegral3D(const Volume &x, ConstRealVector dts, int32_t rule,
                              Remainder remainder, double *result);
 
-// The running integral, `out` may be x. The values beyond the data are at least as many as the rule
-// looks at.
+// The running integral; `out` may be x. There must be at least as many values beyond the data as
+// the rule reads.
 void RunningIntegral(ConstRealVector x, double dt, ConstRealVector initial, ConstRealVector final,
                      IntegrationRule rule, RealVector out);
 ErrorCode RunningIntegral2017(ConstRealVector x, double dt, int32_t rule, RealVector out);

@@ -5,13 +5,14 @@
 
 namespace qx {
 
-// What stands beyond the ends of n samples: x[-2], x[-1] and x[n], x[n+1].
+// The values beyond the ends of n samples: x[-2], x[-1] and x[n], x[n+1].
 struct Beyond {
     double before[2];
     double behind[2];
 };
 
-// As many as the formula looks at, the others 0: the last of `before` is x[-1].
+// Takes as many values as the formula reads and sets the others to 0; the last of `before` is
+// x[-1].
 inline Beyond ValuesBeyond(ConstRealVector initial, int32_t initialCount, ConstRealVector final,
                            int32_t finalCount) {
     QX_EXPECTS(initial.size() >= initialCount && final.size() >= finalCount);
@@ -23,8 +24,8 @@ inline Beyond ValuesBeyond(ConstRealVector initial, int32_t initialCount, ConstR
     return beyond;
 }
 
-// out[i] = formula(x[i-2], x[i-1], x[i], x[i+1], x[i+2]). Reading runs ahead of writing, so `out`
-// may be x.
+// out[i] = formula(x[i-2], x[i-1], x[i], x[i+1], x[i+2]). Each sample is read before it is
+// overwritten, so `out` may be x.
 template <class Formula>
 void FromNeighbours(ConstRealVector x, const Beyond &beyond, RealVector out, Formula formula) {
     const auto n = static_cast<int32_t>(x.size());

@@ -6,7 +6,7 @@ namespace qx {
 
 namespace {
 
-// The running sum of panels, each times its factor.
+// The running sum of panels, each multiplied by the factor.
 template <class Panel>
 void SumPanels(ConstRealVector x, const Beyond &beyond, double factor, RealVector out,
                const Panel &panel) {
@@ -16,7 +16,7 @@ void SumPanels(ConstRealVector x, const Beyond &beyond, double factor, RealVecto
     });
 }
 
-// From y[0] = 0: y[i] takes in x[i - lag].
+// Starts from y[0] = 0; y[i] adds x[i - lag].
 void SumRectangles(ConstRealVector x, double dt, int32_t lag, RealVector out) {
     double before = x[0];
     double sum = 0.0;
@@ -65,7 +65,7 @@ void RunningIntegral(ConstRealVector x, double dt, ConstRealVector initial, Cons
 namespace {
 
 // y[i] = y[i - width] + panel(x[i - width] ... x[i]) factor from i = width on, where the first
-// `width` values of y stand already. The samples that these stood on come from `first`.
+// `width` values of y are given. The samples that these have overwritten are read from `first`.
 template <int32_t Width, class Panel>
 void ChainPanels(ConstRealVector x, const double *first, double factor, RealVector out,
                  const Panel &panel) {
@@ -93,7 +93,7 @@ ErrorCode RunningIntegral2017(ConstRealVector x, double dt, int32_t rule, RealVe
         RunningIntegral(x, dt, {}, {}, static_cast<IntegrationRule>(rule), out);
         return 0;
     }
-    double s[5]; // the samples that the first values overwrite
+    double s[5]; // a copy of the samples that the first values overwrite
     for (int32_t k = 0; k < rule + 2; ++k)
         s[k] = x[k];
     out[0] = 0.0;

@@ -8,8 +8,8 @@
 
 namespace qx {
 
-// The view of a block of three dimensions, In<DBL3D>; no other family has such blocks, and none is
-// an output.
+// The view of a block of three dimensions, In<DBL3D>; no other family uses such blocks, and they
+// are never outputs.
 template <>
 struct HandleTraits<DBL3D> : NumericHandle<ElementType::DBL, 3> {};
 

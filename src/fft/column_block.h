@@ -9,12 +9,12 @@
 
 namespace qx {
 
-// Columns of a row-major matrix, copied out side by side so that a transform finds each of them
-// contiguous. Several are moved at a time, because a fetched cache line holds several.
+// Columns of a row-major matrix are copied out, so that each is contiguous for its transform. Several are
+// moved at a time, because each cache line holds values of several columns.
 constexpr int32_t ColumnsAtOnce = 16;
 
-// The distance between rows or columns of n values in work memory. The spare line keeps those of
-// a power-of-two length from falling into the same cache set.
+// The distance between rows or columns of n values in work memory. The spare line keeps rows or columns
+// of a power-of-two length from mapping to the same cache set.
 inline int64_t PaddedPitch(int32_t n) { return int64_t{n} + 8; }
 
 inline int32_t ColumnsInBlock(int32_t first, int32_t cols) {

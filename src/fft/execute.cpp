@@ -19,14 +19,14 @@ bool IsInterleaved(const DBL *re, const DBL *im, ptrdiff_t stride) {
     return im == re + 1 && stride == 2;
 }
 
-// Complex data at any strides, real and imaginary parts in arrays of their own.
+// Complex data at any strides, with real and imaginary parts in separate arrays.
 struct ComplexData {
     const DBL *inRe, *inIm;
     DBL *outRe, *outIm;
     ptrdiff_t inStride, outStride;
     DBL *work;
 
-    // The part that begins `in` inputs and `out` results behind, with every p-th input.
+    // The part that begins `in` inputs and `out` results later and takes every p-th input.
     ComplexData part(ptrdiff_t in, ptrdiff_t out, ptrdiff_t p) const {
         return {inRe + in * inStride,
                 inIm + in * inStride,
@@ -79,9 +79,9 @@ struct RealData {
     }
 };
 
-// The recursion. At level L a transform of n values with the factor p is p transforms of every
-// p-th value, one behind the other, and then the twiddle stage over all of them. The leaf takes the
-// p transforms of the last level but one at once.
+// The recursion. At each level, a transform of n values with the factor p consists of p transforms of
+// every p-th value, one after the other, and then the twiddle stage over all of them. At the last level
+// but one, the leaf computes the p transforms in one call.
 template <class Data>
 void Recurse(const FFTPlan &plan, int32_t level, int32_t n, const Data &data) {
     const int32_t p = plan.factors[level];
@@ -95,19 +95,26 @@ void Recurse(const FFTPlan &plan, int32_t level, int32_t n, const Data &data) {
     data.twiddle(plan, level, m);
 }
 
-// The recursion in SIMD lanes, for results that lie side by side and a leaf with kernels. Several
-// transforms of one level run together where their inputs are neighbours, so that the leaf reads
-// whole cache lines.
+// The recursion in SIMD lanes, for contiguous results and a leaf with kernels. Several transforms of one
+// level run together if their inputs are neighbours, so that the leaf reads whole cache lines.
 struct Bundle {
     ptrdiff_t count;
     ptrdiff_t inStride;  // from the input of one to that of the next
     ptrdiff_t outStride; // from the results of one to those of the next
+    // After every `fold` transforms, the results continue foldStride after the first of these.
+    ptrdiff_t fold = PTRDIFF_MAX;
+    ptrdiff_t foldStride = 0;
+
+    ptrdiff_t resultsOf(ptrdiff_t b) const {
+        return b < fold ? b * outStride : b % fold * outStride + b / fold * foldStride;
+    }
 };
 
-// What differs between complex and real data. The stage takes blocks `inLeg` apart and leaves its
-// results side by side.
+// What differs between complex and real data. A stage takes blocks that are `inLeg` apart and writes
+// contiguous results.
 struct ComplexLanesPath {
     static constexpr ptrdiff_t width = 2; // DBL units of one value
+    static constexpr ptrdiff_t bundle = complexBundle;
     static bool gainsByBuffer(int32_t, int32_t) { return true; }
     static void leaf(const LanesPasses &passes, const DBL *in, DBL *out,
                      const LeafColumns &columns) {
@@ -123,8 +130,9 @@ struct ComplexLanesPath {
 };
 struct RealLanesPath {
     static constexpr ptrdiff_t width = 1;
-    // Only where the columns are copied in any case. Two places double the addresses of a stage,
-    // which reads from two ends of each block: 10^3 to 10^5 took 1.15 to 1.3 times as long.
+    static constexpr ptrdiff_t bundle = realBundle;
+    // Only if the columns are copied in any case. Separate input and output double the addresses of a
+    // stage, which reads from both ends of each block: 10^3 to 10^5 took 1.15 to 1.3 times as long.
     static bool gainsByBuffer(int32_t p, int32_t m) { return p > 4 && m % 256 == 0; }
     static void leaf(const LanesPasses &passes, const DBL *in, DBL *out,
                      const LeafColumns &columns) {
@@ -139,7 +147,7 @@ struct RealLanesPath {
     }
 };
 
-// What a transform works in besides its results; either may be null.
+// The memory of a transform besides its results; either pointer may be null.
 struct LanesMemory {
     DBL *work;   // of the prime stages
     DBL *buffer; // of the plan's bufferLevel
@@ -159,32 +167,51 @@ void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, 
         const LanesPasses &passes = plan.stages[level + 1]->passes;
         if (bundle.count == 1)
             Path::leaf(passes, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
-        else
+        else if (bundle.fold == PTRDIFF_MAX)
             Path::leaf(passes, in, blocks,
                        {{bundle.count, p},
                         {bundle.inStride, inStride},
                         {nextBlocks, block},
                         p * inStride});
+        else
+            for (ptrdiff_t j = 0; j < p; ++j)
+                Path::leaf(passes, in + j * inStride, blocks + j * block,
+                           {{bundle.fold, bundle.count / bundle.fold},
+                            {bundle.inStride, bundle.fold * bundle.inStride},
+                            {nextBlocks, bundle.foldStride},
+                            p * inStride});
     } else if (bundle.count > 1) {
-        for (ptrdiff_t j = 0; j < p; ++j)
-            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, blocks + j * block,
-                               p * inStride, {bundle.count, bundle.inStride, nextBlocks}, memory);
+        // If the inputs of the next blocks follow those of a short bundle, these blocks join it.
+        const ptrdiff_t more = Path::bundle / bundle.count;
+        const bool follow = bundle.fold == PTRDIFF_MAX && more > 1 &&
+                            Path::bundle % bundle.count == 0 && p % Path::bundle == 0 &&
+                            inStride == bundle.count * bundle.inStride;
+        const ptrdiff_t step = follow ? more : 1;
+        for (ptrdiff_t j = 0; j < p; j += step)
+            RecurseLanes<Path>(
+                plan, level + 1, m, in + j * inStride, blocks + j * block, p * inStride,
+                follow
+                    ? Bundle{more * bundle.count, bundle.inStride, nextBlocks, bundle.count, block}
+                    : Bundle{bundle.count, bundle.inStride, nextBlocks, bundle.fold,
+                             bundle.foldStride},
+                memory);
     } else {
-        for (ptrdiff_t j = 0; j < p; j += leafBundle)
+        const ptrdiff_t together = p % Path::bundle == 0 ? Path::bundle : 8;
+        for (ptrdiff_t j = 0; j < p; j += together)
             RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, blocks + j * block,
-                               p * inStride,
-                               {std::min<ptrdiff_t>(leafBundle, p - j), inStride, block}, memory);
+                               p * inStride, {std::min(together, p - j), inStride, block}, memory);
     }
     for (ptrdiff_t b = 0; b < bundle.count; ++b) {
-        DBL *const results = out + b * bundle.outStride;
+        DBL *const results = out + bundle.resultsOf(b);
         if (plan.kinds[level] == KernelFactor)
-            Path::twiddle(*plan.stages[level], blocks + b * nextBlocks, block, results, m);
+            Path::twiddle(*plan.stages[level], buffered ? blocks + b * nextBlocks : results, block,
+                          results, m);
         else
             Path::primeTwiddle(PrimeAt(plan, level), results, m, memory.work);
     }
 }
 
-// The buffer of a plan while one transform has it.
+// Borrows the buffer of a plan for one transform.
 class BufferLoan {
 public:
     explicit BufferLoan(const FFTPlan &plan)
@@ -196,7 +223,7 @@ public:
     BufferLoan(const BufferLoan &) = delete;
     BufferLoan &operator=(const BufferLoan &) = delete;
 
-    // At the next cache line, or null.
+    // The first cache line of the buffer, or null.
     DBL *data() const {
         const auto address = reinterpret_cast<std::uintptr_t>(memory_);
         return reinterpret_cast<DBL *>((address + 63) / 64 * 64);
@@ -329,10 +356,10 @@ bool ExecuteComplexColumns(const FFTPlan &plan, const DBL *in, ptrdiff_t inPitch
                            ptrdiff_t outPitch, ptrdiff_t count, DBL *work) {
     if (plan.whole.complex != nullptr || plan.factorCount < 2 || !LeafHasKernels(plan))
         return false;
-    for (ptrdiff_t c = 0; c < count; c += leafBundle)
+    for (ptrdiff_t c = 0; c < count; c += complexBundle)
         RecurseLanes<ComplexLanesPath>(
             plan, 0, plan.length, in + 2 * c, out + 2 * c * outPitch, 2 * inPitch,
-            {std::min<ptrdiff_t>(leafBundle, count - c), 2, 2 * outPitch}, {work, nullptr});
+            {std::min<ptrdiff_t>(complexBundle, count - c), 2, 2 * outPitch}, {work, nullptr});
     return true;
 }
 
@@ -385,11 +412,11 @@ ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStrid
     return 0;
 }
 
-// The same with work memory of their own.
+// The same, with work memory that they allocate themselves.
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                             DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
-    // Short transforms feel every call and the scope of a block.
+    // For short transforms, each call and the scope of a scratch block are noticeable.
     if (plan->whole.complex != nullptr && n == plan->length &&
         IsInterleaved(inRe, inIm, inStride) && IsInterleaved(outRe, outIm, outStride)) {
         plan->whole.complex(inRe, outRe);

@@ -14,10 +14,10 @@ void Append(FFTPlan *plan, int32_t factor, int32_t kind) {
     ++plan->factorCount;
 }
 
-// Estimated times, in tenths of a nanosecond on the machine that fft/README.md names. What is
-// chosen by them must be the same everywhere, so they are whole numbers.
+// Estimated times, in tenths of a nanosecond on the machine that fft/README.md names. They are whole
+// numbers, so that every target makes the same choices.
 
-// One value in one stage.
+// The cost of one value in one stage.
 int64_t KernelCost(int32_t p) {
     if (p % 2 != 0 && p > 10)
         return 3 * p / 5;
@@ -29,7 +29,7 @@ int64_t KernelCost(int32_t p) {
 
 int64_t RaderCost(int32_t p);
 
-// One transform.
+// The cost of one transform.
 int64_t Cost(int32_t length) {
     FFTPlan plan = {};
     plan.length = length;
@@ -45,8 +45,8 @@ int64_t Cost(int32_t length) {
     return cost;
 }
 
-// Of the transform of a prime by a convolution of that length: its two transforms and the passes
-// over the data.
+// The cost of the transform of a prime by a convolution of that length: its two transforms and the
+// passes over the data.
 int64_t CostByLength(int32_t p, int32_t length) { return 2 * Cost(length) + 30 * int64_t{p}; }
 
 // The cheapest length for the padded convolution.
@@ -96,7 +96,7 @@ void Factorise(FFTPlan *plan) {
 }
 
 int32_t RaderLength(int32_t p) {
-    constexpr int32_t smallestPadded = 128;    // below, all sub-plans stay those of p - 1
+    constexpr int32_t smallestPadded = 128;    // below, all convolutions have length p - 1
     constexpr int32_t largestPadded = 1 << 24; // its work memory fits int32
     if (p < smallestPadded || p > largestPadded)
         return p - 1;

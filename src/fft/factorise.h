@@ -10,9 +10,9 @@ namespace qx {
 // Fills in the factors of the plan's length, ascending, with their kinds.
 void Factorise(FFTPlan *plan);
 
-// The length of the cyclic convolution by which Rader's algorithm transforms a prime p: p - 1, or
-// where p - 1 has large prime factors and a transform of small factors is far cheaper, an even
-// length from 2 (p - 1) - 1 up, for data padded with zeros.
+// The length of the cyclic convolution by which Rader's algorithm transforms a prime p: p - 1, or, if
+// p - 1 has large prime factors and a length of small factors is much cheaper, an even length of at
+// least 2 (p - 1) - 1, for data padded with zeros.
 int32_t RaderLength(int32_t p);
 
 } // namespace qx

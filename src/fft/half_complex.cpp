@@ -15,7 +15,7 @@ void SetElement(DBL *buffer, std::ptrdiff_t i, double re, double im) {
 void ExpandPlain(DBL *buffer, std::ptrdiff_t n) {
     const DBL *const h = buffer + n;
     const double nyquist = h[n / 2];
-    // Element k ends at 2k + 1, which reaches into h only where h[0] stood.
+    // Element k ends at 2k + 1 and overlaps h only at h[0].
     SetElement(buffer, 0, h[0], 0);
     const auto pairs = static_cast<int32_t>((n - 1) / 2);
     JoinMirrored(h + 1, h + n - 1, buffer + 2, pairs);
@@ -29,7 +29,7 @@ void ExpandShifted(DBL *buffer, std::ptrdiff_t n) {
     const std::ptrdiff_t middle = n / 2;
     const double zeroFrequency = h[0];
     const double nyquist = h[middle];
-    // The elements above the middle one stand behind h, which is overwritten after them.
+    // The elements above the middle one lie after h, which is overwritten later.
     const auto pairs = static_cast<int32_t>((n - 1) / 2);
     DBL *const zero = buffer + 2 * middle;
     JoinMirrored(h + 1, h + n - 1, zero + 2, pairs);

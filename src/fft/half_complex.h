@@ -7,12 +7,12 @@
 
 namespace qx {
 
-// Between the half-complex form h of a spectrum of n values (h[k] = Re X[k], h[n-k] = Im X[k])
+// Conversions between the half-complex form h of a spectrum of n values (h[k] = Re X[k], h[n-k] = Im X[k])
 // and the full spectrum, interleaved, in plain or, with `shift` non-zero, in shifted order.
 
-// Expands in place a buffer of n complex values in which h lies in one piece, as transforms of
-// stride 1, which are the faster ones, give it: its place is at the end of the buffer in plain
-// order, at the start in shifted order.
+// FFTCompactToFull expands h in place in a buffer of n complex values. h is contiguous in it, because
+// transforms of stride 1 are faster: at the end of the buffer for plain order, at the start for shifted
+// order. CompactHalf returns that place.
 inline DBL *CompactHalf(DBL *buffer, int32_t n, int32_t shift) {
     return shift == 0 ? buffer + n : buffer;
 }

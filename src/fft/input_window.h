@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// The `size` values of an input that a transform reads from `offset` on: the input itself where
-// they all lie in it, else a scratch copy with zeros before the input's start and behind its end.
+// The `size` values of an input that a transform reads from `offset` on: the input itself if it
+// contains them all, else a scratch copy with zeros before the input's start and after its end.
 template <ElementType Code>
 class InputWindow {
 public:

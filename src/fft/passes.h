@@ -8,12 +8,12 @@
 
 namespace qx {
 
-// The passes over whole arrays before and behind the transforms, for values side by side.
+// The passes over whole arrays before and after the transforms, for contiguous values.
 
 // Sums and differences of mirrored values: half-complex form to Hartley form and back. For k from 1
 // to (n - 1) / 2, value k becomes itself less value n - k, and value n - k their sum.
 QX_BY_WIDTH(void, MirrorSums, (DBL * values, int32_t n))
-// The same of all values times `scale`.
+// The same, with all values multiplied by `scale` first.
 QX_BY_WIDTH(void, ScaledMirrorSums, (DBL * values, double scale, int32_t n))
 
 // n interleaved complex values times `scale`, k and n - k exchanged: a forward transform becomes an

@@ -28,7 +28,7 @@ struct Times {
     }
 };
 
-// For k onward, one pair in each lane; scaled(x) is what a value counts for.
+// Pairs from k on, one in each lane; scaled(x) is the value that replaces x.
 template <class L, class Scaled>
 QX_INLINE void MirrorSome(DBL *values, ptrdiff_t k, ptrdiff_t n, const Scaled &scaled) {
     const ptrdiff_t opposite = n - k - (L::count - 1);
@@ -70,7 +70,7 @@ void ScaleReversed(DBL *values, double scale, int32_t n) {
         ReversedPairs(b).store(low);
         ReversedPairs(a).store(high - nativeLanes);
     }
-    for (; high - low >= 2; low += 2, high -= 2) { // they may be the same value at last
+    for (; high - low >= 2; low += 2, high -= 2) { // the last two may be the same value
         const Lanes<2> a = Lanes<2>::load(low) * Lanes<2>(scale);
         const Lanes<2> b = Lanes<2>::load(high - 2) * Lanes<2>(scale);
         b.store(low);

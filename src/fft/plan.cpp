@@ -21,14 +21,14 @@ namespace {
 
 using std::ptrdiff_t;
 
-// The cache: every plan that has a holder, the newest first. The mutex lives as long as the
-// process and has no destructor: the host may sweep plans from its last exit handler.
+// The cache: every plan in use, the newest first. The mutex lives as long as the process and is never
+// destroyed, because the host may release plans from its last exit handler.
 alignas(platform::Mutex) unsigned char cacheMutexMemory[sizeof(platform::Mutex)];
 platform::Mutex &cacheMutex = *new (cacheMutexMemory) platform::Mutex;
 FFTPlan *cacheHead = nullptr;
 
-// A table from the heap, for a plan outlives the workspace. Sizes that int32 cannot count are
-// refused on every target alike; an empty table takes no memory and stays null.
+// A table from the heap, because a plan outlives the workspace. Sizes beyond int32 are refused on every
+// target; an empty table takes no memory and stays null.
 template <class T>
 bool Allocate(T *&table, int64_t count) {
     if (count == 0)
@@ -39,7 +39,7 @@ bool Allocate(T *&table, int64_t count) {
     return table != nullptr;
 }
 
-// A table of this file alone, given back with the scope.
+// A temporary table, released with the scope.
 struct TemporaryTable {
     explicit TemporaryTable(int64_t count) : isThere(Allocate(data, count)) {}
     ~TemporaryTable() { std::free(data); }
@@ -55,10 +55,10 @@ struct TemporaryTable {
     bool isThere;
 };
 
-// The powers of exp(-i theta) from the first up: each from the one before by a recurrence whose
-// error stays small because 1 - cos(theta), formed without cancellation, is small. What a rounding
-// takes from one power is handed on to the next, as in Kahan's summation (1965); without that the
-// errors of a hundred thousand steps add up to a hundred times that of one.
+// The powers of exp(-i theta) from the first up: each follows from the previous one by a recurrence whose
+// error stays small because 1 - cos(theta), formed without cancellation, is small. The rounding error of
+// each power is carried to the next, as in Kahan's summation (1965); without that, the errors of a
+// hundred thousand steps add up to a hundred times the error of one.
 class Roots {
 public:
     Roots() = default;
@@ -150,7 +150,7 @@ int32_t PowerModulo(int32_t base, int32_t exponent, int32_t p) {
 // The smallest g whose powers reach 1 modulo the prime p only after p - 1 steps: no power to
 // (p - 1) / q with a prime q is 1.
 int32_t Generator(int32_t p) {
-    int32_t primes[9]; // the product of the first ten passes int32
+    int32_t primes[9]; // the product of the first ten primes exceeds int32
     int32_t count = 0;
     int32_t rest = p - 1;
     for (int32_t q = 2; int64_t{q} * q <= rest; ++q) {
@@ -184,11 +184,11 @@ void BuildRaderOrders(FFTStage *stage, int32_t p) {
 }
 
 // The spectrum of the roots in the order of the powers of the generator. A padded convolution of
-// n values begins with those p - 1 and ends with the last p - 2 of them, so that every sum over
+// n values begins with those p - 1 values and ends with the last p - 2 of them, so that every sum over
 // the orders wraps around as it does without padding.
 bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
     TemporaryTable ordered(2 * int64_t{n});
-    TemporaryTable spectrum(2 * int64_t{n}); // the roots, before
+    TemporaryTable spectrum(2 * int64_t{n}); // holds the roots first
     TemporaryTable work(stage->raderPlan->complexWork);
     if (!ordered.isThere || !spectrum.isThere || !work.isThere)
         return false;
@@ -209,7 +209,7 @@ bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
     }
     ExecuteComplex(*stage->raderPlan, ordered.data, ordered.data + 1, spectrum.data,
                    spectrum.data + 1, 2, 2, work.data);
-    ordered.release(); // before more is taken
+    ordered.release(); // before more memory is allocated
     if (!Allocate(stage->raderCos, n) || !Allocate(stage->raderSin, n))
         return false;
     for (ptrdiff_t k = 0; k < n; ++k) {
@@ -263,10 +263,11 @@ void MeasureWork(FFTPlan *plan) {
     }
 }
 
-// From the second level on only where the first alone would leave the blocks of the second in each
-// other's cache sets.
+// The buffer serves the first level, or the second if the first factor is so small that the blocks of the
+// second would otherwise share cache sets.
 bool BuildBuffer(FFTPlan *plan) {
-    constexpr int32_t longestBuffered = 1 << 17; // beyond, the memory costs what the order gains
+    constexpr int32_t longestBuffered = 1
+                                        << 17; // beyond, the extra memory costs as much as it gains
     const int32_t level = plan->factorCount > 3 && plan->factors[0] <= 4 ? 1 : 0;
     plan->bufferLevel = -1;
     if (plan->factorCount < 2 || plan->length > longestBuffered ||
@@ -296,7 +297,7 @@ void FillKernels(FFTPlan *plan) {
     plan->whole = WholeOf(plan->length);
 }
 
-// Releases a plan, whole or as far as it was built.
+// Releases a plan that is complete or partly built.
 void Dismantle(FFTPlan *plan) {
     for (FFTStage *stage : plan->stages) {
         if (stage == nullptr)
@@ -329,7 +330,7 @@ FFTPlan *Build(int32_t length) {
     return plan;
 }
 
-// The next three run under the mutex.
+// The next three functions run under the mutex.
 
 FFTPlan *Find(int32_t length) {
     for (FFTPlan *plan = cacheHead; plan != nullptr; plan = plan->next) {
@@ -349,7 +350,7 @@ void Insert(FFTPlan *plan) {
     cacheHead = plan;
 }
 
-// Whether that was the last holder, and the plan is out of the cache.
+// Returns whether that was the last reference and the plan has left the cache.
 bool LeaveCache(FFTPlan *plan) {
     if (--plan->refCount > 0)
         return false;
@@ -361,8 +362,8 @@ bool LeaveCache(FFTPlan *plan) {
 
 } // namespace
 
-// A plan is built and dismantled outside the mutex, so that nobody waits for a long one. Of two
-// threads that build the same length at once one keeps its plan and the other takes that.
+// A plan is built and dismantled outside the mutex, so that no thread waits for a long one. If two threads
+// build the same length at the same time, one keeps its plan and the other takes that plan.
 FFTPlan *create_oxfft_table(int32_t length) {
     if (length < 1)
         return nullptr;

@@ -41,9 +41,9 @@ struct LeafColumns {
     std::ptrdiff_t legStride;
 };
 
-// The loops of one radix that run in SIMD lanes: complex data is interleaved, results lie side by
-// side, and twiddles come from tables in the order in which the lanes read them, blocks of so many
-// lanes at a time. All numbers of lanes give the same bits.
+// The loops of one radix that run in SIMD lanes: complex data is interleaved, results are contiguous,
+// and the twiddles come from tables in the order in which the lanes read them, in blocks of
+// complexLanes or realLanes. Every number of lanes gives the same bits.
 struct LanesPasses {
     void (*complexLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
     void (*realLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
@@ -51,16 +51,18 @@ struct LanesPasses {
                            std::ptrdiff_t m);
     void (*realTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
                         std::ptrdiff_t m);
+    // The part of realTwiddle for column 0 and, for even m, column m / 2.
+    void (*realEdges)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, std::ptrdiff_t m);
     int32_t complexLanes, realLanes;
 };
 
-// Straight-line transforms of one length, input and results side by side; null where there are
+// Straight-line transforms of one length, with contiguous input and results; null where there are
 // none.
 struct WholeTransform {
     void (*complex)(const DBL *in, DBL *out); // interleaved
     void (*real)(const DBL *in, DBL *out);
 };
-// The longest of them.
+// The longest length with a straight-line transform.
 constexpr int32_t longestWhole = 64;
 
 // How the p-point transform of a factor p is done: by a kernel of straight-line code, as a plain
@@ -69,27 +71,27 @@ enum FactorKind : int32_t { KernelFactor = 0, DirectPrime = 1, RaderPrime = 2 };
 
 } // namespace qx
 
-// The tables of one factor p; what the factor does not need is null.
+// The tables of one factor p. Tables that the factor does not need are null.
 struct FFTStage {
     // Direct prime: exp(-2 pi i k / p), p values.
     DBL *rootCos, *rootSin;
-    // Every stage but the last, which works on sub-transforms of length n and has m = n / p:
+    // Every stage but the last; the stage forms transforms of length n and has m = n / p columns:
     // exp(-2 pi i j k / n) at index (k - 1)(p - 1) + (j - 1), k from 1 to m - 1, j from 1 to p - 1.
     DBL *twiddleCos, *twiddleSin;
-    // Rader prime: the plan of its convolution, held by reference, of length p - 1 or, padded, the
-    // one that RaderLength gives; the spectrum of the roots in the order of the powers of a
-    // generator, scaled by 1 / length, and the two orders of p indices.
+    // Rader prime: a reference to the plan of its convolution, whose length is RaderLength(p); the
+    // spectrum of the roots in the order of the powers of a generator, scaled by 1 / length; and the
+    // two permutations of p indices.
     FFTPlan *raderPlan;
     DBL *raderCos, *raderSin;
     int32_t *raderGather, *raderScatter;
-    // Factor with kernels: its loops in lanes, and for every stage but the last its twiddles once
-    // more, in the order in which these read them.
+    // Factor with kernels: its loops in lanes, and for every stage but the last a second copy of its
+    // twiddles in the order in which these loops read them.
     qx::LanesPasses passes;
     DBL *complexLanes, *realLanes;
 };
 
-// Everything that a transform of one length needs. Read-only from its creation to its release,
-// apart from the last two fields: a buffer that transforms lend themselves, and a table that is set
+// Everything that a transform of one length needs. A plan is read-only from its creation to its
+// release, apart from the last two fields: a buffer that transforms borrow, and a table that is set
 // once.
 struct FFTPlan {
     static constexpr int32_t maxFactors = 20; // no int32 length has more
@@ -106,43 +108,43 @@ struct FFTPlan {
     qx::ComplexTwiddle complexTwiddle[maxFactors];
     FFTPlan *prev, *next; // the cache
 
-    // Of a small length, which is transformed in one call: the stages of one with several factors
-    // would cost more than the arithmetic.
+    // For a small length, which is transformed in one call: with several factors, the overhead of the
+    // stages would exceed the arithmetic.
     qx::WholeTransform whole;
 
     // The work memory of a transform of complex and of real data, in values; 0 unless a Rader
     // prime is among the factors.
     int64_t complexWork, realWork;
 
-    // The blocks that the stage of one level combines may stand in a buffer, from which the stage
-    // brings them to the results: on cache lines of their own, where results of the host are not,
-    // and at distances at which a column's values do not fall into one set of the cache. The level,
-    // -1 for none, and the number of blocks.
+    // The blocks that the stage of one level combines may be kept in a buffer, from which the stage
+    // writes to the results. In the buffer each block starts on a cache line, which the host's arrays
+    // do not, and the pitch keeps the values of a column from mapping to one set of the cache. The
+    // level, -1 for none, and the number of blocks.
     int32_t bufferLevel, bufferBlocks;
-    // The buffer that does not fit the stack, for one transform at a time; null while one has it.
-    // Others do without, with the same results.
+    // The buffer, if it does not fit on the stack, for one transform at a time; null while a transform
+    // uses it. Other transforms meanwhile run without a buffer, with the same results.
     mutable std::atomic<void *> buffer;
 
-    // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
+    // Twiddles of the cosine transforms; null until the first call of QuarterWave builds them.
     mutable std::atomic<const double *> quarterWave;
 };
 
 namespace qx {
 
-// In a buffer each block begins on a cache line and is followed by a spare one.
+// In a buffer each block begins on a cache line and is followed by a spare line.
 constexpr int32_t lineValues = 64 / sizeof(DBL);
 inline std::ptrdiff_t BlockPitch(std::ptrdiff_t values) {
     return (values + lineValues - 1) / lineValues * lineValues + lineValues;
 }
-// The values of a plan's buffer, for data of so many DBL units a value.
+// The size of a plan's buffer in values, for data of `width` DBL units a value.
 inline std::ptrdiff_t BufferValues(const FFTPlan &plan, std::ptrdiff_t width) {
     return plan.bufferBlocks * BlockPitch(width * (plan.length / plan.bufferBlocks));
 }
-// Buffers up to this size stand on the stack.
+// Buffers up to this size are on the stack.
 constexpr int32_t stackBufferValues = 2304;
 
-// The inner side of the two exports of the same names: the shared plan of a length, or null, and
-// its return. (Qualified in calls: the exports are visible too.)
+// The implementation of the two exports of the same names: returns the shared plan of a length, or
+// null, and releases it. (Calls are qualified, because the exports are visible too.)
 FFTPlan *create_oxfft_table(int32_t length);
 void destroy_oxfft_table(FFTPlan *plan);
 
@@ -166,7 +168,7 @@ ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStrid
                          int32_t outStride, int32_t n);
 
 // The work memory of transforms, for callers that run many of one length: the plan's complexWork
-// or realWork values, or more. No scratch memory is asked for where these are 0.
+// or realWork values, or more. If these are 0, no scratch memory is requested.
 class TransformWork {
 public:
     ErrorCode take(int64_t values) { return values == 0 ? 0 : memory_.allocate(values); }
@@ -176,7 +178,7 @@ private:
     Scratch<ElementType::DBL> memory_;
 };
 
-// The same four in that memory. They have no failure but a plan of another length.
+// The same four transforms in that memory. They fail only for a plan of another length.
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                             DBL *outIm, int32_t inStride, int32_t outStride, int32_t n, DBL *work);
 ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
@@ -186,7 +188,7 @@ ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t i
 ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStride,
                          int32_t outStride, int32_t n, DBL *work);
 
-// A plan held for the scope.
+// Holds a plan for the scope.
 class PlanReference {
 public:
     explicit PlanReference(int32_t length) : plan_(qx::create_oxfft_table(length)) {}

@@ -27,7 +27,7 @@ ErrorCode Acquire(PlanSlot *slot, int32_t n) {
     const bool isNew = !cell->plan;
     qx::destroy_oxfft_table(cell->plan);
     cell->plan = qx::create_oxfft_table(n);
-    // A plan that nobody would sweep is none.
+    // If the clean-up cannot be registered, treat it as a failed allocation.
     if (cell->plan && isSwept && isNew && HostRegisterSweep(CellSweep, cell, SweepForObject) != 0) {
         qx::destroy_oxfft_table(cell->plan);
         cell->plan = nullptr;

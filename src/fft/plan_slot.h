@@ -22,23 +22,23 @@ struct TransformInstance {
     PlanSlot second;
 };
 
-// Makes the slot hold a plan of length n. A plan of that length that is there already is left
-// as it is, without a look into the plan cache. 0; ErrInternal for a slot that holds something
-// else, which stays; ErrOutOfMemory, with the slot then null.
+// Makes the slot hold a plan of length n. If it already holds a plan of that length, nothing changes
+// and the plan cache is not consulted. Returns 0; ErrInternal for a slot that holds something else,
+// which stays; or ErrOutOfMemory, and then the slot is null.
 //
 // The first form registers a sweep for the cell with the host; the IDP form registers nothing,
-// because the host gives instance data back through TransformUnreserveProc.
+// because the host releases instance data through TransformUnreserveProc.
 ErrorCode PlanSlotAcquire(PlanSlot *slot, int32_t n);
 ErrorCode PlanSlotAcquireIDP(PlanSlot *slot, int32_t n);
 
-// Called by the host when it cleans up after an aborted run: gives the plan and the cell back.
-// The slot belongs to the object that the host is discarding and is not touched.
+// Called by the host when it cleans up after an aborted run: releases the plan and the cell. The slot
+// belongs to the object that the host is discarding and is not accessed.
 int32_t CellSweep(void *cell);
 
-// Makes an instance where the word is null. 0, ErrInternal for a word that holds something else,
-// ErrOutOfMemory.
+// Creates an instance if the word is null. Returns 0, ErrInternal for a word that holds something else,
+// or ErrOutOfMemory.
 ErrorCode TransformInstanceReserve(InstanceWord *word);
-// 0, or ErrInternal for a word that holds something else, which stays.
+// Returns 0, or ErrInternal for a word that holds something else, which stays.
 ErrorCode TransformInstanceRelease(InstanceWord *word);
 
 inline bool IsPlanLength(int64_t n) { return n <= std::numeric_limits<int32_t>::max(); }
@@ -48,10 +48,11 @@ inline const FFTPlan *HeldPlan(const PlanSlot *slot) {
 }
 
 // The two ways to keep plans across the calls of a node; a plain export and its _IDP twin differ
-// in nothing else. A length beyond int32, which some transforms compute from theirs, is memory
-// that cannot be had. The plans are remembered: within a reshape the host may change the words.
+// in nothing else. A length beyond int32, which some transforms compute from their own, counts as
+// memory that cannot be allocated. The plans are remembered, because the host may change the words
+// during a resize.
 
-// In words that the caller owns, swept by the host.
+// In words that the caller owns, cleaned up by the host.
 class KeepInSlots {
 public:
     explicit KeepInSlots(PlanSlot *first, PlanSlot *second = nullptr)
@@ -81,7 +82,7 @@ private:
     const FFTPlan *plan_ = nullptr, *secondPlan_ = nullptr;
 };
 
-// In the host's instance data, given back through TransformUnreserveProc.
+// In the host's instance data, released through TransformUnreserveProc.
 class KeepInInstance {
 public:
     explicit KeepInInstance(InstanceWord *word) : word_(word) {}

@@ -36,14 +36,14 @@ Output Interleaved(DBL *values) { return {values, values + 1, 2}; }
 
 // The p-point transforms. They gather their input into `work` first, so they may work in place.
 
-// A padded convolution has its spectrum in work too.
+// A padded convolution keeps its spectrum in `work` too.
 bool IsPadded(const PrimeFactor &factor) { return factor.stage->raderPlan->length != factor.p - 1; }
 
-// Cache lines' worth of values, so that what stands behind is placed no worse.
+// Rounded up to whole cache lines, so that the memory that follows keeps its alignment.
 int64_t WholeLines(int64_t values) { return (values + 7) / 8 * 8; }
 
-// The values of work that a transform by Rader's algorithm takes for itself. That of the
-// transforms of its convolution stands behind them.
+// The number of values of `work` that Rader's algorithm itself uses. The work memory of the transforms of
+// its convolution follows.
 int64_t RaderComplexWork(const PrimeFactor &factor) {
     const int64_t n = factor.stage->raderPlan->length;
     return WholeLines(IsPadded(factor) ? 4 * n : 2 * n);
@@ -52,7 +52,7 @@ int64_t RaderRealWork(const PrimeFactor &factor) {
     return WholeLines(4 * int64_t{factor.stage->raderPlan->length});
 }
 
-// A plain sum works on the stack: a column of complex values, and as much again.
+// A plain sum works on the stack, in two columns of complex values.
 constexpr ptrdiff_t directWork = 4 * 47;
 
 void DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
@@ -72,7 +72,7 @@ void DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
         sum = sum + (left + right);
     }
     y.set(0, sum);
-    // Two sums at a time, for neither has to wait for the other; both are the last if h is odd.
+    // Two sums at a time, because they do not depend on each other; if h is odd, both are the last one.
     for (ptrdiff_t q = 1; q <= h; q += 2) {
         const ptrdiff_t frequencies[2] = {q, std::min(q + 1, h)};
         Pair value[2] = {x0, x0};
@@ -125,7 +125,7 @@ void DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL
 }
 
 // Multiplies value k of the spectrum by that of the roots and conjugates it: together with the
-// conjugation at the end, a forward transform then serves as the inverse one.
+// conjugation at the end, a forward transform then acts as the inverse transform.
 void SetConjugateProduct(const FFTStage &stage, ptrdiff_t k, double a, double b, Output y) {
     const double c = stage.raderCos[k];
     const double s = stage.raderSin[k];
@@ -164,7 +164,7 @@ void RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
         y.set(stage.raderScatter[i], x0Re + work[2 * i - 2], x0Im - work[2 * i - 1]);
 }
 
-// The length of a convolution is even, padded or not.
+// The length of a convolution is even, with or without padding.
 void RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
                ptrdiff_t outStride, DBL *work) {
     const FFTStage &stage = *factor.stage;

@@ -8,17 +8,18 @@
 namespace qx {
 
 // The leaf and the twiddle stage of a prime factor without a kernel, of either kind, with the
-// contracts of the kernels. `work` has as many values as the two sizes below tell, for a plain sum
+// contracts of the kernels. `work` has PrimeComplexWork or PrimeRealWork values; a plain sum needs
 // none.
 
-// One of the two factors of these stages: p with its kind and its tables.
+// A factor of these stages: p with its kind and its tables.
 struct PrimeFactor {
     int32_t p;
     int32_t kind;
     const FFTStage *stage;
 };
 
-// Of complex and of real data, as leaf or as twiddle stage, with that of the plan inside.
+// The work memory for complex and for real data, as leaf or as twiddle stage, including that of the
+// Rader plan.
 int64_t PrimeComplexWork(const PrimeFactor &factor, bool isLeaf);
 int64_t PrimeRealWork(const PrimeFactor &factor, bool isLeaf);
 

@@ -32,7 +32,7 @@ double *QuarterWaveOf(int32_t length) {
 const DBL *BuildQuarterWave(const FFTPlan *plan) {
     double *const built = QuarterWaveOf(plan->length);
     const double *wave = nullptr;
-    // Of several threads that build one at the same time, the first one's stays.
+    // If several threads build the table at the same time, the first one is kept.
     if (plan->quarterWave.compare_exchange_strong(wave, built, std::memory_order_acq_rel))
         return built;
     std::free(built);

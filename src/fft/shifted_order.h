@@ -11,10 +11,10 @@ namespace qx {
 // A spectrum of n values in shifted order has its zero frequency at index n/2: index j holds
 // frequency (j - n/2) modulo n.
 
-// Into shifted order, in place. 0 or ErrOutOfMemory.
+// Converts to shifted order, in place. Returns 0 or ErrOutOfMemory.
 ErrorCode RotateToShifted(CDB *spectrum, int32_t n);
 
-// Out of shifted order. `plain` must not overlap `shifted`.
+// Converts from shifted order. `plain` must not overlap `shifted`.
 void RotateFromShifted(const CDB *shifted, int32_t n, CDB *plain);
 
 } // namespace qx

@@ -43,7 +43,7 @@ int32_t RowsTaken(const MatrixRegion &region) {
     return std::min(region.rows, region.matrixRows - region.rowStart);
 }
 
-// The rows of a region, each padded with zeros where the matrix ends before.
+// The rows of a region, each padded with zeros beyond the end of the matrix.
 template <ElementType Code>
 class RegionRows {
 public:
@@ -71,7 +71,7 @@ private:
     HeapBlock<Code> padded_;
 };
 
-// Where a forward transform writes. Its columns come as copies, side by side, whose frequencies
+// The output of a forward transform. The columns are passed as contiguous copies, whose frequencies
 // ascend from 0.
 class SpectrumMatrix {
 public:
@@ -86,20 +86,19 @@ public:
         ScatterColumns<ElementType::CDB>(columns + front, pitch, zero_, count, data_ + c, cols_);
     }
 
-    // Those of opposite frequency, which hold the conjugates at the opposite rows. Not for the
-    // columns that are opposite to themselves.
-    void setOppositeColumns(int32_t c, int32_t count, const CDB *columns, int64_t pitch) const {
+    // Sets the columns whose frequencies are opposite to those of columns that setColumns has set: the
+    // conjugates at the opposite rows. Not for columns that are their own opposites.
+    void setOppositeColumns(int32_t c, int32_t count) const {
         if (count < 1)
             return;
-        CDB *const target = data_ + (opposites_ - c);
-        const int64_t targetPitch = cols_;
-        const int32_t zero = zero_;
-        const int32_t rows = rows_;
-        ForEachInBlock(rows, count, [=](int32_t f, int32_t i) {
-            const CDB &value = columns[i * pitch + f];
-            const int32_t row = f <= zero ? zero - f : zero - f + rows;
-            target[row * targetPitch - i] = CDB{value.re, -value.im};
-        });
+        for (int32_t row = 0; row < rows_; ++row) {
+            const int32_t opposite = 2 * zero_ - row;
+            const int32_t target = opposite < 0        ? opposite + rows_
+                                   : opposite >= rows_ ? opposite - rows_
+                                                       : opposite;
+            ConjugateBackward(&data_[int64_t{row} * cols_ + c].re,
+                              &data_[int64_t{target} * cols_ + (opposites_ - c)].re, count);
+        }
     }
 
 private:
@@ -109,12 +108,12 @@ private:
     int32_t opposites_; // the sum of the indices of two opposite columns
 };
 
-// The columns of a matrix of so many values, which the second cache holds, are read where they are; those of
-// larger ones are first copied, row by row.
+// The columns of a matrix of up to this many values, which fits the second-level cache, are read in place;
+// those of larger matrices are first copied, row by row.
 constexpr int64_t mostReadInPlace = 1 << 16;
 
 // Transforms the columns in matrix, which is row-major with `usedRows` rows, padded with zeros to
-// `rows` values. set(c, count, columns, pitch) takes them as they come.
+// `rows` values. Calls set(c, count, columns, pitch) for each block of columns.
 template <class Set>
 ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_t usedRows,
                          int32_t rows, int32_t cols, DBL *work, const Set &set) {
@@ -158,7 +157,7 @@ void KeepHalf(const DBL *h, int32_t n, int32_t shift, CDB *kept) {
         kept[shift == 0 ? half : 0] = CDB{h[half], 0};
 }
 
-// The inverse transforms of the rows of frequencies 0 to count - 1, in this order, into results.
+// Writes the inverse transforms of the rows of frequencies 0 to count - 1, in this order, to results.
 ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t cols, int32_t shift,
                       int32_t count, CDB *results, DBL *work) {
     ComplexBlock plain;
@@ -178,7 +177,7 @@ ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t 
     return 0;
 }
 
-// `count` columns of spectra of real data, frequencies 0 to n/2 from the top, in half-complex
+// Copies `count` columns of spectra of real data, with frequencies 0 to n/2 from the top, in half-complex
 // form.
 void GatherHalfComplex(const CDB *work, int64_t workPitch, int32_t n, int32_t count, DBL *columns,
                        int64_t pitch) {
@@ -193,7 +192,7 @@ void GatherHalfComplex(const CDB *work, int64_t workPitch, int32_t n, int32_t co
     }
 }
 
-// What the columns of the two inverses are.
+// The columns of the complex and of the real inverse.
 struct ComplexColumns {
     static constexpr auto Code = ElementType::CDB;
     static int32_t rowsUsed(int32_t rows) { return rows; }
@@ -215,7 +214,7 @@ struct RealColumns {
 
 // Rows first, then columns.
 // kept: a failed column ends the loop unreported, and the columns from there on stay unwritten.
-// None fails for want of memory, which is taken before the first row.
+// No column fails for lack of memory, because all memory is allocated before the first row.
 template <class Columns>
 ErrorCode InverseMatrix(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
                         int32_t rows, int32_t cols, int32_t shift,
@@ -315,7 +314,7 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
             return failed;
         KeepHalf(half.data(), cols, shift, matrix.data() + r * PaddedPitch(kept));
     }
-    // Frequency 0 and, of an even number, n/2 are opposite to themselves.
+    // Frequency 0 and, if n is even, n/2 are their own opposites.
     const int32_t first = shift != 0 && cols % 2 != 0 ? 0 : 1;
     const int32_t last = shift == 0 && cols % 2 != 0 ? kept - 1 : kept - 2;
     const SpectrumMatrix target(out, region.rows, cols, shift);
@@ -324,8 +323,7 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
                               target.setColumns(c, count, columns, pitch);
                               const int32_t from = std::max(c, first);
                               const int32_t to = std::min(c + count - 1, last);
-                              target.setOppositeColumns(from, to - from + 1,
-                                                        columns + (from - c) * pitch, pitch);
+                              target.setOppositeColumns(from, to - from + 1);
                           });
 }
 

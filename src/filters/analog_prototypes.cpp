@@ -9,8 +9,8 @@ namespace qx {
 
 namespace {
 
-// The angles of the pairs of poles of a Butterworth filter, from the imaginary axis towards the
-// real one. The poles of the other families lie on the same angles of other curves.
+// The angles of the pole pairs of a Butterworth filter, from the imaginary axis towards the real
+// axis. The poles of the other families have the same angles on other curves.
 class PairAngles {
 public:
     explicit PairAngles(int32_t n) : step_(kPi / n), theta_((kPi + step_) * 0.5) {}
@@ -24,7 +24,7 @@ private:
     double step_, theta_;
 };
 
-// Half axes of the ellipse of the poles, from x to the power 1 / n: cosh and sinh of acosh(..) / n.
+// Half axes of the ellipse of the poles: cosh and sinh of acosh(..) / n, from x to the power 1 / n.
 struct Ellipse {
     double sh, ch;
     Ellipse(double x, int32_t n) {
@@ -36,7 +36,7 @@ struct Ellipse {
 
 double FromDecibels(double power) { return std::pow(10.0, 0.1 * power); }
 
-// The zero (n odd: even, n even: odd multiples) that goes with pair i.
+// The number of the zero for pair i (n odd: even multiples, n even: odd multiples).
 int32_t ZeroNumber(int32_t n, int32_t i) { return 2 * i + 1 + n % 2; }
 
 } // namespace
@@ -71,7 +71,7 @@ void ChebyshevPrototype(int32_t n, double ripple, GainIn gainIn, DigitalSections
     }
 }
 
-// The poles are reciprocals of those of a Chebyshev filter.
+// The poles are the reciprocals of those of a Chebyshev filter.
 void InvChebyshevPrototype(int32_t n, double attenuation, DigitalSections &sections) {
     const double e = 1.0 / std::sqrt(FromDecibels(attenuation) - 1.0);
     const Ellipse ellipse((std::sqrt(1.0 + e * e) + 1.0) / e, n);

@@ -6,12 +6,13 @@
 
 namespace qx {
 
-// The analog lowpasses of order n, section by section: first the real pole if n is odd, then the
-// pairs from the imaginary axis inwards. Ripple and attenuation are in decibels. Butterworth and
-// Bessel are 3 dB down at 1 rad/s, Chebyshev and elliptic filters have the edge of their pass band
-// there, and inverse Chebyshev filters that of their stop band.
+// Analog lowpass prototypes of order n, section by section: first the real pole if n is odd, then
+// the pairs from the imaginary axis inwards. Ripple and attenuation are in decibels. Butterworth
+// and Bessel are 3 dB down at 1 rad/s, Chebyshev and elliptic filters have their pass-band edge
+// there, and inverse Chebyshev filters their stop-band edge.
 
-// Which section takes the factor by which filters of even order and ripple begin below 1 at 0 Hz.
+// The section that includes the factor by which the gain at 0 Hz of filters with ripple and even
+// order is below 1.
 enum class GainIn { FirstSection, LastSection };
 
 void ButterworthPrototype(int32_t n, DigitalSections &sections);
@@ -19,8 +20,8 @@ void ChebyshevPrototype(int32_t n, double ripple, GainIn gainIn, DigitalSections
 void InvChebyshevPrototype(int32_t n, double attenuation, DigitalSections &sections);
 void EllipticPrototype(int32_t n, double ripple, double attenuation, DigitalSections &sections);
 
-// By the eigenvalues of a tridiagonal matrix. ErrDegenerateValue for a pole of 0; ErrOutOfMemory
-// and what the eigenvalues and the roots give.
+// Uses the eigenvalues of a tridiagonal matrix. ErrDegenerateValue for a pole of 0; ErrOutOfMemory
+// and the codes of the eigenvalues and roots.
 ErrorCode BesselPrototype(int32_t n, DigitalSections &sections);
 
 } // namespace qx

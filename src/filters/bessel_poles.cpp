@@ -13,18 +13,18 @@ namespace {
 
 constexpr double kLn2 = 0x1.62e42fefa39efp-1;
 
-CDB Root(CDB x) { // for real parts above 0
+CDB Root(CDB x) { // for positive real parts
     const double re = std::sqrt(0.5 * (std::hypot(x.re, x.im) + x.re));
     return {re, x.im / (2.0 * re)};
 }
 CDB Logarithm(CDB x) { return {std::log(std::hypot(x.re, x.im)), std::atan2(x.im, x.re)}; }
 double Size(CDB x) { return std::fabs(x.re) + std::fabs(x.im); }
 
-// The zeros of the reverse Bessel polynomial, those above the real axis by twos with their
-// conjugates, as the expansion of K_nu(nu w) for large nu = n + 1/2 has them (NIST Digital Library
-// of Mathematical Functions, 10.41(ii), and 10.34.2 for the left half plane): s = -nu w with
+// The zeros of the reverse Bessel polynomial, with those above the real axis followed by their
+// conjugates, from the expansion of K_nu(nu w) for large nu = n + 1/2 (NIST Digital Library of
+// Mathematical Functions, 10.41(ii), and 10.34.2 for the left half plane): s = -nu w with
 //     sqrt(1 + w^2) + ln(w / (1 + sqrt(1 + w^2))) = i pi (n + 1 - 2 m) / (2 n + 1).
-// By steps along the curve from its point on the real axis; to 1 % for all n.
+// Computed in steps along the curve, starting on the real axis; accurate to 1 % for all n.
 void StartValues(int32_t n, ComplexVector s) {
     const double nu = n + 0.5;
     CDB w = {0.6627434193491815, 0.0};
@@ -42,9 +42,9 @@ void StartValues(int32_t n, ComplexVector s) {
     }
 }
 
-// Newton's method for the relations of T. J. Stieltjes: s theta'' - 2 (s + n) theta' + 2 n theta =
-// 0 gives sum over j != i of 1 / (s_i - s_j) = 1 + n / s_i. The condition of this system is about
-// 1.4 n, where that of the coefficients of the polynomial grows exponentially.
+// Newton's method for the relations of T. J. Stieltjes: s theta'' - 2 (s + n) theta' +
+// 2 n theta = 0 gives sum over j != i of 1 / (s_i - s_j) = 1 + n / s_i. The condition number of
+// this system is about 1.4 n, while that of the coefficients of the polynomial grows exponentially.
 ErrorCode Refine(int32_t n, ComplexVector s) {
     ComplexMatrix slopes;
     ComplexVector miss, step;
@@ -75,21 +75,21 @@ ErrorCode Refine(int32_t n, ComplexVector s) {
             s[i] += step[i];
             largest = std::fmax(largest, Size(step[i]) / Size(s[i]));
         }
-        if (largest < 1e-12) // the next step would be its square
+        if (largest < 1e-12) // the next step would be about its square
             break;
     }
     return 0;
 }
 
-// Where the gain is 3 dB down: the logarithm of |theta(i w) / theta(0)|^2, a sum over the poles,
-// is ln 2. By Newton's method in w^2.
+// The frequency at which the gain is 3 dB down: the logarithm of |theta(i w) / theta(0)|^2, which
+// is a sum over the poles, equals ln 2. By Newton's method in w^2.
 double HalfPowerFrequency(int32_t n, ConstComplexVector s) {
     double x = (2.0 * n - 1.0) * kLn2;
     for (int round = 0; round < 30; ++round) {
         double value = 0.0, slope = 0.0;
         for (std::ptrdiff_t i = 0; i < n; ++i) {
             const double re2 = s[i].re * s[i].re, im2 = s[i].im * s[i].im;
-            // Of a pair there are two, with half of its logarithm each.
+            // A pair has two poles, which contribute half of its logarithm each.
             const double size2 = (re2 + im2) * (re2 + im2), twist = 2.0 * (re2 - im2);
             const double excess = x * (x + twist) / size2;
             value += 0.5 * std::log1p(excess);

@@ -11,17 +11,17 @@ namespace qx {
 
 namespace {
 
-// Beyond this a part is no rounding of 0: the roots are of the order of 1.
+// A larger part is not a rounding error of 0: the roots are of order 1.
 constexpr double realWithin = 1e-08;
 
-// The Bessel polynomial whose reciprocal is the filter of order n, scaled to begin and end with 1:
-// its coefficients ascend. g is the factor of the scaling.
+// The Bessel polynomial whose reciprocal is the filter of order n, scaled to have first and last
+// coefficient 1, with ascending coefficients. g is the scaling factor.
 ErrorCode ScaledPolynomial(int32_t n, DBL *c, double &g) {
     c[0] = 1.0;
     for (int32_t k = 0; k < n; ++k)
         c[0] *= n - 0.5 * k;
     if (!std::isfinite(c[0]))
-        return ErrBadCoefficients; // about order 150
+        return ErrBadCoefficients; // from about order 150 on
     for (int32_t i = 1; i < n; ++i)
         c[i] = c[i - 1] * 2.0 * (n - i + 1) / (2.0 * n - i + 1) / i;
     c[n] = 1.0;
@@ -33,9 +33,9 @@ ErrorCode ScaledPolynomial(int32_t n, DBL *c, double &g) {
     return 0;
 }
 
-// The reciprocal of the frequency where the gain is 3 dB down: where the squares of the even and
-// the odd part of c, on the imaginary axis, add up to 2. In the reciprocal frequency these are the
-// greatest real root.
+// The reciprocal of the frequency at which the gain is 3 dB down: where the squares of the even and
+// odd parts of c, on the imaginary axis, add up to 2. As a function of the reciprocal frequency
+// this is the largest real root.
 ErrorCode BesselCutoffScale(const DBL *c, int32_t n, double &scale) {
     const int32_t count = 2 * n + 1;
     RealVector even, odd, evenSquare, oddSquare;
@@ -67,8 +67,8 @@ ErrorCode BesselCutoffScale(const DBL *c, int32_t n, double &scale) {
     return 0;
 }
 
-// The poles are the reciprocals of the eigenvalues of the matrix of the continued fraction of the
-// polynomial, and of g.
+// The poles are the reciprocals of the eigenvalues of the polynomial's continued-fraction matrix
+// multiplied by g.
 ErrorCode FindPoles(int32_t n, double g, CDB *poles) {
     Scratch<ElementType::DBL> matrix;
     if (matrix.allocate(int64_t{n} * n) != 0)
@@ -94,7 +94,7 @@ ErrorCode FindPoles(int32_t n, double g, CDB *poles) {
 
 bool IsReal(const CDB &pole) { return std::fabs(pole.im) < realWithin; }
 
-// Real poles first: one alone if their number is odd, then two by two.
+// Real poles first: a single one if their number is odd, then in pairs.
 void AddRealPoles(const CDB *poles, int32_t n, double scale, DigitalSections &sections) {
     int32_t left = 0;
     for (int32_t i = 0; i < n; ++i)
@@ -116,7 +116,7 @@ void AddRealPoles(const CDB *poles, int32_t n, double scale, DigitalSections &se
 }
 
 void AddPolePairs(const CDB *poles, int32_t n, double scale, DigitalSections &sections) {
-    bool isSecond = false; // conjugates are next to each other
+    bool isSecond = false; // conjugates are adjacent
     for (int32_t i = 0; i < n; ++i) {
         if (IsReal(poles[i]))
             continue;

@@ -44,7 +44,7 @@ void RunSamples(const DBL *a, const DBL *b, typename Element<Code>::type *state,
     }
 }
 
-// From so many samples on the start and the end of the lanes' wave cost little.
+// From this many samples on the start and the end of the wave in lanes cost little.
 constexpr int32_t worthLanes = 100;
 
 } // namespace

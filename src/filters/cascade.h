@@ -10,17 +10,17 @@
 namespace qx {
 
 // Cascades of sections of order m, 2 or 4, in direct form II. Each section has m values in `a`
-// (behind a leading 1 that is not stored), m + 1 in `b`, and m values w of its memory in `state`,
-// the newest first:
+// (without the leading 1), m + 1 values in `b`, and m values w of its memory in `state`, newest
+// first:
 //
 //     w = v - a[0] state[0] - a[1] state[1] - ...        from left to right
 //     v = b[0] w + b[1] state[0] + ... + b[m] state[m-1]  on to the next section
-//
+// The memory stores flush(w), and the output of the last section is flushed (spectra/recursion.h).
 // The memory takes flush(w), and the output of the last section is flushed (spectra/recursion.h).
 
 enum SectionForm : int32_t { SecondOrderSections = 0, FourthOrderSections = 1 };
 
-// The order of the sections of each form; 0 where there is no such form.
+// The order of the sections of a form; 0 if there is no such form.
 constexpr int32_t SectionOrder(int32_t form) {
     return form == SecondOrderSections ? 2 : form == FourthOrderSections ? 4 : 0;
 }
@@ -30,7 +30,7 @@ struct CascadeCoefficients {
     int32_t form;
 };
 
-// In place. ErrCoefficientSizes where the sizes, that of the state included, do not fit the form.
+// In place. ErrCoefficientSizes if the sizes, including that of the state, do not fit the form.
 template <ElementType E>
 ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, VectorView<E> state, VectorView<E> x);
 
@@ -42,8 +42,8 @@ struct CascadeRun {
     int32_t n;
 };
 
-// All sections over all samples, in lanes: sections of a group work at once, each a few samples
-// behind the one before it, and every value is that of the plain order.
+// Runs all sections over all samples, in lanes. The sections of a group work together, each a few
+// samples behind the previous one; every value is the same as in plain order.
 QX_BY_WIDTH(void, RunCascadeInLanes, (const CascadeRun &run))
 
 } // namespace qx

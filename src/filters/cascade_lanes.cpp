@@ -1,9 +1,9 @@
 #include "filters/cascade.h"
 #include "frame/lane_masks.h"
 
-// Sections s, s + 1, ... stand in the lanes of one or two vectors, and each is `lag` samples behind
-// its predecessor, so that all of them can take their next sample at once. A lag of 2 gives a value
-// the time of two steps to reach the next lane; with 1 that way would be longer than the recursion
+// Sections s, s + 1, ... are in the lanes of one or two vectors, and each is `lag` samples behind
+// its predecessor, so that all of them can process their next sample together. With a lag of 2 a
+// value has two steps to reach the next lane; with 1 this path would be longer than the recursion
 // of a section itself. The wave starts and ends with sections that work alone.
 namespace qx::QX_WIDTH {
 namespace {
@@ -11,17 +11,17 @@ namespace {
 typedef Lanes<nativeLanes> L;
 constexpr int lanes = nativeLanes;
 constexpr int lag = 2;
-// Vectors at once: eight sections.
+// Vectors that are processed together: eight sections.
 constexpr int vectors = 8 / lanes;
 constexpr int together = vectors * lanes;
-// Samples that go through all sections before the next ones: they stay in the cache.
+// Samples that pass through all sections before the next ones, so that they stay in the cache.
 constexpr int32_t tile = 2048;
 
 constexpr double smallest = 2.2250738585072014e-308;
 
 inline double FlushOne(double value) { return __builtin_fabs(value) <= smallest ? 0.0 : value; }
 
-// Nearly always there is nothing to flush, and a branch costs the recursion no time.
+// Almost always there is nothing to flush, and a branch does not delay the recursion.
 inline L FlushEach(L value) {
     const LaneMask<L> small = Magnitude(value) <= L(smallest);
     return __builtin_expect(Any(small), 0) ? Select(small, L(0.0), value) : value;
@@ -41,12 +41,12 @@ inline double OneSection(const DBL *a, const DBL *b, DBL *state, double v) {
     return v;
 }
 
-// The values of a group of sections, one section in each lane. Lanes without a section hand on what
-// they get, and nobody reads it; were it 0, each step would have something to flush.
+// The values of a group of sections, one section in each lane. Lanes without a section pass their
+// input on, and the result is not used; if it were 0, each step would have something to flush.
 template <int Order>
 struct Group {
     L a[Order][vectors], b[Order + 1][vectors], state[Order][vectors];
-    L pending[lag][vectors]; // what each section takes at the next steps
+    L pending[lag][vectors]; // the inputs of each section for the next steps
 
     void load(const CascadeRun &run, int32_t first, int32_t sections) {
         for (int j = 0; j < Order; ++j) {
@@ -71,8 +71,8 @@ struct Group {
     }
 };
 
-// One step of the vectors that hold sections: all of them take what is pending; `next` is what the
-// first section takes `lag` steps later. What the sections give is left in `given`.
+// One step of the vectors that have sections: all sections process their pending inputs; `next` is
+// the first section's input `lag` steps later. The outputs of the sections are returned in `given`.
 template <int Order, int Count>
 inline void Step(Group<Order> &group, double next, L (&given)[Count]) {
     L before(next);
@@ -100,7 +100,7 @@ public:
     Wave(const CascadeRun &run, int32_t first, int32_t sections)
         : run_(run), first_(first), sections_(sections), ahead_(lag * (sections - 1)) {}
 
-    // Needs more than `ahead` samples.
+    // Requires more than `ahead` samples.
     template <int Count>
     void go(DBL *x, int32_t n, bool isLast) {
         start(x);
@@ -125,7 +125,7 @@ private:
                                           run_.state + at * Order, values[i]);
     }
 
-    // Each section runs so far ahead of the last one that the wave can begin.
+    // Each section runs far enough ahead of the last one for the wave to begin.
     void start(const DBL *x) {
         double values[lag * together];
         for (int i = 0; i < ahead_; ++i)
@@ -157,7 +157,7 @@ private:
         group_ = group;
     }
 
-    // The sections behind the first one catch up.
+    // The sections after the first one catch up.
     void finish(DBL *x, bool isLast) const {
         double values[lag * together];
         int count = 0;

@@ -15,7 +15,7 @@ DigitalSections::DigitalSections(int32_t type, const FilterBand &band, DBL *a, D
     B_ = upper - lower;
 }
 
-// S^k becomes (1 - z^-1)^k (1 + z^-1)^(m - k) in a polynomial of degree m.
+// Replaces S^k by (1 - z^-1)^k (1 + z^-1)^(m - k) in a polynomial of degree m.
 DigitalSections::Polynomial<2> DigitalSections::Quadratic(double p2, double p1, double p0) {
     return {{p2 + p1 + p0, 2.0 * p0 - 2.0 * p2, p2 - p1 + p0}};
 }

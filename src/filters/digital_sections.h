@@ -6,7 +6,7 @@
 
 namespace qx {
 
-// One section of an analog filter whose cut-off is at 1 rad/s.
+// One section of an analog filter with its cut-off at 1 rad/s.
 struct RealPole { // gain / (s + d0)
     double gain, d0;
 };
@@ -14,14 +14,14 @@ struct PolePair { // (n2 s^2 + n0) / (s^2 + d1 s + d0)
     double n2, n0, d1, d0;
 };
 
-// Turns the sections of an analog filter, as they come, into those of the digital one: s becomes a
-// function of S = (1 - z^-1) / (1 + z^-1),
+// Converts the sections of an analog filter, in the order in which they are added, to those of the
+// digital filter: s is replaced by a function of S = (1 - z^-1) / (1 + z^-1),
 //
 //     lowpass S / g    highpass g / S    bandpass (S^2 + A) / (B S)    bandstop B S / (S^2 + A)
 //
-// with the cut-offs moved beforehand to where S has them again: g = tan(pi fl / fs), and A the
-// product and B the difference of the two tangents. A section of lowpass and highpass takes 2
-// values in a and 3 in b, one of the others 4 and 5; a real pole leaves the upper ones zero.
+// with prewarped cut-offs: g = tan(pi fl / fs), and A is the product and B the difference of the
+// two tangents. A section of a lowpass or highpass takes 2 values in a and 3 in b, a section of the
+// other types 4 and 5; a real pole leaves the upper ones zero.
 class DigitalSections {
 public:
     DigitalSections(int32_t type, const FilterBand &band, DBL *a, DBL *b);
@@ -35,7 +35,8 @@ private:
     struct Polynomial {
         double z[Order + 1];
     };
-    // p2 S^2 + p1 S + p0 and p4 S^4 + ... + p0, times the denominator of S to their order.
+    // p2 S^2 + p1 S + p0 and p4 S^4 + ... + p0, times the denominator of S to the power of their
+    // order.
     static Polynomial<2> Quadratic(double p2, double p1, double p0);
     static Polynomial<4> Quartic(double p4, double p3, double p2, double p1, double p0);
     template <int Order>

@@ -20,8 +20,8 @@ void CopyElements(const typename Element<Code>::type *from, std::ptrdiff_t count
     std::memcpy(static_cast<void *>(to), from, sizeof *to * static_cast<std::size_t>(count));
 }
 
-// y[t] = sum over k of b[nb-1-k] x[t+k], the real and the imaginary parts apart where either the
-// taps or the signal are real.
+// y[t] = sum over k of b[nb-1-k] x[t+k], with real and imaginary parts separately if the taps or
+// the signal are real.
 void Slide(ConstantSteps<Real> taps, int32_t nb, const DBL *x, int64_t length, DBL *y,
            int32_t count) {
     SlidingSums({taps, nb, {x}, length, 0, {y}, count});
@@ -54,7 +54,8 @@ CDB Sum(const CDB &a, const CDB &b) { return {a.re + b.re, a.im + b.im}; }
 template <ElementType C, ElementType X>
 using Output = VectorView<DirectForm<C, X>::output>;
 
-// The sums over x of one sample, which needs no memory: a filter may be called for each sample.
+// The sums over x for a single sample. Needs no memory, because a filter may be called for each
+// sample.
 template <ElementType C, ElementType X>
 void OneSum(ConstVectorView<C> b, const typename Element<X>::type x,
             typename Element<X>::type *state, typename Output<C, X>::T *y) {
@@ -70,8 +71,9 @@ void OneSum(ConstVectorView<C> b, const typename Element<X>::type x,
     }
 }
 
-// The sums over x alone, from 0.0 on. Those that reach into the state run over a copy that joins
-// the state and the first samples; they come last, for the others read these samples in place.
+// The sums over x alone, starting from 0.0. Those that reach into the state use a copy of the state
+// followed by the first samples; they are computed last, because the others read these samples in
+// place.
 template <ElementType C, ElementType X>
 ErrorCode Sums(ConstVectorView<C> b, ConstVectorView<X> x, VectorView<X> state, Output<C, X> y) {
     const std::ptrdiff_t n = x.size(), past = b.size() - 1;

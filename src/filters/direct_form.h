@@ -8,17 +8,17 @@
 
 namespace qx {
 
-// Filters of one numerator and one denominator, a[0] included:
+// Filters with a numerator and a denominator, including a[0]:
 //
 //     y[t] = (b[0] x[t] + ... + b[nb-1] x[t-nb+1] - a[1] y[t-1] - ... - a[na-1] y[t-na+1]) / a[0]
 //
-// summed from the oldest sample of x to the newest, then of y. The values before x[0] and y[0] are
-// in xState (nb - 1) and yState (na - 1), the newest last, which are brought up to date. The signal
-// may be cut anywhere with no change to a bit. y has the size of x and may be x. ErrOutOfMemory,
-// with nothing done.
+// summed from the oldest to the newest sample of x, then of y. The values before x[0] and y[0] are
+// in xState (nb - 1) and yState (na - 1), newest last, and are updated. The signal may be split
+// anywhere without changing a bit. y has the size of x and may be x. ErrOutOfMemory, with nothing
+// done.
 
-// Coefficients and signals, real or complex: real filters of both kinds of signal, complex filters
-// of both kinds of signal.
+// Coefficients and signals may be real or complex: real and complex filters for real and complex
+// signals.
 template <ElementType Coefficient, ElementType Signal>
 struct DirectForm {
     static constexpr auto output = Coefficient == ElementType::CDB || Signal == ElementType::CDB
@@ -26,7 +26,7 @@ struct DirectForm {
                                        : ElementType::DBL;
     typedef ConstVectorView<Coefficient> Coefficients;
 
-    // Without a denominator. One tap multiplies and keeps no state.
+    // Without a denominator. A single tap multiplies and has no state.
     static ErrorCode fir(Coefficients b, ConstVectorView<Signal> x, VectorView<Signal> state,
                          VectorView<output> y);
     static ErrorCode iir(Coefficients b, VectorView<Signal> xState, Coefficients a,

@@ -7,7 +7,7 @@
 namespace qx {
 
 namespace {
-// Means converge quadratically, so a few rounds are enough unless a modulus is no number.
+// Means converge quadratically, so a few iterations are enough unless a modulus is NaN.
 constexpr int mostRounds = 25;
 constexpr double tolerance = 1e-15;
 constexpr double halfOfTheDigits = 1.2e-07;
@@ -25,10 +25,10 @@ double CompleteEllipticK(double kc) {
     return kPi / a * 0.5;
 }
 
-// By theta functions: k = (theta2 / theta3)^2 of the nome q.
+// By theta functions: k = (theta2 / theta3)^2 at the nome q.
 double ModulusFromNomeRatio(double ratio) {
     const double q = std::exp(-kPi * ratio);
-    double T = 1.0, C = 1.0; // sums of theta3 and of theta2
+    double T = 1.0, C = 1.0; // sums of theta3 and theta2
     double t = 1.0, p = q;
     for (int round = 0; round < mostRounds && !(t < tolerance); ++round) {
         T += 2.0 * t * p;
@@ -75,7 +75,7 @@ double InverseSc(double x, double kc) {
     for (int round = 0; round < mostRounds; ++round) {
         const double product = a * b;
         const double gap = std::fabs(a - b);
-        const bool isLast = a * halfOfTheDigits > gap; // the means of this round have them all
+        const bool isLast = a * halfOfTheDigits > gap; // this iteration's means have all digits
         a += b;
         const double s = std::sqrt(product);
         y -= product / y;

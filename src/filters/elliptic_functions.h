@@ -5,13 +5,13 @@
 
 namespace qx {
 
-// What elliptic filters need of elliptic integrals and functions, by arithmetic-geometric means. A
-// modulus k is given by its complement kc = sqrt(1 - k^2) where that is the accurate one.
+// The elliptic integrals and functions that elliptic filters need, by arithmetic-geometric means. A
+// modulus k is given by its complement kc = sqrt(1 - k^2) where that is the more accurate one.
 
 // The complete integral of the first kind, K(k).
 double CompleteEllipticK(double kc);
 
-// The modulus k whose K(kc) / K(k) is the ratio; below 1.
+// The modulus k for which K(kc) / K(k) is the ratio; below 1.
 double ModulusFromNomeRatio(double ratio);
 
 struct JacobiFunctions {
@@ -19,12 +19,12 @@ struct JacobiFunctions {
 };
 JacobiFunctions JacobiElliptic(double u, double kc);
 
-// The u whose sn(u) / cn(u) is x.
+// The u for which sn(u) / cn(u) is x.
 double InverseSc(double x, double kc);
 
-// Of the elliptic lowpass of order n: ripple and attenuation in decibels become the modulus k with
-// its complement kc and K(k), the ripple factor e of 1 / (1 + e^2 R^2), and the functions of
-// modulus kc at the point where the poles are shifted off the real axis.
+// The parameters of the elliptic lowpass of order n, from ripple and attenuation in decibels: the
+// modulus k with its complement kc and K(k), the ripple factor e of 1 / (1 + e^2 R^2), and the
+// functions of modulus kc at the shift of the poles' arguments off the real axis.
 struct EllipticParameters {
     double e, k, kc, K;
     JacobiFunctions at0;

@@ -21,7 +21,7 @@ ErrorCode DesignFIRWindowless(FilterType type, const FilterBand &band, RealVecto
     if (passesNyquist && taps % 2 == 0)
         return ErrBadTapCount;
 
-    // Running sums: the phases of both edges, and pi times the distance to the middle.
+    // Accumulated sums: the phases of both edges, and pi times the distance from the middle.
     const double w1 = kTwoPi * fl / fs, w2 = isBand ? kTwoPi * fh / fs : 0.0;
     double p1 = -0.5 * (taps - 1) * w1, p2 = -0.5 * (taps - 1) * w2;
     double v = -0.5 * kPi * (taps - 1);

@@ -17,7 +17,8 @@ bool IsBand(int32_t type) { return type == Bandpass || type == Bandstop; }
     return sizes.a > 0 && request.a.size() >= sizes.a && request.b.size() >= sizes.b;
 }
 
-// Runs the prototype into the request's arrays, through the native form where another is wanted.
+// Runs the prototype into the request's arrays, converting from the native form if another form is
+// requested.
 template <class Prototype>
 ErrorCode Design(const FilterBand &band, const IIRDesignRequest &request,
                  const Prototype &prototype) {

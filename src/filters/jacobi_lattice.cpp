@@ -8,7 +8,7 @@ namespace qx {
 
 namespace {
 
-// Terms of a theta series: the nome is at most exp(-pi), and its power 16 below 1e-21.
+// Terms of a theta series: the nome is at most exp(-pi), and its 16th power is below 1e-21.
 constexpr int terms = 5;
 
 double Sign(int m) { return m % 2 == 0 ? 1.0 : -1.0; }
@@ -55,8 +55,8 @@ JacobiFunctions JacobiLattice::byTrigonometric(double fraction, double complemen
             theta4_ * theta3 / (theta3_ * theta4)};
 }
 
-// By the functions of modulus kc at an imaginary argument, for fractions up to 1/2: theta1 and
-// theta2 are taken times exp(-v), so that nothing overflows.
+// By the functions of modulus kc at an imaginary argument, for fractions up to 1/2. theta1 and
+// theta2 are multiplied by exp(-v), so that nothing overflows.
 JacobiFunctions JacobiLattice::byHyperbolic(double fraction) const {
     const double v = kHalfPi * fraction / periodRatio_;
     double sine = 0.0, cosine = 0.0, theta3 = 1.0, theta4 = 1.0;
@@ -82,7 +82,8 @@ double EllipticFOfTangent(double t, double kc) {
     double mean = (x + y + z) / 3.0;
     if (!std::isfinite(mean))
         return kNaN;
-    // 408 = (3 2^-53)^(-1/6): the series below is then cut off under the rounding.
+    // 408 = (3 2^-53)^(-1/6): the truncation error of the series below is then less than the
+    // rounding.
     double spread = 408.0 * std::fmax(z - mean, mean - x);
     while (spread >= mean) {
         const double rootX = std::sqrt(x), rootY = std::sqrt(y), rootZ = std::sqrt(z);

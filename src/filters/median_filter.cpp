@@ -24,8 +24,9 @@ bool HasNaN(ConstRealVector x) {
     return count != 0;
 }
 
-// Values that come in the order of time, `step` apart, into a sorted window. Sorting may exchange
-// equal values, which can be told apart where they are zeros: these get their order back.
+// Sorts values in the order of time, `step` apart, into a window. Sorting may exchange equal
+// values, which can be distinguished if they are zeros of different sign; the order of these is
+// restored.
 void SortWindow(const DBL *values, std::ptrdiff_t step, std::ptrdiff_t width, DBL *sorted) {
     for (std::ptrdiff_t k = 0; k < width; ++k)
         sorted[k] = values[k * step];
@@ -38,11 +39,11 @@ void SortWindow(const DBL *values, std::ptrdiff_t step, std::ptrdiff_t width, DB
             *zero++ = values[k * step];
 }
 
-// The values of a window in ascending order, equal ones in the order of time.
+// The values of a window in ascending order, with equal ones in the order of time.
 //
-// kept: a NaN is equal to nothing and above nothing. It enters at the top (in the first window it
-// stands in front), and when it is to leave, the value on top goes in its place. So a NaN may stay
-// for good, and with it the medians are those of fewer values.
+// kept: a NaN is neither equal to nor above any value. It is inserted at the top (in the first
+// window, at the front), and when it should leave, the value at the top is removed instead. So a
+// NaN may stay for good, and the medians are then those of fewer values.
 class SortedWindow {
 public:
     SortedWindow(DBL *values, std::ptrdiff_t width, bool hasNaN)
@@ -55,7 +56,7 @@ public:
 
     void replace(double leaving, double entering) {
         const std::ptrdiff_t from = hasNaN_ ? findByEquality(leaving) : countBelow(leaving);
-        // Counted with the value that leaves still in place.
+        // Counted with the leaving value still in place.
         const std::ptrdiff_t upTo = hasNaN_ ? findAbove(entering, from) : countNotAbove(entering);
         if (upTo > from) {
             move(from, from + 1, upTo - 1 - from);
@@ -71,7 +72,7 @@ private:
         std::memmove(values_ + to, values_ + from, static_cast<std::size_t>(count) * sizeof(DBL));
     }
 
-    // By halving, without a branch that depends on the data.
+    // Binary search without a branch that depends on the data.
     template <class IsBefore>
     std::ptrdiff_t countFirst(const IsBefore &isBefore) const {
         std::ptrdiff_t first = 0, count = width_;
@@ -107,7 +108,7 @@ private:
     bool hasNaN_;
 };
 
-// A ring remembers the samples that will leave, for y may be x.
+// A ring stores the samples that will leave, because y may be x.
 ErrorCode RunOneByOne(const Job &job, bool hasNaN) {
     Scratch<ElementType::DBL> work;
     const std::ptrdiff_t width = job.width();
@@ -136,7 +137,7 @@ ErrorCode RunOneByOne(const Job &job, bool hasNaN) {
     return work.release();
 }
 
-// Stretches of the signal side by side, in tiles that stay in the cache.
+// Several stretches of the signal side by side, in tiles that stay in the cache.
 class StretchedFilter {
 public:
     explicit StretchedFilter(const Job &job)
@@ -144,7 +145,7 @@ public:
           length_(std::min((std::ptrdiff_t{job.n} + medianStretches - 1) / medianStretches,
                            std::max<std::ptrdiff_t>(256, 8 * width_))) {}
 
-    // A window passes through all ranks at each step, which only pays if it is short, and each
+    // At each step a window is passed through completely, which pays only if it is short, and each
     // stretch begins with a sort. Up to four values at a time.
     static bool pays(const Job &job) {
         return job.width() <= 64 * std::min(lanesInUse, 4) &&
@@ -177,7 +178,7 @@ private:
         }
         Fill(window_ + width_ * medianStretches, medianStretches, kInfinity);
         const std::ptrdiff_t end = start + medianStretches * length_;
-        if (end < job_.n) // what the next tile begins with, before y may take its place
+        if (end < job_.n) // saved for the start of the next tile, because y may overwrite it
             std::memcpy(past_, job_.x + (end - job_.left),
                         static_cast<std::size_t>(job_.left) * sizeof(DBL));
         MedianSteps(window_, static_cast<int32_t>(width_), samples_, static_cast<int32_t>(length_));
@@ -189,8 +190,8 @@ private:
         }
     }
 
-    // Samples from `first` on into a column; those before the tile are past, and those behind the
-    // signal are zeros.
+    // Copies samples from `first` on into a column; those before the tile come from `past_`, those
+    // after the signal are zeros.
     void layOut(std::ptrdiff_t tile, std::ptrdiff_t first, DBL *column) const {
         const std::ptrdiff_t rows = length_ + width_, end = std::ptrdiff_t{job_.n} - first;
         std::ptrdiff_t row = 0;
@@ -217,7 +218,7 @@ ErrorCode MedianFilterRun(ConstRealVector x, int32_t leftRank, int32_t rightRank
             std::memmove(y.data(), x.data(), static_cast<std::size_t>(n) * sizeof(DBL));
         return 0;
     }
-    if (leftRank / 4 > n) { // the zeros before x outnumber it, and the median is always one of them
+    if (leftRank / 4 > n) { // the zeros before x outnumber it, so the median is always one of them
         Fill(y.data(), n, 0.0);
         return 0;
     }

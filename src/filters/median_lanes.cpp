@@ -8,17 +8,17 @@ namespace {
 
 typedef Lanes<nativeLanes> L;
 
-// Two vectors of stretches at a time: one alone would wait for its own results.
+// Two vectors of stretches at a time; a single one would wait for its own results.
 constexpr int vectors = 2;
 
-// The second where both are equal, so that equal values keep their order.
+// Returns the second argument if both are equal, so that equal values keep their order.
 QX_INLINE L Smaller(L a, L b) { return L(a.v < b.v ? a.v : b.v); }
 QX_INLINE L Larger(L a, L b) { return L(a.v > b.v ? a.v : b.v); }
 QX_INLINE L FirstIfBelow(L a, L limit, L b) { return L(a.v < limit.v ? a.v : b.v); }
 
-// Takes the first value equal to `leaving` out of the sorted window and puts `entering` behind all
-// that are not above it: with b the window without the value that leaves, rank k becomes the middle
-// one of b[k - 1], b[k] and the value that enters.
+// Removes the first value equal to `leaving` from the sorted window and inserts `entering` after
+// all values that are not above it. If b is the window without the leaving value, rank k becomes
+// the middle one of b[k - 1], b[k] and the entering value.
 QX_INLINE void Replace(DBL *window, int32_t width, const L (&leaving)[vectors],
                        const L (&entering)[vectors]) {
     L current[vectors], before[vectors];

@@ -10,15 +10,15 @@ namespace qx {
 
 namespace {
 
-// The normalised problem: a lowpass that passes up to f1 and stops from f2, or a bandpass with
-// those distances from its centre.
+// The normalised problem: a lowpass with pass band up to f1 and stop band from f2, or a bandpass
+// with these distances from its centre.
 struct LowpassProblem {
     double fs, f1, f2;
-    double dp, ds; // ripples of pass and stop band
+    double dp, ds; // ripples of the pass and stop bands
     int32_t kind;
     bool isBand() const { return kind == NarrowBandpass || kind == NarrowBandstop; }
     bool isComplement() const { return kind >= NarrowBandstop; }
-    // Each of two filters in a row may have half the ripple.
+    // Each of two cascaded filters may have half the ripple.
     double target() const { return dp / 2.0; }
     double stopWeight() const { return target() / ds; }
 };
@@ -51,7 +51,8 @@ bool IsPossible(const NarrowFIRGoal &goal, const LowpassProblem &problem) {
            problem.ds > 0.0 && problem.dp > 0.0;
 }
 
-// Lengths that no design reaches stand as a length that none takes; no number is a negative one.
+// Truncates a length. Lengths beyond any design are limited to one that no design accepts; NaN
+// becomes -1.
 int32_t Truncated(double length) {
     constexpr double beyond = 1 << 29;
     if (std::isnan(length))
@@ -59,17 +60,16 @@ int32_t Truncated(double length) {
     return static_cast<int32_t>(length > beyond ? beyond : length < -beyond ? -beyond : length);
 }
 
-// How a problem is cut into two filters.
+// How a problem is split into two filters.
 struct Stages {
     int32_t M = 1, modelCount = 0, interpolatorCount = 0;
-    // Of bands: where the image of the centre lies, which of the M images the centre is, counted
-    // in half turns of the frequency axis, and the room between the images.
+    // For bands: the frequency of the centre's image, the index of the centre among the M images,
+    // counted in half turns of the frequency axis, and the gap between the images.
     double image = 0.0, position = 1.0, width = 0.0;
     int64_t sum() const { return int64_t{modelCount} + interpolatorCount; }
 };
 
-// The length of an equiripple filter times the width of its transition, in cycles per sample, and
-// times 14.6.
+// The length of an equiripple filter times its transition width, in cycles per sample, times 14.6.
 double LengthFactor(double a, double b) { return -20.0 * std::log10(std::sqrt(a * b)) - 13.0; }
 
 Stages EstimateLowpassStages(const LowpassProblem &problem) {
@@ -89,7 +89,7 @@ Stages EstimateLowpassStages(const LowpassProblem &problem) {
     return stages;
 }
 
-// The image of the centre when the model is stretched by m. False where the images of the band
+// The image of the centre if the model is stretched by m. Returns false if the images of the band
 // overlap.
 bool FindImage(const LowpassProblem &problem, double center, int32_t m, Stages &stages) {
     const double fs = problem.fs, reach = m * problem.f2;
@@ -104,7 +104,7 @@ bool FindImage(const LowpassProblem &problem, double center, int32_t m, Stages &
     return stages.image - reach > 0.0 && stages.image + reach < fs / 2.0;
 }
 
-// The distance, in the model's frequencies, of the image from the next one.
+// The distance from the image to the next one, in the frequencies of the model.
 double GapOfImages(double fs, const Stages &stages) {
     const double below = 2.0 * stages.image, above = fs - 2.0 * stages.image;
     if (stages.position == 1.0)
@@ -122,8 +122,8 @@ Stages EstimateBandStages(const LowpassProblem &problem, double center) {
     best.modelCount = Truncated(oneK / (14.6 * (f2 - f1) / fs));
     best.image = center;
     best.width = f2 - f1;
-    // Without this no length is positive; with it an interpolator has more than K m / 14.6 taps, so
-    // that the search ends where these alone are too many.
+    // If this is not positive, no length is positive. If it is, an interpolator has more than
+    // K m / 14.6 taps, so the search ends when these alone are too many.
     if (oneK <= 0.0)
         return best;
     constexpr double tooMany = 8200.0; // for any two filters
@@ -160,7 +160,7 @@ BandTable ModelBands(const LowpassProblem &problem, const Stages &stages) {
             {0.0, a - f2 * M, a - f1 * M, a + f1 * M, a + f2 * M, half}};
 }
 
-// What passes the wanted image and stops its neighbours.
+// The bands of the filter that passes the wanted image and stops its neighbours.
 BandTable InterpolatorBands(const LowpassProblem &problem, const Stages &stages, double center) {
     const double f1 = problem.f1, half = problem.fs / 2.0, r = problem.stopWeight();
     if (!problem.isBand())
@@ -173,11 +173,11 @@ BandTable InterpolatorBands(const LowpassProblem &problem, const Stages &stages,
     return {3, {0.0, 1.0, 0.0}, {r, 1.0, r}, {0.0, low - w, low, high, high + w, half}};
 }
 
-// The shortest filter of the lengths that are tried, from the estimate on, whose ripple is not
-// above the target.
+// The first filter whose ripple is not above the target, for increasing lengths from the estimate
+// on.
 ErrorCode DesignStage(const LowpassProblem &problem, const BandTable &bands, int32_t &count,
                       Scratch<ElementType::DBL> &taps) {
-    // Only an odd length has its middle on a tap and may pass the Nyquist frequency.
+    // Only a filter of odd length has its middle on a tap and can pass the Nyquist frequency.
     const auto shaped = [&](int32_t n) { return problem.kind == NarrowLowpass ? n : n | 1; };
     for (int32_t n = shaped(count);; n = shaped(Truncated(std::ceil(1.05 * n)))) {
         if (const ErrorCode failed = taps.allocate(n))
@@ -192,8 +192,8 @@ ErrorCode DesignStage(const LowpassProblem &problem, const BandTable &bands, int
     }
 }
 
-// Moves the response by half the sampling rate: every other tap changes its sign, the middle one
-// not.
+// Shifts the response by half the sampling rate: every other tap changes sign, but not the middle
+// one.
 void FlipAlternate(DBL *taps, int32_t n) {
     const int32_t middle = (n - 1) / 2;
     const int32_t last = middle % 2 == 0 ? 2 * middle - 1 : 2 * middle;
@@ -219,7 +219,7 @@ void Flip(NarrowFIRBlock &block) {
         Negate(taps, count);
 }
 
-// Estimates are short for long filters.
+// The estimates are too short for long filters.
 int32_t WithMargin(int32_t length) { return length > 100 ? Truncated(1.1 * length) : length; }
 
 } // namespace
@@ -260,7 +260,7 @@ int64_t NarrowFIRFilter::outputCount(std::ptrdiff_t n) const {
 
 namespace {
 
-// The stretched model meets every M-th value of what the interpolator gives.
+// The stretched model uses every M-th value of the interpolator's output.
 ErrorCode FilterInStages(ConstRealVector x, const NarrowFIRFilter &filter, RealVector y) {
     const std::ptrdiff_t smoothCount = x.size() + filter.interpolator.size() - 1;
     RealVector smooth;
@@ -304,7 +304,7 @@ ErrorCode FilterNarrowFIR(ConstVectorView<E> x, const NarrowFIRFilter &filter, V
     QX_EXPECTS(!x.isEmpty() && filter.isComplete() && y.size() == filter.outputCount(x.size()));
     if constexpr (E == ElementType::DBL) {
         return FilterReal(x, filter, y);
-    } else { // the parts one after the other
+    } else { // one part after the other
         RealVector part, filtered;
         ScratchParts memory;
         if (const ErrorCode failed = memory.take(Sized(part, x.size()), Sized(filtered, y.size())))

@@ -6,10 +6,10 @@
 
 namespace qx {
 
-// Narrow bands in few multiplications, after Y. Neuvo, C.-Y. Dong and S. K. Mitra, "Interpolated
-// finite impulse response filters", 1984: a model filter for the band M times as wide, stretched
-// by M zeros between its taps, repeats its response M times, and a short interpolator leaves one
-// image.
+// Narrow bands with few multiplications, after Y. Neuvo, C.-Y. Dong and S. K. Mitra, "Interpolated
+// finite impulse response filters", 1984: a model filter for a band M times as wide, stretched by
+// inserting M - 1 zeros between its taps, repeats its response M times, and a short interpolator
+// removes all but one image.
 
 enum NarrowKind : int32_t {
     NarrowLowpass = 0,
@@ -22,32 +22,32 @@ enum NarrowKind : int32_t {
 
 struct NarrowFIRBlock {
     int32_t kind = 0, M = 0;
-    int32_t modelCount = 0, interpolatorCount = 0; // none for M = 1
+    int32_t modelCount = 0, interpolatorCount = 0; // no interpolator for M = 1
     Scratch<ElementType::DBL> model, interpolator;
 };
 
 struct NarrowFIRGoal {
-    double fs, fPass, fStop, fCenter; // of bands, fPass and fStop are widths about fCenter
+    double fs, fPass, fStop, fCenter; // for bands, fPass and fStop are widths about fCenter
     double passRipple;                // linear
     double stopAttenuation;           // in decibels
     int32_t type;
 };
 
-// ErrBadDesignField: a type that does not exist, an edge, a width or a ripple that is out of order,
-// lengths below what RemezDesign takes. Else the codes of RemezDesign.
+// ErrBadDesignField: an unknown type; an edge, width or ripple that is out of order; or lengths
+// below those that RemezDesign accepts. Otherwise the codes of RemezDesign.
 ErrorCode DesignNarrowFIR(const NarrowFIRGoal &goal, NarrowFIRBlock &block);
 
 struct NarrowFIRFilter {
-    int32_t kind, M; // an M below 2 means no interpolator
+    int32_t kind, M; // an M below 2 means that there is no interpolator
     ConstRealVector model, interpolator;
 
-    // Has a model and, with M above 1, an interpolator.
+    // Whether there is a model and, for M above 1, an interpolator.
     bool isComplete() const;
-    // Of the output for n values: the full convolution with both.
+    // The length of the output for n values: that of the full convolution with both.
     int64_t outputCount(std::ptrdiff_t n) const;
 };
 
-// x, which is not empty, through a filter that is complete. ErrOutOfMemory.
+// Filters x, which must not be empty, with a complete filter. ErrOutOfMemory.
 template <ElementType E>
 ErrorCode FilterNarrowFIR(ConstVectorView<E> x, const NarrowFIRFilter &filter, VectorView<E> y);
 

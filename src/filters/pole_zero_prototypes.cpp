@@ -12,11 +12,11 @@ namespace {
 
 constexpr double kLn10Over10 = 0x1.d791c5f888822p-3;
 
-// 10^(decibels / 10) - 1, with the digits of small levels.
+// 10^(decibels / 10) - 1, accurate for small levels.
 double ExcessPower(double decibels) { return std::expm1(decibels * kLn10Over10); }
 
-// Of the pair i of n, from the imaginary axis: the parts of the pole of a Butterworth filter, both
-// by sines of angles up to pi / 2.
+// The pole of a Butterworth filter in pair i of n, counted from the imaginary axis: its damping and
+// frequency, both as sines of angles up to pi / 2.
 struct PairAngle {
     double damping, frequency;
     PairAngle(int32_t n, int32_t i)
@@ -39,11 +39,15 @@ void ButterworthPoles(int32_t n, PoleZeroSections &sections) {
     }
 }
 
-// For x above 0. The system's own is not the module's, and has other bits elsewhere.
+namespace {
+
+// For positive x. The system's function is not used because its last bits depend on the platform.
 double Asinh(double x) {
     return x > 1e8 ? std::log(x) + std::log(2.0)
                    : std::log1p(x + x * x / (1.0 + std::sqrt(1.0 + x * x)));
 }
+
+} // namespace
 
 void ChebyshevPoles(int32_t n, double ripple, PoleZeroSections &sections) {
     const double u = Asinh(1.0 / std::sqrt(ExcessPower(ripple))) / n;
@@ -56,7 +60,7 @@ void ChebyshevPoles(int32_t n, double ripple, PoleZeroSections &sections) {
     }
 }
 
-// Reciprocals of the poles of a Chebyshev filter.
+// The reciprocals of the poles of a Chebyshev filter.
 void InvChebyshevPoles(int32_t n, double attenuation, PoleZeroSections &sections) {
     const double u = Asinh(std::sqrt(ExcessPower(attenuation))) / n;
     const double sh = std::sinh(u), ch = std::cosh(u);
@@ -70,9 +74,10 @@ void InvChebyshevPoles(int32_t n, double attenuation, PoleZeroSections &sections
     }
 }
 
-// With the ripple factors e and es of pass and stop band, k1 = e / es; the degree equation
+// With the ripple factors e and es of the pass and stop bands, k1 = e / es. The degree equation
 // K'/K = K1' / (n K1) gives the modulus k of the filter, whose zeros are at 1 / (k sn(u_i)). The
-// poles lie off the real axis by x with sc(x, k1') = 1 / e, where K1' - x has sc = es.
+// arguments of the poles are shifted off the real axis by x with sc(x, k1') = 1 / e, and K1' - x
+// has sc = es.
 void EllipticPoles(int32_t n, double ripple, double attenuation, PoleZeroSections &sections) {
     const double e2 = ExcessPower(ripple), es2 = ExcessPower(attenuation);
     const double k1 = std::sqrt(e2 / es2);

@@ -6,9 +6,9 @@
 
 namespace qx {
 
-// The analog lowpasses of order n by poles and zeros: first the real pole if n is odd, then the
-// pairs from the real axis outwards, so that the least damped poles come last. Ripple and
-// attenuation are in decibels, above 0. Edges as of filters/analog_prototypes.h.
+// Analog lowpass prototypes of order n as poles and zeros: first the real pole if n is odd, then
+// the pairs from the real axis outwards, so that the least damped poles come last. Ripple and
+// attenuation are in decibels, positive. Edges are those of filters/analog_prototypes.h.
 void ButterworthPoles(int32_t n, PoleZeroSections &sections);
 void ChebyshevPoles(int32_t n, double ripple, PoleZeroSections &sections);
 void InvChebyshevPoles(int32_t n, double attenuation, PoleZeroSections &sections);
@@ -16,7 +16,7 @@ void EllipticPoles(int32_t n, double ripple, double attenuation, PoleZeroSection
 // ErrOutOfMemory, ErrSingularMatrix.
 ErrorCode BesselPoles(int32_t n, PoleZeroSections &sections);
 
-// At 0, of a filter with ripple in its pass band.
+// The gain at 0 of a filter with ripple in its pass band.
 double GainAt0(int32_t n, double ripple);
 
 } // namespace qx

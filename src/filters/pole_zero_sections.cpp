@@ -9,7 +9,8 @@ namespace qx {
 
 namespace {
 
-// Of pi f / fs; from a quarter of the rate on by the distance from the half, which is exact.
+// Sine and cosine of pi f / fs; above a quarter of the rate computed from the distance to half the
+// rate, which is exact.
 struct EdgeAngle {
     double sine, cosine;
     EdgeAngle(double f, double fs) {
@@ -33,7 +34,7 @@ CDB ToZ(CDB s) {
 }
 double ToZ(double s) { return (1.0 + s) / (1.0 - s); }
 
-// The square root with a real part that is not negative.
+// The square root with nonnegative real part.
 CDB Root(CDB x) {
     const double size = Modulus(x);
     if (size == 0.0)
@@ -44,8 +45,8 @@ CDB Root(CDB x) {
     return {re, x.im < 0.0 ? -im : im};
 }
 
-// The root of larger modulus of S^2 - 2 q S + A: q plus the root of q^2 - A, whose parts both have
-// the signs of those of q or both the opposite ones.
+// The root of larger modulus of S^2 - 2 q S + A: q plus the root of q^2 - A. The parts of that root
+// either both have the signs of the parts of q, or both have the opposite signs.
 CDB LargerRoot(CDB q, double A) {
     const CDB root = Root({(q.re - q.im) * (q.re + q.im) - A, 2.0 * q.re * q.im});
     const bool isAlong = q.re * root.re + q.im * root.im >= 0.0;
@@ -54,9 +55,9 @@ CDB LargerRoot(CDB q, double A) {
 
 CDB Reciprocal(CDB s) { return CDB{s.re, -s.im} / SquareOf(s); }
 
-// 1 + z1 / z + z2 / z^2 of a pole in S and its conjugate. Next to z = +-1 the value there, |1 -+
-// z|^2, decides where the resonance is, and it is a small difference of the coefficients: z2 is
-// what makes it right for the z1 that has been rounded.
+// 1 + z1 / z + z2 / z^2 for a pole in S and its conjugate. Near z = +-1 the value there, |1 -+
+// z|^2, determines the resonance, and it is a small difference of the coefficients; z2 is chosen to
+// make it accurate for the rounded z1.
 PoleZeroSections::Denominator DenominatorOf(CDB pole) {
     constexpr double isNear = 0.25;
     const double below = FromOne2(pole), square = SquareOf(pole);

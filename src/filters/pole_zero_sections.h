@@ -6,14 +6,14 @@
 
 namespace qx {
 
-// What a design by poles and zeros fills: sections of second order, and the poles and zeros of the
-// digital filter, section by section, conjugates next to each other.
+// The output of a design with poles and zeros: sections of second order, and the poles and zeros of
+// the digital filter, section by section, with conjugates adjacent.
 struct PoleZeroDesign {
     RealVector a, b;
     ComplexVector zeros, poles;
 };
 
-// How many sections, and how many poles and as many zeros, an order of the prototype gives.
+// The number of sections, and the number of poles (and of zeros), for an order of the prototype.
 constexpr int32_t SectionsOf(int32_t type, int32_t order) {
     return type == Lowpass || type == Highpass ? (order + 1) / 2 : order;
 }
@@ -21,30 +21,30 @@ constexpr int32_t PolesOf(int32_t type, int32_t order) {
     return type == Lowpass || type == Highpass ? order : 2 * order;
 }
 
-// Turns poles and zeros of an analog lowpass, whose edge is at 1 rad/s, into sections of the
+// Converts the poles and zeros of an analog lowpass with its edge at 1 rad/s to sections of the
 // digital filter. With S = (z - 1) / (z + 1) and s the variable of the analog filter,
 //
 //     lowpass s = S / g    highpass s = g / S    bandpass s = (S^2 + A) / (B S)
 //     bandstop s = B S / (S^2 + A)
 //
 // where g = tan(pi fl / fs), A is the product and B the difference of the tangents of both edges.
-// No polynomial is multiplied out and no difference of near numbers is formed: B comes from the
-// sine of the difference, of the two roots of S^2 - 2 q S + A = 0 the larger one comes from a sum
-// and the other one is A divided by it, and 1 - |z|^2 = -4 Re S / |1 - S|^2. So the distances of
-// the poles from the unit circle have small relative errors.
+// No polynomial is multiplied out and no difference of nearly equal numbers is formed: B is
+// computed from the sine of the difference; of the two roots of S^2 - 2 q S + A = 0 the larger one
+// is computed as a sum and the other one as A divided by it; and 1 - |z|^2 = -4 Re S / |1 - S|^2.
+// Therefore the distances of the poles from the unit circle have small relative errors.
 //
-// In a band, the pole farther out goes with the zero farther out. Each section has gain 1 in the
-// middle of the pass band (at 0 Hz, at half the sampling rate, at S = i sqrt(A)); the first one
-// also has the gain that the analog filter has at 0.
+// In a band filter, the outer pole is combined with the outer zero. Each section has gain 1 in the
+// middle of the pass band (at 0 Hz, at half the sampling rate, or at S = i sqrt(A)); the first
+// section also has the gain of the analog filter at 0.
 class PoleZeroSections {
 public:
-    // The edges lie between 0 and half the sampling rate and rise.
+    // The edges must be between 0 and half the sampling rate, in ascending order.
     PoleZeroSections(int32_t type, const FilterBand &band, double gainAt0,
                      const PoleZeroDesign &design);
 
-    void add(double pole); // real, below 0; its zero is at infinity
-    // A conjugate pair, of which the one above the real axis is given, with zeros at +-i zero;
-    // noZero: at infinity. From the real axis outwards.
+    void add(double pole); // real and negative; its zero is at infinity
+    // A conjugate pair, given by the pole above the real axis, with zeros at +-i zero, or at
+    // infinity if `zero` is noZero. To be added from the real axis outwards.
     static constexpr double noZero = 0.0;
     void add(CDB pole, double zero);
 
@@ -52,7 +52,7 @@ public:
         double z1, z2;
     };
 
-    // k of H(z) = k (product of z - zeros) / (product of z - poles); 0 where it underflows.
+    // k in H(z) = k (product of z - zeros) / (product of z - poles); 0 if it underflows.
     double gain() const { return gain_; }
 
 private:
@@ -62,7 +62,7 @@ private:
     void putZeros(double zero); // at +-i zero in S
     // A section from a pair of poles in S and the zeros +-i zero in S.
     void putPair(double lead, CDB pole, double zero);
-    void putAllPole(double lead, CDB pole); // zeros where the type has them
+    void putAllPole(double lead, CDB pole); // with the zeros of the type
 
     int32_t type_;
     double g_, A_, B_, pending_, gain_ = 1.0;

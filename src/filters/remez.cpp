@@ -35,7 +35,8 @@ ErrorCode CheckNumbers(const RemezBands &bands) {
     return 0;
 }
 
-// The ends of the bands against the zeros that the symmetry of the taps forces on the response.
+// Checks the ends of the bands against the zeros that the symmetry of the taps forces on the
+// response.
 ErrorCode CheckEnds(const RemezBands &bands, bool isOdd) {
     const double gap = std::fabs(bands.lastEdge() - 0.5 * bands.fs);
     if (bands.type == RemezHilbert ? bands.firstEdge() == 0.0 : bands.firstEdge() != 0.0)
@@ -64,7 +65,7 @@ ErrorCode CheckBands(const RemezBands &bands, int32_t n) {
     return CheckEnds(bands, n % 2 != 0);
 }
 
-// Points of the frequency axis, with what is desired there and its weight.
+// Points of the frequency axis, with the desired value and the weight at each.
 struct Grid {
     RealVector frequency, desired, weight;
     int32_t size = 0;
@@ -86,10 +87,10 @@ private:
     ScratchParts memory;
 };
 
-// Each band from its lower edge in steps; its last point is its upper edge instead.
+// Each band from its lower edge in steps; its last point is replaced by its upper edge.
 ErrorCode LayGrid(const RemezBands &bands, int32_t nfcns, Grid &grid) {
     const double step = 0.5 / (gridDensity * nfcns);
-    // All bands together are no wider than one half; rounding and the edges add two a band.
+    // All bands together are at most one half wide; rounding and the edges add two points per band.
     if (const ErrorCode failed =
             grid.allocate(int64_t{gridDensity} * nfcns + 2 * int64_t{bands.count()} + 1))
         return failed;
@@ -107,15 +108,15 @@ ErrorCode LayGrid(const RemezBands &bands, int32_t nfcns, Grid &grid) {
     return 0;
 }
 
-// A response of n taps is a cosine polynomial times a factor, which goes into what is desired and
-// into the weights.
+// A response of n taps is a cosine polynomial times a factor. The desired values are divided by
+// this factor and the weights are multiplied by it.
 double SymmetryFactor(const RemezBands &bands, bool isOdd, double f) {
     if (bands.type == RemezMultiband)
         return isOdd ? 1.0 : std::cos(kPi * f);
     return isOdd ? std::sin(kTwoPi * f) : std::sin(kPi * f);
 }
 
-// ErrBadDesignField where a weight vanishes: the deviation allowed by it would be no number.
+// ErrBadDesignField if a weight vanishes, because the deviation that it allows would not be finite.
 ErrorCode DivideByFactor(const RemezBands &bands, bool isOdd, int32_t nfcns, Grid &grid) {
     const bool isZeroAtNyquist = (bands.type == RemezMultiband) != isOdd;
     const double step = 0.5 / (gridDensity * nfcns);
@@ -133,18 +134,18 @@ ErrorCode DivideByFactor(const RemezBands &bands, bool isOdd, int32_t nfcns, Gri
     return 0;
 }
 
-// The exchange: a polynomial through r alternating deviations at the extrema ext, whose error over
-// the grid gives the next extrema.
+// The exchange: a polynomial through r alternating deviations at the extrema ext, whose error on
+// the grid determines the next extrema.
 class Exchange {
 public:
     Exchange(Grid &grid, int32_t nfcns) : grid_(grid), r_(nfcns + 1) {}
 
-    // Where the rounds run out, *unsettled takes the deviation of the last one.
+    // If the iteration limit is reached, *unsettled is set to the last deviation.
     ErrorCode run(int32_t maxIterations, double *unsettled);
     double deviation() const { return deviation_; }
     // The polynomial at x = cos(2 pi f).
     double at(double x) const;
-    // The same, but y[j] in reach of x[j].
+    // The same, but y[j] within `reach` of x[j].
     double near(double x, double reach) const;
 
 private:
@@ -190,7 +191,7 @@ ErrorCode Exchange::prepare() {
     return 0;
 }
 
-// All weights get one power of 2 in common, which cancels where they are used.
+// All weights are scaled by a common power of 2, which cancels where they are used.
 ErrorCode Exchange::formWeights() {
     MultiplyDistances({x_.data(), r_, ad_.data(), exponent_});
     int32_t least = 0;
@@ -248,7 +249,7 @@ double Exchange::near(double x, double reach) const {
     return std::fabs(x - x_[nearest]) < reach ? y_[nearest] : at(x);
 }
 
-// A group is evaluated when the first of its points is asked for.
+// A group is evaluated when one of its points is first needed.
 void Exchange::evaluateGroup(int32_t group) {
     const int32_t first = group * interpolationGroup;
     double values[interpolationGroup];
@@ -268,8 +269,8 @@ double Exchange::error(int32_t l) {
     return error_[l];
 }
 
-// From l, which beats the level, on to where the error ceases to rise or the end comes; the level
-// becomes that of the summit.
+// Climbs from l, which exceeds the level, until the error stops increasing or the end is reached;
+// the level is set to that of the summit.
 int32_t Exchange::climb(int32_t l, int32_t direction, int32_t end, double sign, double &level) {
     level = sign * error(l);
     while (l + direction != end && beats(l + direction, sign, level)) {
@@ -280,8 +281,8 @@ int32_t Exchange::climb(int32_t l, int32_t direction, int32_t end, double sign, 
     return l;
 }
 
-// Moves extremum j within what lies between the next one, `above`, and the one before it, `below`,
-// which becomes what bounds the search for the next one. The result is the error there.
+// Moves extremum j between the next one, `above`, and the previous one, `below`, which is set to
+// the bound of the search for the next extremum. Returns the error at the new place.
 double Exchange::moveExtremum(int32_t j, int32_t above, double sign, int32_t &below) {
     const int32_t old = ext_[j];
     double level = deviation_;
@@ -309,7 +310,7 @@ double Exchange::moveExtremum(int32_t j, int32_t above, double sign, int32_t &be
     return level;
 }
 
-// An extremum beyond the first or the last that is greater than what would leave at the other end.
+// Replaces an extremum at one end by one beyond the other end if that is larger.
 void Exchange::shiftAtEnds(int32_t first, int32_t last, double levelOfFirst, double levelOfLast) {
     constexpr double clearly = 1.00001;
     const double signBelow = -signOf(0), signAbove = -signOf(r_ - 1);
@@ -361,7 +362,7 @@ ErrorCode Exchange::run(int32_t maxIterations, double *unsettled) {
         before = deviation_;
         if (const ErrorCode failed = interpolate())
             return failed;
-        if (!(deviation_ >= before)) // the exchange must never lose
+        if (!(deviation_ >= before)) // the deviation must never decrease
             return ErrBadDesignField;
         exchange();
     }
@@ -370,10 +371,10 @@ ErrorCode Exchange::run(int32_t maxIterations, double *unsettled) {
     return ErrBadDesignField;
 }
 
-// What is left after the exchange: the coefficients of the polynomial in cos(2 pi k f), and the
-// taps that they are.
+// After the exchange: the coefficients of the polynomial in cos(2 pi k f), and the taps computed
+// from them.
 
-// Points at which the polynomial is sampled, mapped onto what the grid covers: its cosine is
+// The points at which the polynomial is sampled, mapped onto the range of the grid: the cosine is
 // (sample - bb) / aa.
 struct Mapping {
     double aa = 1.0, bb = 0.0;
@@ -386,8 +387,8 @@ struct Mapping {
     }
 };
 
-// The sum of alpha[k] T_k(aa x + bb) as one of T_k(x), T the Chebyshev polynomials, by Clenshaw's
-// recurrence on whole polynomials. `work` holds 2 n values.
+// The sum of alpha[k] T_k(aa x + bb) as a sum of T_k(x), with T the Chebyshev polynomials, by
+// Clenshaw's recurrence on whole polynomials. `work` has 2 n elements.
 void MapBack(const Mapping &mapping, int32_t n, DBL *alpha, DBL *work) {
     DBL *p = work, *q = work + n; // the sums from k on, and from k + 1 on
     Fill(work, 2 * std::ptrdiff_t{n}, 0.0);
@@ -425,7 +426,7 @@ ErrorCode FindCoefficients(const Exchange &exchange, const Mapping &mapping, boo
     for (int32_t k = 0; k < nfcns; ++k) {
         double sum = 0.0;
         for (int32_t j = 1, at = k; j < nfcns; ++j) {
-            sum += samples[j] * cosines[at]; // at is j k less whole periods
+            sum += samples[j] * cosines[at]; // at is j k modulo the period
             at += at + k < period ? k : k - period;
         }
         alpha[k] = (samples[0] + 2.0 * sum) * (k == 0 ? 1.0 : 2.0) / period;
@@ -435,11 +436,11 @@ ErrorCode FindCoefficients(const Exchange &exchange, const Mapping &mapping, boo
     return 0;
 }
 
-// The first half of the taps, of a sum of alpha[k] cos(2 pi k f) times the factor of the symmetry,
-// which adds or subtracts neighbours. The other half mirrors it.
+// The first half of the taps, for a sum of alpha[k] cos(2 pi k f) times the symmetry factor, which
+// adds or subtracts neighbours. The other half is its mirror image.
 void FormTaps(const DBL *alpha, int32_t nfcns, int32_t type, int32_t n, DBL *h) {
     const bool isOdd = n % 2 != 0, isSymmetric = type == RemezMultiband;
-    const int32_t distance = isOdd ? 2 : 1; // of the neighbours
+    const int32_t distance = isOdd ? 2 : 1; // between the neighbours
     const auto coefficient = [&](int32_t k) { return k < nfcns ? alpha[k] : 0.0; };
     const int32_t middle = nfcns - 1;
     if (isOdd && isSymmetric) {

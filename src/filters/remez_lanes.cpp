@@ -6,7 +6,7 @@ namespace qx::QX_WIDTH {
 
 namespace {
 
-// All places of a group side by side, so that their divisions overlap.
+// All places of a group together, so that their divisions overlap.
 template <int Vectors>
 QX_INLINE void InterpolateIn(const Interpolation &polynomial, const DBL *places, DBL *values) {
     typedef Lanes<nativeLanes> L;
@@ -30,7 +30,7 @@ QX_INLINE void InterpolateIn(const Interpolation &polynomial, const DBL *places,
         (above[i] / below[i]).store(values + i * nativeLanes);
 }
 
-// The factors between two looks at the range: distances of cosines on the grid are above 1e-9.
+// The number of factors between two range checks: distances of cosines on the grid are above 1e-9.
 constexpr int32_t factorsAtOnce = 16;
 
 QX_INLINE void KeepInRange(DBL &product, I32 &exponent) {
@@ -67,7 +67,7 @@ QX_INLINE void MultiplyDistancesOf(int32_t j, const Distances &distances) {
         const int32_t end = first + factorsAtOnce < count ? first + factorsAtOnce : count;
         for (int32_t k = first; k < end; ++k) {
             L distance = own - L(x[k]);
-            if (k >= j && k < j + L::count) // the distance of one lane from itself
+            if (k >= j && k < j + L::count) // the distance of a lane from itself
                 distance = WithOne(distance, k - j);
             part = part * distance;
         }

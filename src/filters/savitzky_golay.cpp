@@ -42,7 +42,7 @@ public:
     }
 
     const DBL *coefficients() const { return coefficients_; }
-    // Rows of V G: what the samples add to the values at these places of the frame.
+    // Rows of V G: the weights of the samples in the smoothed values at these places of the frame.
     void smoothing(int32_t firstRow, int32_t rows, DBL *out) const {
         OrderedProduct<Real>({powers_ + std::ptrdiff_t{firstRow} * terms_, rows, terms_},
                              {coefficients_, terms_, frame_}, {out, rows, frame_});

@@ -17,7 +17,7 @@ bool Fits(const CascadeCoefficients &from, const CascadeOutput &to, std::ptrdiff
            to.a.size() >= a && to.b.size() >= b;
 }
 
-// (1, a[0], a[1]) (1, a[2], a[3]) and (b[0], b[1], b[2]) (b[3], b[4], b[5]).
+// Multiplies (1, a[0], a[1]) by (1, a[2], a[3]) and (b[0], b[1], b[2]) by (b[3], b[4], b[5]).
 ErrorCode MultiplyOut(const DBL *a, const DBL *b, DBL *fourthA, DBL *fourthB) {
     const double first[3] = {1.0, a[0], a[1]}, second[3] = {1.0, a[2], a[3]};
     double product[5];
@@ -33,7 +33,7 @@ ErrorCode MultiplyOut(const DBL *a, const DBL *b, DBL *fourthA, DBL *fourthB) {
 // of its roots: re is their mean, modulus2 their product.
 struct Factors {
     double re[2], modulus2[2];
-    bool exist = false; // not if the degree is lower, or a coefficient NaN
+    bool exist = false; // false if the degree is lower, or a coefficient is NaN
 
     ErrorCode find(double c0, const DBL *rest);
 
@@ -46,7 +46,7 @@ private:
 
 bool IsReal(const CDB &root) { return std::fabs(root.im) < 1e-8 * std::fabs(root.re); }
 
-// Conjugate roots come next to each other; real ones, wherever they come, make a pair, too.
+// Conjugate roots are adjacent; two real roots also form a pair, wherever they are.
 void Factors::take(int which, const CDB &root, const CDB &next) {
     re[which] = IsReal(root) ? 0.5 * (root.re + next.re) : +root.re;
     modulus2[which] = IsReal(root) ? root.re * next.re : root.re * root.re + root.im * root.im;
@@ -63,7 +63,8 @@ void Factors::takeFour(const CDB *roots) {
     take(1, ordered[2], ordered[3]);
 }
 
-// Of the product of the factors from the polynomial, beside the greatest coefficient.
+// The deviation of the product of the factors from the polynomial, relative to the largest
+// coefficient.
 double Factors::deviation(const CDB *polynomial) const {
     const double product[5] = {
         modulus2[0] * modulus2[1], -2.0 * (modulus2[0] * re[1] + re[0] * modulus2[1]),
@@ -97,9 +98,9 @@ ErrorCode Factors::findWithin(double tolerance, const CDB *polynomial) {
     return 0;
 }
 
-// In bands far below the sampling rate roots that are not the same lie so close together that they
-// are taken for one; then the product of the factors is another polynomial, and roots are told
-// apart as far as they can be.
+// In bands far below the sampling rate, different roots are so close to each other that they are
+// taken for one; the product of the factors is then another polynomial. In that case the roots are
+// distinguished as far as possible.
 ErrorCode Factors::find(double c0, const DBL *rest) {
     const CDB polynomial[5] = {{c0, 0}, {rest[0], 0}, {rest[1], 0}, {rest[2], 0}, {rest[3], 0}};
     if (const ErrorCode failed = findWithin(-1.0, polynomial))
@@ -109,7 +110,7 @@ ErrorCode Factors::find(double c0, const DBL *rest) {
     return 0;
 }
 
-// A section of lower order stays whole, beside one that is 1.
+// A section of lower order is kept whole, followed by a section equal to 1.
 ErrorCode SplitDenominator(const DBL *a, DBL *second) {
     Factors factors;
     if (const ErrorCode failed = factors.find(1.0, a))
@@ -123,7 +124,7 @@ ErrorCode SplitDenominator(const DBL *a, DBL *second) {
     return 0;
 }
 
-// The first factor takes b[4], which is b[0] here, along.
+// The first factor includes b[4], which is b[0] here.
 ErrorCode SplitNumerator(const DBL *b, DBL *second) {
     Factors factors;
     if (const ErrorCode failed = factors.find(b[0], b + 1))

@@ -9,17 +9,17 @@ struct CascadeOutput {
     RealVector a, b;
 };
 
-// The same filter in sections of the other order. ErrCoefficientSizes where the sizes do not fit;
+// The same filter in sections of the other order. ErrCoefficientSizes if the sizes do not fit;
 // ErrOutOfMemory.
 
-// Two sections are multiplied out to one; of an odd number the first remains alone, with zeros in
-// the upper places.
+// Pairs of sections are multiplied out. If their number is odd, the first remains single, with
+// zeros for the upper coefficients.
 ErrorCode SecondToFourthOrder(const CascadeCoefficients &second, const CascadeOutput &fourth);
 
-// Each section is split between its conjugate pairs of roots, so that the product of the two is the
-// section within 1e-12 of its greatest coefficient; one of lower order stays whole, and the section
-// beside it is 1. The numerator is one whose first and last values are equal, as that of a band
-// filter is.
+// Each section is split into its conjugate pairs of roots, so that the product of the two is the
+// section within 1e-12 of its largest coefficient. A section of lower order is kept whole, and the
+// section beside it is 1. The numerator must have equal first and last values, as that of a band
+// filter has.
 ErrorCode FourthToSecondOrder(const CascadeCoefficients &fourth, const CascadeOutput &second);
 
 } // namespace qx

@@ -11,7 +11,7 @@
 namespace qx {
 namespace {
 
-// The two passes over a padded copy; pass(values, state) filters in place.
+// Both passes over a padded copy; pass(values, state) filters in place.
 template <class State, class Pass>
 ErrorCode ThereAndBack(RealVector x, int64_t pad, State forward, State backward, Pass pass) {
     const int64_t count = x.size() + 2 * pad;
@@ -36,8 +36,8 @@ ErrorCode ThereAndBack(RealVector x, int64_t pad, State forward, State backward,
     return memory.release();
 }
 
-// The length of a section's response as its coefficients tell it: all of them, or without the upper
-// half where that is zero.
+// The length of a section's response according to its coefficients: all of them, or all but the
+// upper half if that is zero.
 int64_t ResponseLength(const DBL *coefficients, int32_t order, int64_t base) {
     const int32_t half = order / 2;
     for (int32_t k = 0; k < half; ++k)
@@ -66,7 +66,7 @@ ErrorCode ZeroPhaseCascade(const CascadeCoefficients &filter, RealVector forward
         return ErrInvalidSelector;
     if (filter.a.size() < order || filter.b.size() < order + 1)
         return ErrCoefficientSizes;
-    // By the upper coefficients of the first section.
+    // Based on the upper coefficients of the first section.
     const int64_t base = int64_t{filter.a.size()} / order * order - order / 2;
     const int64_t pad = std::max(ResponseLength(filter.a.data() + (order - 1), order, base),
                                  ResponseLength(filter.b.data() + order, order, base)) +

@@ -22,7 +22,7 @@ public:
     }
     // Element (i, i + j), j < band; at j = band the target.
     DBL *row(int32_t i) const { return elements_.row(i); }
-    // No diagonal element is negligible beside its column.
+    // Whether no diagonal element is negligible compared with its column.
     bool hasFullRank() const;
     void solve(RealVector x) const;
 
@@ -52,8 +52,8 @@ void BandedTriangle::solve(RealVector x) const {
     }
 }
 
-// The samples, which ascend, in runs within one span; the last x belongs to the last span that has
-// a length.
+// Splits the samples, which ascend, into runs within one span; the last x belongs to the last span
+// that has a length.
 class Spans {
 public:
     Spans(const FitSamples &all, ConstRealVector knots, int32_t degree)
@@ -62,7 +62,7 @@ public:
         while (last_ > degree && !(knots[last_] < knots[last_ + 1]))
             --last_;
     }
-    // The next run, of at most kSplineRows samples; false behind the last one.
+    // Sets *run to the next run of at most kSplineRows samples; returns false after the last one.
     bool next(SpanSamples *run) {
         first_ += count_;
         if (first_ >= all_.n())
@@ -87,7 +87,7 @@ private:
     int32_t span_, last_, first_ = 0, count_ = 0;
 };
 
-// A power of two near 1 / sqrt(largest |w|), with which no square of a row leaves the range.
+// A power of two near 1 / sqrt(largest |w|), with which no square of a row overflows or underflows.
 double ScaleOfWeights(const FitSamples &samples) {
     const DBL *const w = samples.weights();
     const double largest = w == nullptr ? 1.0 : LargestWeight(w, samples.n());

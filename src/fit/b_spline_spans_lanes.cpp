@@ -5,7 +5,7 @@ namespace qx::QX_WIDTH {
 
 namespace {
 
-// Four samples, in as many vectors as the width needs.
+// Four samples, in as many vectors as the width requires.
 struct Four {
     typedef Lanes<nativeLanes> Part;
     static constexpr int parts = 4 / nativeLanes;
@@ -49,7 +49,7 @@ struct Four {
     Part part[parts];
 };
 
-// Samples i to i + 3; behind the last one its x goes on, with y and weight 0.
+// Samples i to i + 3; after the last sample its x is repeated, with y and weight 0.
 struct Samples {
     Four x, y;
     double weight[4];
@@ -132,7 +132,7 @@ void WriteRows(const SpanSamples &samples, const DBL *knots, double scale, DBL *
 
 // H = I - tau u u' with u = (1, v / (alpha - beta)) maps (alpha, v) to (beta, 0), where alpha is
 // the diagonal element r[0] and v the column; Rest columns follow, the target last. The sign of
-// beta is the one with which nothing cancels.
+// beta is chosen so that nothing cancels.
 template <int Rest>
 void Reflect(DBL *v, int32_t rows, DBL *r, int32_t target) {
     Four squares(0.0), products[Rest];
@@ -159,7 +159,7 @@ void Reflect(DBL *v, int32_t rows, DBL *r, int32_t target) {
         above -= step;
         steps[c] = Four(step * factor);
     }
-    if constexpr (Rest > 1) // else the target's rest, which nobody needs
+    if constexpr (Rest > 1) // otherwise only the rest of the target remains, which is not needed
         for (int32_t i = 0; i < rows; i += 4) {
             const Four element = Four::load(v + i);
 #pragma GCC unroll 16

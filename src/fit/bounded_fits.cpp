@@ -11,7 +11,7 @@ namespace qx {
 
 namespace {
 
-// What sets a model that is fitted in steps apart from the others.
+// The properties that distinguish the models which are fitted by iteration.
 struct SteppedModel {
     FitModel model;
     ErrorCode (*start)(const FitSamples &samples, DBL *p);
@@ -20,7 +20,7 @@ struct SteppedModel {
     int32_t divisor;      // the parameter that must not start at 0, or -1
 };
 
-// A bound, or 0 where there is none.
+// Starts each parameter at one of its bounds, or at 0 if it has none.
 void StartAtBounds(const FitBounds &bounds, DBL *p) {
     for (std::ptrdiff_t i = 0; i < bounds.lower.size(); ++i) {
         const double lower = bounds.lower[i], upper = bounds.upper[i];
@@ -33,7 +33,7 @@ class SteppedFit {
 public:
     explicit SteppedFit(const SteppedModel &model) : model_(model) {}
 
-    // Copies, by which no sum is moved but for a factor.
+    // Repeats the samples, which changes the sums only by a factor.
     ErrorCode pad(const BoundedFit &request, FitSamples *samples) {
         const auto [x, y, w] = request.samples;
         const int32_t given = request.samples.n(),
@@ -66,7 +66,7 @@ public:
     double value(double x, const DBL *p) const { return Model::value(x, p, nullptr); }
 
 private:
-    // ln x in place of x, which must be above 0.
+    // Replaces x, which must be above 0, by ln x.
     ErrorCode takeLogarithms(FitSamples *samples) {
         for (const double x : samples->x)
             if (x <= 0.0)
@@ -93,12 +93,13 @@ private:
         return isUseless ? ErrFitStartValues : 0;
     }
 
-    // First without bounds by least squares, then within the bounds in the norm asked for.
+    // First without bounds by least squares, then within the bounds in the requested norm.
     ErrorCode iterate(const BoundedFit &request, const FitSamples &samples) const {
         const int32_t limit = *request.iterations;
         int32_t first = std::min(limit / 2, model_.mostInFirstPass);
         int32_t second = limit - first;
-        // kept: a power law by least squares has all iterations without bounds, and one within them
+        // kept: a power law by least squares uses all iterations without bounds, and one within
+        // them
         const bool allInFirst = model_.isOverLogarithm && request.method == leastSquares;
         if (allInFirst)
             first = limit;
@@ -108,7 +109,7 @@ private:
         free.tolerance = std::sqrt(request.tolerance);
         if (const ErrorCode failed = pass(free, samples, &first))
             return failed;
-        // Where a bound cuts that answer off, one iteration would not find the best point within.
+        // If that result is out of bounds, one iteration would not find the best point within them.
         if (allInFirst)
             second = IsWithin(request.bounds, request.p) ? 0 : limit;
         if (const ErrorCode failed = pass(request, samples, &second))

@@ -8,7 +8,7 @@
 
 namespace qx {
 
-// The steps of two passes, as far as they can be counted.
+// The number of steps of two passes, at most the largest int32_t.
 inline int32_t StepsOfBoth(int32_t first, int32_t second) {
     return static_cast<int32_t>(
         std::min(int64_t{first} + second, int64_t{std::numeric_limits<int32_t>::max()}));
@@ -41,7 +41,7 @@ struct TwoSamples {
     }
 };
 
-// What every bounded fit does around the model's own method. A model has
+// The frame of every bounded fit around the model's own method. A model has
 //     pad(request, &samples)          samples for a request that has fewer than parameters
 //     checkAbscissae(samples)         the codes that come before those of the weights
 //     fit(request, samples)           p, *mse and *iterations from the samples with settled weights
@@ -52,7 +52,7 @@ ErrorCode FitInFrame(BoundedFit request, Model &&model) {
     const int32_t n = request.samples.n();
     if (n < FreeParameters(request.bounds))
         return ErrFitPointsTooFew;
-    if (n == 0) { // nothing is free
+    if (n == 0) { // no parameter is free
         for (int32_t i = 0; i < count; ++i)
             request.p[i] = request.bounds.upper[i];
         *request.mse = 0.0;

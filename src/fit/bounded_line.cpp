@@ -16,7 +16,7 @@ struct Interval {
     bool contains(double v) const { return v >= lower && v <= upper; }
 };
 
-// Half the sum of squares as a function of the line, less what no line changes.
+// Half the sum of squares as a function of the line, without the part that does not depend on it.
 struct Quadratic {
     LineSums s;
     double at(const Line &line) const {
@@ -29,8 +29,8 @@ struct Quadratic {
     }
 };
 
-// Newton steps on the quadratic function, held back near the bounds by a barrier on the diagonal
-// of its second derivatives, whose weight falls from round to round.
+// Newton steps on the quadratic function, shortened near the bounds by a barrier on the diagonal of
+// its second derivatives, whose weight decreases from round to round.
 class Barrier {
 public:
     Barrier(const Quadratic &q, const Interval &slopes, const Interval &intercepts, Line start)
@@ -51,7 +51,7 @@ public:
     }
 
 private:
-    // More are never needed where the steps are finite.
+    // More are never needed if the steps are finite.
     static constexpr int32_t mostRounds = 400, mostSteps = 400;
 
     bool findBetter(double &weight) {
@@ -100,8 +100,8 @@ private:
     double value_, bestValue_;
 };
 
-// The barrier method stalls in a corner that it has entered from outside. The lowest points of the
-// four edges have closed forms.
+// The barrier method stalls in a corner that it enters from outside, so the lowest points of the
+// four edges are compared as well; they have closed forms.
 Line BestOfEdges(const Quadratic &q, const Interval &slopes, const Interval &intercepts,
                  Line best) {
     double lowest = q.at(best);
@@ -142,7 +142,7 @@ double Cost(const FitSamples &samples, const Line &line, int32_t norm) {
     return sum / samples.n();
 }
 
-// The line of least squares again and again, with the weights that follow from the last one.
+// Repeats the line of least squares, each time with the weights that follow from the last line.
 class RobustLine {
 public:
     RobustLine(const FitSamples &samples, const FitBounds &bounds, FitNorm norm)
@@ -150,8 +150,9 @@ public:
 
     ErrorCode allocate() { return state_.take(samples_.n()); }
 
-    // From *line on. *rounds is the limit, and then the count. Least absolute residuals have a norm
-    // by which the best line is known; bisquare has come to rest where it ends.
+    // Iterates from *line. *rounds is the limit on entry and the count on return. For least
+    // absolute residuals the norm identifies the best line, which is returned; for bisquare the
+    // last line is the result.
     ErrorCode run(FitNorm norm, double tolerance, int32_t *rounds, Line *line) {
         const int32_t limit = *rounds;
         state_.norm = norm;
@@ -159,8 +160,9 @@ public:
             findLeverageFactors();
         Line last = *line;
         double lowest = Cost(samples_, last, norm);
-        // A line follows from the one before, so lines that come back come back for ever (R. P.
-        // Brent, "An improved Monte Carlo factorization algorithm", 1980, finds them so).
+        // Each line depends only on the one before, so once a line recurs, the iteration is in a
+        // cycle. It is detected as by R. P. Brent, "An improved Monte Carlo factorization
+        // algorithm", 1980.
         Line earlier = last;
         int32_t noted = 0;
         for (*rounds = 1; *rounds <= limit; ++*rounds) {
@@ -212,7 +214,8 @@ private:
         state_.setLeverages();
     }
 
-    // The line moves by a part of the residuals, or within the rounding of the data.
+    // Whether the line moves by at most the tolerance times the residuals, or within the rounding
+    // errors of the data.
     bool isSettled(const Line &last, const Line &next, double tolerance) const {
         double moved = 0.0, size = 0.0, rest = 0.0;
         for (int32_t i = 0; i < samples_.n(); ++i) {
@@ -231,7 +234,7 @@ private:
 
 class LineFit {
 public:
-    // A second sample that the fixed parameter puts beside the first.
+    // Adds a second sample, on the line that the first sample and the fixed parameter determine.
     ErrorCode pad(const BoundedFit &request, FitSamples *samples) {
         const FitBounds &bounds = request.bounds;
         const double x0 = samples->x[0], y0 = samples->y[0];
@@ -282,7 +285,7 @@ ErrorCode FitLineRobustly(const BoundedFit &request) {
     Line line = LineWithin(samples, request.bounds);
     const int32_t limit = std::clamp(*request.iterations, 1, mostIterations);
     int32_t done = 0;
-    // Samples that all lie on one side of the plain line would take its place as the bulk of the
+    // Samples that all lie on one side of the plain line could be mistaken for the bulk of the
     // data; the line of least absolute residuals goes through the bulk.
     if (norm == bisquare) {
         constexpr double nearEnough = 0.01;

@@ -18,7 +18,7 @@ void Copy(DBL *to, const DBL *from, std::ptrdiff_t count) {
     std::memcpy(to, from, sizeof(DBL) * static_cast<std::size_t>(count));
 }
 
-// Central differences; `moved` is p but for the one parameter that moves.
+// Central differences; `moved` is p except for the one parameter that moves.
 void NumericGradient(const FitModel &model, double x, RealVector p, RealVector moved,
                      RealVector out) {
     const double leastSize = std::sqrt(kEpsilon);
@@ -153,7 +153,7 @@ public:
         return evaluation_.take(samples_.n());
     }
 
-    // The best point stands at point() afterwards, also after a failure.
+    // Afterwards point() is the best point, even after a failure.
     ErrorCode run(const DBL *start, int32_t limit, double tolerance, double *lambda,
                   int32_t *steps) {
         const double startLambda = *lambda;
@@ -176,7 +176,7 @@ public:
                 return ErrNonFiniteInput;
             if (before < after || std::isnan(after)) {
                 *lambda *= 10.0;
-                if (*lambda == 0.0) { // no damping grows from it: the rest repeats this step
+                if (*lambda == 0.0) { // it cannot grow again: all further steps would be the same
                     if (limit >= 0)
                         k = limit + 1;
                     return 0;
@@ -191,7 +191,7 @@ public:
                 continue;
             }
             std::swap(current_, trial_);
-            // A cost that stays, as 0 does, falls by no part of itself, however small.
+            // An unchanged cost, such as 0, ends the iteration whatever the tolerance.
             if (before - after < before * tolerance || before == after)
                 return 0;
             *lambda *= 0.4;
@@ -224,7 +224,7 @@ private:
         return !bounds_.upper.isEmpty() && p[i] >= bounds_.upper[i];
     }
 
-    // Only a lack of memory ends the iteration.
+    // Of the failures only a lack of memory is returned, which ends the iteration.
     ErrorCode evaluate(Point &at) {
         ErrorCode status = 0;
         if (norm_ == leastSquares)
@@ -244,9 +244,9 @@ private:
         return 0;
     }
 
-    // A parameter at a bound that the cost would fall from. Its step along the gradient alone may
-    // be so long, against the curvature, that no damping makes it fall: from then on such
-    // parameters take part in the equations. False where there is none, or all do.
+    // Lets the parameters at a bound from which the cost falls inwards take part in the equations
+    // from now on: a step along the gradient alone may be so long, given the curvature, that no
+    // damping makes the cost fall. Returns false if there are none, or if they already take part.
     bool release() {
         bool any = false;
         for (int32_t i = 0; !isReleasing_ && i < count_; ++i)
@@ -272,7 +272,7 @@ private:
             at.g[i] = 0.0;
     }
 
-    // The next point to try; the point itself where the equations are not finite.
+    // The next point to try; the current point if the equations are not finite.
     ErrorCode propose(double lambda) {
         const std::ptrdiff_t square = std::ptrdiff_t{count_} * count_;
         DBL *const a = damped_.a.data(), *const g = damped_.g.data();
@@ -291,7 +291,7 @@ private:
         return 0;
     }
 
-    // Relative to the parameter; one that stays at 0 has not changed.
+    // The largest change relative to the parameter; a parameter that stays at 0 has not changed.
     double largestChange() const {
         double largest = 0.0;
         for (int32_t i = 0; i < count_; ++i) {

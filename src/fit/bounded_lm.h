@@ -12,13 +12,13 @@ typedef double (*ModelValue)(double x, const DBL *p, int32_t count, const void *
 // The partial derivatives at x, one per parameter.
 typedef void (*ModelGradient)(double x, const DBL *p, int32_t count, DBL *out, const void *user);
 // Over all samples, with r = y - f(x): the mean of |w| r^2, the sum a of |w| times the outer
-// products of the derivatives (count by count), the sum g of |w| r times the derivatives, and,
-// where `jacobian` is not null, the derivatives themselves, row after row.
+// products of the derivatives (count by count), the sum g of |w| r times the derivatives, and, if
+// `jacobian` is not null, the derivatives themselves, row by row.
 typedef void (*ModelNormalEquations)(const FitSamples &samples, const DBL *p, int32_t count,
                                      double *mse, DBL *a, DBL *jacobian, DBL *g, const void *user);
 
-// Gradient and normal equations may be null: the derivatives are then central differences, and the
-// sums are formed from values and derivatives.
+// Gradient and normal equations may be null: without the former the derivatives are central
+// differences, without the latter the sums are formed from values and derivatives.
 struct FitModel {
     int32_t count; // of parameters
     ModelValue value;
@@ -27,14 +27,14 @@ struct FitModel {
     const void *user;
 };
 
-// One bound per parameter, infinite where there is none; empty for no bounds at all. A parameter
-// whose bounds are equal is fixed.
+// One bound per parameter, infinite if there is none; empty if there are no bounds at all. A
+// parameter whose bounds are equal is fixed.
 struct FitBounds {
     ConstRealVector lower, upper;
 };
 
-// The parameters p, and the cost of a method there, with a and g as above for the weights that the
-// method gives; g points where the cost falls.
+// The parameters p, and the cost of a method there, with a and g as above for the weights of the
+// method; the cost falls in the direction of g.
 struct FitPoint {
     RealVector p;
     RealMatrix a;
@@ -42,7 +42,7 @@ struct FitPoint {
     double cost;
 };
 
-// What an evaluation needs beside the point.
+// The work memory of an evaluation.
 class EvaluationMemory {
 public:
     EvaluationMemory(const FitModel &model, const FitSamples &samples, FitNorm norm)
@@ -52,7 +52,7 @@ public:
 
     RealVector gradient, moved;
     Reweighting state;
-    RealMatrix inverse, jacobian; // bisquare alone
+    RealMatrix inverse, jacobian; // for bisquare only
 
 private:
     ScratchParts memory_;
@@ -70,19 +70,19 @@ ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, Fi
 ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, FitPoint &at,
                        EvaluationMemory &memory);
 
-// Levenberg-Marquardt iteration from p within the bounds, with the damping a (1 + lambda) + lambda
-// of the diagonal (K. Levenberg, "A method for the solution of certain non-linear problems in least
-// squares", 1944; D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
+// Levenberg-Marquardt iteration from p within the bounds, where the damped diagonal of a is a (1 +
+// lambda) + lambda (K. Levenberg, "A method for the solution of certain non-linear problems in
+// least squares", 1944; D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
 // parameters", 1963). A parameter at a bound takes no part in the normal equations: it stays as
-// long as the cost falls beyond the bound, else it moves along the gradient alone.
+// long as the cost falls outwards, and otherwise moves along the gradient alone.
 //
-// It ends, with 0, where a step lowers the cost by less than the tolerance times the cost, where
-// the damping has passed 10000 without a better point, where the cost is 0, and with bisquare where
-// no parameter changes by more than the tolerance times itself. A tolerance of 0 or below is 1e-8,
-// and such a damping 1. *iterations is the limit, below 0 for none, and becomes the count of steps
-// that were tried after the first. Where the damping has fallen to 0 and the step is worse, all
-// steps up to the limit would be the same, and count without being tried. *lambda becomes the last
-// damping. *mse is the cost, with bisquare the mean of |w| r^2.
+// It ends, with 0, when a step lowers the cost by less than the tolerance times the cost, when the
+// damping has passed 10000 without a better point, when the cost is 0, and, with bisquare, when no
+// parameter changes by more than the tolerance times itself. A tolerance of 0 or below means 1e-8,
+// and such a damping means 1. *iterations is the limit, below 0 for no limit, and becomes the
+// number of steps tried after the first. If the damping has fallen to 0 and the step is worse, all
+// steps up to the limit would be the same; they are counted without being tried. *lambda becomes
+// the last damping. *mse is the cost, with bisquare the mean of |w| r^2.
 //
 // ErrEmptyInput (no samples, or no p), ErrPolynomialOrderTooHigh (fewer samples than parameters),
 // ErrInvalidSelector (no such method), ErrBoundsCrossed, ErrOutOfMemory, ErrNaNInData (no weights

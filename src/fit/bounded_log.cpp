@@ -36,7 +36,8 @@ class LogFit {
 public:
     explicit LogFit(double base) : base_(base), constants_(base) {}
 
-    // A second sample at twice the abscissa that the fixed parameter puts beside the first.
+    // Adds a second sample at twice the abscissa, on the curve that the first sample and the fixed
+    // parameter determine.
     ErrorCode pad(const BoundedFit &request, FitSamples *samples) {
         const FitBounds &bounds = request.bounds;
         const double x0 = samples->x[0], y0 = samples->y[0];
@@ -81,7 +82,7 @@ public:
     double value(double x, const DBL *p) const { return LogModel::value(x, p, &constants_); }
 
 private:
-    // Without bounds; *iterations is the limit, and then the count.
+    // Fits without bounds; *iterations is the limit on entry and the count on return.
     ErrorCode fitFree(const BoundedFit &request, const FitSamples &samples,
                       int32_t *iterations) const {
         if (request.method != leastSquares)

@@ -70,7 +70,7 @@ void RowLengthsThroughTriangle(const Elimination &triangle, int32_t k, const Row
         lengths[l] = std::sqrt(lengths[l]);
 }
 
-// The root of the sum of |w| (y - f)^2 over dof, without overflow on the way. NaN or infinite where
+// The root of the sum of |w| (y - f)^2 over dof, without intermediate overflow. NaN or infinite if
 // a residual is.
 double ResidualDeviation(const FittedModel &model, ConstRealVector f, int32_t dof) {
     const DBL *const w = model.linear.w;
@@ -115,7 +115,7 @@ ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what
     if (!HasFullRank(triangle, k))
         return ErrSingularMatrix;
 
-    // The values of the model go to `upper`, sqrt(j' (J' W J)^-1 j) to `lower`.
+    // First the values of the model are written to `upper`, sqrt(j' (J' W J)^-1 j) to `lower`.
     RowStream stream;
     if (const ErrorCode failed = stream.open(model.linear))
         return failed;

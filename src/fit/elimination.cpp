@@ -10,7 +10,7 @@ namespace qx {
 
 namespace {
 
-// Squares are summed as they are where neither they nor their sum leave the range.
+// Squares are summed without scaling if neither they nor their sum can overflow or underflow.
 constexpr double smallSquare = 0x1p-900, largeSquare = 0x1p900;
 
 double SumOfSquares(const DBL *v, int32_t n) {
@@ -83,7 +83,7 @@ ErrorCode Elimination::reduce(const LinearModel &model) {
 }
 
 // H = I - tau u u^T with u = (1, v / (alpha - beta)) maps (alpha, v) to (beta, 0), where alpha is
-// the diagonal element of R and v the column in the block. The sign of beta is the one with which
+// the diagonal element of R and v the column in the block. The sign of beta is chosen so that
 // nothing cancels.
 void Elimination::reflect(int32_t j, const RowBlock &block) {
     DBL *const v = block.column(j), *const r = row(j);

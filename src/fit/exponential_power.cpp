@@ -13,8 +13,8 @@ namespace qx {
 
 namespace {
 
-// What exponential and power have in common: y = a g(b), g = exp(b t), with t = x or t = ln x. The
-// derivatives are g and a t g.
+// The common form of exponential and power law: y = a g(b), g = exp(b t), with t = x or t = ln x.
+// The derivatives are g and a t g.
 struct GrowthData : FitSamples {
     ConstRealVector t;
 };
@@ -25,7 +25,7 @@ struct Parameters {
     double a, b, mse;
 };
 
-// +1, or -1 where more values are negative than positive.
+// +1, or -1 if more values are negative than positive.
 double DataSign(ConstRealVector y) {
     int32_t balance = 0;
     for (const double v : y)
@@ -33,8 +33,8 @@ double DataSign(ConstRealVector y) {
     return balance < 0 ? -1.0 : 1.0;
 }
 
-// The line ln(sign y) = p + q t over the values of that sign, in rows that carry their weights
-// |w| y^2; the others are rows of zeros.
+// Fits the line ln(sign y) = p + q t to the values of that sign, in rows that include their weights
+// |w| y^2; the rows of the other values are zeros.
 ErrorCode FitLogarithms(const GrowthData &data, double sign, DBL *pq) {
     int32_t count = 0;
     for (int32_t i = 0; i < data.n(); ++i)
@@ -55,14 +55,14 @@ ErrorCode FitLogarithms(const GrowthData &data, double sign, DBL *pq) {
     return SolveLinearModel({writeRows, data.n(), 2, nullptr}, bySVD, pq, nullptr);
 }
 
-// Where a step follows from the parameters alone, parameters that come back come back for ever:
-// rounding ends most iterations of a small tolerance in such a cycle. R. P. Brent, "An improved
-// Monte Carlo factorization algorithm", 1980, finds it in a few times the steps that lead into it
-// and once around.
+// If a step depends only on the parameters, parameters that recur start a cycle: with a small
+// tolerance, rounding leads most iterations into one. The method of R. P. Brent, "An improved Monte
+// Carlo factorization algorithm", 1980, finds it in a few times the number of steps that lead into
+// it and once around.
 class Cycle {
 public:
-    // The number of steps after as many whole rounds as fit below `limit`, from `count` on: the
-    // parameters are the same then.
+    // Returns the number of steps after as many whole rounds of the cycle as fit below `limit`,
+    // counted on from `count`: the parameters are the same then.
     int32_t skipRounds(const Parameters &at, int32_t count, int32_t limit) {
         if (count > noted_ && count < limit && isSame(at))
             return count + (limit - count) / (count - noted_) * (count - noted_);
@@ -116,7 +116,7 @@ public:
         return 0;
     }
 
-    // *best starts as the first parameters.
+    // On entry *best holds the start parameters.
     ErrorCode run(const FitLimits &limits, Parameters *best, int32_t *steps) {
         best->mse = mseAt(best->a, best->b);
         Parameters latest = *best;
@@ -127,7 +127,8 @@ public:
         while (limits.iterations >= 0 &&
                std::fabs(earlier - latest.mse) > earlier * limits.tolerance &&
                latest.mse > limits.floor) {
-            // Up to here no step ends the iteration for being worse, and the best is known.
+            // Up to this limit a worse step does not end the iteration, and the best parameters are
+            // known.
             count = cycle.skipRounds(latest, count, limits.iterations / 10);
             earlier = latest.mse;
             if (const ErrorCode failed = step(&latest))
@@ -149,7 +150,8 @@ private:
     const RealVector values_;
 };
 
-// From the guess, or the line through the logarithms, or both where the guess is of no use.
+// The start is the guess, or, without one, the line through the logarithms. If the guess is not
+// finite, the line is fitted as well, for its codes.
 ErrorCode FindStart(const GrowthData &data, const DBL *guess, Parameters *start) {
     if (guess == nullptr || CheckFinite(guess, 2) != 0) {
         const double sign = DataSign(data.y);
@@ -158,7 +160,7 @@ ErrorCode FindStart(const GrowthData &data, const DBL *guess, Parameters *start)
             return failed;
         *start = {sign * std::exp(pq[0]), pq[1], 0.0};
     }
-    // kept: also a guess that is not finite
+    // kept: even a guess that is not finite is the start
     if (guess != nullptr)
         *start = {guess[0], guess[1], 0.0};
     return 0;

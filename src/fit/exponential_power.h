@@ -5,21 +5,22 @@
 
 namespace qx {
 
-// Parameters: a, b. A guess that is not finite starts the iteration all the same, which then gives
-// NaN and no failure.
+// Parameters: a, b. The iteration starts even from a guess that is not finite; the result is then
+// NaN, without a failure.
 //
 // Codes of SettleWeights, then ErrNotStrictlyPositive (FitPower: an abscissa is not above 0),
-// ErrPolynomialOrderTooHigh (fewer than two values have the sign of most), ErrNonFiniteInput,
-// ErrOutOfMemory, ErrIterationLimit (of the singular values).
+// ErrPolynomialOrderTooHigh (fewer than two values have the sign of the majority),
+// ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit (of the singular values).
 
 enum class ExponentialMethod { LogarithmicLine, GaussNewton };
 
-// y = a exp(b x). By a line through ln |y|, with the weights |w| y^2 that make up for the
-// logarithm; or by Gauss-Newton steps from it or from the guess on, of which the best wins. The
-// line takes no guess and leaves *steps.
+// y = a exp(b x). Fitted by a line through ln |y|, with weights |w| y^2 that compensate for the
+// logarithm, or by Gauss-Newton steps that start from this line or from the guess; the best
+// parameters are returned. The method of the line uses no guess and leaves *steps unchanged.
 ErrorCode FitExponential(const ModelFit &request, ExponentialMethod method);
 
-// y = a x^b, always by Gauss-Newton steps, from the line through (ln x, ln |y|) or the guess on.
+// y = a x^b, always by Gauss-Newton steps, starting from the line through (ln x, ln |y|) or from
+// the guess.
 ErrorCode FitPower(const ModelFit &request);
 
 } // namespace qx

@@ -20,7 +20,7 @@ double Bell(const GaussianPeak &peak, double x) {
     return std::exp(-0.5 * (z * z));
 }
 
-// The first of the elements with the largest modulus.
+// The index of the first element with the largest modulus.
 int32_t HighestPeak(const FitSamples &data) {
     int32_t best = 0;
     for (int32_t i = 1; i < data.n(); ++i)
@@ -29,7 +29,8 @@ int32_t HighestPeak(const FitSamples &data) {
     return best;
 }
 
-// The sample nearest to the peak on one side, of the sign of the peak; -1 where there is none.
+// The index of the sample nearest to the peak on one side that has the sign of the peak; -1 if
+// there is none.
 int32_t Neighbour(const FitSamples &data, int32_t peak, double side) {
     int32_t best = -1;
     double nearest = 0.0;
@@ -61,7 +62,7 @@ ErrorCode ThroughThreePoints(const FitSamples &data, int32_t peak, GaussianPeak 
     return 0;
 }
 
-// Where all that is above a tenth of the peak is as high as the peak.
+// The start if all samples above a tenth of the peak are as high as the peak.
 GaussianPeak OverPlateau(const FitSamples &data, int32_t peak) {
     double left = data.x[peak], right = left;
     for (int32_t i = 0; i < data.n(); ++i) {
@@ -70,11 +71,11 @@ GaussianPeak OverPlateau(const FitSamples &data, int32_t peak) {
         left = data.x[i] < left ? data.x[i] : left;
         right = data.x[i] > right ? data.x[i] : right;
     }
-    // kept: the deviation is the root of the width itself
+    // kept: the deviation is the square root of the width
     return {1.2 * data.y[peak], (left + right) / 2.0, std::sqrt(right - left)};
 }
 
-// *isExact where the peak is found without iteration.
+// Sets *isExact if the peak is found without iteration.
 ErrorCode Estimate(const FitSamples &data, GaussianPeak *found, bool *isExact) {
     const int32_t peak = HighestPeak(data);
     const double height = data.y[peak], x0 = data.x[peak];
@@ -110,7 +111,7 @@ public:
         return squares.mean();
     }
 
-    // Half the negative gradient of the sum of squares, for the peak that mseAt was asked for last.
+    // Half the negative gradient of the sum of squares, for the peak of the last call of mseAt.
     GaussianPeak direction(const GaussianPeak &at) const {
         GaussianPeak sum = {};
         for (int32_t i = 0; i < data_.n(); ++i) {
@@ -126,7 +127,7 @@ public:
         return sum;
     }
 
-    // *peak becomes the result.
+    // *peak is the start on entry and the result on return.
     void run(const FitLimits &limits, GaussianPeak *peak, int32_t *steps) {
         const GaussianPeak start = *peak;
         const double first = mseAt(start);

@@ -19,7 +19,7 @@ namespace qx {
 
 namespace {
 
-// R without the target, row after row.
+// Copies R without the target, row by row.
 void CopyTriangle(const Elimination &triangle, int32_t k, DBL *r) {
     for (int32_t i = 0; i < k; ++i)
         for (int32_t j = 0; j < k; ++j)
@@ -37,9 +37,9 @@ ErrorCode TimesTranspose(const DBL *a, const DBL *b, int32_t k, DBL *out) {
     return 0;
 }
 
-// Brings the columns of R to a length near 1 by powers of two, whose exponents it gives. Their
-// lengths then cost no digit of the decomposition, where a single one would be dominated by the
-// longest column: powers of x differ by many orders of magnitude.
+// Brings the columns of R to a length near 1 by powers of two, and returns their exponents.
+// Different lengths then cost the decomposition no digits; with a single exponent the longest
+// column would dominate: powers of x differ by many orders of magnitude.
 void EquilibrateColumns(DBL *r, int32_t k, I32 *exponents) {
     for (std::ptrdiff_t j = 0; j < k; ++j) {
         double largest = 0.0;
@@ -54,17 +54,16 @@ void EquilibrateColumns(DBL *r, int32_t k, I32 *exponents) {
     }
 }
 
-// One exponent for all columns, so that the singular values stay in proportion.
+// Uses one exponent for all columns, which keeps the ratios of the singular values.
 void ScaleTogether(DBL *r, int32_t k, I32 *exponents) {
-    // The decomposition takes what is far below 1 for zero.
+    // The decomposition treats values far below 1 as zero.
     const int exponent = BringIntoRange<ElementType::DBL>({r, k, k}, 1.0);
     for (int32_t j = 0; j < k; ++j)
         exponents[j] = exponent;
 }
 
-// H has the singular values and the right vectors of R, and of U only U^T y is asked for. Where
-// none but zeros are left out, the solution is the same for scaled columns, and so is the
-// covariance.
+// H has the singular values and the right vectors of R, and of U only U^T y is needed. If only
+// zeros are left out, the solution and the covariance are the same for scaled columns.
 ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, int32_t method,
                         DBL *c, DBL *covariance) {
     const int32_t k = model.k;
@@ -129,8 +128,8 @@ ErrorCode SolveByTriangle(const LinearModel &model, const Elimination &triangle,
     return PseudoInverseMatrix<ElementType::DBL>({normal, k, k}, -1.0, {covariance, k, k});
 }
 
-// The sums of the normal equations: [normal | right], k by k + 1, each element one sum over the
-// samples in ascending order.
+// The sums of the normal equations: [normal | right], k by k + 1, where each element is one sum
+// over the samples in ascending order.
 ErrorCode SumNormalEquations(const LinearModel &model, DBL *sums) {
     const int32_t k = model.k, cols = k + 1;
     Fill(sums, std::ptrdiff_t{k} * cols, 0.0);

@@ -9,7 +9,7 @@ namespace qx {
 
 // How a linear least-squares problem is solved.
 enum LeastSquaresMethod : int32_t {
-    bySVD = 0, // no singular value is left out but exact zeros
+    bySVD = 0, // leaves out only singular values that are exactly 0
     byQR = 1,  // kept: 1, 2 and 3 are one method
     byQR2 = 2,
     byQR3 = 3,
@@ -26,12 +26,12 @@ enum LeastSquaresMethod : int32_t {
 // ErrIterationLimit.
 ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL *covariance);
 
-// The same for a matrix h of n rows and k columns, with the covariance where that is not empty, and
-// the values h c and their MSE.
+// The same for a matrix h of n rows and k columns, with the covariance, if that is not empty, the
+// values h c and their MSE.
 ErrorCode FitGeneral(const ConstRealMatrix &h, const FitSamples &samples, int32_t algorithm,
                      RealVector c, const RealMatrix &covariance, const FitOutput &out);
 
-// Solves r x = v for the upper triangle of a square matrix; x may be v. ErrSingularMatrix where a
+// Solves r x = v for the upper triangle of a square matrix; x may be v. ErrSingularMatrix if a
 // diagonal element is 0 or NaN.
 ErrorCode SolveUpperTriangular(const ConstRealMatrix &r, ConstRealVector v, RealVector x);
 

@@ -37,8 +37,8 @@ int32_t NearestPoint(const Table &table, double xi) {
     return nearest;
 }
 
-// Goes through the tableau from the nearest point, always to the correction that keeps the points
-// in use centred on xi. `advance(i, m)` replaces c[i] and d[i] by those of column m.
+// Walks through the tableau from the nearest point, taking each time the correction that keeps the
+// points in use centred on xi. `advance(i, m)` replaces c[i] and d[i] by those of column m.
 template <class Advance>
 ErrorCode WalkTableau(const Table &table, int32_t nearest, const Tableau &tableau, double *yi,
                       double *dy, const Advance &advance) {
@@ -57,7 +57,7 @@ ErrorCode WalkTableau(const Table &table, int32_t nearest, const Tableau &tablea
     return 0;
 }
 
-// A slope that is larger, or NaN, asks for a natural end.
+// A larger slope, or NaN, requests a natural end condition.
 bool IsSlope(double slope) { return slope <= 9.9e+29; }
 
 ErrorCode CheckAbscissae(ConstRealVector x) {
@@ -96,7 +96,7 @@ ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, doubl
         return 0;
     }
     Tableau tableau;
-    if (const ErrorCode failed = tableau.start(table, 1e-10)) // against 0 / 0 in the tableau
+    if (const ErrorCode failed = tableau.start(table, 1e-10)) // avoids 0 / 0 in the tableau
         return failed;
     const RealVector c = tableau.c, d = tableau.d;
     return WalkTableau(table, nearest, tableau, yi, dy, [&](int32_t i, int32_t m) {
@@ -112,8 +112,8 @@ ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, doubl
     });
 }
 
-// The tridiagonal system of the spline, by one pass forward, which leaves the ratios of the
-// elimination in s and the right side in u, and one backward.
+// Solves the tridiagonal system of the spline by a forward pass, which leaves the ratios of the
+// elimination in s and the right side in u, and a backward pass.
 ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double lastSlope,
                                   RealVector s) {
     const auto [x, y] = table;

@@ -6,8 +6,8 @@
 
 namespace qx {
 
-// A table of at least one point, as many x as y. include/qx/interpolation.h has what is computed
-// and the codes.
+// A table of at least one point, as many x as y. include/qx/interpolation.h documents what is
+// computed and the codes.
 struct Table {
     ConstRealVector x, y;
     int32_t n() const { return static_cast<int32_t>(x.size()); }

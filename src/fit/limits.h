@@ -7,14 +7,14 @@
 
 namespace qx {
 
-// The largest limit of steps that counts: one step beyond it can still be counted.
+// The largest limit of steps: the count can still exceed it by one.
 constexpr int32_t mostIterations = std::numeric_limits<int32_t>::max() - 1;
 
 inline double ToleranceOrDefault(double tolerance) { return tolerance <= 0.0 ? 0.0001 : tolerance; }
 
-// When the iteration of a fit ends: a step changes what it lowers by no more than `tolerance` of
-// itself, or that is at most `floor`; or after about `iterations` steps, of which a negative count
-// allows none. 0 or below select 0.0001 and 1e-12.
+// When the iteration of a fit ends: when a step changes the quantity that it minimises by no more
+// than `tolerance` times that quantity, when this is at most `floor`, or after about `iterations`
+// steps (none if negative). A tolerance of 0 or below means 0.0001, and such a floor means 1e-12.
 struct FitLimits {
     double tolerance = 0.0, floor = 0.0;
     int32_t iterations = 0;

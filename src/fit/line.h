@@ -18,14 +18,17 @@ struct LineSums {
     double weight, x, y, xy, xx;
 };
 LineSums SumsOfLine(const FitSamples &samples);
-// The same of weights whose largest magnitude is known.
+LineSums SumsOfLine(const FitSamples &samples, double largestWeight);
+// The same for weights whose largest magnitude is known.
 QX_BY_WIDTH(void, WeightedLineSums,
             (const DBL *x, const DBL *y, const DBL *w, int32_t n, double largest, LineSums *sums))
 
-// The line of least squares, from the closed formula: equal abscissae give NaN or infinities.
-Line LineThrough(const FitSamples &samples);
+// The line of least squares, from the closed formula: if all abscissae are equal, the result is NaN
+// or infinite.
+Line LineThrough(const FitSamples &samples, double largestWeight);
 
-// The same with settled weights (SettleWeights, which has the codes), and its values.
+// The same after settling the weights (SettleWeights, which documents the codes), and the values of
+// the line.
 ErrorCode FitLine(FitSamples samples, Line *line, const FitOutput &out);
 
 } // namespace qx

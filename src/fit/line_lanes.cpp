@@ -3,8 +3,8 @@
 
 namespace qx::QX_WIDTH {
 
-// As many samples as a vector has lanes are weighted together; then their terms are turned about, so
-// that the sums of four kinds stand side by side in vectors and take one sample after the other.
+// As many samples as a vector has lanes are weighted together. Their terms are then transposed, so
+// that the four kinds of sums lie side by side in vectors and take one sample after the other.
 void WeightedLineSums(const DBL *x, const DBL *y, const DBL *w, int32_t n, double largest,
                       LineSums *sums) {
     typedef Lanes<nativeLanes> L;

@@ -10,7 +10,7 @@
 namespace qx {
 
 LogBase::LogBase(double base)
-    // kept: e is told by its first six digits
+    // kept: e is recognised by its first six digits
     : kind_(base == 2.71828 ? Kind::Natural
             : base == 10.0  ? Kind::Common
                             : Kind::Other),
@@ -45,7 +45,8 @@ double SameSign(ConstRealVector x) {
 ErrorCode FitLog(FitSamples samples, double base, DBL *p, const FitOutput &out) {
     if (base <= 0.0)
         return ErrNotStrictlyPositive;
-    if (const ErrorCode failed = SettleWeights(&samples, 2))
+    double largestWeight = 1.0;
+    if (const ErrorCode failed = SettleWeights(&samples, 2, &largestWeight))
         return failed;
     const double sign = SameSign(samples.x);
     if (sign == 0.0)
@@ -56,7 +57,7 @@ ErrorCode FitLog(FitSamples samples, double base, DBL *p, const FitOutput &out) 
         return failed;
     for (int32_t i = 0; i < samples.n(); ++i)
         t[i] = logarithm.log(sign * samples.x[i]);
-    const Line line = LineThrough({{t.data(), samples.n()}, samples.y, samples.w});
+    const Line line = LineThrough({{t.data(), samples.n()}, samples.y, samples.w}, largestWeight);
     const double slope = line.slope;
     const double factor = slope == 0.0 ? sign : sign * logarithm.power(line.intercept / slope);
     EvaluateFit(samples, out,

@@ -6,7 +6,7 @@
 
 namespace qx {
 
-// How a squared residual z, divided by the square of a scale, counts.
+// The loss of a squared residual z that is divided by the square of a scale.
 enum class Loss : int32_t { Linear, SoftAbsolute, Huber, Cauchy, Arctan };
 constexpr int32_t lossCount = 5;
 

@@ -7,13 +7,13 @@
 
 namespace qx {
 
-// A fit of a model without bounds: in, and from `p` on, out.
+// The request of a fit without bounds: inputs, and, from `p` on, outputs.
 struct ModelFit {
     FitSamples samples;
     const DBL *guess; // one value per parameter, or null
     FitLimits limits; // of the MSE
     DBL *p;
-    int32_t *steps; // how many were tried
+    int32_t *steps; // the number of steps tried
     FitOutput out;
 };
 

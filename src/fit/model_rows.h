@@ -14,8 +14,8 @@ struct RowBlock {
     DBL *column(int32_t j) const { return start + std::ptrdiff_t{j} * count; }
 };
 
-// Whoever can write blocks of rows: a function object (const RowBlock &) that outlives this. So a
-// model of any length is solved for with a few thousand elements of memory.
+// A source of blocks of rows: a function object (const RowBlock &) that must outlive this. It
+// allows a model of any length to be solved with a few thousand elements of memory.
 class ModelRows {
 public:
     template <class Writer>
@@ -30,7 +30,7 @@ private:
     void (*write_)(const void *writer, const RowBlock &block);
 };
 
-// n rows of k columns and the target, unweighted; the weights count as |w|, or there are none.
+// n rows of k columns and the target, unweighted; the weights count as |w|, and may be absent.
 struct LinearModel {
     ModelRows rows;
     int32_t n, k;

@@ -34,7 +34,7 @@ QX_INLINE L PowerOfTwo(L shifted) {
     return power;
 }
 
-// exp(t) as 2^k exp(r) with |r| below 0.35, by Taylor's series, whose rest is below 5e-18.
+// exp(t) as 2^k exp(r) with |r| below 0.35, by Taylor's series, whose remainder is below 5e-18.
 template <class L>
 QX_INLINE L ExpWithin(L t) {
     const L shift(0x1.8p52);
@@ -42,7 +42,7 @@ QX_INLINE L ExpWithin(L t) {
     const L k = shifted - shift;
     const L r = (t - k * L(0x1.62e42feep-1)) - k * L(0x1.a39ef35793c76p-33);
     const L r2 = r * r, r4 = r2 * r2;
-    // 1 / 2!, 1 / 3!, ... 1 / 13!, in pairs, so that few operations wait for each other.
+    // 1 / 2!, 1 / 3!, ... 1 / 13!, in pairs, so that few operations depend on each other.
     const L p2 = L(0.5) + L(0x1.5555555555555p-3) * r;
     const L p4 = L(0x1.5555555555555p-5) + L(0x1.1111111111111p-7) * r;
     const L p6 = L(0x1.6c16c16c16c17p-10) + L(0x1.a01a01a01a01ap-13) * r;

@@ -9,8 +9,8 @@
 
 namespace qx {
 
-// The models of the bounded fits. evaluate gives the value at x and the derivatives by the
-// parameters in their order; what both need, as the exponential, is computed once.
+// The models of the bounded fits. evaluate returns the value at x and the derivatives with respect
+// to the parameters, in their order; common terms, such as the exponential, are computed once.
 
 // a exp(b x) + c
 struct ExponentialModel {
@@ -28,7 +28,7 @@ struct ExponentialModel {
     }
 };
 
-// a x^b + c for x > 0. It is fitted as an exponential of ln x, which has to be taken but once.
+// a x^b + c for x > 0. It is fitted as an exponential of ln x, which needs to be taken only once.
 struct PowerModel {
     static double value(double x, const DBL *p, const void *) {
         return p[0] * std::pow(x, p[1]) + p[2];
@@ -85,7 +85,7 @@ void NormalEquations(const FitSamples &samples, const DBL *p, int32_t, double *m
     }
 }
 
-// The same in lanes, for models that have it.
+// The same in lanes, for models that support it.
 template <class Model>
 void NormalEquationsInLanes(const FitSamples &samples, const DBL *p, int32_t count, double *mse,
                             DBL *a, DBL *jacobian, DBL *g, const void *user) {
@@ -104,7 +104,7 @@ void NormalEquationsInLanes(const FitSamples &samples, const DBL *p, int32_t cou
     }
 }
 
-// The model as the iteration takes it; `user` is what its functions are handed.
+// The model in the form that the iteration takes; `user` is passed to its functions.
 template <class Model>
 FitModel FitModelOf(const void *user = nullptr) {
     return {Model::count,

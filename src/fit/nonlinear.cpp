@@ -14,7 +14,7 @@ namespace qx {
 
 namespace {
 
-// To how much of itself a parameter is known where a fit claims to have converged.
+// The relative accuracy of a parameter if a fit reports that it has converged.
 constexpr double claimedDigits = 1e-7;
 
 void Copy(RealVector to, ConstRealVector from) {
@@ -22,7 +22,7 @@ void Copy(RealVector to, ConstRealVector from) {
         std::memcpy(to.data(), from.data(), sizeof(DBL) * static_cast<std::size_t>(to.size()));
 }
 
-// A point and what the model gives there.
+// A point and the values of the model there.
 struct FitState {
     RealVector p, values, residuals; // of the weighted model less y
     double cost;
@@ -44,13 +44,14 @@ public:
             roots_[i] = std::sqrt(std::fabs(fit_.w[i]));
         return 0;
     }
-    // The sizes of parameters that come to be 0.
+    // The magnitudes that are assumed for parameters that become 0.
     void setTypical(ConstRealVector p) {
         for (int32_t j = 0; j < k_; ++j)
             typical_[j] = p[j] == 0.0 ? 1.0 : 0x1p-26 * std::fabs(p[j]);
     }
 
-    // Residuals and cost, which is infinite where one is not finite. ErrNotAvailable.
+    // Computes the residuals and the cost, which is infinite if a residual is not finite.
+    // ErrNotAvailable.
     ErrorCode evaluate(FitState &at) const {
         if (fit_.model.values(fit_.model.user, at.p.data(), at.values.data()) != 0)
             return ErrNotAvailable;
@@ -63,8 +64,8 @@ public:
         return 0;
     }
 
-    // By how much the cost falls from one point to the other, with the digits that a difference of
-    // sums has not.
+    // The decrease of the cost from one point to the other, with the digits that a difference of
+    // sums would lose.
     double fall(const FitState &from, const FitState &to) const {
         double sum = 0.0;
         for (int32_t i = 0; i < n_; ++i) {
@@ -74,7 +75,7 @@ public:
         return 0.5 * sum;
     }
 
-    // The derivatives at a point; isFine takes differences of higher order.
+    // The derivatives at a point; isFine selects differences of higher order.
     // ErrNotAvailable.
     ErrorCode differentiate(const FitState &at, bool isFine) {
         if (fit_.model.jacobian != nullptr)
@@ -90,7 +91,7 @@ public:
         return 0;
     }
 
-    // The triangle of the derivatives as the loss counts them, and the residuals beside it.
+    // The triangle of the derivatives, weighted by the loss, and the residuals beside it.
     // ErrOutOfMemory, ErrNonFiniteInput.
     ErrorCode reduce(const FitState &at, const RealMatrix &r, RealVector z) const {
         const auto write = [&](const RowBlock &block) { writeRows(at, block); };
@@ -124,8 +125,8 @@ private:
         return fit_.scale * (fit_.scale * EvaluateLoss(fit_.loss, ratio * ratio).value);
     }
 
-    // Triggs' correction: the rows of least squares that have the gradient of the loss, and its
-    // curvature as far as that is positive.
+    // Triggs' correction: the rows of a least-squares problem with the gradient of the loss, and
+    // with its curvature as far as that is positive.
     void writeRows(const FitState &at, const RowBlock &block) const {
         DBL *const target = block.column(k_);
         for (int32_t i = 0; i < block.count; ++i) {
@@ -160,8 +161,8 @@ private:
         return fit_.bounds.upper.isEmpty() ? kInfinity : fit_.bounds.upper[j];
     }
 
-    // Column j. The steps are powers of two, so that a parameter moves by what is divided by as
-    // nearly as can be.
+    // Computes column j. The steps are powers of two, so that a parameter moves as nearly as
+    // possible by the number by which the difference is divided.
     ErrorCode differences(const FitState &at, int32_t j, bool isFine) {
         const double below = at.p[j] - lower(j), above = upper(j) - at.p[j];
         if (below + above == 0.0) {
@@ -295,12 +296,12 @@ private:
         return 0;
     }
 
-    // The step with which the region is left no further than by `radius`, and the point there.
+    // Computes the step within `radius`, and the model at its end.
     ErrorCode tryStep(double radius) {
         move_.find({r_, z_}, scale_, lowest_, highest_, radius);
         for (int32_t j = 0; j < k_; ++j) {
             const double s = move_.step[j];
-            // A bound is met to the bit.
+            // A bound is reached to the bit.
             there_.p[j] = s == lowest_[j] ? lower(j)
                           : s == highest_[j]
                               ? upper(j)
@@ -309,8 +310,9 @@ private:
         return model_.evaluate(there_);
     }
 
-    // By what part of itself the step moves a parameter at most. One that hardly matters counts as
-    // large as what would change the model by a millionth of y: it may well be 0.
+    // The largest relative change of a parameter by the step. A parameter with little effect may
+    // well be 0, so its magnitude is taken to be at least what would change the model by a
+    // millionth of y.
     double largestMove() const {
         double largest = 0.0;
         for (int32_t j = 0; j < k_; ++j) {
@@ -323,8 +325,8 @@ private:
         return largest;
     }
 
-    // Until the step that the linear model gives is so small that it is as good as Newton's, or
-    // the cost does not fall any more.
+    // Iterates until the step of the linear model is so small that it is as good as Newton's, or
+    // until the cost no longer falls.
     ErrorCode descend() {
         constexpr double smallStep = 1e-5;
         while (iterations_ < fit_.limit) {
@@ -342,7 +344,7 @@ private:
             if (isBetter) {
                 std::swap(here_, there_);
                 const ErrorCode failed = linearise(false);
-                if (failed == ErrNonFiniteInput) { // a point without derivatives is no way on
+                if (failed == ErrNonFiniteInput) { // cannot continue without derivatives
                     std::swap(here_, there_);
                     radius_ = 0.25 * move_.length;
                     if (const ErrorCode again = linearise(false))
@@ -375,8 +377,9 @@ private:
         return true;
     }
 
-    // Steps of Gauss and Newton as long as each is shorter than the one before: the cost has twice
-    // the digits of the parameters, and can no longer tell a better point from a worse one.
+    // Takes Gauss-Newton steps as long as each is shorter than the one before: parameters that
+    // differ in the second half of their digits have the same cost, so the cost cannot rank these
+    // points.
     ErrorCode polish() {
         if (end_ == FitEnd::Exact || !isAtRest_)
             return 0;
@@ -414,7 +417,7 @@ private:
 
     bool isFixed(int32_t j) const { return lower(j) == upper(j); }
 
-    // What the end is, and the covariance.
+    // Determines why the iteration has ended, and the covariance.
     ErrorCode finish(NonlinearResult *result) {
         Copy(result->p, here_.p);
         for (std::ptrdiff_t i = 0; i < result->residuals.size(); ++i)
@@ -437,7 +440,7 @@ private:
     }
 
     bool hasFullRank(const ScaledColumns &columns) const {
-        // Differences have no more digits than that.
+        // Derivatives from differences have no more digits than this.
         const double least =
             (model_.hasDerivatives() ? 16.0 * kEpsilon : 1e-11) * columns.largest();
         for (int32_t i = 0; i < columns.count(); ++i)

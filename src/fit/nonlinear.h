@@ -6,12 +6,12 @@
 
 namespace qx {
 
-// A model over all samples at once. Either function returns 0, or ends the fit by any other number.
+// A model over all samples at once. Either function returns 0, or any other number to end the fit.
 struct SampledModel {
     int32_t count; // of parameters
     // The value at each sample.
     int32_t (*values)(const void *user, const DBL *p, DBL *out);
-    // The derivatives, a row of `count` for each sample; null for differences.
+    // The derivatives, a row of `count` for each sample; null to use differences.
     int32_t (*jacobian)(const void *user, const DBL *p, DBL *out);
     const void *user;
 };
@@ -19,23 +19,24 @@ struct SampledModel {
 // Why an iteration has ended.
 enum class FitEnd : int32_t {
     Limit,        // of the iterations
-    Converged,    // no parameter would move by more than a part of itself
+    Converged,    // no parameter would change by more than the relative tolerance
     Exact,        // all residuals are 0
-    Undetermined, // the residuals do not depend on each free parameter for itself
-    NoLowerCost   // no step lowers the cost, but there is no minimum to the digits that are claimed
+    Undetermined, // the residuals do not determine each free parameter
+    NoLowerCost   // no step lowers the cost, but it is not a minimum to the accuracy that
+                  // convergence claims
 };
 
 struct NonlinearFit {
     SampledModel model;
-    ConstRealVector y, w; // w counts by its absolute values, or is empty
+    ConstRealVector y, w; // the absolute values of w count; w may be empty
     FitBounds bounds;     // both empty, or one for each parameter
     Loss loss = Loss::Linear;
     double scale = 1.0;     // of the loss
-    double tolerance = 0.0; // on the part of itself by which a parameter may still move
+    double tolerance = 0.0; // limit of the relative change of a parameter
     int32_t limit = 0;      // of the iterations
 };
 
-// What comes back; p holds the start on entry. covariance and residuals, y less the model, may be
+// The outputs; p holds the start on entry. covariance and residuals, y minus the model, may be
 // empty.
 struct NonlinearResult {
     RealVector p;
@@ -46,16 +47,17 @@ struct NonlinearResult {
     FitEnd end = FitEnd::Limit;
 };
 
-// Least squares of nonlinear models, or the robust losses of B. Triggs, P. McLauchlan, R. Hartley
-// and A. Fitzgibbon, "Bundle adjustment - a modern synthesis", 2000, by a trust region (J. J. More,
-// "The Levenberg-Marquardt algorithm: implementation and theory", 1978), and by steps of Gauss and
-// Newton at the end, where the cost has no digits left to decide. Bounds are those of
-// TrustRegionStep. Without derivatives these are differences of the second order, near the end of
-// the fourth; the model is asked for values within the bounds alone.
+// Fits nonlinear models by least squares, or with the robust losses of B. Triggs, P. McLauchlan, R.
+// Hartley and A. Fitzgibbon, "Bundle adjustment - a modern synthesis", 2000, by a trust region (J.
+// J. More, "The Levenberg-Marquardt algorithm: implementation and theory", 1978), and by
+// Gauss-Newton steps at the end, where the cost has no digits left to decide. Bounds are treated as
+// in TrustRegionStep. If the model has no derivatives, differences of second order replace them,
+// and near the end of fourth order; the model is evaluated only within the bounds.
 //
 // The cost is half the sum of C^2 rho(|w| r^2 / C^2) for the scale C. The covariance is the inverse
-// of J^T J, where J are the weighted derivatives as the loss counts them, times twice the cost over
-// the degrees of freedom; 0 for fixed parameters, and infinite where it does not exist.
+// of J^T J, where J holds the derivatives, weighted by the samples' weights and the loss, times
+// twice the cost divided by the degrees of freedom; it is 0 for fixed parameters, and infinite if
+// it does not exist.
 //
 // ErrOutOfMemory, ErrNonFiniteFunction (no finite cost or derivatives at the start),
 // ErrNotAvailable (the model has ended the fit).

@@ -38,7 +38,7 @@ SampledModel PeakOver(const ConstRealVector &x) {
             &x};
 }
 
-// A point to which a start has led.
+// The point that a fit from one start has reached.
 struct FoundPeak {
     DBL p[count];
     double cost = kInfinity;
@@ -46,7 +46,7 @@ struct FoundPeak {
     FitEnd end = FitEnd::NoLowerCost;
 
     bool isAtRest() const { return end == FitEnd::Converged || end == FitEnd::Exact; }
-    // Of the same place and about the same width.
+    // Whether the start has the same place and about the same width.
     bool explains(const PeakStart &start) const {
         const double s = std::fabs(p[2]);
         return std::fabs(start.m - p[1]) < 0.5 * s && start.s < 1.5 * s && s < 1.5 * start.s;
@@ -65,7 +65,8 @@ public:
             lower_[j] = request.bounds.lower[j];
             upper_[j] = request.bounds.upper[j];
         }
-        // The model knows s by its square alone: it is taken to be positive where it may be so.
+        // The model depends only on the square of s: s is taken to be positive if the bounds allow
+        // it.
         const double low = lower_[2], high = upper_[2];
         isReflected_ = high <= 0.0 && low < 0.0;
         lower_[2] = isReflected_ ? -high : std::max(low, 0.0);
@@ -87,8 +88,8 @@ public:
     }
 
 private:
-    // The best start goes all the way, and those that lead elsewhere some steps: on if they are
-    // ahead then.
+    // The best start is fitted to the end. Starts that lead elsewhere take a few steps, and
+    // continue if they are then ahead.
     ErrorCode race(const PeakSearch &search, FoundPeak *best) const {
         constexpr int32_t enough = 6, enoughOfSign = 3, most = 24, firstSteps = 12;
         constexpr double exact = 1e-24;
@@ -150,7 +151,7 @@ private:
     bool isReflected_;
 };
 
-// Weights that are all 0 are none.
+// If all weights are 0, they count as absent.
 ErrorCode SettleWeightsOf(FitSamples *samples, int32_t free) {
     if (CheckFinite(samples->w.data(), samples->w.size()) != 0)
         return ErrNonFiniteInput;
@@ -181,8 +182,8 @@ ErrorCode Check(const BoundedFit &request, FitSamples *samples, int32_t free) {
     return isFlat || (request.guess != nullptr && request.guess[2] == 0.0) ? ErrFitStartValues : 0;
 }
 
-// The samples as often as they make up no fewer than the parameters, by which no sum is moved but
-// for a factor.
+// Repeats the samples until there are at least as many as parameters, which changes the sums only
+// by a factor.
 ErrorCode Repeat(const FitSamples &given, ScratchParts &memory, FitSamples *samples) {
     const int32_t n = given.n(), times = (count + n - 1) / n;
     RealVector x, y, w;
@@ -202,7 +203,7 @@ ErrorCode Repeat(const FitSamples &given, ScratchParts &memory, FitSamples *samp
 
 typedef VectorView<ElementType::I32> Places;
 
-// The samples in ascending order of x, by merging runs of twice the length each time.
+// Orders the samples by ascending x, merging runs whose length doubles each time.
 void OrderBy(ConstRealVector x, Places order, Places merged) {
     const std::ptrdiff_t n = x.size();
     for (std::ptrdiff_t i = 0; i < n; ++i)
@@ -220,10 +221,10 @@ void OrderBy(ConstRealVector x, Places order, Places merged) {
         std::swap(order, merged);
     }
     for (std::ptrdiff_t i = 0; i < n; ++i)
-        merged[i] = order[i]; // whichever of both is the caller's
+        merged[i] = order[i]; // `merged` may be either of the caller's two arrays
 }
 
-// Medians of each five neighbours, for a start that lone outliers do not decide.
+// Medians of five neighbours each, for a start that single outliers do not determine.
 ErrorCode SmoothByMedians(const FitSamples &samples, RealVector smooth) {
     constexpr int32_t reach = 2;
     const int32_t n = samples.n();
@@ -246,7 +247,7 @@ ErrorCode SmoothByMedians(const FitSamples &samples, RealVector smooth) {
     return 0;
 }
 
-// The least squares of the samples, with the sign of s that the bounds want.
+// The least-squares peak of the samples, with the sign of s that the bounds require.
 ErrorCode LeastSquaresPeak(const BoundedFit &request, const FitSamples &samples, FoundPeak *peak) {
     if (const ErrorCode failed = PeakFit(request, samples).run(peak))
         return failed;
@@ -255,7 +256,7 @@ ErrorCode LeastSquaresPeak(const BoundedFit &request, const FitSamples &samples,
     return 0;
 }
 
-// On from a peak in another norm.
+// Continues from a peak in another norm.
 ErrorCode FollowNorm(FitNorm norm, const BoundedFit &request, const FitSamples &samples,
                      FoundPeak *peak) {
     int32_t iterations = *request.iterations > 0 ? *request.iterations : 2000;
@@ -268,15 +269,16 @@ ErrorCode FollowNorm(FitNorm norm, const BoundedFit &request, const FitSamples &
     return status == ErrIterationLimit ? 0 : status;
 }
 
-// By least absolute residuals, and by bisquare from there.
+// Continues by least absolute residuals, and from there by bisquare.
 ErrorCode FollowNorms(const BoundedFit &request, const FitSamples &samples, FoundPeak *peak) {
     if (const ErrorCode failed = FollowNorm(leastAbsolute, request, samples, peak))
         return failed;
     return request.method == bisquare ? FollowNorm(bisquare, request, samples, peak) : 0;
 }
 
-// By what peaks in a robust norm are compared: the sum of the residuals, or for bisquare, whose
-// weights differ, their median (P. J. Rousseeuw, "Least median of squares regression", 1984).
+// The measure by which peaks in a robust norm are compared: the cost, or for bisquare, whose
+// weights differ, the median of the absolute residuals (P. J. Rousseeuw, "Least median of squares
+// regression", 1984).
 ErrorCode RobustCost(const BoundedFit &request, const FitSamples &samples, const FoundPeak &peak,
                      RealVector residuals, double *cost) {
     *cost = peak.cost;
@@ -291,7 +293,8 @@ ErrorCode RobustCost(const BoundedFit &request, const FitSamples &samples, const
     return failed;
 }
 
-// From the least squares of the samples, and of their medians, where lone outliers do not show.
+// Starts from the least squares of the samples, and from those of their medians, in which single
+// outliers disappear.
 ErrorCode FitRobustly(const BoundedFit &request, FitSamples samples, FoundPeak *best) {
     ScratchParts copies, memory;
     if (samples.n() < count)
@@ -331,7 +334,7 @@ ErrorCode FitPeak(const BoundedFit &request, FitEnd *end) {
     *end = FitEnd::Exact;
     if (const ErrorCode failed = Check(request, &samples, FreeParameters(request.bounds)))
         return failed;
-    if (samples.n() == 0) { // nothing is free
+    if (samples.n() == 0) { // no parameter is free
         for (int32_t j = 0; j < count; ++j)
             request.p[j] = request.bounds.upper[j];
         *request.mse = 0.0;

@@ -10,7 +10,7 @@ namespace qx {
 
 namespace {
 
-constexpr double farthest = 4.0; // deviations, beyond which a peak counts as 0
+constexpr double farthest = 4.0; // in deviations; farther out a peak counts as 0
 
 double Clamped(double value, const FitBounds &bounds, int32_t j) {
     return std::min(std::max(value, double{bounds.lower[j]}), double{bounds.upper[j]});
@@ -34,17 +34,18 @@ ErrorCode PeakSearch::run() {
         searchLevel(level, 2.0);
         searchLevel(level, 2.0 * kRootTwo);
     }
-    // Up to peaks far wider than the samples reach: what is seen is the top, or a flank.
+    // Includes peaks far wider than the range of the samples, of which only the top or a flank is
+    // visible.
     for (double wide = 4.0; wide < 8.0 * fewestBins; wide *= kRootTwo)
         searchLevel(level, wide);
-    // By insertion: there are few.
+    // Insertion sort: there are few.
     for (int32_t i = 1; i < count_; ++i)
         for (int32_t k = i; k > 0 && starts_[k].rest < starts_[k - 1].rest; --k)
             std::swap(starts_[k], starts_[k - 1]);
     return 0;
 }
 
-// As many bins as the first power of two not below the samples, but at most 2^16.
+// The number of bins is the first power of two not below the number of samples, but at most 2^16.
 ErrorCode PeakSearch::fillBins() {
     const int32_t n = samples_.n();
     int32_t bins = fewestBins;
@@ -65,7 +66,7 @@ ErrorCode PeakSearch::fillBins() {
     const double range = last_ - first_;
     finest_.width =
         range < kInfinity ? range / (bins - 1) : last_ / (bins - 1) - first_ / (bins - 1);
-    if (!(finest_.width > 0.0)) // all in one place, or as near as numbers can be
+    if (!(finest_.width > 0.0)) // all x are equal, or as close as numbers can be
         finest_.width = range > 0.0 ? range : 1.0;
     Fill(finest_.weights.data(), bins, 0.0);
     Fill(finest_.products.data(), bins, 0.0);
@@ -80,7 +81,7 @@ ErrorCode PeakSearch::fillBins() {
     return 0;
 }
 
-// Pairs of bins, in the place of the first half of them.
+// Adds pairs of bins; the sums overwrite the first half of the bins.
 PeakSearch::Level PeakSearch::halved(const Level &level, RealVector weights, RealVector products) {
     for (std::ptrdiff_t i = 0; i < weights.size(); ++i) {
         weights[i] = level.weights[2 * i] + level.weights[2 * i + 1];
@@ -89,7 +90,7 @@ PeakSearch::Level PeakSearch::halved(const Level &level, RealVector weights, Rea
     return {weights, products, 2.0 * level.width};
 }
 
-// The bin i of a level has its middle at first_ + (i + 1/2) width - half the finest width.
+// The middle of bin i of a level is at first_ + (i + 1/2) width - half the finest width.
 void PeakSearch::searchLevel(const Level &level, double widthsPerScale) {
     const double s = Clamped(widthsPerScale * level.width, bounds_, 2);
     const bool isOnGrid = s == widthsPerScale * level.width && s > 0.0;
@@ -118,7 +119,7 @@ void PeakSearch::searchLevel(const Level &level, double widthsPerScale) {
             if (m >= lowest && m <= highest)
                 consider(sumsOnBin(level, bin), m);
         }
-    } else { // a scale that the bounds ask for
+    } else { // a scale that the bounds require
         constexpr int32_t places = 64;
         const double from = Clamped(first_ - 3.0 * s, bounds_, 1);
         const double to = Clamped(last_ + 3.0 * s, bounds_, 1);
@@ -162,12 +163,13 @@ PeakSearch::ShapeSums PeakSearch::sumsAt(const Level &level, double m, double s)
     return sums;
 }
 
-// What is left of the squares with the height a above c, c counted from the mean.
+// The residual sum of squares for the height a above c, where c is relative to the mean.
 double PeakSearch::restOf(double a, double c, const ShapeSums &sums) const {
     return squares_ + a * (a * sums.gg + 2.0 * (c * sums.g - sums.gy)) + c * c * weight_;
 }
 
-// The least squares over a and c within their bounds: the free solution, or the best on an edge.
+// The best a and c within their bounds, by least squares: the free solution, or the best on an
+// edge.
 PeakStart PeakSearch::bestHeight(const ShapeSums &sums, double m, double s) const {
     const double aLow = bounds_.lower[0], aHigh = bounds_.upper[0];
     const double cLow = bounds_.lower[3] - mean_, cHigh = bounds_.upper[3] - mean_;
@@ -207,7 +209,8 @@ void PeakSearch::keep(const PeakStart &start) {
         starts_[count_++] = start;
 }
 
-// The highest or lowest sample, as wide as where the samples come to half of it on either side.
+// Adds the highest or lowest sample as a start; its width follows from the nearest sample that is
+// below half its height.
 void PeakSearch::addExtreme(bool isPeak) {
     int32_t at = 0;
     for (int32_t i = 1; i < samples_.n(); ++i)

@@ -5,23 +5,24 @@
 
 namespace qx {
 
-// Where a fit of a exp(-((x - m) / s)^2 / 2) + c may start, with the sum of squares that is left
-// of the samples in bins.
+// A start for a fit of a exp(-((x - m) / s)^2 / 2) + c, with the residual sum of squares of the
+// binned samples.
 struct PeakStart {
     double a, m, s, c;
     double rest;
 };
 
-// Starts at every scale. The samples are sorted into bins, and those into bins of twice the width
-// until 64 are left. At each width the peaks that are some bins wide are placed on every bin, and
-// beyond the ends, and at the last one wider ones, too; a and c are the best within their bounds, in closed form, since the model is
-// linear in them (G. H. Golub, V. Pereyra, "The differentiation of pseudo-inverses and nonlinear
-// least squares problems whose variables separate", 1973). The best peak and the best dip
-// of each scale are starts, and so are the highest and the lowest sample with the width that is seen there. They come
-// best first. The work is in proportion to the samples.
+// Finds starts at every scale. The samples are sorted into bins, and those into bins of twice the width until
+// 64 are left. At each width, peaks that are a few bins wide are placed on every bin and beyond the ends; at
+// the last width wider peaks are tried, too. a and c are the best within their bounds, in closed form, since
+// the model is linear in them (G. H. Golub, V. Pereyra, "The differentiation of pseudo-inverses and nonlinear
+// least squares problems whose variables separate", 1973). The best peak and the best dip of each scale are
+// starts, and so are the highest and the lowest sample with the width observed there. The starts are sorted,
+// best first. The work is proportional to the number of samples.
 class PeakSearch {
 public:
-    // Four bounds each, in the order a, m, s, c; a lower bound of s that is not below 0.
+    // Takes four lower and four upper bounds, in the order a, m, s, c; the lower bound of s must
+    // not be below 0.
     PeakSearch(const FitSamples &samples, const FitBounds &bounds)
         : samples_(samples), bounds_(bounds) {}
     // ErrOutOfMemory.
@@ -33,13 +34,13 @@ public:
 
 private:
     static constexpr int32_t mostStarts = 96, fewestBins = 64;
-    // Bins from the middle of the widest peak to the farthest bin.
+    // The number of bins from the middle of the widest peak to the farthest bin.
     static constexpr int32_t widest = 25 * fewestBins;
     struct Level {
         RealVector weights, products; // sums of w and of w (y - mean) in each bin
         double width;
     };
-    // Of the shape of a peak: sums of w g, w g^2 and w g (y - mean).
+    // Sums over the shape g of a peak: of w g, w g^2 and w g (y - mean).
     struct ShapeSums {
         double g, gg, gy;
     };
@@ -58,7 +59,7 @@ private:
     const FitBounds bounds_;
     double first_ = 0.0, last_ = 0.0; // x
     double mean_ = 0.0, weight_ = 0.0, squares_ = 0.0;
-    int32_t reach_ = 0; // bins of the shape on either side
+    int32_t reach_ = 0; // number of bins of the shape on either side
     double shape_[widest + 1];
     PeakStart starts_[mostStarts];
     int32_t count_ = 0;

@@ -12,7 +12,7 @@ namespace {
 
 constexpr int32_t highestFitted = 25;
 
-// Which terms are fitted, and what the others are.
+// Which terms are fitted, and the values of the others.
 class Terms {
 public:
     ErrorCode make(int32_t order, const FixedTerms &fixed) {
@@ -40,13 +40,14 @@ public:
     bool isFixedAt(int32_t j) const { return kinds_[j] >= 0; }
     int32_t fixedAt(int32_t j) const { return kinds_[j]; }
     int32_t freeCount() const { return freeCount_; }
-    int32_t last() const { return last_; } // behind it all are zero
+    int32_t last() const { return last_; } // all terms after it are zero
     bool isCapped() const { return isCapped_; }
 
 private:
-    enum Kind : int32_t { isFree = -1, isZero = -2 }; // else fixed, with the index of its value
+    enum Kind : int32_t { isFree = -1, isZero = -2 }; // else the index of its fixed value
 
-    // kept: where the first 26 terms leave only one free, the second one of all is fitted, too
+    // kept: if fewer than two of the first 26 terms are free, the first two free terms of all are
+    // fitted
     int32_t limitBeside(int32_t order) const {
         int32_t found = 0;
         for (int32_t j = 0; j <= order; ++j)
@@ -114,7 +115,7 @@ ErrorCode SolveFreeTerms(const LinearModel &model, int32_t algorithm, FitNorm no
                                 : SolveRobustly(model, norm, limits, c);
 }
 
-// The solution stands in the first elements of c and is spread out from its end.
+// The solution is in the first elements of c and is moved to its places from the last element on.
 void PlaceTerms(const Terms &terms, const FixedTerms &fixed, RealVector c) {
     int32_t next = terms.freeCount();
     for (auto j = static_cast<int32_t>(c.size()) - 1; j >= 0; --j) {

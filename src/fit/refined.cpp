@@ -16,7 +16,7 @@ bool AreNumbers(ConstRealVector x) {
     return x.isEmpty() || HoldsOnlyNumbers<ElementType::DBL>(AsColumn(x));
 }
 
-// The e with all of |x| below 2^e, next to the largest; 0 for zeros.
+// The smallest e with all |x| below 2^e; 0 if all x are 0.
 int ExponentOf(ConstRealVector x) {
     double largest = 0.0;
     for (std::ptrdiff_t i = 0; i < x.size(); ++i)
@@ -27,7 +27,7 @@ int ExponentOf(ConstRealVector x) {
     return exponent;
 }
 
-// y and the weights over powers of two.
+// y and the weights, divided by powers of two.
 struct ScaledSamples {
     ErrorCode make(const FitSamples &samples) {
         if (const ErrorCode failed = memory.take(Sized(y, samples.n()), Sized(w, samples.w.size())))
@@ -48,7 +48,7 @@ struct ScaledSamples {
     int yExponent = 0, wExponent = 0;
 };
 
-// Values y - r and the MSE of coefficients that were found.
+// Computes the values y - r and the MSE for the coefficients found.
 ErrorCode Evaluate(const PairModel &model, const PairVector &c, const ScaledSamples &samples,
                    const FitOutput &out) {
     double squares;
@@ -93,7 +93,7 @@ void ColumnExponents(const ConstRealMatrix &h, IndexVector exponents) {
     }
 }
 
-// x = middle + half t, in pairs, after x was divided by 2^exponent.
+// x = middle + half t, in pairs of doubles, after x has been divided by 2^exponent.
 struct Interval {
     int exponent = 0;
     double middle = 0.0, half = 1.0;
@@ -117,7 +117,7 @@ struct Interval {
 
 constexpr int32_t chunk = 64;
 
-// Chebyshev polynomials of t, or powers of t with some of them fixed and taken from y.
+// Chebyshev polynomials of t, or powers of t, of which some are fixed and subtracted from y.
 class PolynomialPairRows final : public PairRows {
 public:
     enum class Basis { Chebyshev, Powers };
@@ -166,7 +166,7 @@ private:
             y->set(i, {samples_.y[first + i], 0.0});
         }
     }
-    // From term j to the next.
+    // Advances from term j to the next.
     void advance(std::ptrdiff_t j, int32_t count, const Pairs &t, Pairs *last, Pairs *now) const {
         if (basis_ == Basis::Powers) {
             for (int32_t i = 0; i < count; ++i)
@@ -198,8 +198,8 @@ private:
     const RealVector value_;
 };
 
-// Coefficients of Chebyshev polynomials become those of powers, by Clenshaw's recurrence; `one` and
-// `two` are memory of the same size.
+// Converts coefficients of Chebyshev polynomials to those of powers, by Clenshaw's recurrence;
+// `one` and `two` are memory of the same size.
 void ToPowers(const PairVector &c, const PairVector &one, const PairVector &two) {
     const std::ptrdiff_t k = c.high.size();
     PairVector now = one, before = two; // b[j + 1] and b[j + 2]
@@ -220,7 +220,7 @@ void ToPowers(const PairVector &c, const PairVector &one, const PairVector &two)
         c.set(i, now.at(i));
 }
 
-// Coefficients of powers of t become those of powers of middle + half t.
+// Converts coefficients of powers of t to those of powers of middle + half t.
 void ToAbscissae(const PairVector &c, const Interval &interval) {
     const std::ptrdiff_t k = c.high.size();
     Pair power = {1.0, 0.0};

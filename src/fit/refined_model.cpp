@@ -14,7 +14,8 @@ namespace {
 constexpr double eps = std::numeric_limits<double>::epsilon();
 constexpr int32_t sums = 8, chunk = 64;
 
-// Residuals of up to `chunk` rows; the low parts are added up unrounded.
+// Residuals of up to `chunk` rows; the low parts are accumulated without rounding them into the
+// high parts.
 struct Residuals {
     double high[chunk], low[chunk];
 
@@ -223,8 +224,8 @@ double Largest(ConstRealVector x) {
     return largest;
 }
 
-// Whether a step that is `rate` times this one changes no digit that counts: of a rounded
-// coefficient, or of a pair where pairs are wanted.
+// Whether a step that is `rate` times this one changes no significant digit of a rounded
+// coefficient, or of a pair if pairs are wanted.
 bool IsSettled(const PairVector &c, ConstRealVector step, double rate, bool inPairs) {
     const double least = Largest(c.high) * (inPairs ? 0x1p-106 : 0x1p-90);
     const double relative = inPairs ? 0.0 : 0x1p-57;
@@ -259,7 +260,7 @@ ErrorCode Improve(const PairModel &model, const Values &values, const PairVector
         values.project(gradient);
         values.combine(2, step);
         const double size = Largest(step);
-        // Steps that do not fall are rounding, or the condition number is beyond 1 / eps.
+        // Steps that do not decrease are rounding errors, or the condition number is above 1 / eps.
         if (!(size <= 0.5 * last))
             break;
         for (int32_t j = 0; j < model.k; ++j)

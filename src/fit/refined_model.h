@@ -9,7 +9,7 @@
 
 namespace qx {
 
-// The inner problem of fit/refined.h, whose columns and targets are of a size near 1.
+// The inner problem of fit/refined.h, whose columns and targets have magnitudes near 1.
 
 inline Pair PairProduct(Pair a, Pair b) {
     const Pair product = ExactProduct(a.hi, b.hi);
@@ -17,7 +17,7 @@ inline Pair PairProduct(Pair a, Pair b) {
 }
 
 // Rows of a model in pairs of doubles: the columns, then the target, as in a RowBlock; `low` has
-// the low parts in the same places, and is null where they are not asked for.
+// the low parts in the same places, and is null if they are not requested.
 struct PairBlock {
     RowBlock high;
     DBL *low;
@@ -25,7 +25,7 @@ struct PairBlock {
 class PairRows {
 public:
     virtual void write(const PairBlock &block) const = 0;
-    // Whether low parts may be other than 0; then coefficients are wanted in pairs, too.
+    // Whether low parts may be other than 0; the coefficients are then computed in pairs, too.
     virtual bool hasLow() const = 0;
 
 protected:
@@ -42,18 +42,18 @@ struct PairVector {
     }
 };
 
-// n rows, k columns and weights that are not negative, or none.
+// n rows, k columns and nonnegative weights, or no weights.
 struct PairModel {
     const PairRows &rows;
     int32_t n, k;
     const DBL *w;
 };
 
-// The coefficients, and the inverse of H^T W H where `covariance` is not empty.
+// The coefficients, and the inverse of H^T W H if `covariance` is not empty.
 ErrorCode SolveRefined(const PairModel &model, double tolerance, const PairVector &c,
                        const RealMatrix &covariance);
 
-// y - H c for all rows, and the sum of w r^2. Without columns r is y.
+// y - H c for all rows, and the sum of w r^2. If there are no columns, r is y.
 ErrorCode RefinedResiduals(const PairModel &model, const PairVector &c, RealVector residuals,
                            double *squares);
 

@@ -18,7 +18,7 @@ ErrorCode GoodnessOfFit(ConstRealVector y, ConstRealVector fit, ConstRealVector 
     for (int32_t i = 0; i < n; ++i) {
         const double residual = y[i] * y[i] + (fit[i] - 2.0 * y[i]) * fit[i];
         const double deviation = (y[i] - 2.0 * mean) * y[i];
-        // kept: with the sign of the weight, unlike in the fits
+        // kept: weighted with its sign, unlike in the fits
         residuals += w.isEmpty() ? residual : w[i] * residual;
         total += w.isEmpty() ? deviation : w[i] * (deviation + mean * mean);
     }

@@ -6,8 +6,8 @@
 
 namespace qx {
 
-// The sum of |w| (y - f)^2 over the samples, divided by their count and not by the sum of the
-// weights. Always in the expanded form y^2 + (f - 2 y) f, term by term.
+// The sum of |w| (y - f)^2 over the samples, divided by their number and not by the sum of the
+// weights. It is always computed in the expanded form y^2 + (f - 2 y) f, term by term.
 class SquaredResiduals {
 public:
     explicit SquaredResiduals(const FitSamples &samples) : samples_(samples) {}
@@ -23,7 +23,7 @@ private:
     double sum_ = 0.0;
 };
 
-// The values of a fit, of which valueAt(i) is that at sample i, and their MSE.
+// The values of a fit, where valueAt(i) is the value at sample i, and their MSE.
 template <class ValueAt>
 void EvaluateFit(const FitSamples &samples, const FitOutput &out, const ValueAt &valueAt) {
     if (out.values.isEmpty() && out.mse == nullptr)
@@ -44,12 +44,12 @@ struct FitScores {
 };
 
 // How well `fit` describes y, which has at least one element: the weighted sum of squared
-// residuals; 1 less its ratio to the squares about the mean; and sqrt(sse / dof). The mean is the
-// plain one, and the weights, where there are any, count with their signs. dof of 0 or below
-// becomes n - 2. Where all y are equal rSquare is 1 for a fit without residuals, else infinite.
-// Expanded sums, as above.
+// residuals; 1 minus its ratio to the squares about the mean; and sqrt(sse / dof). The mean is
+// unweighted, and the weights, if there are any, count with their signs. A dof of 0 or below means
+// n - 2. If all y are equal, rSquare is 1 for a fit without residuals and infinite otherwise. The
+// sums are expanded as above.
 //
-// ErrFewerThanTwo; ErrTooFewForParameters for n <= dof.
+// ErrFewerThanTwo; ErrTooFewForParameters if n <= dof.
 ErrorCode GoodnessOfFit(ConstRealVector y, ConstRealVector fit, ConstRealVector w, int32_t dof,
                         FitScores *scores);
 

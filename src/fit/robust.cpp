@@ -23,7 +23,7 @@ public:
         return state_.take(model_.n);
     }
 
-    // The least-squares solution, and for bisquare the leverages.
+    // Computes the least-squares solution and, for bisquare, the leverages.
     ErrorCode start(DBL *c) {
         const bool needsLeverages = state_.norm == bisquare;
         DBL *const covariance = needsLeverages ? covariance_.data() : nullptr;

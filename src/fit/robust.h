@@ -10,12 +10,12 @@ namespace qx {
 
 inline constexpr int32_t robustIterations = 500;
 
-// The c of a linear model in a robust norm, by reweighted least squares from the least-squares
-// solution on; leastSquares ends with that. The limits are those of the residuals, in the mean of
-// their absolute values. The leverages of bisquare are those of the rows with the weights of the
-// model.
+// The c of a linear model in a robust norm, by reweighted least squares that start from the
+// least-squares solution; for leastSquares this is the result. The limits apply to the mean of the
+// absolute values of the residuals. The leverages of bisquare are those of the rows with the
+// weights of the model.
 //
-// As SolveLinearModel by singular values, and ErrNaNInData.
+// The codes of SolveLinearModel by singular values, and ErrNaNInData.
 ErrorCode SolveRobustly(const LinearModel &model, FitNorm norm, const FitLimits &limits, DBL *c);
 
 } // namespace qx

@@ -13,8 +13,8 @@ double WeightOr1(ConstRealVector w, std::ptrdiff_t i) {
     return w.isEmpty() ? 1.0 : std::fabs(w[i]);
 }
 
-// The distances of the adjusted residuals from their median, or from 0 where that is farther off
-// than any of them. *scale is their median, or their mean where that is 0.
+// The distances of the adjusted residuals from their median, or from 0 if no residual is farther
+// from the median than 0 is. *scale is the median of the distances, or their mean if that is 0.
 ErrorCode ScaleOfResiduals(ConstRealVector residuals, ConstRealVector factors, RealVector distances,
                            double *scale) {
     const std::ptrdiff_t n = distances.size();
@@ -51,7 +51,7 @@ ErrorCode LeastAbsoluteWeights(ConstRealVector residuals, ConstRealVector w, Rea
 void LeverageFactors(ConstRealVector leverage, ConstRealVector w, RealVector factors) {
     for (std::ptrdiff_t i = 0; i < factors.size(); ++i) {
         const double h = leverage[i];
-        // kept: beyond the limit two constants, which differ in their last digits
+        // kept: two constants beyond the limit, which differ in their last digits
         const double rest = h <= 0.9999 ? 1.0 - h : 9.999999999998899e-05;
         const double v = !w.isEmpty() || h <= 0.9999 ? WeightOr1(w, i) / rest : 10000.0000000011;
         factors[i] = std::sqrt(std::fabs(v));

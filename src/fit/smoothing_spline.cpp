@@ -8,8 +8,8 @@
 
 namespace qx {
 
-// What the pass forwards leaves of the interval from sample i to i + 1 for that backwards: with the
-// value g and the slope s at i + 1,
+// What the forward pass leaves of the interval from sample i to i + 1 for the backward pass: with
+// the value g and the slope s at i + 1,
 //     u1 = t1 - a1 g - a2 s + noise of variance v1,
 //     u2 = t2 - q u1 - b1 g - b2 s + noise of variance v2,
 // and the value at i is g - h s + h/2 u1 + h/sqrt(12) u2, the slope there s - u1.
@@ -19,7 +19,8 @@ struct SmoothingSpline::Step {
     DBL t2, q, b1, b2, v2;
 };
 
-// (r11 r12; r21 r22) (g, s) = (z1, z2), r21 other than 0 only from a step to its sample.
+// (r11 r12; r21 r22) (g, s) = (z1, z2), where r21 differs from 0 only between a step and its
+// sample.
 struct SmoothingSpline::Triangle {
     double r11, r12, r21, r22, z1, z2;
 
@@ -57,9 +58,9 @@ struct Turn {
     }
 };
 
-// Where the growing f, above 0 at high and not at low, has its zero: the last x found, to 1e-13 of
-// x or of 1, with f not above 0 (T. R. Chandrupatla, A new hybrid quadratic/bisection algorithm for
-// finding the zero of a nonlinear function without using derivatives, 1997).
+// The zero of an increasing f that is above 0 at high and not at low: the last x found with f not
+// above 0, to 1e-13 relative to x or 1 (T. R. Chandrupatla, A new hybrid quadratic/bisection
+// algorithm for finding the zero of a nonlinear function without using derivatives, 1997).
 template <class Function>
 double LastNotAbove(const Function &f, double low, double atLow, double high, double atHigh) {
     double newest = low, atNewest = atLow, other = high, atOther = atHigh, share = 0.5;
@@ -105,7 +106,7 @@ ErrorCode SmoothingSpline::make(ConstRealVector x, ConstRealVector y, ConstRealV
     return 0;
 }
 
-// The weighted line, with x and y about their weighted means.
+// Fits the weighted line, with x and y relative to their weighted means, and subtracts it.
 void SmoothingSpline::takeOffLine() {
     double sum = 0.0;
     for (int32_t i = 0; i < n_; ++i) {
@@ -129,9 +130,9 @@ void SmoothingSpline::takeOffLine() {
     }
 }
 
-// A row for each u, u / gamma = 0, joins the triangle, whose state is written by the u and the next
-// state: rows (u1, u2 | g, s | z) of (e1, e2 | r11, r12 | z1) and (e3, 0 | 0, r22 | z2). Columns of
-// u are in units of gamma.
+// A row u / gamma = 0 is added to the triangle for each u, and its state is expressed by the u and
+// the next state: rows (u1, u2 | g, s | z) of (e1, e2 | r11, r12 | z1) and (e3, 0 | 0, r22 | z2).
+// Columns of u are in units of gamma.
 void SmoothingSpline::Triangle::takeStep(double h, double gamma, Step *step) {
     double e1 = gamma * (0.5 * h * r11 - r12), e3 = -gamma * r22;
     const double e2 = gamma * (h / rootOf12) * r11;
@@ -165,7 +166,7 @@ void SmoothingSpline::Triangle::takeStep(double h, double gamma, Step *step) {
     step->v1 = scale * scale;
 }
 
-// The row weight g = weight y joins, and the triangle is one again.
+// The row weight g = weight y is added and reduced, so that the matrix is triangular again.
 void SmoothingSpline::Triangle::takeSample(double weight, double y) {
     double fill = 0.0, rest = weight * y;
     const Turn sample(&r11, weight);
@@ -179,7 +180,7 @@ void SmoothingSpline::Triangle::takeSample(double weight, double y) {
     r21 = 0.0;
 }
 
-// The triangle of the last sample.
+// Returns the triangle of the last sample.
 SmoothingSpline::Triangle SmoothingSpline::forwards(double lambda) {
     const double rootOfLambda = std::sqrt(lambda);
     Triangle triangle = {1.0 / deviation(0), 0.0, 0.0, 0.0, rest_[0] / deviation(0), 0.0};
@@ -197,7 +198,7 @@ SmoothingSpline::Covariance::Covariance(const Triangle &r) {
     gg = 1.0 / (r.r11 * r.r11) - r.r12 / r.r11 * gs;
 }
 
-// The state before is F (g, s) and noise, by the formulas of Step.
+// The previous state is F (g, s) plus noise, by the formulas of Step.
 void SmoothingSpline::Covariance::stepBack(double h, const Step &step) {
     const double k = h / rootOf12, m = 0.5 * h - k * step.q;
     const double f11 = 1.0 - k * step.b1 - m * step.a1, f12 = -(h + k * step.b2 + m * step.a2);
@@ -218,8 +219,8 @@ SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, RealVe
     for (int32_t i = n_ - 1;; --i) {
         const double weight = 1.0 / deviation(i), u = weight * (rest_[i] - g);
         quality.squares += u * u;
-        // The variance is at most that of the sample alone; rounding lifts it where weights or
-        // steps differ by more than the digits.
+        // The variance is at most that of the sample alone, but rounding errors raise it if weights
+        // or steps differ by more than the available digits.
         quality.effective += std::min(1.0, weight * weight * variance.gg);
         values[i] = g;
         if (i == 0)
@@ -243,7 +244,7 @@ SmoothingSpline::Quality SmoothingSpline::solve(double lambda, RealVector values
 }
 
 // The score of generalised cross validation (P. Craven, G. Wahba, Smoothing noisy data with spline
-// functions, 1979), less a factor of n.
+// functions, 1979), without its factor n.
 double SmoothingSpline::score(double logLambda, RealVector values, RealVector second) {
     const Quality found = solve(std::exp(logLambda), values, second);
     const double rest = n_ - found.effective;
@@ -269,8 +270,8 @@ void SmoothingSpline::interpolate(RealVector second) {
 }
 
 // Moves *at, whose score is `least`, to the lowest score between low and high, to 1e-5, and returns
-// that: parabolas, and the golden section where these do not converge (R. P. Brent, Algorithms for
-// Minimization Without Derivatives, 1973).
+// that score: by parabolas, and by the golden section where these do not converge (R. P. Brent,
+// Algorithms for Minimization Without Derivatives, 1973).
 double SmoothingSpline::leastScore(double low, double high, RealVector values, RealVector second,
                                    double *at, double least) {
     constexpr double golden = 0x1.8722191a02d61p-2, tolerance = 2.5e-6;
@@ -314,8 +315,8 @@ double SmoothingSpline::leastScore(double low, double high, RealVector values, R
     return atBest;
 }
 
-// A walk by factors of 10 from where the spline follows each sample to where it is nearly the line,
-// then the minimum about the lowest score; infinite where no score is below the line's.
+// Steps by factors of 10 from where the spline follows each sample to where it is nearly the line,
+// then finds the minimum near the lowest score; infinite if no score is below that of the line.
 double SmoothingSpline::crossValidated(RealVector values, RealVector second) {
     constexpr double decade = 0x1.26bb1bbb55516p+1;
     const auto decades = static_cast<int32_t>(4.0 * std::log10(n_)) + 2;
@@ -328,13 +329,13 @@ double SmoothingSpline::crossValidated(RealVector values, RealVector second) {
         }
     }
     least = leastScore(at - decade, at + decade, values, second, &at, least);
-    constexpr double clearly = 1.0 - 1e-7; // below the rounding errors of the scores
+    constexpr double clearly = 1.0 - 1e-7; // the margin exceeds the rounding errors of the scores
     const double freedom = n_ - 2.0;
     return least < clearly * (lineSquares_ / (freedom * freedom)) ? std::exp(at) : kInfinity;
 }
 
-// The largest lambda at which the squares are at most `wanted`, to 1e-13 of its logarithm or of 1;
-// 0 where that is beyond the numbers.
+// The largest lambda at which the squares are at most `wanted`, to 1e-13 relative to its logarithm
+// or 1; 0 if it is too small to be represented.
 double SmoothingSpline::within(double wanted, RealVector values, RealVector second) {
     if (wanted >= lineSquares_)
         return kInfinity;

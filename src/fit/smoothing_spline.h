@@ -10,20 +10,21 @@ enum class Smoothing : int32_t { CrossValidated = 0, Given = 1, WithinSquares = 
 // The natural cubic spline that minimises sum ((y - s) / d)^2 + lambda integral s''^2, n > 2.
 //
 // Value and slope at a sample are the state of an integrated random walk, x[i + 1] = F x[i] + G u
-// with independent u of variance 1 / lambda, of which the spline is the smoothed path (G. Wahba,
-// Improper priors, spline smoothing and the problem of guarding against model errors in
-// regression, 1978). A pass forwards reduces the rows of samples and steps to triangles of order 2
-// by rotations (G. J. Bierman, Factorization Methods for Discrete Sequential Estimation, 1977), a
-// pass backwards gives the states, the second derivatives, which are the u, and the variances of
-// the values, of which the trace of the matrix from y to the values is the sum (the same in O(n) as
-// M. F. Hutchinson and F. R. de Hoog's, 1985, but a sum of positive terms, which keeps its digits
-// where samples lie close together). x is in units of its mean spacing, d in units of its largest,
-// and the weighted line is taken off y, which changes neither.
+// with independent u of variance 1 / lambda, whose smoothed path is the spline (G. Wahba, Improper
+// priors, spline smoothing and the problem of guarding against model errors in regression, 1978). A
+// forward pass reduces the rows of samples and steps to triangles of order 2 by rotations (G. J.
+// Bierman, Factorization Methods for Discrete Sequential Estimation, 1977). A backward pass gives
+// the states, the second derivatives, which follow from the u, and the variances of the values. The
+// sum of these variances, each divided by d^2, is the trace of the matrix from y to the values (the
+// same in O(n) as M. F. Hutchinson and F. R. de Hoog's, 1985, but a sum of positive terms, which
+// keeps its digits where samples lie close together). x is in units of its mean spacing, d in units of its
+// largest element, and the weighted line is subtracted from y, which changes neither the trace nor the second
+// derivatives.
 class SmoothingSpline {
 public:
     // d may be empty. The arrays must outlive this. ErrOutOfMemory.
     ErrorCode make(ConstRealVector x, ConstRealVector y, ConstRealVector d);
-    // values and second, n elements each, are also work until the end.
+    // values and second, n elements each, also serve as work memory until the end.
     void fit(Smoothing method, double parameter, RealVector values, RealVector second, DBL *lambda,
              DBL *effective);
 
@@ -56,7 +57,7 @@ private:
     int32_t n_ = 0;
     double unitOfX_ = 1.0, unitOfD_ = 1.0;
     double meanX_ = 0.0, meanY_ = 0.0, slope_ = 0.0, lineSquares_ = 0.0;
-    RealVector rest_; // y less the line
+    RealVector rest_; // y minus the line
     Step *steps_ = nullptr;
     ScratchParts memory_;
 };

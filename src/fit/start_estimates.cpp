@@ -36,7 +36,7 @@ struct Levels {
     I32 counts[levels];
     DBL centres[levels];
     double halfWidth;
-    double max, min, atMax, atMin; // the extremes of y, and where they stand
+    double max, min, atMax, atMin; // the extremes of y, and their abscissae
 };
 
 ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
@@ -55,7 +55,7 @@ ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
                           {found->centres, levels});
 }
 
-// The outermost level, from below or from above, at which more than a tenth of the samples stay.
+// The outermost level, from below or from above, that holds more than a tenth of the samples.
 int32_t BaseLevel(const Levels &found, int32_t n, bool fromBelow) {
     for (int32_t i = 0; i < levels; ++i) {
         const int32_t level = fromBelow ? i : levels - 1 - i;
@@ -65,7 +65,8 @@ int32_t BaseLevel(const Levels &found, int32_t n, bool fromBelow) {
     return fromBelow ? 0 : levels - 1;
 }
 
-// Half the longer distance from the extreme to where the data are back at their level.
+// Half the longer of the distances, on either side, from the extreme to where the data return to
+// their level.
 double Deviation(const FitSamples &samples, double extremeAt, double level, double halfWidth) {
     double left = std::fabs(samples.x[0] - extremeAt);
     double right = std::fabs(samples.x[samples.n() - 1] - extremeAt);
@@ -81,7 +82,7 @@ double Deviation(const FitSamples &samples, double extremeAt, double level, doub
     return (left > right ? left : right) / 2.0;
 }
 
-// A peak or a dip, fitted above or below its level; mse is below 0 where it does not fit.
+// A peak or a dip, fitted above or below its level; mse is below 0 if the fit failed.
 struct Candidate {
     DBL p[4];
     DBL mse = -1.0;
@@ -99,14 +100,14 @@ struct Candidate {
         p[3] = level;
         if (status == ErrOutOfMemory)
             return status;
-        // The sum of a mean square may come out just below 0.
+        // Rounding may make the expanded mean square slightly negative.
         const bool isUsable = status >= 0 && std::isfinite(mse);
         mse = !isUsable ? -1.0 : mse < 0.0 ? 0.0 : mse;
         return 0;
     }
 };
 
-// The samples without those of weight 0.
+// The samples whose weight is not 0.
 class Counting {
 public:
     ErrorCode take(const FitSamples &samples) {

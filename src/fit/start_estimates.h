@@ -5,17 +5,18 @@
 
 namespace qx {
 
-// Where the iteration of a bounded fit begins if the caller has no guess. p takes the parameters of
-// the model of that name (fit/models.h). Codes are those of the fits that they call.
+// The start of the iteration of a bounded fit if the caller has no guess. p receives the parameters
+// of the model of that name (fit/models.h). Codes are those of the fits that they call.
 
-// The vertex of the parabola through the data is the offset c, or 0 where the data do not bend; a
-// and b are the exponential through what is left. Over ln x it is the start of a power law.
+// The vertex of the parabola through the data is the offset c, or 0 if the data have no curvature;
+// a and b are those of the exponential through the remainder. With ln x for x, this is the start of
+// a power law.
 ErrorCode StartExponential(const FitSamples &samples, DBL *p);
 
-// A peak that stands on the lowest level at which the data stay, or a dip in the highest one,
-// whichever fits better. A level is a tenth of the range of y with more than a tenth of the
-// samples, or the outermost one where there is none. Samples of weight 0 do not count.
-// ErrNoUsableFit where neither fits, ErrOutOfMemory, ErrEmptyInput.
+// A peak above the lowest level of the data, or a dip below the highest one, whichever fits better.
+// A level is a tenth of the range of y that holds more than a tenth of the samples, or the
+// outermost tenth if there is none. Samples of weight 0 do not count. ErrNoUsableFit if neither can
+// be fitted, ErrOutOfMemory, ErrEmptyInput.
 ErrorCode StartGaussian(const FitSamples &samples, DBL *p);
 
 } // namespace qx

@@ -58,7 +58,7 @@ void ScaledColumns::decompose(const RealMatrix &r, ConstVectorView<ElementType::
         sigma_[i] = std::sqrt(Dot(u_.row(i), u_.row(i), k));
 }
 
-// Makes two columns orthogonal; false where they are.
+// Makes two columns orthogonal; returns false if they already are.
 bool ScaledColumns::rotate(int32_t p, int32_t q) {
     const int32_t k = u_.cols();
     const double pp = Dot(u_.row(p), u_.row(p), k), qq = Dot(u_.row(q), u_.row(q), k);
@@ -137,7 +137,7 @@ void TrustRegionStep::holdWhatIsAtABound(const LinearisedFit &fit, ConstRealVect
     }
 }
 
-// The steps of the moving parameters; the others have theirs.
+// Solves for the steps of the moving parameters; the steps of the others are given.
 void TrustRegionStep::solve(const LinearisedFit &fit, ConstRealVector scale, double radius) {
     const int32_t k = fit.r.cols();
     columns_.decompose(fit.r, isMoving_, scale);
@@ -171,7 +171,7 @@ void TrustRegionStep::solve(const LinearisedFit &fit, ConstRealVector scale, dou
     }
 }
 
-// The length of the step with the damping lambda, and its derivative by lambda.
+// The length of the step with the damping lambda, and its derivative with respect to lambda.
 double TrustRegionStep::lengthAt(double lambda, double *slope) const {
     double squares = 0.0, cubes = 0.0;
     const double least = kEpsilon * columns_.largest();
@@ -189,8 +189,8 @@ double TrustRegionStep::lengthAt(double lambda, double *slope) const {
     return root;
 }
 
-// 0 where the undamped step is within the radius, else the damping with which its length is within
-// a tenth of it: Newton's steps on 1 / length, between limits.
+// Returns 0 if the undamped step is within the radius, otherwise the damping for which the length
+// differs from the radius by at most a tenth: by Newton's method on 1 / length, between limits.
 double TrustRegionStep::damping(double radius) const {
     double slope;
     double reach = lengthAt(0.0, &slope);
@@ -213,7 +213,8 @@ double TrustRegionStep::damping(double radius) const {
     return lambda;
 }
 
-// Holds the moving parameters whose steps pass a bound there; false where there are none.
+// Fixes the moving parameters whose steps pass a bound at that bound; returns false if there are
+// none.
 bool TrustRegionStep::putAtBounds(ConstRealVector lowest, ConstRealVector highest) {
     bool any = false;
     for (std::ptrdiff_t j = 0; j < step.size(); ++j) {

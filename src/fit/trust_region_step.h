@@ -5,16 +5,17 @@
 
 namespace qx {
 
-// The linear model of least squares around a point: half of |z + R s|^2 for a step s, where R is
-// the triangle of the derivatives and z the residuals in its coordinates.
+// The linear model of a least-squares problem around a point: half of |z + R s|^2 for a step s,
+// where R is the triangle of the derivatives and z the residuals in its coordinates.
 struct LinearisedFit {
     RealMatrix r;      // upper triangular
-    ConstRealVector z; // as many as R has rows
+    ConstRealVector z; // as many elements as R has rows
 };
 
-// R without some columns, each divided by a length, as U diag(sigma) V^T by one-sided Jacobi
-// rotations of its columns. Small singular values of columns that have about one length are as
-// accurate as large ones. J. Demmel, K. Veselic, "Jacobi's method is more accurate than QR", 1992.
+// R without some of its columns, the others divided by given lengths, as U diag(sigma) V^T by
+// one-sided Jacobi rotations of its columns. If the columns have similar lengths, small singular
+// values are as accurate as large ones (J. Demmel, K. Veselic, "Jacobi's method is more accurate
+// than QR", 1992).
 class ScaledColumns {
 public:
     // ErrOutOfMemory.
@@ -25,7 +26,7 @@ public:
 
     int32_t count() const { return count_; } // of free columns
     int32_t column(int32_t i) const { return columns_[i]; }
-    double sigma(int32_t i) const { return sigma_[i]; } // in no order
+    double sigma(int32_t i) const { return sigma_[i]; } // in no particular order
     double largest() const;
     // u_i^T z.
     double projection(int32_t i, ConstRealVector z) const;
@@ -42,24 +43,24 @@ private:
     ScratchParts memory_;
 };
 
-// The step of least |z + R s| with |diag(scale) s| at most radius and lowest <= s <= highest, which
-// enclose 0. Without bounds in the way it is the exact one (J. J. More, "The Levenberg-Marquardt
-// algorithm: implementation and theory", 1978). A parameter at a bound beyond which the cost falls
-// takes no part; one that the step would carry over a bound is put there, and the others are solved
-// for again. Where the linear model does not fall by that, the step is cut at the first bound.
+// The step s that minimises |z + R s| with |diag(scale) s| at most radius and lowest <= s <=
+// highest, which enclose 0. If no bound is in the way it is the exact minimiser (J. J. More, "The
+// Levenberg-Marquardt algorithm: implementation and theory", 1978). A parameter at a bound beyond
+// which the cost falls takes no part; a parameter that the step would carry over a bound is put on
+// the bound, and the others are solved for again. If that does not lower the linear model, the step
+// is cut at the first bound.
 class TrustRegionStep {
 public:
     // ErrOutOfMemory.
     ErrorCode take(int32_t count);
-    // An infinite radius gives the step of Gauss and Newton, along the directions that R
-    // determines.
+    // An infinite radius gives the Gauss-Newton step, along the directions that R determines.
     void find(const LinearisedFit &fit, ConstRealVector scale, ConstRealVector lowest,
               ConstRealVector highest, double radius);
 
     RealVector step;
-    double predicted = 0.0;              // by how much half of |z + R s|^2 falls
+    double predicted = 0.0;              // the decrease of half of |z + R s|^2
     double length = 0.0;                 // |diag(scale) step|
-    bool isInside = false;               // neither the radius nor a bound is in the way
+    bool isInside = false;               // neither the radius nor a bound limits the step
     VectorView<ElementType::I32> isFree; // 0 where a parameter does not take part from the start
 
 private:

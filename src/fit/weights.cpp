@@ -5,6 +5,11 @@
 namespace qx {
 
 ErrorCode SettleWeights(FitSamples *samples, int32_t fewest) {
+    double largest;
+    return SettleWeights(samples, fewest, &largest);
+}
+
+ErrorCode SettleWeights(FitSamples *samples, int32_t fewest, double *largest) {
     const int32_t n = samples->n();
     if (n < fewest)
         return fewest == 2 ? ErrFewerThanTwo : ErrFewerThanThree;
@@ -12,9 +17,10 @@ ErrorCode SettleWeights(FitSamples *samples, int32_t fewest) {
         return 0;
     WeightCounts counts;
     CountWeights(samples->w.data(), n, &counts);
-    if (counts.broken != 0.0)
+    if (counts.hasNaN)
         return ErrNonFiniteInput;
-    if (counts.used == 0.0)
+    *largest = counts.largest;
+    if (counts.used == 0)
         samples->w = {};
     else if (counts.used < fewest)
         return ErrTooFewWeights;

@@ -1,50 +1,52 @@
 #include "fit/weights.h"
 
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 namespace qx::QX_WIDTH {
 
 namespace {
 
 template <class L>
-QX_INLINE L Modulus(L x) {
-    return L(x.v < L(0.0).v ? -x.v : x.v);
-}
-template <class L>
-QX_INLINE L Larger(L a, L b) {
+QX_INLINE L Larger(L a, L b) { // b where a is NaN
     return L(a.v > b.v ? a.v : b.v);
-}
-template <class L>
-QX_INLINE L OneWhereUnequal(L a, L b) {
-    return L(a.v != b.v ? L(1.0).v : L(0.0).v);
 }
 
 } // namespace
 
-// The counts are doubles, which are exact and need no conversion.
+// Several sums of each kind, so that one need not wait for the other.
 void CountWeights(const DBL *w, int32_t n, WeightCounts *counts) {
     typedef Lanes<nativeLanes> L;
-    constexpr int apart = 4; // sums, so that one need not wait for the other
-    L used[apart], broken[apart];
-    for (int k = 0; k < apart; ++k)
-        used[k] = broken[k] = L(0.0);
+    constexpr int apart = 4;
+    BitsOf<L> zeros[apart] = {}, numbers[apart]; // all bits set for numbers
+    L largest[apart];
+    for (int k = 0; k < apart; ++k) {
+        numbers[k] = ~zeros[k];
+        largest[k] = L(0.0);
+    }
     int32_t i = 0;
     for (; i + apart * nativeLanes <= n; i += apart * nativeLanes)
         for (int k = 0; k < apart; ++k) {
             const L weight = L::load(w + i + k * nativeLanes);
-            used[k] = used[k] + OneWhereUnequal(weight, L(0.0));
-            broken[k] = broken[k] + OneWhereUnequal(weight, weight);
+            zeros[k] -= (weight == L(0.0)).m;
+            numbers[k] &= (weight == weight).m;
+            largest[k] = Larger(Magnitude(weight), largest[k]);
         }
-    *counts = {0.0, 0.0};
+    int32_t zero = 0;
+    bool areNumbers = true;
+    double most = 0.0;
     for (int k = 0; k < apart; ++k)
         for (int lane = 0; lane < nativeLanes; ++lane) {
-            counts->used += used[k][lane];
-            counts->broken += broken[k][lane];
+            zero += static_cast<int32_t>(zeros[k][lane]);
+            areNumbers &= numbers[k][lane] != 0;
+            most = largest[k][lane] > most ? largest[k][lane] : most;
         }
     for (; i < n; ++i) {
-        counts->used += w[i] != 0.0 ? 1.0 : 0.0;
-        counts->broken += w[i] != w[i] ? 1.0 : 0.0;
+        const double size = __builtin_fabs(w[i]);
+        zero += size == 0.0;
+        areNumbers &= size == size;
+        most = size > most ? size : most;
     }
+    *counts = {n - zero, !areNumbers, most};
 }
 
 double LargestWeight(const DBL *w, int32_t n) {
@@ -56,7 +58,7 @@ double LargestWeight(const DBL *w, int32_t n) {
     int32_t i = 0;
     for (; i + apart * nativeLanes <= n; i += apart * nativeLanes)
         for (int k = 0; k < apart; ++k)
-            held[k] = Larger(Modulus(L::load(w + i + k * nativeLanes)), held[k]);
+            held[k] = Larger(Magnitude(L::load(w + i + k * nativeLanes)), held[k]);
     const L all = Larger(Larger(held[0], held[1]), Larger(held[2], held[3]));
     double largest = 0.0;
     for (int lane = 0; lane < nativeLanes; ++lane)

@@ -5,14 +5,15 @@
 
 namespace qx {
 
-// The modes of the processor's floating-point unit are the calling thread's own, and hosts change them:
-// another rounding, numbers below the normal ones taken for zero or results flushed to it (what a library
-// that is linked with fast-math does to its whole process), exceptions that end in a signal. From its
-// construction to its end there are the modes in which all results are defined: rounding to nearest, gradual
-// underflow, no exception unmasked. Then the caller has its own again. The frame of every export holds one
-// (frame/export.h); where the modes are right, it costs reading a register: 3 ns on AMD's Zen 4.
+// The modes of the processor's floating-point unit belong to the calling thread, and hosts change
+// them: another rounding mode, subnormal numbers read as zero or flushed to zero (which a library
+// linked with fast-math does to its whole process), exceptions that raise a signal. While this
+// object lives, the modes are those in which all results are defined: rounding to nearest, gradual
+// underflow, all exceptions masked. Its destructor restores the caller's modes. The frame of every
+// export holds one (frame/export.h). Where the modes are right already, it costs one read of a
+// register: 3 ns on AMD's Zen 4.
 //
-// What the caller's flags say of exceptions after a call is left open.
+// The state of the caller's exception flags after a call is unspecified.
 class DefaultArithmetic {
 public:
     __attribute__((always_inline)) DefaultArithmetic() : callers_(Read()) {
@@ -27,10 +28,10 @@ public:
     DefaultArithmetic &operator=(const DefaultArithmetic &) = delete;
 
 private:
-    // A port adds the type of its register, the value with the modes above, the bits that say
-    // something of them, and how the register is read and written.
+    // A port adds the type of its register, the value for the modes above, the mask of the mode
+    // bits, and the functions that read and write the register.
 #if defined(__x86_64__) || defined(__i386__)
-    typedef uint32_t Modes; // MXCSR. The x87 unit has its own, and none of our arithmetic
+    typedef uint32_t Modes; // MXCSR. The x87 unit has its own register, and none of our arithmetic
     static constexpr Modes byDefault = 0x1f80, relevant = 0xffc0;
     static __attribute__((always_inline)) Modes Read() {
         Modes modes;

@@ -14,13 +14,13 @@
 
 namespace qx {
 
-// Views of host arrays, named by the handle type that the declaration of an export has: In<DBL1D>,
-// Out<CDB2D>, InOut<DBL1D>. The element follows from the handle, so a view of another element does
-// not compile. They read the block through the handle at every use, so that no pointer outlives a
-// resize. Handles are never null and are not tested.
+// Views of host arrays, named by the handle type in the declaration of the export: In<DBL1D>,
+// Out<CDB2D>, InOut<DBL1D>. The handle determines the element, so a view of another element does
+// not compile. Views read the block through the handle at every use, so that no pointer outlives a
+// resize. Handles are assumed not to be null and are not tested.
 //
-// A block that says a negative size is an empty array to everybody: size(), rows() and cols() are
-// never below 0. Where such a block has a code of its own, the body asks hasNegativeSize().
+// A block with a negative size is treated as an empty array: size(), rows() and cols() are never
+// below 0. Where an export has a code for such a block, its body asks hasNegativeSize().
 
 // The element and the number of dimensions of a handle type.
 template <class Handle>
@@ -61,7 +61,7 @@ struct RecordHandle {
     static constexpr int dimensions = 1;
 };
 
-// What a block shows, for one and for two dimensions.
+// What can be read from a block of one or two dimensions.
 template <class Handle, int Dimensions = HandleTraits<Handle>::dimensions>
 class Block;
 
@@ -130,11 +130,11 @@ public:
     // The elements for inner routines, until the next resize of an output.
     auto view() const { return ViewOf<false>(*this, this->elements()); }
 
-    // For the frame: an input that is an output of the same call reads a copy from here on.
+    // For the frame: an input that is also an output of the call reads from a copy from here on.
     auto inputs() { return std::tie(*this); }
     const void *identity() const { return this->handle_; }
     ErrorCode readCopyIn(ScratchBytes &memory, void *&block) {
-        // Scratch memory starts at any byte, the sizes of a block do not.
+        // Scratch memory starts at any byte; the size fields of a block are aligned.
         constexpr std::size_t alignment = alignof(int32_t);
         const std::size_t size = this->bytes();
         if (const ErrorCode failed = memory.allocate(static_cast<int64_t>(size + alignment - 1)))
@@ -147,8 +147,8 @@ public:
     }
 };
 
-// An input that the export uses as work memory: its content is spoiled, its size is not, and a
-// failure leaves it.
+// An input that the export uses as work memory: its elements are overwritten, its size is kept, and
+// a failure does not empty it.
 template <class Handle>
 class Spoiled : public In<Handle> {
 public:
@@ -157,12 +157,12 @@ public:
     auto view() const { return ViewOf<true>(*this, this->elements()); }
 };
 
-// An output. EmptyCode is the element type that the host is told when the output is emptied; it
-// differs from the element's own only in the few exports that were written so. A failure empties
-// the output unless it is Kept.
+// An output. EmptyCode is the element type that the host is given when the output is emptied; it
+// differs from the element's own in only a few exports. A failure empties the output unless it is
+// Kept.
 //
-// A view takes the address of the frame's own handle argument, because the host is given that
-// address and may replace the handle itself.
+// A view takes the address of the frame's own handle argument: the host receives that address and
+// may replace the handle.
 enum class OnFailure { Empty, Keep };
 
 template <class Handle, OnFailure Failure = OnFailure::Empty,
@@ -188,8 +188,8 @@ public:
             (*this->handle_)->dimSize = count;
         return Outcome::OfHost(hostStatus);
     }
-    // The host takes the count in int32. A product that wraps there would leave a block that is
-    // smaller than its dimensions say, so it is refused as memory that cannot be had.
+    // The host takes the count as an int32. A product that wraps would give a block smaller than
+    // its dimensions, so such a request is refused as out of memory.
     static bool mayHave(int32_t rows, int32_t cols) requires(dimensions == 2) {
         return int64_t{rows} * cols <= std::numeric_limits<int32_t>::max();
     }
@@ -203,10 +203,10 @@ public:
         return Outcome::OfHost(hostStatus);
     }
 
-    // Rows become columns: the elements have been rearranged where they stand.
+    // Rows become columns; the elements have already been rearranged in place.
     void exchangeSizes() requires(dimensions == 2) { setSizes(this->cols(), this->rows()); }
 
-    // The sizes become 0 even where the host refuses.
+    // Sets the sizes to 0 even if the host refuses.
     void empty() {
         reshape(static_cast<int32_t>(EmptyCode), 0);
         if constexpr (dimensions == 1)
@@ -236,16 +236,17 @@ private:
     AnyHandle *address_;
 };
 
-// An array that is input and output at once: an output whose content is read first.
+// An array that is both input and output: an output whose content is read first.
 template <class Handle, OnFailure Failure = OnFailure::Empty>
 using InOut = Out<Handle, Failure>;
 
-// What is left in a scalar output by a failure: 0 in integers and in records of them, else the
-// quiet NaN.
+// The value that a failure leaves in a scalar output: 0 for integers and records of integers,
+// otherwise the quiet NaN.
 template <class T>
 inline constexpr bool FailsToZero = std::is_integral_v<T>;
 
-// A scalar output, or a record of numbers of one kind. A failure settles it, to the bit.
+// A scalar output, or a record of numbers of one kind. A failure sets it to a value that is defined
+// to the bit.
 template <class T>
 class OutValue {
 public:

@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// Complex arithmetic, written out: that of the standard library may go through helper functions
-// with another rounding on another target.
+// Complex arithmetic, written out, because the standard library's may call helper functions that
+// round differently on another target.
 
 inline CDB operator+(CDB a, CDB b) { return {a.re + b.re, a.im + b.im}; }
 inline CDB operator+(CDB a, double b) { return {a.re + b, a.im}; }
@@ -22,7 +22,7 @@ inline CDB operator/(CDB a, double b) { return {a.re / b, a.im / b}; }
 inline CDB &operator+=(CDB &a, CDB b) { return a = a + b; }
 inline CDB &operator-=(CDB &a, CDB b) { return a = a - b; }
 
-// Neither overflows nor underflows before the quotient does (R. L. Smith, "Algorithm 116: Complex
+// Does not overflow or underflow unless the quotient does (R. L. Smith, "Algorithm 116: Complex
 // division", 1962).
 inline CDB operator/(CDB a, CDB b) {
     if (std::fabs(b.re) >= std::fabs(b.im)) {

@@ -3,9 +3,10 @@
 
 #include <limits>
 
-// The numbers that more than one file needs, each the double nearest to its value and written to
-// the bit, so that no compiler's reading of decimals decides. A constant that one routine alone
-// needs, or that is deliberately not the nearest double, stands in that routine with its reason.
+// Constants that more than one file needs. Each is the double nearest to its value, written as a
+// hexadecimal float so that it does not depend on how a compiler reads decimals. A constant that
+// only one routine needs, or that is deliberately not the nearest double, is in that routine with
+// the reason.
 
 namespace qx {
 
@@ -28,8 +29,8 @@ inline constexpr double kRootThree = 0x1.bb67ae8584caap+0;
 inline constexpr double kE = 0x1.5bf0a8b145769p+1;
 inline constexpr double kEuler = 0x1.2788cfc6fb619p-1; // -digamma(1)
 
-inline constexpr double kEpsilon = 0x1p-52;                   // from 1 to the next double
-inline constexpr double kLogOfLargest = 0x1.62e42fefa39efp+9; // beyond, exp overflows
+inline constexpr double kEpsilon = 0x1p-52;                   // distance from 1 to the next double
+inline constexpr double kLogOfLargest = 0x1.62e42fefa39efp+9; // exp overflows above it
 
 inline constexpr double kInfinity = std::numeric_limits<double>::infinity();
 inline constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();

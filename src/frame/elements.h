@@ -50,8 +50,8 @@ struct Element<ElementType::CDB> {
     typedef ::CDB type;
 };
 
-// Elements stand at addresses that their C++ type does not promise, and the algorithms of the
-// standard library would forget that. These do not.
+// Elements lie at addresses that are not aligned for their C++ type, and the algorithms of the
+// standard library assume alignment. These do not.
 
 inline void Fill(DBL *to, std::ptrdiff_t count, double value) {
     for (std::ptrdiff_t i = 0; i < count; ++i)

@@ -1,8 +1,8 @@
 #ifndef QX_FRAME_EXPECTS_H
 #define QX_FRAME_EXPECTS_H
 
-// What an inner routine relies on because its callers have checked it. Debug and sanitized builds
-// stop where it does not hold; others take no time for it.
+// A condition that an inner routine relies on because its callers have checked it. Debug and
+// sanitizer builds stop where it does not hold; other builds do not evaluate it.
 #ifdef QX_CHECKED
 #define QX_EXPECTS(condition) ((condition) ? static_cast<void>(0) : __builtin_trap())
 #else

@@ -10,7 +10,7 @@
 
 namespace qx {
 
-// An export is one line: the ending that tells its outcome, the body, and the arguments.
+// An export is one line: the ending that returns its outcome, the body, and the arguments.
 //
 //     Outcome SolveLU(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x) {
 //         if (const Outcome bad = LastFailed({{a.isEmpty(), ErrEmptyInput}, ...})) return bad;
@@ -22,23 +22,21 @@ namespace qx {
 //         return InErrWithHost(err, SolveLU, a, b, x);
 //     }
 //
-// The body's parameter types say what each argument is, and the frame does the rest from them:
+// The types of the body's parameters describe the arguments, and the frame does the rest:
 //   - a failure settles every output (Out, InOut, OutDBL ...), in the order of the parameters,
 //     whether the body reached it or not: arrays are emptied, scalars become NaN. Warnings and
 //     success leave them.
 //   - two outputs that are one array are refused with ErrInternal, before the body runs.
 //   - an In or Spoiled whose array is also an Out of the call reads a copy, so that a host that
 //     works in place gets the result of separate arrays.
-//   - a record of the caller's that carries arrays is a class which names those that are inputs by
-//     inputs(), a tuple of references to its views, and the others by outputs(), a tuple of what
-//     their identity() gives.
-//   - the body runs in the arithmetic in which results are defined (frame/arithmetic.h), whatever the host
-//     has set; so do calls of the host within it. An export without a frame, or one that computes an argument of the
-//     body, has the line for itself.
-//   - everything else (numbers, plain pointers, plan keepers) is handed on as it is.
-// A body is a function or a lambda whose parameters have their types written out; it returns an
-// Outcome or an ErrorCode. What a twin does differently is a template argument of its body, or a
-// capture.
+//   - a caller's record that contains arrays is a class with inputs(), a tuple of references to its
+//     input views, and outputs(), a tuple of the identity() of each of its outputs.
+//   - the body runs in the arithmetic in which results are defined (frame/arithmetic.h), whatever
+//     the host has set; this includes its calls to the host. An export without a frame, or one that
+//     computes an argument of the body, declares a DefaultArithmetic itself.
+//   - everything else (numbers, plain pointers, plan keepers) is passed through unchanged.
+// A body is a function or a lambda whose parameters have explicit types; it returns an Outcome or
+// an ErrorCode. What a twin does differently is a template argument of its body or a capture.
 
 namespace detail {
 
@@ -55,7 +53,7 @@ concept HasOutputs = requires(Parameter parameter) {
     parameter.outputs();
 };
 
-// Where an input that is also an output has its copy.
+// The copy of an input that is also an output.
 struct Copy {
     ScratchBytes memory;
     void *block = nullptr;
@@ -69,7 +67,7 @@ auto InputsOf(Parameter &parameter) {
     else
         return std::tuple<>();
 }
-// Its outputs, by what tells one array from another.
+// The outputs of a parameter, by the address that identifies each array.
 template <class Parameter>
 auto OutputsOf(const Parameter &parameter) {
     if constexpr (HasOutputs<Parameter>)
@@ -120,7 +118,7 @@ private:
                        parameters_);
         return std::apply([](auto... identity) { return Identities{identity...}; }, all);
     }
-    // A record may carry no array where none is needed.
+    // A record may have no arrays if it needs none.
     template <std::size_t... I>
     static bool isAmong(const void *identity, const Identities &all, std::index_sequence<I...>) {
         return ((all[I] == identity) || ...) && identity != nullptr;
@@ -190,15 +188,15 @@ int32_t ReturnedWithHost(Body body, Arguments &&...arguments) {
     return detail::RunFrame(body, std::forward<Arguments>(arguments)...).raw();
 }
 
-// The code is in *err, and the function result is 0 whatever happened.
+// The code is in *err, and the function result is always 0.
 template <class Body, class... Arguments>
 int32_t InErr(ErrorCode *err, Body body, Arguments &&...arguments) {
     *err = detail::RunFrame(body, std::forward<Arguments>(arguments)...).code();
     return 0;
 }
 
-// The code is in *err. The function result is the host's own status where the host refused a
-// resize, else 0.
+// The code is in *err. The function result is the host's status if the host refused a resize,
+// otherwise 0.
 template <class Body, class... Arguments>
 int32_t InErrWithHost(ErrorCode *err, Body body, Arguments &&...arguments) {
     const Outcome outcome = detail::RunFrame(body, std::forward<Arguments>(arguments)...);
@@ -206,8 +204,8 @@ int32_t InErrWithHost(ErrorCode *err, Body body, Arguments &&...arguments) {
     return outcome.isHosts() ? outcome.raw() : 0;
 }
 
-// The code is in *err and is the function result too, where the host's own status takes its place
-// if the host refused a resize.
+// The code is in *err and is also the function result, unless the host refused a resize: then the
+// function result is the host's status.
 template <class Body, class... Arguments>
 int32_t InErrAndReturnedWithHost(ErrorCode *err, Body body, Arguments &&...arguments) {
     const Outcome outcome = detail::RunFrame(body, std::forward<Arguments>(arguments)...);

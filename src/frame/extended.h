@@ -5,7 +5,7 @@
 
 namespace qx {
 
-// A number as the unevaluated sum of two doubles, about 32 digits; for sums that lose digits to
+// A number as the unevaluated sum of two doubles, about 32 digits. For sums that lose digits to
 // cancellation and for phases of many turns.
 // Source: T. J. Dekker, A floating-point technique for extending the available precision, 1971.
 struct Extended {

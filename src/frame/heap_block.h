@@ -11,8 +11,8 @@
 
 namespace qx {
 
-// Elements straight from the heap, given back with the scope: for the work memory that the
-// analysis workspace never serves. Unlike a scratch block it may exceed the range of int32.
+// Elements allocated directly on the heap and freed at the end of the scope, for work memory that
+// the analysis workspace never serves. Unlike a scratch block, it may exceed the range of int32.
 template <ElementType Code>
 class HeapBlock {
 public:
@@ -44,7 +44,7 @@ private:
         block_ = nullptr;
         if (count < 0 || count > limit)
             return ErrOutOfMemory;
-        // One element at least, so that null always means failure.
+        // At least one element, so that null always means failure.
         block_ = allocateElements(count > 0 ? static_cast<std::size_t>(count) : 1);
         return block_ ? 0 : ErrOutOfMemory;
     }

@@ -21,7 +21,7 @@ std::atomic<void *> gRTModule = nullptr;
 
 constexpr char fatalCaption[] = "Fatal Error";
 
-// The first module that has the host's run-time, of those already in the process.
+// The first of the modules already in the process that has the host's run-time.
 void *FindHostModule() {
     if (void *module = gRTModule.load(std::memory_order_relaxed))
         return module;
@@ -35,7 +35,7 @@ void *FindHostModule() {
     return nullptr;
 }
 
-// No lock is taken: two threads can only store the same address.
+// No lock is needed: two threads can only store the same address.
 void *Resolve(HostFunction &function) {
     void *module = FindHostModule();
     if (module == nullptr)

@@ -5,12 +5,12 @@
 
 namespace qx {
 
-// The two functions of the host's run-time. The module cannot know at build time which module
-// of the process holds them, so each is bound by name at its first call. A process in which
-// they cannot be found ends there, with a message.
+// The two functions of the host's run-time. The module cannot know at build time which module of
+// the process has them, so each is bound by name at its first call. If they cannot be found, the
+// process ends with a message.
 
-// Resizes a block to `count` elements and may move it: 0, or a host status. A frame writes the
-// dimension fields itself after a success.
+// Resizes a block to `count` elements and may move it. Returns 0 or a host status. A frame writes
+// the dimension fields itself on success.
 int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count);
 
 typedef int32_t (*SweepProcedure)(void *argument);
@@ -20,7 +20,7 @@ enum SweepMode : int32_t { SweepWithdraw = 0, SweepForProcess = 1, SweepForObjec
 // up after an aborted run.
 int32_t HostRegisterSweep(SweepProcedure procedure, void *argument, int32_t mode);
 
-// Names the module that holds the host's functions, ahead of every other place.
+// Sets the module in which the host's functions are looked for first.
 void *SetHostModule(void *module);
 
 } // namespace qx

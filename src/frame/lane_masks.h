@@ -7,7 +7,7 @@
 
 namespace qx {
 
-// Comparisons of lanes, choices by them, the bits of numbers, and lanes moved by one, for Lanes<2>,
+// Comparisons of lanes, selection by masks, bit operations, and shifts by one lane, for Lanes<2>,
 // Lanes<4> and Lanes<8>.
 
 template <class L>
@@ -39,22 +39,22 @@ QX_INLINE Lanes<N> Sqrt(Lanes<N> x) {
     return root;
 }
 
-// The products of the lower halves of each 64 bits as unsigned integers, in full.
+// The full products of the low 32 bits of each lane, as unsigned integers.
 template <class L>
 QX_INLINE BitsOf<L> ProductOfLowerHalves(BitsOf<L> a, BitsOf<L> b) {
     return LowerProducts<L::count>(a, b);
 }
-// Shifted towards the lower bits, with zeros behind.
+// Shifted right, filled with zeros.
 template <class L>
 QX_INLINE BitsOf<L> ShiftedDown(BitsOf<L> bits, int count) {
     typedef uint64_t Unsigned __attribute__((vector_size(sizeof(BitsOf<L>))));
     return (BitsOf<L>)((Unsigned)bits >> count);
 }
 
-// A truth for each lane. Comparisons with NaN are false.
+// A boolean for each lane. Comparisons with NaN are false.
 template <class L>
 struct LaneMask {
-    BitsOf<L> m; // all bits of a lane, or none
+    BitsOf<L> m; // a lane has all bits set or none
 };
 
 template <int N>

@@ -14,13 +14,13 @@
 #define QX_VECTOR_REGISTER "x"
 #endif
 
-// QX_VECTOR_REGISTER is the constraint of assembly for a register of lanes.
+// QX_VECTOR_REGISTER is the assembly constraint for a register of lanes.
 
-// Operations become part of the loop that uses them, at every level of optimisation.
+// Operations are inlined into the loop that uses them at every optimisation level.
 #define QX_INLINE __attribute__((always_inline)) inline
 
-// Before a loop of at most eight rounds over an array of vectors, which then stays in registers: by
-// itself g++ 12 unrolls some of them too late for that.
+// Placed before a loop of at most eight iterations over an array of vectors, so that the array
+// stays in registers: g++ 12 by itself unrolls some of these loops too late for that.
 #ifdef __clang__
 #define QX_UNROLLED _Pragma("unroll")
 #else
@@ -30,8 +30,9 @@
 namespace qx {
 
 // SIMD over independent elements: Lanes<N> holds N doubles, and every operation does in each lane
-// exactly what it would do to one double. A text written over Lanes thus gives the same bits for
-// every N, and an array may be cut into Lanes<nativeLanes> and a rest of Lanes<1> at will.
+// exactly what it would do to a single double. Code written over Lanes therefore gives the same
+// bits for every N, and an array may be split into Lanes<nativeLanes> and a remainder of Lanes<1>
+// at any point.
 //
 //     template <class L>
 //     void ScaleSome(DBL *x, double factor) { (L::load(x) * L(factor)).store(x); }
@@ -39,11 +40,11 @@ namespace qx {
 //     for (; i + nativeLanes <= n; i += nativeLanes) ScaleSome<Lanes<nativeLanes>>(x + i, f);
 //     for (; i < n; ++i) ScaleSome<Lanes<1>>(x + i, f);
 //
-// Memory need not be aligned. N is 1, 2, 4 or 8. What depends on the instruction set is here and
-// nowhere else; comparisons and choices are in frame/lane_masks.h.
+// Memory need not be aligned. N is 1, 2, 4 or 8. Everything that depends on the instruction set is
+// here and nowhere else; comparisons and selections are in frame/lane_masks.h.
 
-// What the instruction set of the build offers. Each build has its own of all that follows, so that
-// none of it can stand in for that of another.
+// What the instruction set of the build offers. All that follows is in a namespace for each build,
+// so that the linker cannot take it from another build.
 #ifdef __AVX512F__
 inline namespace lanes8 {
 constexpr int nativeLanes = 8;
@@ -102,8 +103,8 @@ public:
     QX_INLINE explicit Lanes(double value) : v(LaneVector<N>::broadcast(value)) {}
     QX_INLINE explicit Lanes(Vector vector) : v(vector) {}
 
-    // Through a type of the memory and not std::memcpy, which g++ 12 leads through a copy on the
-    // stack.
+    // Through a pointer to an unaligned vector type, not std::memcpy, which g++ 12 compiles to a
+    // copy on the stack.
     static QX_INLINE Lanes load(const DBL *x) {
         return Lanes(Vector(*reinterpret_cast<const typename LaneVector<N>::inMemory *>(x)));
     }
@@ -111,7 +112,8 @@ public:
         *reinterpret_cast<typename LaneVector<N>::inMemory *>(x) = v;
     }
 
-    // The first `some` elements, with zeros in the lanes behind; and these alone back to memory.
+    // The first `some` elements, with zeros in the remaining lanes; and the store of those elements
+    // only.
     static QX_INLINE Lanes loadFirst(const DBL *x, std::ptrdiff_t some) {
 #ifdef __AVX512F__
         if constexpr (N == 8)
@@ -149,7 +151,7 @@ public:
             x[i * stride] = v[i];
     }
 
-    // The lanes in the opposite order.
+    // The lanes in reverse order.
     QX_INLINE Lanes reversed() const {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(v, v, 1, 0));
@@ -159,9 +161,8 @@ public:
             return Lanes(__builtin_shufflevector(v, v, 7, 6, 5, 4, 3, 2, 1, 0));
     }
 
-    // Of the values of a, followed by those of b, every second one from the first or from the
-    // second on; and the first or the second half of the values of a and b by turns. (Not for N
-    // = 1.)
+    // Evens and Odds take every second value of a followed by b, from the first or the second on.
+    // TurnsLow and TurnsHigh interleave the first or the second halves of a and b. (Not for N = 1.)
     friend QX_INLINE Lanes Evens(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
@@ -195,8 +196,8 @@ public:
             return Lanes(__builtin_shufflevector(a.v, b.v, 4, 12, 5, 13, 6, 14, 7, 15));
     }
 
-    // a and b interleaved pair by pair: with lanes numbered from 0, the low half is a0 b0 (a2 b2 ...),
-    // the high half a1 b1 (a3 b3 ...). The same operations take the pairs apart again.
+    // a and b interleaved pair by pair: with lanes numbered from 0, the low half is a0 b0
+    // (a2 b2 ...), the high half a1 b1 (a3 b3 ...). Applied again, they restore a and b.
     friend QX_INLINE Lanes PairsLow(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
@@ -253,8 +254,9 @@ public:
 template <int N>
 QX_INLINE Lanes<N> Times(Lanes<N> x, const DBL *factor) {
 #if defined(__AVX512F__) && !defined(__clang__)
-    // One instruction, which g++ splits where the number is used again: but to fill a vector of eight
-    // lanes takes the place of arithmetic on AMD's Zen 4, and to read it with each product does not.
+    // One instruction. g++ would split it where the number is used again, but on AMD's Zen 4 a
+    // broadcast to eight lanes takes the place of arithmetic, and reading the number with each
+    // product does not.
     if constexpr (N == 8) {
         typename Lanes<N>::Vector product;
         __asm__("vmulpd %2%{1to8%}, %1, %0" : "=v"(product) : "v"(x.v), "m"(*factor));
@@ -266,7 +268,7 @@ QX_INLINE Lanes<N> Times(Lanes<N> x, const DBL *factor) {
 
 // ---- Neighbouring lanes as pairs, such as the parts of complex values ----
 
-// The first and the second value of each pair, twice.
+// The first, or the second, value of each pair in both places of the pair.
 template <int N>
 QX_INLINE Lanes<N> FirstsTwice(Lanes<N> x) {
     if constexpr (N == 2)
@@ -285,7 +287,7 @@ QX_INLINE Lanes<N> SecondsTwice(Lanes<N> x) {
     else
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 1, 3, 3, 5, 5, 7, 7));
 }
-// The values of each pair exchanged.
+// The two values of each pair exchanged.
 template <int N>
 QX_INLINE Lanes<N> Swapped(Lanes<N> x) {
     if constexpr (N == 2)
@@ -295,7 +297,7 @@ QX_INLINE Lanes<N> Swapped(Lanes<N> x) {
     else
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 0, 3, 2, 5, 4, 7, 6));
 }
-// The pairs in the opposite order.
+// The pairs in reverse order.
 template <int N>
 QX_INLINE Lanes<N> ReversedPairs(Lanes<N> x) {
     if constexpr (N == 2)
@@ -305,7 +307,7 @@ QX_INLINE Lanes<N> ReversedPairs(Lanes<N> x) {
     else
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 6, 7, 4, 5, 2, 3, 0, 1));
 }
-// One pair in the place of all.
+// One pair, repeated in all pairs.
 template <int N>
 QX_INLINE Lanes<N> InEveryPair(Lanes<2> x) {
     if constexpr (N == 2)
@@ -315,7 +317,7 @@ QX_INLINE Lanes<N> InEveryPair(Lanes<2> x) {
     else
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1, 0, 1, 0, 1));
 }
-// The first values of all pairs, or the second ones, with the opposite sign.
+// The first, or the second, values of all pairs with the opposite sign.
 template <int N>
 QX_INLINE Lanes<N> NegatedInPairs(Lanes<N> x, bool first) {
     const int64_t one = first ? INT64_MIN : 0, other = first ? 0 : INT64_MIN;
@@ -329,7 +331,7 @@ QX_INLINE Lanes<N> NegatedInPairs(Lanes<N> x, bool first) {
         sign = Bits{one, other, one, other, one, other, one, other};
     return Lanes<N>((typename Lanes<N>::Vector)((Bits)x.v ^ sign));
 }
-// a with the first values less those of b, the second ones plus those of b.
+// a - b in the first values, a + b in the second ones.
 QX_INLINE Lanes<2> MinusPlus(Lanes<2> a, Lanes<2> b) {
 #ifdef __SSE3__
     return Lanes<2>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 3));
@@ -344,7 +346,7 @@ QX_INLINE Lanes<8> MinusPlus(Lanes<8> a, Lanes<8> b) {
     return Lanes<8>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 9, 2, 11, 4, 13, 6, 15));
 }
 
-// Pairs from N / 2 places, and back.
+// Loads pairs from N / 2 places, or stores them there.
 template <int N>
 QX_INLINE Lanes<N> LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
     const Lanes<2> a = Lanes<2>::load(from[0] + at);
@@ -362,7 +364,7 @@ QX_INLINE void StorePairs(Lanes<2> pairs, DBL *const *to, std::ptrdiff_t at) {
 QX_INLINE void StorePairs(Lanes<4> pairs, DBL *const *to, std::ptrdiff_t at) {
     Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 0, 1)).store(to[0] + at);
 #ifdef __AVX2__
-    // As a shuffle g++ makes it one across lanes and a store.
+    // Written as a shuffle, g++ compiles this to a shuffle across lanes and a store.
     Lanes<2>(__builtin_ia32_vextractf128_pd256(pairs.v, 1)).store(to[1] + at);
 #else
     Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 2, 3)).store(to[1] + at);
@@ -375,8 +377,8 @@ QX_INLINE void StorePairs(Lanes<8> pairs, DBL *const *to, std::ptrdiff_t at) {
 
 // ---- Other lanes ----
 
-// A square block of as many vectors as they have lanes: lane j of vector i and lane i of vector j
-// exchange places. By turns each half of the vectors, as often as N halves.
+// Transposes a square block of N vectors: lane j of vector i and lane i of vector j exchange
+// places. Interleaves the two halves of the vectors log2(N) times.
 template <int N>
 QX_INLINE void Transpose(Lanes<N> *block) {
     if constexpr (N == 4) { // within pairs, then pair by pair: a third of the instructions
@@ -400,13 +402,13 @@ QX_INLINE void Transpose(Lanes<N> *block) {
     }
 }
 
-// Makes the compiler read x once into a register, not once per use.
+// Makes the compiler load x into a register once, not once per use.
 template <int N>
 QX_INLINE void KeepInRegister(Lanes<N> &x) {
     asm("" : "+" QX_VECTOR_REGISTER(x.v));
 }
 
-// One value from each of N places.
+// Lane i is the value at the i-th of N places.
 template <int N>
 QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
     if constexpr (N == 2)
@@ -420,7 +422,7 @@ QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
                                                   from[6][at], from[7][at]});
 }
 
-// The sign bits of the lanes, that of lane 0 lowest.
+// The sign bits of the lanes, lane 0 in the lowest bit.
 QX_INLINE unsigned SignBits(Lanes<2> x) {
 #ifdef __SSE2__
     return static_cast<unsigned>(__builtin_ia32_movmskpd(x.v));
@@ -448,8 +450,9 @@ QX_INLINE unsigned SignBits(Lanes<8> x) {
 #endif
 }
 
-// The products of the lower halves of each 64 bits as unsigned integers. clang++ makes one
-// instruction of the plain text, g++ three multiplications; ARM has none for lanes of 64 bits.
+// The full products of the low 32 bits of each lane, as unsigned integers. clang++ compiles the
+// plain expression to one instruction, g++ to three multiplications; ARM has no multiplication for
+// 64-bit lanes.
 template <int N>
 QX_INLINE typename LaneInteger<N>::type LowerProducts(typename LaneInteger<N>::type a,
                                                       typename LaneInteger<N>::type b) {
@@ -479,7 +482,7 @@ QX_INLINE typename LaneInteger<N>::type LowerProducts(typename LaneInteger<N>::t
     return (a & 0xffffffff) * (b & 0xffffffff);
 }
 
-// N floats: the few operations that sums of products need. N is 1, 4, 8 or 16.
+// N floats, with the few operations that sums of products need. N is 1, 4, 8 or 16.
 template <int N>
 struct FloatLaneVector;
 template <>
@@ -548,7 +551,7 @@ public:
 
     float v;
 };
-// As many as a register of Lanes<nativeLanes> holds.
+// The number of floats in a register of Lanes<nativeLanes>.
 constexpr int nativeFloatLanes = 2 * nativeLanes;
 
 } // inline namespace

@@ -10,21 +10,21 @@
 
 namespace qx {
 
-// What an export keeps from call to call lies in a cell, whose address stands in a word of the
-// caller's or in the host's instance data. Before each cell stands its kind, so that a word with a
-// cell of another kind is refused and not followed. An address that is none of a cell cannot be
-// told from one.
+// What an export keeps from call to call is in a cell, whose address is in a word of the caller's
+// or in the host's instance data. The kind of the cell is stored before it, so that a word with the
+// address of another kind of cell is refused and not followed. An address that does not belong to a
+// cell cannot be recognised.
 //
-// The numbers are arbitrary, and neither small nor addresses.
+// The numbers are arbitrary; they are not small and not plausible addresses.
 enum class CellKind : uint64_t {
     Plan = 0xC31D9A5E40B7F261,              // a PlanCell that the host sweeps
     PlanOfInstance = 0xC31D9A5E40B7F262,    // a PlanCell in a TransformInstance
-    TransformInstance = 0xC31D9A5E40B7F263, // given back by TransformUnreserveProc
+    TransformInstance = 0xC31D9A5E40B7F263, // freed by TransformUnreserveProc
     Histogram = 0xC31D9A5E40B7F264,         // a MeasurementHistogram that the host sweeps
-    HistogramInstance = 0xC31D9A5E40B7F265, // one that MeasurementUnreserveProc gives back
+    HistogramInstance = 0xC31D9A5E40B7F265, // one that MeasurementUnreserveProc frees
 };
 
-// A cell with all bits of its contents 0, or null.
+// A cell with its contents set to zero bits, or null.
 template <class Contents>
 Contents *NewCell(CellKind kind) {
     static_assert(alignof(Contents) <= sizeof kind);
@@ -42,7 +42,7 @@ inline bool IsCell(const void *word, CellKind kind) {
     return static_cast<const CellKind *>(word)[-1] == kind;
 }
 
-// Makes a null word hold a new cell. ErrInternal where it holds one of another kind,
+// Gives a null word a new cell. Returns ErrInternal if the word holds a cell of another kind, or
 // ErrOutOfMemory.
 template <class Contents>
 ErrorCode ReserveCell(void **word, CellKind kind) {

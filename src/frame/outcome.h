@@ -9,19 +9,19 @@
 
 namespace qx {
 
-// What the body of an export came to: success, a code of the library, or the host's own status
-// where the host refused a resize. How it is told to the caller is the ending's business
-// (frame/export.h).
+// The result of an export's body: success, a code of the library, or the host's own status if the
+// host refused a resize. The ending decides how it is returned to the caller (frame/export.h).
 class [[nodiscard]] Outcome {
 public:
-    // 0, a failure or a warning. Implicit, so that a body may return what an inner routine gave.
+    // 0, a failure or a warning. Implicit, so that a body may return the result of an inner
+    // routine.
     Outcome(ErrorCode code = 0) : status_(code) {}
     static Outcome OfHost(int32_t hostStatus) {
         Outcome outcome(hostStatus);
         outcome.isHosts_ = hostStatus != 0;
         return outcome;
     }
-    // A failure that leaves its results: the outputs stay as they are.
+    // A failure that keeps its results: the outputs are left as they are.
     static Outcome WithResults(ErrorCode code) {
         Outcome outcome(code);
         outcome.keepsResults_ = true;
@@ -30,14 +30,14 @@ public:
 
     // Anything but plain success: `if (const Outcome bad = x.resize(n)) return bad;`
     explicit operator bool() const { return status_ != 0; }
-    // A failure of the library or a refusal of the host, after which the outputs are settled; a
-    // warning is none.
+    // A failure of the library or a refusal of the host, after which the outputs are settled. A
+    // warning is not a failure.
     bool failed() const { return isHosts_ || (status_ < 0 && !keepsResults_); }
     bool isHosts() const { return isHosts_; }
 
-    // The host's status as the library's code.
+    // The outcome as a code of the library.
     ErrorCode code() const { return isHosts_ ? ErrOutOfMemory : status_; }
-    // The host's status as it is.
+    // The code, or the host's status unchanged.
     int32_t raw() const { return status_; }
 
 private:

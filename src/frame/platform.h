@@ -6,10 +6,10 @@
 
 namespace qx::platform {
 
-// Everything that differs between the operating systems; one .cpp per platform and no other
-// file that includes a platform header.
+// Everything that differs between operating systems. There is one .cpp per platform, and no other
+// file includes a platform header.
 
-// A lock with a blocking wait, created unowned. A failure to create it is not reported.
+// A lock with a blocking wait, initially unlocked. A failure to create it is not reported.
 class Mutex {
 public:
     Mutex();
@@ -23,22 +23,22 @@ private:
     void *handle_;
 };
 
-// Never 0.
+// Never returns 0.
 uintptr_t CurrentThread();
 
 // Lets other threads run.
 void Yield();
 
-// Module look-up; nothing is ever loaded. A module is an opaque handle, null for none.
+// Module look-up; no module is ever loaded. A module is an opaque handle, null if there is no such
+// module.
 void *MainModule();
 void *LoadedModule(const char *name);
-// What the module itself exports under the name, or null.
+// The address that the module itself exports under the name, or null.
 void *ModuleSymbol(void *module, const char *name);
-// File names of the host's run-time, in the order in which they are looked for.
+// File names of the host's run-time, in search order.
 extern const char *const hostModuleNames[2];
 
-// Memory by the page, not from the heap: zeros, taken from the system as they are touched. Null
-// where there is none.
+// Zeroed pages from the system, not from the heap, committed as they are touched. Null on failure.
 void *MapPages(std::size_t bytes);
 void UnmapPages(void *pages, std::size_t bytes);
 

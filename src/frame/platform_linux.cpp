@@ -54,7 +54,7 @@ void *ModuleSymbol(void *module, const char *name) {
     void *address = dlsym(module, name);
     if (address == nullptr)
         return nullptr;
-    // dlsym also looks through what the module depends on; only the module itself counts.
+    // dlsym also searches the module's dependencies; only the module itself counts.
     Dl_info found;
     link_map *owner = nullptr;
     link_map *asked = nullptr;
@@ -67,7 +67,7 @@ void *ModuleSymbol(void *module, const char *name) {
 void FatalExit(const char *caption, const char *text) {
     const iovec pieces[] = {Piece(caption), Piece(": "), Piece(text), Piece("\n")};
     const ssize_t written = writev(STDERR_FILENO, pieces, 4);
-    static_cast<void>(written); // nobody is left to tell
+    static_cast<void>(written); // there is no one left to report a failure to
     _exit(1);
 }
 

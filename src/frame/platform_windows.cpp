@@ -2,7 +2,7 @@
 
 #define WIN32_LEAN_AND_MEAN
 #include <windows.h>
-#undef Yield // a macro that is left from 16-bit times
+#undef Yield // a macro left over from 16-bit Windows
 
 namespace qx::platform {
 

@@ -1,5 +1,5 @@
-// What lets the libraries run with a C library older than the one that they are linked with. Only in
-// builds that are given to others (cmake/QxPortable.cmake).
+// Lets the libraries run with a C library older than the one they are linked with. Only in builds
+// that are distributed (cmake/QxPortable.cmake).
 
 #include <dlfcn.h>
 #include <link.h>
@@ -7,8 +7,8 @@
 
 #include <cstdint>
 
-// The C library has these under one version since 2.34, and under an elder one before, in a library of
-// its own. The linker turns every call of NAME into one of __wrap_NAME.
+// Since 2.34 the C library has these under one version, and before that under an older version in a
+// library of its own. The linker redirects every call of NAME to __wrap_NAME.
 #if defined(__x86_64__)
 #define QX_ELDER(name) __asm__(".symver " #name "," #name "@GLIBC_2.2.5")
 #define QX_ELDER_3_3(name) __asm__(".symver " #name "," #name "@GLIBC_2.3.3")
@@ -45,7 +45,7 @@ int __wrap___pthread_key_create(pthread_key_t *key, void (*destructor)(void *)) 
     return __pthread_key_create(key, destructor);
 }
 
-// The C library says so since 2.32; that there may be other threads is always right.
+// The C library provides this since 2.32. To assume that there are other threads is always correct.
 extern char __libc_single_threaded;
 char __libc_single_threaded = 0;
 
@@ -84,8 +84,8 @@ int LookIn(dl_phdr_info *object, std::size_t, void *data) {
 
 } // namespace
 
-// By this the compiler's run-time library finds the object of an exception's caller. The C library has it
-// since 2.35; the libraries keep this one to themselves.
+// The compiler's run-time library uses this to find the object of an exception's caller. The C
+// library has it since 2.35; this copy is not exported.
 extern "C" int _dl_find_object(void *address, dl_find_object *result) noexcept {
     Search search = {reinterpret_cast<uintptr_t>(address), result};
     return dl_iterate_phdr(LookIn, &search) == 1 ? 0 : -1;

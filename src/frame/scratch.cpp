@@ -12,7 +12,7 @@ namespace {
 
 enum Mode : int32_t { TableHeap = 1, Workspace = 2, PlainHeap = 3 };
 
-// Directly before the pointer that the caller gets.
+// Stored directly before the pointer that the caller gets.
 struct FrontHeader {
     I32 totalSize; // of header and payload, as first requested
     I32 mode;      // where the block came from
@@ -26,8 +26,8 @@ struct HeapTable {
     void (*release)(void *);
 };
 
-// Empty until the process attach; static initialisers that run before it are served by the
-// plain heap, and what they took goes back there.
+// Empty until process attach. Static initialisers that run before it get blocks from the plain
+// heap, and these are returned there.
 HeapTable heapTable;
 std::atomic<int32_t> defaultMode = 0;
 
@@ -46,11 +46,11 @@ bool IsTooLarge(int32_t size) {
     return size < 0 || size > std::numeric_limits<int32_t>::max() - frontSize;
 }
 
-// A block from the mode's source, or null. A region that was given back since the mode was chosen
-// has the heap in its place.
+// A block from the mode's source, or null. If the region was given back after the mode was chosen,
+// the block comes from the heap.
 void *TakeFrom(Mode &mode, int32_t total) {
     if (mode == Workspace) {
-        // Exhaustion reaches the caller as a null pointer, like every other failure.
+        // The caller sees exhaustion as a null pointer, like every other failure.
         void *payload;
         if (analysisWorkspace.allocate(total, &payload) != ErrWorkspaceNotInitialized)
             return payload;
@@ -71,15 +71,15 @@ void GiveBackTo(int32_t mode, void *front) {
 
 FrontHeader *HeaderOf(void *block) { return static_cast<FrontHeader *>(block) - 1; }
 
-// Resizes within the block's own source; null if that failed. The region has then already lost
-// the old block.
+// Resizes within the block's own source; null on failure. The region has then already released the
+// old block.
 FrontHeader *ResizeInPlace(FrontHeader *front, int32_t mode, int32_t total) {
     if (mode == Workspace) {
         void *payload = front;
         analysisWorkspace.resize(&payload, total);
         return static_cast<FrontHeader *>(payload);
     }
-    // A smaller block stays as it is, so that the block is never smaller than totalSize says.
+    // A block that would shrink keeps its size, so that it is never smaller than totalSize.
     if (total <= front->totalSize)
         return front;
     const auto bytes = static_cast<std::size_t>(total);
@@ -125,7 +125,7 @@ ErrorCode ScratchFree(void *block) {
 
 namespace {
 
-// *isLost tells whether a failure has lost the block.
+// Sets *isLost to whether a failure has released the old block.
 ErrorCode Reallocate(void **block, int32_t size, bool *isLost) {
     *isLost = false;
     if (size == 0) {
@@ -148,7 +148,7 @@ ErrorCode Reallocate(void **block, int32_t size, bool *isLost) {
             *isLost = mode == Workspace;
             return ErrOutOfMemory;
         }
-        // kept: totalSize stays that of the first request, so a later move to another source
+        // kept: totalSize remains that of the first request, so a later move to another source
         // copies no more than that.
         *resized = old;
         *block = resized + 1;
@@ -158,7 +158,7 @@ ErrorCode Reallocate(void **block, int32_t size, bool *isLost) {
     void *moved;
     if (const ErrorCode status = ScratchAlloc(&moved, size))
         return status;
-    const int32_t oldTotal = old.totalSize; // a copy, since references forget the alignment
+    const int32_t oldTotal = old.totalSize; // a reference would drop the alignment attribute
     std::memcpy(moved, *block, static_cast<std::size_t>(std::min(oldTotal, total) - frontSize));
     GiveBackTo(old.mode, front);
     *block = moved;

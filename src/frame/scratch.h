@@ -12,9 +12,9 @@
 
 namespace qx {
 
-// The one front of all temporary memory. A request is served by the analysis workspace while
-// that is enabled, else by the heap; every block remembers its source, so it is given back
-// correctly whatever has changed since. Blocks may start at any byte and are not cleared.
+// The single front end of all temporary memory. A request is served by the analysis workspace while
+// that is enabled, otherwise by the heap. Every block records its source, so it is returned there
+// whatever has changed since. Blocks may start at any byte and are not cleared.
 
 // 0, or ErrOutOfMemory with *block null.
 ErrorCode ScratchAlloc(void **block, int32_t size);
@@ -23,32 +23,34 @@ ErrorCode ScratchAlloc(void **block, int32_t size, int32_t ignored);
 void *ScratchAllocPointer(int32_t size);
 // Always 0; null is allowed.
 ErrorCode ScratchFree(void *block);
-// 0, or ErrOutOfMemory. Size 0 frees and sets *block to null; a null *block allocates. A failure
-// leaves *block alone, and its memory too, unless that lies in the workspace: then it is lost.
+// 0, or ErrOutOfMemory. Size 0 frees and sets *block to null; a null *block allocates. After a
+// failure *block is unchanged and still valid, unless it lies in the workspace: then its memory has
+// been released.
 ErrorCode ScratchRealloc(void **block, int32_t size);
 ErrorCode ScratchRealloc(void **block, int32_t size, int32_t ignored);
 
-// The same where a failure frees the block in any case and sets *block to null.
+// The same, but any failure frees the block and sets *block to null.
 ErrorCode ScratchReallocOrFree(void **block, int32_t size);
 
-// At process attach: from here on the table of heap functions serves what the workspace does
-// not. Blocks taken earlier go back to where they came from.
+// Called at process attach: from here on the table of heap functions serves what the workspace does
+// not. Blocks allocated earlier are returned to where they came from.
 void AttachScratchHeap();
 
-// The rule for a clean-up status: a failure stands, a failing clean-up replaces success and
+// How the status of a clean-up is merged: a failure is kept, a failed clean-up replaces success and
 // warnings, a positive clean-up status replaces success only.
 inline ErrorCode Merge(ErrorCode status, ErrorCode cleanUp) {
     const bool replaces = status == 0 || (status > 0 && cleanUp < 0);
     return replaces ? cleanUp : status;
 }
 
-// The bytes of `count` elements of `size`, or -1 where no block of the host holds them.
+// The bytes of `count` elements of `size`, or -1 if no host block can hold them.
 inline int64_t BytesOf(int64_t count, std::size_t size) {
     const int64_t limit = std::numeric_limits<int32_t>::max() / static_cast<int64_t>(size);
     return count < 0 || count > limit ? -1 : count * static_cast<int64_t>(size);
 }
 
-// A scratch block of bytes that is given back with the scope, or by whom it is moved to.
+// A scratch block of bytes that is freed at the end of the scope, or by the object to which it is
+// moved.
 class ScratchBytes {
 public:
     ScratchBytes() = default;
@@ -63,7 +65,7 @@ public:
         return *this;
     }
 
-    // Takes `bytes`; a size that int32 cannot hold is a failure like any other.
+    // Takes `bytes`; a size that does not fit into int32 is a failure like any other.
     ErrorCode allocate(int64_t bytes) {
         release();
         if (bytes < 0 || bytes > std::numeric_limits<int32_t>::max())
@@ -71,7 +73,7 @@ public:
         return ScratchAlloc(&block_, static_cast<int32_t>(bytes));
     }
 
-    // Changes the size and keeps what fits; grows from nothing, too. A failure gives the block up.
+    // Changes the size and keeps what fits; an empty block is allocated. A failure frees the block.
     ErrorCode resize(int64_t bytes) {
         if (bytes < 0 || bytes > std::numeric_limits<int32_t>::max()) {
             release();
@@ -80,7 +82,7 @@ public:
         return ScratchReallocOrFree(&block_, static_cast<int32_t>(bytes));
     }
 
-    // Gives the block back early; the status is meant for Merge.
+    // Frees the block early; the status is meant for Merge.
     ErrorCode release() {
         void *block = block_;
         block_ = nullptr;
@@ -112,7 +114,7 @@ private:
     ScratchBytes block_;
 };
 
-// Several blocks at once, by one statement that says size and place together:
+// Takes several blocks with one statement that gives the size and the place of each:
 //     RealVector weights;
 //     ComplexMatrix factors;
 //     I32 *pivots;
@@ -121,9 +123,9 @@ private:
 //             memory.take(Sized(weights, n), Sized(factors, n, n), Sized(pivots, n)))
 //         return failed;
 // The parts live as long as `memory`, or until it takes others. They start at multiples of 8 bytes
-// from the start of a block, which may be any byte.
+// from the start of a block, which may start at any byte.
 
-// A view or a pointer that is to be given memory; bytes is below 0 where no size holds it.
+// A view or a pointer that is to receive memory; `bytes` is negative if no block can hold it.
 template <class Place>
 struct ScratchPart {
     Place place;
@@ -162,7 +164,7 @@ public:
             release();
     }
 
-    // ErrOutOfMemory, and then nothing is taken and no place is set.
+    // On ErrOutOfMemory nothing is taken and no place is set.
     template <class... Places>
     ErrorCode take(const ScratchPart<Places> &...parts) {
         if (last_ != nullptr)
@@ -179,14 +181,14 @@ public:
         return 0;
     }
 
-    // Gives all parts back early; the status is meant for Merge.
+    // Frees all parts early; the status is meant for Merge.
     ErrorCode release();
 
 private:
-    // Parts that fit into eight mebibytes share a block: of several large blocks a heap may give the
-    // last one's pages back at each release, and to be given them anew costs more than most routines
-    // do with them. Larger parts have a block each, so that they need no more memory in one piece
-    // than the largest of them.
+    // Parts that fit into eight mebibytes together share a block: a heap may return the pages of
+    // the last of several large blocks to the system at each release, and getting new pages costs
+    // more than most routines do with them. Larger parts have a block each, so that the largest
+    // contiguous block needed is that of the largest part.
     static constexpr int64_t sharedUpTo = int64_t{1} << 23;
     static int64_t wholeWords(int64_t bytes) { return (bytes + 7) / 8 * 8; }
     template <class... Places>
@@ -201,10 +203,10 @@ private:
         (parts.place(places[at++]), ...);
         return 0;
     }
-    // 0 or ErrOutOfMemory.
+    // Returns 0 or ErrOutOfMemory.
     ErrorCode takeBlock(int64_t bytes, void **block);
 
-    void *last_ = nullptr; // each block starts with the address of the one before
+    void *last_ = nullptr; // each block starts with the address of the previous one
 };
 
 } // namespace qx

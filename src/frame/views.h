@@ -11,15 +11,15 @@
 
 namespace qx {
 
-// Views of elements that somebody else owns. Inner routines take them in place of a pointer with
+// Views of elements that are owned elsewhere. Inner routines take them in place of a pointer with
 // its sizes: vectors by value, which are two words in registers, and matrices by reference, because
-// a copy on the stack takes longer than many a small matrix. They are keyed by the element's code
-// and not by its C++ type, because a template argument would drop the alignment that the types
-// carry.
+// a copy on the stack costs more than many operations on small matrices. They are keyed by the
+// element's code and not by its C++ type, because a template argument would drop the alignment
+// attribute of the element types.
 //
-// VectorView<E> and MatrixView<E> may be written through, ConstVectorView<E> and ConstMatrixView<E>
-// may not; the former become the latter by themselves. Inner routines that are templates of E are
-// called with it, Solve<E>(a, b, x), and defined for both element types by
+// VectorView<E> and MatrixView<E> are writable, ConstVectorView<E> and ConstMatrixView<E> are not;
+// the former convert implicitly to the latter. Inner routines that are templates of E are called as
+// Solve<E>(a, b, x) and defined for both element types by
 //     template ErrorCode Solve<ElementType::DBL>(...);
 //     template ErrorCode Solve<ElementType::CDB>(...);
 // in their source file.
@@ -52,8 +52,8 @@ public:
     bool isEmpty() const { return size_ == 0; }
     T &operator[](std::ptrdiff_t i) const { return data_[i]; }
 
-    // For loops over the elements. A class, for `auto` and template arguments would drop the
-    // alignment from a pointer.
+    // For loops over the elements. A class, because `auto` and template arguments would drop the
+    // alignment attribute of a pointer.
     struct Iterator {
         T *at;
         T &operator*() const { return *at; }
@@ -78,7 +78,7 @@ private:
 };
 
 namespace detail {
-// What all views of matrices hold.
+// The members that all views of matrices share.
 class MatrixPlace {
 public:
     MatrixPlace() = default;
@@ -91,7 +91,7 @@ public:
     std::ptrdiff_t stride() const { return stride_; }
     bool isEmpty() const { return rows_ == 0 || cols_ == 0; }
     bool isSquare() const { return rows_ == cols_; }
-    // Its elements follow one another without a gap.
+    // Whether the elements are contiguous.
     bool isWhole() const { return stride_ == cols_; }
     int64_t count() const { return int64_t{rows_} * cols_; }
 
@@ -104,8 +104,8 @@ private:
 };
 } // namespace detail
 
-// Row after row; `stride` elements from a row to the next one. A view that may be written through
-// is a constant one too, so that a function takes it by reference without a copy.
+// Row-major; `stride` elements lie between the starts of consecutive rows. A writable view is
+// derived from the constant one, so that a function takes it by reference without a copy.
 template <ElementType E, bool Writable>
 class BasicMatrixView
     : public std::conditional_t<Writable, BasicMatrixView<E, false>, detail::MatrixPlace> {
@@ -131,7 +131,7 @@ public:
         QX_EXPECTS(i >= 0 && j >= 0 && i + rows <= this->rows() && j + cols <= this->cols());
         return {row(i) + j, rows, cols, this->stride()};
     }
-    // All elements of a matrix that is whole.
+    // All elements of a contiguous matrix.
     BasicVectorView<E, Writable> elements() const {
         QX_EXPECTS(this->isWhole());
         return {data(), static_cast<std::ptrdiff_t>(this->count())};
@@ -147,7 +147,7 @@ using MatrixView = BasicMatrixView<E, true>;
 template <ElementType E>
 using ConstMatrixView = BasicMatrixView<E, false>;
 
-// All elements of one vector into another of the same size, with which it shares none.
+// Copies all elements of a vector to another of the same size that does not overlap it.
 template <ElementType E>
 void Copy(ConstVectorView<E> from, VectorView<E> to) {
     QX_EXPECTS(from.size() == to.size());

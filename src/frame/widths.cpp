@@ -10,7 +10,7 @@ int32_t lanesInUse = 2;
 #ifdef QX_HAS_AVX2_BUILD
 namespace {
 
-// The lanes that the environment allows.
+// The largest number of lanes that the environment allows.
 int32_t MostLanes() {
     const char *const width = std::getenv("QX_WIDTH");
     if (width != nullptr && (std::strcmp(width, "2") == 0 || std::strcmp(width, "4") == 0))
@@ -20,7 +20,7 @@ int32_t MostLanes() {
 
 } // namespace
 
-// Looks at the processor and at which registers the operating system saves.
+// Checks the processor and which registers the operating system saves.
 __attribute__((constructor(101))) static void ChooseWidth() {
     __builtin_cpu_init();
     const int32_t most = MostLanes();

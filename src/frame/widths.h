@@ -16,34 +16,35 @@
 //     }
 //     }
 //
-// QX_BY_WIDTH_TO_8 in the place of QX_BY_WIDTH, and WIDE_LANES in that of LANES, are for what gains by
-// eight lanes as well; the others run with four there.
+// QX_BY_WIDTH_TO_8 in place of QX_BY_WIDTH, and WIDE_LANES in place of LANES, are for routines that
+// gain from eight lanes; the others run with four lanes there.
 //
-// Everybody calls qx::AddArrays(...), which costs one well-predicted branch more than a plain
-// function. It is an object: it has no overloads, no default arguments and no address. Routines of
-// one width call each other directly, for they find the name in their own namespace first.
+// Callers write qx::AddArrays(...), which costs one well-predicted branch more than a plain
+// function. It is an object: it has no overloads, no default arguments and no function address.
+// Routines of one width call each other directly, because name look-up finds their own namespace
+// first.
 //
-// Whatever a LANES source needs from elsewhere is a function that is no template and not inline, or
-// stands in the namespace of the width, as Lanes does: an inline function that several widths share
-// could come out of the wider build, and the linker might give it to all.
+// Whatever a LANES source needs from elsewhere must be a function that is neither a template nor
+// inline, or be in the namespace of the width, as Lanes is: of an inline function that several
+// widths share, the linker might keep the one compiled for the wider width.
 
 #ifndef QX_WIDTH
 #define QX_WIDTH baseline
 #endif
 
-// Where there are routines of eight lanes (cmake/QxFamily.cmake asks the same). Not on Windows: g++
-// keeps 64-byte vectors on the stack with aligned stores and does not align the stack for them there
-// (its report 54412). Not on 32-bit processors, which have eight registers in place of 32.
+// Where there are routines of eight lanes (cmake/QxFamily.cmake has the same condition). Not on
+// Windows: g++ keeps 64-byte vectors on the stack with aligned stores but does not align the stack
+// for them there (GCC bug 54412). Not on 32-bit x86, which has eight registers in place of 32.
 #if defined(__x86_64__) && !defined(_WIN32)
 #define QX_HAS_EIGHT_LANES
 #endif
 
 namespace qx {
 
-// The lanes of the routines that are called, 2, 4 or 8: the most that processor and operating system
-// offer, and the build has. QX_WIDTH=2 or QX_WIDTH=4 in the environment forces a smaller one. It is
-// found when the module is loaded, ahead of static initialisers; whoever comes still earlier meets 2.
-// ARM has 2 alone.
+// The number of lanes of the routines that are called, 2, 4 or 8: the largest that the processor,
+// the operating system and the build support. QX_WIDTH=2 or QX_WIDTH=4 in the environment forces a
+// smaller one. It is set when the module is loaded, before static initialisers; code that runs even
+// earlier sees 2. On ARM it is always 2.
 extern int32_t lanesInUse;
 
 #if defined(__x86_64__) || defined(__i386__)

@@ -16,11 +16,11 @@ constinit AnalysisWorkspace analysisWorkspace;
 
 namespace {
 
-// What stands before a payload. Blocks start at any byte, so no word here can be an atomic one:
-// a locked access that crosses a cache line costs a hundred times as much as one that does not,
-// and kernels throttle it. Only the byte is atomic: that of a block in a unit holds the number of
-// its chunk, that of a block in the stack whether the left neighbour has been released. The
-// neighbour writes runStart and then sets the byte; who finds it set may read runStart.
+// The header before a payload. Blocks start at any byte, so no word here can be atomic: a locked
+// access that crosses a cache line costs a hundred times as much as one that does not, and kernels
+// throttle it. Only the byte is atomic. In a block of units it holds the number of the chunk; in a
+// block of the stack it says whether the left neighbour has been released. The neighbour writes
+// runStart and then sets the byte; a thread that finds it set may read runStart.
 struct __attribute__((packed)) BlockHeader {
     unsigned char mark;
     uint32_t runStart; // start of the run of released blocks that ends at this block
@@ -30,14 +30,14 @@ static_assert(sizeof(BlockHeader) == AnalysisWorkspace::blockOverhead);
 
 constexpr unsigned char inStack = 0;
 constexpr unsigned char leftIsReleased = 1;
-constexpr unsigned char inChunk = 2; // and above: 2 more than the chunk's number
+constexpr unsigned char inChunk = 2; // and above: the chunk's number plus 2
 
 std::atomic_ref<unsigned char> Mark(BlockHeader *header) {
     return std::atomic_ref<unsigned char>(header->mark);
 }
 
-// The reservation is longer than the region by one header, since the last block, too, leaves
-// word at its end. Below a lowered ceiling the same room is kept.
+// The reservation is longer than the region by one header, because the last block also writes a
+// header at its end. The same room is kept below a lowered ceiling.
 constexpr uint64_t reservationOverhead = sizeof(BlockHeader);
 
 BlockHeader *HeaderAt(unsigned char *base, uint32_t offset) {
@@ -54,7 +54,7 @@ constexpr uint64_t MaskOf(uint32_t first, uint32_t count) {
     return (count < 64 ? (uint64_t{1} << count) - 1 : ~uint64_t{0}) << first;
 }
 
-// The highest run of so many zero bits, or false.
+// Finds the highest run of `count` zero bits; false if there is none.
 bool FindRun(uint64_t used, uint32_t count, uint32_t *first) {
     uint64_t starts = ~used;
     for (uint32_t have = 1; have < count && starts != 0;) {
@@ -79,10 +79,10 @@ int32_t AnalysisWorkspace::liveBlocks() const {
     const State now = unpack(state_.load(std::memory_order_acquire));
     if (now.live == noRegion)
         return -1;
-    // Blocks in units are not counted; a chunk is at least one.
+    // Blocks in units are not counted individually; a chunk counts as one.
     uint32_t all = now.live;
     for (const Chunk &chunk : chunks_)
-        all += chunk.usedCells.load(std::memory_order_acquire) != 0;
+        all += (chunk.usedCells.load(std::memory_order_acquire) & ~isCut) != 0;
     return static_cast<int32_t>(all);
 }
 
@@ -96,7 +96,9 @@ ErrorCode AnalysisWorkspace::allocate(int64_t size, void **payload) {
     const uint64_t total = static_cast<uint64_t>(size) + blockOverhead;
     const uintptr_t thread = platform::CurrentThread();
     noteThread(thread);
-    // Room that another thread was moving while this one looked is looked for again, a few times.
+    if (servesMany_.load(std::memory_order_relaxed) && allocateInOwnCells(total, thread, payload))
+        return 0;
+    // Room that another thread was moving during the search is searched for again, a few times.
     for (int look = 0; look < 8; ++look) {
         const uint64_t seen = state_.load(std::memory_order_acquire);
         const uint64_t seenUnits = usedUnits_.load(std::memory_order_acquire);
@@ -122,7 +124,8 @@ void AnalysisWorkspace::noteThread(uintptr_t thread) {
 
 bool AnalysisWorkspace::tryAllocate(State now, uint64_t total, uintptr_t thread, void **payload) {
     const bool isOurs = now.live == 0 || stackOwner_.load(std::memory_order_relaxed) == thread;
-    // Among many a stack that has grown long is left to run empty.
+    // With several threads, a long stack gets new blocks only if the units are full, so that it can
+    // run empty.
     const bool isLong = servesMany_.load(std::memory_order_relaxed) &&
                         now.bump > limit_.load(std::memory_order_relaxed) / 4;
     const bool stackFirst = isOurs && !isLong;
@@ -150,23 +153,27 @@ void AnalysisWorkspace::release(void *payload) {
     const uint32_t index = mark - inChunk;
     const uint32_t unit = limit_.load(std::memory_order_relaxed) / units;
     const uint32_t cell = unit / units;
-    uint64_t cells = ~uint64_t{0};
-    if (cell > 0 && header->end - block <= unit)
-        cells = MaskOf((block - index * unit) / cell, (header->end - block) / cell);
-    releaseCells(index, cells);
+    if (cell == 0 || header->end - block > cellsGiven * cell) {
+        // Its count may be another's once the chunk has ended.
+        const uint32_t count = chunks_[index].count.load(std::memory_order_relaxed);
+        chunks_[index].usedCells.store(0, std::memory_order_release);
+        releaseUnits(index, count);
+    } else {
+        releaseCells(index, MaskOf((block - index * unit) / cell, (header->end - block) / cell));
+    }
 }
 
-// The stack.
+// ---- The stack ----
 
-// Whether a block may end there. The limit is read anew at each call: before a compare-exchange it
-// may be that of a region which has gone, and after one the block holds the region.
+// Whether a block may end at `end`. The limit is read anew at each call: before a compare-exchange
+// it may be that of a region that no longer exists; after one, the block keeps the region alive.
 bool AnalysisWorkspace::fitsStack(uint64_t end, uint32_t ceiling) const {
     const uint32_t limit = limit_.load(std::memory_order_relaxed);
     return ceiling == units ? end < limit
                             : end + blockOverhead <= uint64_t{ceiling} * (limit / units);
 }
 
-// Puts a block onto the stack; `before` tells what the stack was.
+// Pushes a block onto the stack; *before is set to the previous state.
 bool AnalysisWorkspace::push(uint64_t total, State *before) {
     uint64_t seen = state_.load(std::memory_order_acquire);
     State next;
@@ -181,7 +188,7 @@ bool AnalysisWorkspace::push(uint64_t total, State *before) {
                                            std::memory_order_acquire));
     if (fitsStack(next.bump, next.ceiling))
         return true;
-    // The region was replaced by a smaller one between the two looks.
+    // The region was replaced by a smaller one between the two checks.
     takeBack(before->bump, next.bump);
     return false;
 }
@@ -199,7 +206,7 @@ bool AnalysisWorkspace::allocateInStack(uint64_t total, uintptr_t thread, void *
 
 namespace {
 
-// The stack with one live block less, fallen back to `bump`; without one it is idle.
+// The state with one live block less and the top at `bump`; with no live block the stack is idle.
 template <class State>
 State WithoutOne(State now, uint32_t bump) {
     if (now.live == 1)
@@ -209,8 +216,8 @@ State WithoutOne(State now, uint32_t bump) {
 
 } // namespace
 
-// Undoes a push that nothing was written for. Who pushed behind it from the same old look is
-// about to do the same.
+// Undoes a push before anything was written. A thread that pushed above it after the same outdated
+// check is about to do the same.
 void AnalysisWorkspace::takeBack(uint32_t start, uint32_t end) {
     uint64_t seen = state_.load(std::memory_order_acquire);
     do {
@@ -238,13 +245,13 @@ void AnalysisWorkspace::releaseInStack(unsigned char *base, uint32_t block) {
             if (now.bump == end) {
                 bump = runStart();
             } else {
-                // Nobody can go below `end` before this block has left the count, so the next
-                // block, there or to come, starts at `end`.
+                // `bump` cannot fall below `end` before this block has left the count, so the next
+                // block, present or future, starts at `end`.
                 BlockHeader *right = HeaderAt(base, end);
                 right->runStart = runStart();
                 Mark(right).store(leftIsReleased, std::memory_order_release);
-                // From here on the right neighbour may give these bytes back, and they may
-                // belong to another block: this one may only leave the count.
+                // From here on the right neighbour may release these bytes, and they may belong to
+                // another block, so this block may only leave the count.
                 leftWord = true;
             }
         }
@@ -253,8 +260,8 @@ void AnalysisWorkspace::releaseInStack(unsigned char *base, uint32_t block) {
                                            std::memory_order_acquire));
 }
 
-// A request that does not fit leaves the region full until the last live block goes. So it is for
-// one thread; among many room comes back sooner.
+// With one thread, a request that does not fit leaves the region full until the last live block is
+// released. With several threads there is no such mark, because room becomes free sooner.
 void AnalysisWorkspace::markFull(uint64_t total) {
     uint64_t seen = state_.load(std::memory_order_acquire);
     State now;
@@ -268,7 +275,37 @@ void AnalysisWorkspace::markFull(uint64_t total) {
                                            std::memory_order_acquire));
 }
 
-// Units and cells.
+// ---- Units and cells ----
+
+// The chunk from which threads with this hash last took cells.
+std::atomic<uint8_t> &AnalysisWorkspace::latestOf(uintptr_t thread) {
+    return latestChunk_[(thread >> 6 ^ thread >> 12 ^ thread >> 18) % units];
+}
+
+// Takes cells of the unit from which the thread took cells before.
+bool AnalysisWorkspace::allocateInOwnCells(uint64_t total, uintptr_t thread, void **payload) {
+    const uint32_t limit = limit_.load(std::memory_order_relaxed);
+    const uint32_t cell = limit / units / units;
+    if (total > uint64_t{cell} * cellsGiven)
+        return false;
+    const uint32_t index = latestOf(thread).load(std::memory_order_relaxed);
+    const uint32_t count = total <= cell ? 1 : static_cast<uint32_t>((total + cell - 1) / cell);
+    uint32_t first;
+    return takeCells(index, count, &first) && placeCells(limit, index, first, count, payload);
+}
+
+// From here on the cells taken keep the region alive; it may be another one than that with the limit.
+bool AnalysisWorkspace::placeCells(uint32_t limit, uint32_t index, uint32_t first, uint32_t count,
+                                   void **payload) {
+    if (limit_.load(std::memory_order_relaxed) != limit) {
+        releaseCells(index, MaskOf(first, count));
+        return false;
+    }
+    const uint32_t unit = limit / units, cell = unit / units;
+    const uint32_t start = index * unit + first * cell;
+    *payload = place(index + inChunk, start, start + count * cell);
+    return true;
+}
 
 bool AnalysisWorkspace::allocateInUnits(uint64_t total, uintptr_t thread, void **payload) {
     const uint32_t limit = limit_.load(std::memory_order_relaxed);
@@ -276,38 +313,54 @@ bool AnalysisWorkspace::allocateInUnits(uint64_t total, uintptr_t thread, void *
     const uint32_t cell = unit / units;
     if (unit == 0 || total > uint64_t{unit} * units)
         return false;
-    const bool isSmall = cell > 0 && total <= uint64_t{cell} * units;
-    const auto cells = static_cast<uint32_t>(isSmall ? (total + cell - 1) / cell : units);
-    std::atomic<uint8_t> &latest =
-        latestChunk_[(thread >> 6 ^ thread >> 12 ^ thread >> 18) % units];
-
-    uint32_t index = latest.load(std::memory_order_relaxed);
-    uint32_t first = 0;
-    bool found = isSmall && takeCells(index, cells, &first);
-    for (uint32_t i = units; isSmall && !found && i-- > 0;)
-        if ((found = takeCells(i, cells, &first)))
-            index = i;
-    if (!found) {
-        const auto count = static_cast<uint32_t>(isSmall ? 1 : (total + unit - 1) / unit);
+    uint32_t index;
+    if (total > uint64_t{cell} * cellsGiven) {
+        const auto count = static_cast<uint32_t>((total + unit - 1) / unit);
         if (!takeUnits(count, unit, &index))
             return false;
         chunks_[index].count.store(count, std::memory_order_relaxed);
-        first = isSmall ? units - cells : 0;
-        chunks_[index].usedCells.store(MaskOf(first, cells), std::memory_order_release);
+        chunks_[index].usedCells.store(~uint64_t{0}, std::memory_order_release);
+        if (limit_.load(std::memory_order_relaxed) != limit) {
+            chunks_[index].usedCells.store(0, std::memory_order_release);
+            releaseUnits(index, count);
+            return false;
+        }
+        const uint32_t start = index * unit;
+        *payload = place(index + inChunk, start, static_cast<uint32_t>(start + total));
+        return true;
     }
-    // The cells hold the region from here on; it may be another one than at the start.
-    if (limit_.load(std::memory_order_relaxed) != limit) {
-        releaseCells(index, MaskOf(first, cells));
+    const auto count = static_cast<uint32_t>((total + cell - 1) / cell);
+    uint32_t first;
+    if (!cutUnit(count, unit, false, &index, &first) && !shareUnit(count, &index, &first) &&
+        !cutUnit(count, unit, true, &index, &first))
         return false;
-    }
-    latest.store(static_cast<uint8_t>(index), std::memory_order_relaxed);
-    const uint32_t start = index * unit + first * cell;
-    const uint32_t size = isSmall ? cells * cell : static_cast<uint32_t>(total);
-    *payload = place(index + inChunk, start, start + size);
+    latestOf(thread).store(static_cast<uint8_t>(index), std::memory_order_relaxed);
+    return placeCells(limit, index, first, count, payload);
+}
+
+// Cuts a unit that no thread uses. While many are free, threads do not share units, so that they do
+// not wait for each other.
+bool AnalysisWorkspace::cutUnit(uint32_t count, uint32_t unit, bool isNeeded, uint32_t *index,
+                                uint32_t *first) {
+    const bool areMany = unpack(state_.load(std::memory_order_relaxed)).ceiling > units / 2;
+    if (!(isNeeded ? takeUnits(1, unit, index) : areMany && takeFreeUnits(1, unit, index)))
+        return false;
+    *first = cellsGiven - count;
+    chunks_[*index].usedCells.store(isCut | MaskOf(*first, count), std::memory_order_release);
     return true;
 }
 
-// So many cells side by side of a chunk that has used ones.
+// Takes cells of any unit that has been cut.
+bool AnalysisWorkspace::shareUnit(uint32_t count, uint32_t *index, uint32_t *first) {
+    for (uint32_t i = units; i-- > 0;)
+        if (takeCells(i, count, first)) {
+            *index = i;
+            return true;
+        }
+    return false;
+}
+
+// Takes `count` adjacent cells of a unit that has been cut.
 bool AnalysisWorkspace::takeCells(uint32_t index, uint32_t count, uint32_t *first) {
     std::atomic<uint64_t> &word = chunks_[index].usedCells;
     uint64_t used = word.load(std::memory_order_acquire);
@@ -320,14 +373,31 @@ bool AnalysisWorkspace::takeCells(uint32_t index, uint32_t count, uint32_t *firs
 }
 
 void AnalysisWorkspace::releaseCells(uint32_t index, uint64_t cells) {
-    // The chunk ends with its last cell, after which its count may be another's.
-    const uint32_t count = chunks_[index].count.load(std::memory_order_relaxed);
-    if (chunks_[index].usedCells.fetch_and(~cells, std::memory_order_acq_rel) == cells)
-        releaseUnits(index, count);
+    chunks_[index].usedCells.fetch_and(~cells, std::memory_order_acq_rel);
 }
 
-// So many units side by side: free ones, or from the end of the stack's.
+// Whether a unit was cut and all its cells were free: then the caller now holds it.
+bool AnalysisWorkspace::makeWhole(uint32_t index) {
+    uint64_t onlyCut = isCut;
+    return chunks_[index].usedCells.compare_exchange_strong(onlyCut, 0, std::memory_order_acq_rel,
+                                                            std::memory_order_relaxed);
+}
+
+// Takes `count` adjacent units, if necessary after making those whole that have been cut.
 bool AnalysisWorkspace::takeUnits(uint32_t count, uint32_t unit, uint32_t *first) {
+    if (takeFreeUnits(count, unit, first))
+        return true;
+    bool areMore = false;
+    for (uint32_t i = 0; i < units; ++i)
+        if (makeWhole(i)) {
+            releaseUnits(i, 1);
+            areMore = true;
+        }
+    return areMore && takeFreeUnits(count, unit, first);
+}
+
+// Takes `count` adjacent units: free ones, or those at the end of the stack.
+bool AnalysisWorkspace::takeFreeUnits(uint32_t count, uint32_t unit, uint32_t *first) {
     uint64_t used = usedUnits_.load(std::memory_order_acquire);
     while (FindRun(used, count, first))
         if (usedUnits_.compare_exchange_weak(used, used | MaskOf(*first, count),
@@ -356,14 +426,14 @@ void AnalysisWorkspace::releaseUnits(uint32_t first, uint32_t count) {
     usedUnits_.fetch_and(~MaskOf(first, count), std::memory_order_acq_rel);
 }
 
-// Gives the stack the unit at its end if that is free. One at a time: what a thread holds on the
-// way nobody else can have.
+// Gives the stack the unit at its end if that is free, or cut and unused. One unit at a time, because
+// no other thread can take the units held meanwhile.
 bool AnalysisWorkspace::raiseCeiling() {
     const uint32_t from = unpack(state_.load(std::memory_order_acquire)).ceiling;
     if (from == units)
         return false;
     const uint64_t unit = MaskOf(from, 1);
-    if ((usedUnits_.fetch_or(unit, std::memory_order_acq_rel) & unit) != 0)
+    if ((usedUnits_.fetch_or(unit, std::memory_order_acq_rel) & unit) != 0 && !makeWhole(from))
         return false;
     uint64_t seen = state_.load(std::memory_order_acquire);
     State next;
@@ -401,8 +471,8 @@ ErrorCode AnalysisWorkspace::resize(void **payload, int64_t size) {
     return status;
 }
 
-// The four operations change the region one at a time: who finds the phase Ready, or None, and
-// makes it Changing has the region to himself, but for the requests.
+// The four operations change the region one at a time: the thread that changes the phase from
+// Ready, or None, to Changing has exclusive access, except for requests.
 
 ErrorCode AnalysisWorkspace::reserve(uint32_t size) {
     Phase found = Phase::None;
@@ -440,7 +510,7 @@ ErrorCode AnalysisWorkspace::giveBack() {
     else if (enabled_.load())
         status = ErrWorkspaceStillEnabled;
     else if (!state_.compare_exchange_strong(expected, pack(absent)))
-        status = ErrWorkspaceStillInUse; // units or a block are on their way
+        status = ErrWorkspaceStillInUse; // a new block, or a unit that is still in use
     if (status != 0) {
         phase_.store(Phase::Ready);
         return status;
@@ -469,7 +539,8 @@ ErrorCode AnalysisWorkspace::setEnabled(bool enable) {
     if (settledPhase() == Phase::None)
         return ErrWorkspaceNotInitialized;
     enabled_.store(enable);
-    // A give-back that has begun either saw the flag and leaves the region, or ends it.
+    // A give-back that has begun has either seen the flag and leaves the region, or ends the
+    // region.
     if (settledPhase() == Phase::Ready)
         return 0;
     enabled_.store(false);

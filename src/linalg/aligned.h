@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// A part of scratch memory at a multiple of 64 bytes, for LAPACK: its compiled code may count on
-// the alignment of its elements, which scratch memory does not promise.
+// A part of scratch memory that begins at a multiple of 64 bytes, for LAPACK: its compiled code may
+// rely on the alignment of its elements, which scratch memory does not guarantee.
 //     memory.take(Aligned(Sized(band, rows, n)), Aligned(Sized(pivots, n)))
 template <class Place>
 auto Aligned(const ScratchPart<Place> &part) {

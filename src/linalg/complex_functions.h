@@ -27,8 +27,8 @@ inline CDB SquareRoot(CDB z) {
 inline CDB Logarithm(CDB z) {
     return {std::log(z.re * z.re + z.im * z.im) * 0.5, std::atan2(z.im, z.re)};
 }
-// The same for every finite z other than 0, and with few roundings where z is close to 1; of a
-// number on the negative axis with +i pi.
+// The same for every finite z other than 0, with few rounding errors where z is close to 1; the
+// imaginary part is +pi on the negative axis.
 inline double PrincipalLogarithm(double x) { return std::log(x); }
 inline CDB PrincipalLogarithm(CDB z) {
     const double larger = std::fmax(std::fabs(z.re), std::fabs(z.im));
@@ -44,7 +44,8 @@ inline CDB Exponential(CDB z) {
     const double modulus = std::exp(z.re);
     return {modulus * std::cos(z.im), modulus * std::sin(z.im)};
 }
-// exp(z) - 1, sinh(z) and, for a modulus below 1, artanh(z), with few roundings where z is small.
+// exp(z) - 1, sinh(z) and, for a modulus below 1, artanh(z), with few rounding errors where z is
+// small.
 inline double ExpMinusOne(double x) { return std::expm1(x); }
 inline CDB ExpMinusOne(CDB z) {
     const double growth = std::expm1(z.re), sine = std::sin(0.5 * z.im);

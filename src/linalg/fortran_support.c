@@ -1,5 +1,5 @@
-/* What compiled Fortran asks of its run-time and of the mathematics library. So the module needs
-   no Fortran run-time, and takes no mathematics from the process. */
+/* The functions that compiled Fortran requires of its run-time and of the mathematics library, so
+   that the module needs no Fortran run-time and takes no mathematics from the process. */
 
 #include <math.h>
 #include <stddef.h>
@@ -18,7 +18,7 @@ void _gfortran_concat_string(size_t length, char *result, size_t firstLength, co
 
 double cabs(double _Complex z) { return hypot(__real__ z, __imag__ z); }
 
-/* The principal root: the part that does not cancel first, the other from their product. */
+/* The principal root: first the part without cancellation, then the other from their product. */
 double _Complex csqrt(double _Complex z) {
     const double re = __real__ z, im = __imag__ z;
     double _Complex root = 0.0;
@@ -31,14 +31,14 @@ double _Complex csqrt(double _Complex z) {
     return root;
 }
 
-/* Halves away from zero. lroundf may not call lround: the compiler knows that lround of a float is
-   lroundf, and would make it call itself for ever. */
+/* Rounds halves away from zero. lroundf must not call lround: the compiler knows that lround of a
+   float is lroundf, and would make lroundf call itself for ever. */
 static long Nearest(double x) { return (long)(x < 0.0 ? ceil(x - 0.5) : floor(x + 0.5)); }
 long lround(double x) { return Nearest(x); }
 long lroundf(float x) { return Nearest((double)x); }
 float logf(float x) { return (float)log((double)x); }
 
-/* x^n. The one of the compiler's run-time would come from the process. */
+/* x^n. The function of the compiler's run-time would come from the process. */
 double __powidf2(double x, int n) {
     unsigned left = n < 0 ? 0u - (unsigned)n : (unsigned)n;
     double power = left % 2 != 0 ? x : 1.0;
@@ -50,8 +50,8 @@ double __powidf2(double x, int n) {
     return n < 0 ? 1.0 / power : power;
 }
 
-/* BLAS and LAPACK report a bad argument here, which none of our calls has. The process is the
-   host's: nothing is printed, and nobody is stopped. */
+/* BLAS and LAPACK report a bad argument here, which none of our calls has. The process belongs to
+   the host: nothing is printed, and the process is not stopped. */
 void xerbla_(const char *name, const int *argument, size_t nameLength) {
     (void)name;
     (void)argument;

@@ -9,8 +9,8 @@
 
 namespace qx {
 
-// The inner loops of the factorisations, on row-major blocks whose rows stand `stride` elements
-// apart. Every element has one order of arithmetic, whatever the width.
+// The inner loops of the factorisations, on row-major blocks whose rows are `stride` elements
+// apart. The order of arithmetic of each element is the same at every width.
 
 // y[j] += sum over i of x[i] a[i][j], i ascending.
 QX_BY_WIDTH_TO_8(void, AddTransposedProductReal,
@@ -28,13 +28,27 @@ QX_BY_WIDTH_TO_8(void, AddOuterProductComplex,
                  (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
                   const CDB *y))
 
-// a[i][j] -= x[i] y[j], x being a column of a's matrix, whose elements stand `stride` apart, too.
+// a[i][j] -= x[i] y[j], where x is a column of the matrix of a, so its elements are also `stride`
+// apart.
 QX_BY_WIDTH_TO_8(void, SubtractOuterProductComplex,
                  (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
                   const CDB *y))
 
-// y[i] = sum over j of a[i][j] x[j]. Real sums run in eight partial sums, element j in sum j mod
-// 8, which are then added pairwise, and the last (cols mod 8) terms follow; complex ones in two.
+// row[j] -= conj(x) above[j] for `terms` rows above each other, one by one, x being the first element
+// of each. The second row stands `step` elements behind the first, each further one `change` less
+// behind the one before.
+QX_BY_WIDTH_TO_8(void, SubtractRowsAboveReal,
+                 (DBL * row, int32_t cols, const DBL *above, std::ptrdiff_t step,
+                  std::ptrdiff_t change, int32_t terms))
+QX_BY_WIDTH_TO_8(void, SubtractRowsAboveComplex,
+                 (CDB * row, int32_t cols, const CDB *above, std::ptrdiff_t step,
+                  std::ptrdiff_t change, int32_t terms))
+
+// row[j] /= divisor. Returns the largest |row[j]| of the quotients, or 0; NaN does not count.
+QX_BY_WIDTH_TO_8(double, DivideRow, (DBL * row, int32_t cols, double divisor))
+
+// y[i] = sum over j of a[i][j] x[j]. Real rows use eight partial sums, element j in sum j mod 8,
+// which are then added pairwise; the last (cols mod 8) terms follow. Complex rows use two.
 QX_BY_WIDTH_TO_8(void, RowProductsReal,
                  (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
                   DBL *y))
@@ -47,7 +61,7 @@ struct Rotation {
     int32_t p, q;
     double c, s;
 };
-// The rotations one after the other, on rows of `width` doubles.
+// Applies the rotations one after the other, on rows of `width` doubles.
 QX_BY_WIDTH_TO_8(void, RotateRows,
                  (DBL * a, std::ptrdiff_t stride, int32_t width, const Rotation *rotations,
                   int32_t count))
@@ -55,21 +69,22 @@ QX_BY_WIDTH_TO_8(void, RotateRows,
 // Rows p and q become c p + s q and c q - conj(s) p.
 QX_BY_WIDTH_TO_8(void, RotateComplexRows, (CDB * p, CDB *q, int32_t width, double c, CDB s))
 
-// Rows first, first + 1 and, where size is 3, first + 2 each lose w[i] p, where p = u[0] row0 +
-// u[1] row1 + u[2] row2.
+// Subtracts w[i] p from each of rows first, first + 1 and, if size is 3, first + 2, where p = u[0]
+// row0 + u[1] row1 + u[2] row2.
 struct SmallReflection {
     int32_t first, size;
     double u[3], w[3];
 };
-// The reflections one after the other, on rows of `width` doubles.
+// Applies the reflections one after the other, on rows of `width` doubles.
 QX_BY_WIDTH_TO_8(void, ReflectRows,
                  (DBL * a, std::ptrdiff_t stride, int32_t width, const SmallReflection *reflections,
                   int32_t count))
-// The same on columns, of the first `rows` rows.
+// Applies one reflection to columns, in the first `rows` rows.
 QX_BY_WIDTH_TO_8(void, ReflectColumns,
                  (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
 
-// The first three for either element. x and y have as many elements as a has rows or columns.
+// The first three kernels for either element. x and y have as many elements as a has rows or
+// columns.
 template <ElementType E>
 void AddTransposedProduct(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y) {
     QX_EXPECTS(x.size() == a.rows() && y.size() == a.cols());

@@ -1,16 +1,16 @@
 #include "linalg/kernels.h"
 
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 namespace qx::QX_WIDTH {
 
-// (-x, x) by turns.
+// (-x, x) repeated.
 template <class L>
 static QX_INLINE L NegativeFirst(double x) {
     return NegatedInPairs(L(x), true);
 }
 
-// y += the sum of x[i] a[i], rows after each other, for as many elements as a vector has.
+// y += the sum of x[i] a[i], row by row, for one vector of elements.
 template <class L, int Rows>
 static QX_INLINE void AddSomeOfRows(const DBL *a, std::ptrdiff_t stride, const DBL *x, DBL *y) {
     L sum = L::load(y);
@@ -39,7 +39,7 @@ void AddTransposedProductReal(const DBL *a, std::ptrdiff_t stride, int32_t rows,
         AddRows<1>(a + i * stride, stride, cols, x + i, y);
 }
 
-// y += the sum of x[i] a[i], rows after each other, for as many elements as a vector has.
+// y += the sum of x[i] a[i], row by row, for one vector of elements.
 template <class L, int Rows>
 static QX_INLINE void AddComplexRows(const DBL *a, std::ptrdiff_t stride, const CDB *x, DBL *y) {
     L sum = L::load(y);
@@ -105,7 +105,102 @@ void SubtractOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, in
     }
 }
 
-// The products of some rows with x at once.
+// Subtracts multiples of the rows above from some vectors of a row.
+struct RowsAbove {
+    const DBL *first;
+    std::ptrdiff_t step, change;
+    int32_t terms;
+
+    template <class L, int Vectors>
+    QX_INLINE void subtractReal(DBL *row, std::ptrdiff_t at) const {
+        L sum[Vectors];
+        for (int v = 0; v < Vectors; ++v)
+            sum[v] = L::load(row + at + v * L::count);
+        const DBL *above = first;
+        std::ptrdiff_t next = step;
+        for (int32_t i = 0; i < terms; ++i, above += next, next -= change) {
+            const L factor(*above);
+            for (int v = 0; v < Vectors; ++v)
+                sum[v] = sum[v] - factor * L::load(above + at + v * L::count);
+        }
+        for (int v = 0; v < Vectors; ++v)
+            sum[v].store(row + at + v * L::count);
+    }
+    template <class L, int Vectors>
+    QX_INLINE void subtractComplex(DBL *row, std::ptrdiff_t at) const {
+        L sum[Vectors];
+        for (int v = 0; v < Vectors; ++v)
+            sum[v] = L::load(row + at + v * L::count);
+        const DBL *above = first;
+        std::ptrdiff_t next = step;
+        for (int32_t i = 0; i < terms; ++i, above += next, next -= change) {
+            const L re(-above[0]), im = NegativeFirst<L>(above[1]);
+            for (int v = 0; v < Vectors; ++v) {
+                const L x = L::load(above + at + v * L::count);
+                sum[v] = sum[v] + (re * x + im * Swapped(x));
+            }
+        }
+        for (int v = 0; v < Vectors; ++v)
+            sum[v].store(row + at + v * L::count);
+    }
+};
+
+void SubtractRowsAboveReal(DBL *row, int32_t cols, const DBL *above, std::ptrdiff_t step,
+                           std::ptrdiff_t change, int32_t terms) {
+    typedef Lanes<nativeLanes> L;
+    const RowsAbove rows = {above, step, change, terms};
+    int32_t j = 0;
+    for (; j + 4 * nativeLanes <= cols; j += 4 * nativeLanes)
+        rows.subtractReal<L, 4>(row, j);
+    for (; j + nativeLanes <= cols; j += nativeLanes)
+        rows.subtractReal<L, 1>(row, j);
+    if constexpr (nativeLanes > 4)
+        for (; j + 4 <= cols; j += 4)
+            rows.subtractReal<Lanes<4>, 1>(row, j);
+    for (; j + 2 <= cols; j += 2)
+        rows.subtractReal<Lanes<2>, 1>(row, j);
+    if (j < cols)
+        rows.subtractReal<Lanes<1>, 1>(row, j);
+}
+
+void SubtractRowsAboveComplex(CDB *row, int32_t cols, const CDB *above, std::ptrdiff_t step,
+                              std::ptrdiff_t change, int32_t terms) {
+    typedef Lanes<nativeLanes> L;
+    const RowsAbove rows = {reinterpret_cast<const DBL *>(above), 2 * step, 2 * change, terms};
+    DBL *const to = reinterpret_cast<DBL *>(row);
+    const std::ptrdiff_t end = 2 * std::ptrdiff_t{cols};
+    std::ptrdiff_t j = 0;
+    for (; j + 4 * nativeLanes <= end; j += 4 * nativeLanes)
+        rows.subtractComplex<L, 4>(to, j);
+    for (; j + nativeLanes <= end; j += nativeLanes)
+        rows.subtractComplex<L, 1>(to, j);
+    for (; j < end; j += 2)
+        rows.subtractComplex<Lanes<2>, 1>(to, j);
+}
+
+double DivideRow(DBL *row, int32_t cols, double divisor) {
+    typedef Lanes<nativeLanes> L;
+    int32_t j = 0;
+    double largest = 0.0;
+    if (cols >= nativeLanes) {
+        L most(0.0);
+        for (; j + nativeLanes <= cols; j += nativeLanes) {
+            const L quotient = L::load(row + j) / L(divisor);
+            quotient.store(row + j);
+            most = Select(most < Magnitude(quotient), Magnitude(quotient), most);
+        }
+        for (int k = 0; k < nativeLanes; ++k)
+            largest = largest < most[k] ? most[k] : largest;
+    }
+    for (; j < cols; ++j) {
+        row[j] = row[j] / divisor;
+        const double size = __builtin_fabs(row[j]);
+        largest = largest < size ? size : largest;
+    }
+    return largest;
+}
+
+// The products of several rows with x at once.
 template <int Rows>
 static void DotRows(const DBL *a, std::ptrdiff_t stride, int32_t n, const DBL *x, DBL *y) {
     typedef Lanes<nativeLanes> L;
@@ -148,7 +243,7 @@ void RowProductsReal(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t 
         DotRows<1>(a + i * stride, stride, cols, x, y + i);
 }
 
-// Elements 2 j and 2 j + 1 of the rows go into sums of their own.
+// Elements 2 j and 2 j + 1 of the rows go into separate sums.
 template <int Rows>
 static void ComplexDotRows(const CDB *a, std::ptrdiff_t stride, int32_t n, const CDB *x, CDB *y) {
     typedef Lanes<nativeLanes == 2 ? 2 : 4> L;
@@ -206,7 +301,8 @@ static void RotatePanel(DBL *a, std::ptrdiff_t stride, const Rotation *rotations
     }
 }
 
-// A panel of 16 columns passes through all rotations at once, so that it stays in the cache.
+// A panel of 16 columns goes through all rotations before the next one, so that it stays in the
+// cache.
 void RotateRows(DBL *a, std::ptrdiff_t stride, int32_t width, const Rotation *rotations,
                 int32_t count) {
     typedef Lanes<nativeLanes> L;

@@ -2,7 +2,7 @@
 
 #include "linalg/aligned.h"
 
-// LAPACK's complex elements are ours.
+// LAPACK's complex types are the library's own.
 #define lapack_complex_float CSG
 #define lapack_complex_double CDB
 #include <lapack.h>
@@ -45,13 +45,13 @@ int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const D
 
 namespace {
 
-// A work query answers in the first element.
+// A work query returns its answer in the first element.
 int32_t Answer(const DBL *work) { return static_cast<int32_t>(*work); }
 int32_t Answer(const CDB *work) { return static_cast<int32_t>(work->re); }
 
 char Job(const void *vectors) { return vectors != nullptr ? 'V' : 'N'; }
 
-// Asks a driver how much work memory it wants, and calls it with that.
+// Asks a driver how much work memory it needs, and calls it with that memory.
 template <class T, class Driver>
 int32_t WithWork(const Driver &driver) {
     ScratchParts memory;
@@ -95,6 +95,41 @@ int32_t Eigen(int32_t n, CDB *a, CDB *w, CDB *z) {
     });
     for (int32_t i = 0; i < n; ++i)
         w[i] = values[i];
+    return info;
+}
+
+// The drivers of divide and conquer also require integer work memory.
+int32_t SymmetricEigen(int32_t n, DBL *a, DBL *w, bool withVectors) {
+    const char job = withVectors ? 'V' : 'N';
+    ScratchParts memory;
+    DBL *work, size;
+    I32 *integers, count;
+    int32_t info = 0, length = -1, integerLength = -1;
+    LAPACK_dsyevd(&job, "L", &n, a, &n, w, &size, &length, &count, &integerLength, &info);
+    length = Answer(&size);
+    integerLength = count;
+    if (memory.take(Aligned(Sized(work, length)), Aligned(Sized(integers, integerLength))) != 0)
+        return noMemory;
+    LAPACK_dsyevd(&job, "L", &n, a, &n, w, work, &length, integers, &integerLength, &info);
+    return info;
+}
+int32_t SymmetricEigen(int32_t n, CDB *a, DBL *w, bool withVectors) {
+    const char job = withVectors ? 'V' : 'N';
+    ScratchParts memory;
+    CDB *work, size;
+    DBL *real, realSize;
+    I32 *integers, count;
+    int32_t info = 0, length = -1, realLength = -1, integerLength = -1;
+    LAPACK_zheevd(&job, "L", &n, a, &n, w, &size, &length, &realSize, &realLength, &count,
+                  &integerLength, &info);
+    length = Answer(&size);
+    realLength = Answer(&realSize);
+    integerLength = count;
+    if (memory.take(Aligned(Sized(work, length)), Aligned(Sized(real, realLength)),
+                    Aligned(Sized(integers, integerLength))) != 0)
+        return noMemory;
+    LAPACK_zheevd(&job, "L", &n, a, &n, w, work, &length, real, &realLength, integers,
+                  &integerLength, &info);
     return info;
 }
 

@@ -13,16 +13,16 @@ struct GeneralisedRanks {
     int32_t k, l;
 };
 
-// What the library calls of LAPACK, overloaded by element. Nothing else includes its header. The
-// BLAS below it is that of LAPACK's own source, and ours where it is costly (blas/). LAPACK's
-// matrices are column after column and without gaps, hence plain pointers and sizes: see
-// CopyTransposed.
+// The routines of LAPACK that the library calls, overloaded by element. No other file includes
+// LAPACK's header. The BLAS below it comes from LAPACK's own source, except for the costly
+// routines, which are ours (blas/). LAPACK's matrices are stored column by column without gaps,
+// hence plain pointers and sizes: see CopyTransposed.
 
 namespace lapack {
 
-// Each returns LAPACK's info: 0, or what the driver's documentation says, or noMemory.
+// Each returns LAPACK's info: 0, a value that the driver documents, or noMemory.
 constexpr int32_t noMemory = -1000;
-// The code of a negative info.
+// The code for a negative info.
 inline ErrorCode CodeOf(int32_t info) { return info == noMemory ? ErrOutOfMemory : ErrInternal; }
 
 // Solves with a band matrix; `band` has 2 lower + upper + 1 rows per column.
@@ -38,24 +38,31 @@ int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const D
                          const DBL *diagonal, const DBL *upper, const DBL *upper2,
                          const I32 *pivots, DBL *b);
 
-// What follows takes scratch memory of its own for LAPACK's work. All matrices are Aligned
-// (linalg/aligned.h), and of order n where no other size is named.
+// The functions below allocate their own scratch memory for LAPACK's work arrays. All matrices are
+// Aligned (linalg/aligned.h), and of order n where no other size is named.
 
-// Schur form of t: t becomes triangular, or for real elements quasi-triangular, w its eigenvalues,
-// and z its Schur vectors; with z null there are none. Above 0: no convergence.
+// Schur form of t: t becomes triangular, or for real elements quasi-triangular, w holds its
+// eigenvalues and z its Schur vectors; with z null these are not computed. An info above 0: no
+// convergence.
 int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z);
 int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z);
 // Moves the block at row `from` of a Schur form to row `to`, rows counted from 0.
 int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to);
 int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to);
 
-// Eigenvalues of a, which is lost: w; with z not null the right eigenvectors of unit length, for real
-// elements as GeneralisedVectors gives them. Above 0: no convergence.
+// Eigenvalues of a, which is lost: w; if z is not null, it receives the right eigenvectors of unit
+// length, for real elements in the layout of GeneralisedVectors. An info above 0: no convergence.
 int32_t Eigen(int32_t n, DBL *a, CDB *w, DBL *z);
 int32_t Eigen(int32_t n, CDB *a, CDB *w, CDB *z);
 
-// QR factors of a (m by n), with columns in their order, or exchanged by pivots, which count from 1;
-// then of q, which holds the reflections, the first `columns` columns.
+// Eigenvalues w, ascending, of the symmetric or Hermitian matrix whose lower triangle a
+// holds; with vectors, its columns become orthonormal eigenvectors, otherwise a is lost. An info
+// above 0: no convergence.
+int32_t SymmetricEigen(int32_t n, DBL *a, DBL *w, bool withVectors);
+int32_t SymmetricEigen(int32_t n, CDB *a, DBL *w, bool withVectors);
+
+// QR factors of a (m by n), with columns in their order, or exchanged by pivots, which count from 1.
+// FormQ replaces the reflections in q by the first `columns` columns of the matrix q.
 int32_t FactorQR(int32_t m, int32_t n, DBL *a, DBL *tau);
 int32_t FactorQR(int32_t m, int32_t n, CDB *a, CDB *tau);
 int32_t FactorPivotedQR(int32_t m, int32_t n, DBL *a, I32 *pivots, DBL *tau);
@@ -69,12 +76,12 @@ int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *
 int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *q, CDB *z);
 int32_t MoveInGeneralisedSchur(int32_t n, DBL *s, DBL *t, DBL *q, DBL *z, int32_t from, int32_t to);
 int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_t from, int32_t to);
-// The right Schur vectors z become the right eigenvectors; those of a pair are the real and the
-// imaginary part of the first one's.
+// The right Schur vectors z become the right eigenvectors; the two columns of a pair are the real
+// and the imaginary part of its first vector.
 int32_t GeneralisedVectors(int32_t n, const DBL *s, const DBL *t, DBL *z);
 int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z);
 
-// Generalised singular values of a (m by n) and b (p by n), as LAPACK's xGGSVD3 tells.
+// Generalised singular values of a (m by n) and b (p by n), as LAPACK's xGGSVD3 documents them.
 int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b,
                             GeneralisedRanks *ranks, DBL *alpha, DBL *beta, DBL *u, DBL *v, DBL *q);
 int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b,

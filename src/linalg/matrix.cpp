@@ -71,7 +71,7 @@ template <ElementType E>
 void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, const MatrixView<E> &a) {
     QX_EXPECTS(a.isSquare() && packed.size() >= PackedLength(a.rows()));
     ForEachPacked(a.rows(), triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
-        // The mirror image first: on the diagonal the element itself stays.
+        // The mirror image is written first, so that the diagonal keeps the element itself.
         if (triangle == symmetric)
             a(j, i) = packed[at];
         else if (triangle == hermitian)

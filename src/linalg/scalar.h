@@ -7,7 +7,8 @@
 
 namespace qx {
 
-// What reads the same for real and complex elements, so that an algorithm is one text for both.
+// Functions with the same names for real and complex elements, so that one text of an algorithm
+// serves both.
 
 inline double Conj(double a) { return a; }
 inline CDB Conj(CDB a) { return {a.re, -a.im}; }
@@ -15,7 +16,7 @@ inline double RealPart(double a) { return a; }
 inline double RealPart(CDB a) { return a.re; }
 inline double ImagPart(double) { return 0.0; }
 inline double ImagPart(CDB a) { return a.im; }
-// |re| + |im|: as good as the modulus to tell large from small, and without a square root.
+// |re| + |im|: distinguishes large from small as well as the modulus does, without a square root.
 inline double AbsSum(double a) { return std::fabs(a); }
 inline double AbsSum(CDB a) { return std::fabs(a.re) + std::fabs(a.im); }
 inline double SquaredModulus(double a) { return a * a; }
@@ -53,7 +54,7 @@ struct ScalarOf<ElementType::CDB> {
     static type Of(double real) { return {real, 0.0}; }
 };
 
-// How many DBL an element is made of; real factors act on these alone.
+// The number of DBL in an element; real factors act on these alone.
 template <ElementType E>
 constexpr int32_t partsOf = E == ElementType::CDB ? 2 : 1;
 

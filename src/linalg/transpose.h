@@ -12,8 +12,8 @@ namespace qx {
 template <ElementType E>
 inline void Transpose(const ElementOf<E> *x, std::ptrdiff_t xStride, std::ptrdiff_t rows,
                       std::ptrdiff_t cols, ElementOf<E> *y, std::ptrdiff_t yStride) {
-    // Rows that fit into the first cache together, so that neither side is read or written in long
-    // strides.
+    // The number of rows that fit into the first cache together, so that neither side is read or
+    // written in long strides.
     constexpr std::ptrdiff_t rowsAtOnce = 16;
     for (std::ptrdiff_t top = 0; top < rows; top += rowsAtOnce) {
         const std::ptrdiff_t bottom = std::min(top + rowsAtOnce, rows);

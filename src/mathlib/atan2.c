@@ -15,7 +15,7 @@ static int ExponentOf(double x) {
     return (int)(word.bits >> 52 & 0x7ff) - 0x3ff;
 }
 
-/* The tangent of the angle left after taking away that of c:
+/* The tangent of the angle that remains when the angle of c is subtracted:
    (y - c x) / (x + c y). */
 static Pair ReducedTangent(double y, double x, double c) {
     const Pair height = {y, 0}, width = {x, 0};
@@ -73,7 +73,8 @@ double atan2(double y, double x) {
     if (width == height && ExponentOf(width) == 0x400)
         return copysign(left ? threeEighths : eighthTurn, y);
 
-    /* Beyond 2^64 the smaller one moves the angle by less than its rounding, or is the angle. */
+    /* Beyond 2^64 the smaller one changes the angle by less than its rounding error, or the quotient
+       is the angle. */
     const int rise = ExponentOf(height) - ExponentOf(width);
     if (rise > 64)
         return copysign(quarterTurn, y);

@@ -7,7 +7,7 @@
 namespace qx {
 
 // Elementary functions of n numbers, with the bits of std::sin, std::cos, std::atan2 and
-// std::hypot. Results may lie where the arguments do.
+// std::hypot. Results may overwrite the arguments.
 QX_BY_WIDTH(void, Sines, (const DBL *x, int32_t n, DBL *sines))
 QX_BY_WIDTH(void, SinesAndCosines, (const DBL *x, int32_t n, DBL *sines, DBL *cosines))
 QX_BY_WIDTH(void, ArcTangents, (const DBL *y, const DBL *x, int32_t n, DBL *angles))

@@ -8,8 +8,8 @@ namespace {
 
 typedef Lanes<nativeLanes> L;
 
-// Calls lanes(at), which says whether it has had only arguments that are not rare, for all whole
-// groups of lanes, and one(at) for the rest and for the groups that had others.
+// Calls lanes(at) for all whole groups of lanes, and one(at) for the remaining elements and for
+// each element of a group for which lanes(at) returned false because it had rare arguments.
 template <class OfLanes, class OfOne>
 QX_INLINE void ForEach(int32_t n, OfLanes lanes, OfOne one) {
     int32_t i = 0;

@@ -8,13 +8,13 @@
 
 static const Pair one = {1, 0};
 
-/* exp(x) is (1 + m) * 2^k for x from 0 to 1500; m is good to 2^-56 of itself where k is 0, and
-   to 2^-56 of 1 elsewhere. */
+/* exp(x) is (1 + m) * 2^k for x from 0 to 1500; the error of m is at most 2^-56 relative to
+   m if k is 0, and relative to 1 otherwise. */
 static int ExponentialPair(double x, Pair *m) {
     /* ln 2; the first part has 11 trailing zero bits, so that k times it is exact. */
     const double ln2High = 0x1.62e42fefa38p-1, ln2Low = 0x1.ef35793c7673p-45;
     const double inverseLn2 = 0x1.71547652b82fep+0;
-    /* 1/3!, 1/4!, ... 1/14!: the rest is below 5e-18 of m for |r| to (ln 2)/2. */
+    /* 1/3!, 1/4!, ... 1/14!: the remainder is below 5e-18 m for |r| up to (ln 2)/2. */
     static const double tail[12] = {1 / 6.0,         1 / 24.0,         1 / 120.0,
                                     1 / 720.0,       1 / 5040.0,       1 / 40320.0,
                                     1 / 362880.0,    1 / 3628800.0,    1 / 39916800.0,
@@ -33,8 +33,8 @@ static int ExponentialPair(double x, Pair *m) {
     return k;
 }
 
-/* exp(x) and exp(-x), both times 2^-scale; for x above 22 the second is nothing beside the
-   first and left out. */
+/* exp(x) and exp(-x), both times 2^-scale; for x above 22 the second is negligible beside
+   the first and set to 0. */
 static void Exponentials(double x, Pair *growing, Pair *decaying, int *scale) {
     Pair m;
     const Pair nothing = {0, 0};
@@ -44,7 +44,7 @@ static void Exponentials(double x, Pair *growing, Pair *decaying, int *scale) {
     *scale = k;
 }
 
-/* Beyond this sinh and cosh overflow; infinities and NaN as well pass through it. */
+/* Beyond this sinh and cosh overflow; infinities and NaN take the same branch. */
 static const double overflow = 711;
 
 double sinh(double x) {
@@ -57,7 +57,7 @@ double sinh(double x) {
     int scale;
     double result;
     if (size < 0.34) {
-        /* (m + m / (1 + m)) / 2 keeps the relative error where exp(x) - exp(-x) cancels. */
+        /* (m + m / (1 + m)) / 2 keeps the relative accuracy where exp(x) - exp(-x) cancels. */
         ExponentialPair(size, &m);
         const Pair twice = PairSum(m, PairQuotient(m, PairSum(one, m)));
         result = 0.5 * (twice.hi + twice.lo);

@@ -4,17 +4,17 @@
 #include "frame/lane_masks.h"
 
 // Elementary functions over lanes, with the bits of the module's sin, cos, atan2 and hypot: the
-// same operations in the same order, with masks in the place of branches. Arguments for which the
-// scalar functions take a branch of their own (far from 0, next to a multiple of pi/2, zeros,
-// infinities, NaN, numbers near the ends of the range) are marked in `rare`, and the results of
-// these lanes mean nothing: the scalar function has to be called for them.
+// same operations in the same order, with masks instead of branches. Arguments for which the scalar
+// functions take a special branch (far from 0, close to a multiple of pi/2, zeros, infinities, NaN,
+// numbers near the ends of the range) are marked in `rare`, and the results of these lanes are
+// meaningless: the scalar function must be called for them.
 //
 //     LaneMask<L> rare = {};
 //     const SineAndCosine<L> both = SineCosine(L::load(x), rare);
 //     if (!Any(rare)) ...
 //
 // The reduction by pi/2 and the two polynomials of sine and cosine are those of K. C. Ng in fdlibm
-// (Sun Microsystems, 1993); the other two functions are described where the scalar ones are.
+// (Sun Microsystems, 1993); the other two functions are described with the scalar ones.
 
 namespace qx {
 
@@ -57,14 +57,14 @@ QX_INLINE LanePair<L> Select(LaneMask<L> where, LanePair<L> a, LanePair<L> b) {
     return {Select(where, a.hi, b.hi), Select(where, a.lo, b.lo)};
 }
 
-// 2^k of a normal number from 2^k to 2^(k + 1); 0 of one below.
+// 2^k for a normal number from 2^k to 2^(k + 1); 0 for smaller numbers.
 template <class L>
 QX_INLINE L PowerOfTwo(L x) {
     return OfBits<L>(ToBits(x) & 0x7ff0000000000000);
 }
 
-// An angle less a multiple of pi/2, as y + tail in -pi/4 to pi/4. The two lowest bits of `quadrant`
-// are those of the multiple.
+// An angle minus a multiple of pi/2, as y + tail between -pi/4 and pi/4. The two lowest bits of
+// `quadrant` are those of the multiple.
 template <class L>
 struct ReducedAngle {
     L y, tail, quadrant;
@@ -82,16 +82,16 @@ QX_INLINE ReducedAngle<L> Reduced(L x, LaneMask<L> &rare) {
     const L left = x - multiple * high;
     const L tail = multiple * highTail;
     const L once = left - tail;
-    // Where more than 16 bits cancel, as much again is taken away.
+    // Where more than 16 bits cancel, the next part of the multiple is subtracted, too.
     const LaneMask<L> cancels = PowerOfTwo(once) <= PowerOfTwo(size) * L(0x1p-17);
     const L again = multiple * middle;
     const L leftAgain = left - again;
     const L tailAgain = multiple * middleTail - ((left - leftAgain) - again);
     const L twice = leftAgain - tailAgain;
 
-    // Beyond 2^20 pi/2 the reduction is another one, and next to odd multiples of pi/4 the
-    // multiple is. Up to 9/4 pi the second round depends on how near a multiple of pi/2 is, and a
-    // third round comes where 49 bits cancel.
+    // Beyond 2^20 pi/2 the scalar function uses another reduction, and close to odd multiples of
+    // pi/4 another multiple. Up to 9/4 pi its second round depends on the distance from a multiple
+    // of pi/2, and a third round follows where 49 bits cancel.
     const LaneMask<L> isMedium = size < L(0x1.921fbp+20);
     const LaneMask<L> isSmall = size < L(0x1.921fcp-1);
     const L y = Select(cancels, twice, once);
@@ -132,8 +132,9 @@ QX_INLINE L CosinePolynomial(const ReducedAngle<L> &x) {
     return one + (((L(1.0) - one) - half) + (square * rest - x.y * x.tail));
 }
 
-// In an odd quadrant sine and cosine change places. In two of four the sign changes: of sines where
-// bit 1 of the quadrant's number is set, of cosines where one of the bits 0 and 1 is.
+// In odd quadrants sine and cosine are exchanged. In two of four quadrants the sign changes: of
+// sines if bit 1 of the number of the quadrant is set, of cosines if exactly one of the bits 0 and
+// 1 is set.
 template <class L>
 QX_INLINE LaneMask<L> IsOdd(L quadrant) {
     const L one(1.0);
@@ -205,7 +206,7 @@ QX_INLINE L ArcTangent(L y, L x, LaneMask<L> &rare) {
     const L height = Magnitude(y), width = Magnitude(x), zero(0.0);
     const LaneMask<L> isHigh = width < height;
     const L larger = Select(isHigh, height, width), smaller = Select(isHigh, width, height);
-    // NaN is neither below nor above. Powers of 2 by whole factors have no rounding here.
+    // NaN is neither below nor above. Factors that are powers of 2 cause no rounding here.
     const L power = PowerOfTwo(larger);
     rare = rare | !(larger < L(0x1p1000)) | !(L(0x1p-900) <= larger) | (height == width) |
            !(power * L(0x1p-64) <= PowerOfTwo(smaller)) | !(zero < smaller);

@@ -51,8 +51,8 @@ static inline Pair Scaled(Pair a, double powerOfTwo) {
     return result;
 }
 
-/* The polynomial of 12 ascending coefficients in four independent chains, so that it costs the
-   time of 3 steps and not of 11. */
+/* The polynomial of 12 ascending coefficients in four independent chains, so that it takes the
+   time of 3 steps instead of 11. */
 static inline double TwelveTerms(const double *c, double x) {
     const double x2 = x * x, x4 = x2 * x2;
     const double low = (c[0] + c[1] * x) + (c[2] + c[3] * x) * x2;

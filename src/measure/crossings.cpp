@@ -10,31 +10,31 @@ namespace {
 
 constexpr double none = std::numeric_limits<double>::quiet_NaN();
 
-// By signs, not by the product of the distances, which small ones let underflow.
+// Compares the signs and not the product of the distances, which underflows for small ones.
 bool Crosses(double here, double next, double level) {
     return (here <= level && next >= level) || (here >= level && next <= level);
 }
 
-// Where between sample i and the next one a level is met, from sample i on.
+// The fraction of the way from sample i to the next one at which the level is crossed.
 double Fraction(const DBL *y, int32_t i, double level) {
     const double d = y[i] - y[i + 1];
     return (y[i] - level) / (d == 0 ? 1.0 : d);
 }
 
-// On which side of a band the waveform was last, and where it would change that.
+// The side of a band on which the waveform was last, and the bounds at which it would change sides.
 class Side {
 public:
     Side(double lower, double upper) : lower_(lower), upper_(upper) {}
     double lower() const { return side_ == low ? none : lower_; }
     double upper() const { return side_ == high ? none : upper_; }
-    // Takes a sample; whether it lies on another side than those before.
+    // Takes a sample; returns whether it lies on another side than the previous ones.
     bool changesTo(double y) {
         const int32_t found = y >= upper() ? high : y <= lower() ? low : side_;
         const bool isOther = found != side_;
         side_ = found;
         return isOther;
     }
-    // What leaves the upper side falls.
+    // A waveform that leaves the upper side is falling.
     Direction direction() const { return side_ == high ? falling : rising; }
 
 private:

@@ -18,17 +18,17 @@ struct Crossing {
 
 struct Transition {
     DBL startPosition, endPosition; // in samples
-    I32 startIndex, endIndex;       // the samples behind them
+    I32 startIndex, endIndex;       // the first samples after them
     I32 direction;
 };
 
-// The crossings of `mid`, each counted once the waveform has reached mid + h or mid - h on the
-// other side since the last one. Positions are shifted by t0. The search ends with `limit` entries;
-// their number.
+// The crossings of `mid`. Each counts once the waveform has reached mid + h or mid - h, on the
+// other side than the last time. Positions are shifted by t0. The search ends after `limit`
+// entries; returns their number.
 int32_t FindMidCrossings(double t0, const DBL *y, int32_t n, double mid, double h, Crossing *list,
                          int32_t limit);
 
-// The transitions between low and high. ErrMeasureRangeReversed where low is not below high.
+// The transitions between low and high. ErrMeasureRangeReversed if low is not below high.
 ErrorCode FindTransitions(const DBL *y, int32_t n, double low, double high, Transition *list,
                           int32_t limit, int32_t *count);
 

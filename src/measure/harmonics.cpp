@@ -9,7 +9,7 @@
 namespace qx {
 namespace {
 
-// What harmonics are seen as: distinct lines, each with its place in the list of harmonics.
+// The aliased frequencies of the harmonics: distinct lines, and the line of each harmonic.
 class SeenHarmonics {
 public:
     ErrorCode reserve(int32_t highest) {
@@ -19,7 +19,7 @@ public:
 
     int32_t count() const { return count_; }
     Line *lines() const { return lines_; }
-    // The line of harmonic h + 1, or -1 where it cannot be told.
+    // The line of harmonic h + 1, or -1 if it cannot be distinguished.
     int32_t lineOf(int32_t h) const { return lineOf_[h]; }
 
 private:
@@ -42,7 +42,7 @@ void SeenHarmonics::lay(const Line &fundamental, int32_t n, int32_t highest) {
         if (seen.frequency < halfBin)
             continue;
         const bool isTold = seen.frequency <= 0.5 - halfBin;
-        if (!isTold) { // one wave stands for all that is seen there
+        if (!isTold) { // one wave represents all harmonics that alias there
             seen.frequency = 0.5;
             seen.slope = 0;
         }
@@ -63,13 +63,14 @@ void SeenHarmonics::lay(const Line &fundamental, int32_t n, int32_t highest) {
 
 double Decibels(double ratio) { return 20 * std::log10(ratio); }
 
-// The root mean square of a line; at half the sampling rate it has one value and its negative.
+// The mean square of a line. At half the sampling rate the line alternates between one value and
+// its negative.
 double SquaredRms(const Line &line) {
     const double square = line.cosine * line.cosine + line.sine * line.sine;
     return line.frequency < 0.5 ? 0.5 * square : square;
 }
 
-// The amplitude of the largest line in what is left; 0 where that is nothing.
+// The amplitude of the largest line in the residual; 0 if there is none.
 ErrorCode LargestSpur(const DBL *residual, int32_t n, double &amplitude) {
     amplitude = 0;
     ToneSearch search;

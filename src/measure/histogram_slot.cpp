@@ -12,7 +12,8 @@ namespace {
 
 MeasurementHistogram *HeldBy(void *word) { return static_cast<MeasurementHistogram *>(word); }
 
-// The sweep of a block: the word that held it belongs to what the host is discarding.
+// The clean-up of a block. The word that held its address belongs to data that the host is
+// discarding.
 int32_t HistogramSweep(void *block) {
     std::free(HeldBy(block)->counts);
     FreeCell(block);
@@ -22,7 +23,7 @@ int32_t HistogramSweep(void *block) {
 ErrorCode Resize(MeasurementHistogram *histogram, int32_t bins) {
     if (histogram->counts != nullptr && histogram->bins == bins)
         return 0;
-    // As for all other memory, int32 must hold the size.
+    // As for all other memory, the size must fit into int32.
     if (bins > std::numeric_limits<int32_t>::max() / int32_t{sizeof(uint32_t)})
         return ErrOutOfMemory;
     void *const resized =
@@ -48,7 +49,7 @@ ErrorCode KeepHistogramInSlot::acquire(int32_t bins) const {
     auto *const block = NewCell<MeasurementHistogram>(CellKind::Histogram);
     if (block == nullptr)
         return ErrOutOfMemory;
-    // A block that nobody would sweep is none.
+    // If the clean-up cannot be registered, treat it as a failed allocation.
     if (Resize(block, bins) != 0 || HostRegisterSweep(HistogramSweep, block, SweepForObject) != 0) {
         HistogramSweep(block);
         return ErrOutOfMemory;

@@ -8,17 +8,18 @@
 
 namespace qx {
 
-// The counters that a call site holds between its calls.
+// The counters that a call site keeps between calls.
 struct MeasurementHistogram {
     int32_t bins;
     uint32_t *counts;
 };
 
-// The two ways to keep them; a plain export and its _IDP twin differ in nothing else. `acquire`
-// makes the word hold so many counters, of any content: 0, ErrInternal for a word that holds
-// something else, which stays, or ErrOutOfMemory.
+// The two ways to store them, which are the only difference between a plain export and its _IDP
+// twin. `acquire` gives the word `bins` counters with unspecified content. Returns 0, ErrInternal
+// if the word holds something else, which is left alone, or ErrOutOfMemory.
 
-// In a word that the caller owns, swept by the host. A change of the number replaces the block.
+// In a word that the caller owns, freed by the host's clean-up. If the number of bins changes, the
+// block is replaced.
 class KeepHistogramInSlot {
 public:
     explicit KeepHistogramInSlot(MeasurementSlot *slot) : word_(slot) {}
@@ -30,7 +31,7 @@ private:
     MeasurementSlot *word_;
 };
 
-// In the host's instance data, given back through MeasurementUnreserveProc.
+// In the host's instance data, freed by MeasurementUnreserveProc.
 class KeepHistogramInInstance {
 public:
     explicit KeepHistogramInInstance(MeasurementInstanceWord *word) : word_(word) {}
@@ -42,7 +43,7 @@ private:
     MeasurementInstanceWord *word_;
 };
 
-// 0, or ErrInternal for a word that holds something else, which stays.
+// 0, or ErrInternal if the word holds something else, which is left alone.
 ErrorCode MeasurementInstanceRelease(MeasurementInstanceWord *word);
 
 } // namespace qx

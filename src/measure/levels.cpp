@@ -10,7 +10,7 @@ namespace qx {
 
 namespace {
 
-constexpr double leastShare = 0.05; // of the samples that the bin of a state should hold
+constexpr double leastShare = 0.05; // share of the samples that the bin of a state should contain
 
 struct State {
     double level;
@@ -30,12 +30,12 @@ void BuildHistogram(const Waveform &waveform, const LevelSearch &search, double 
     const int32_t last = search.bins - 1;
     for (int32_t i = 0; i < waveform.n; ++i) {
         const double position = (waveform.y[i] - min) * perUnit;
-        if (position >= 0) // NaN counts nowhere
+        if (position >= 0) // NaN is not counted
             ++search.counts[position < last ? static_cast<int32_t>(position) : last];
     }
 }
 
-// The fullest bin from `from` up or down to `to`, the last of several.
+// The fullest bin on the way from `from` to `to`; the last one if several are equally full.
 State FullestBin(const LevelSearch &search, int32_t from, int32_t to, double min, double range) {
     const int32_t step = from < to ? 1 : -1;
     int32_t best = from;
@@ -96,7 +96,7 @@ ErrorCode ComputeLevels(const Waveform &waveform, const LevelSearch &search,
     if (const ErrorCode failed = ArrayMaxMin({waveform.y, waveform.n}, &extremes))
         return failed;
     const double max = extremes.max, min = extremes.min, range = max - min;
-    // Numbers are needed, and a range of them; peaks alone may coincide.
+    // The extremes must be numbers and, except for the method of peaks, must differ.
     const bool isFlatAllowed = search.method == QXLevelsByPeaks;
     if (!(isFlatAllowed ? range >= 0 : range > 0) || range > std::numeric_limits<double>::max())
         return ErrMeasureNotPositive;

@@ -14,7 +14,7 @@ struct Waveform {
     double t0, dt;
 };
 
-// How levels are found, with the counters of the histogram.
+// The method by which levels are found, with the counters of the histogram.
 struct LevelSearch {
     int32_t method;
     int32_t bins;
@@ -23,9 +23,9 @@ struct LevelSearch {
     bool isStrict() const { return limit == 1; }
 };
 
-// The levels of the two states, and what they were found from.
+// The levels of the two states, and the data they were computed from.
 struct StateLevelsFound {
-    int32_t chosen; // the method that has decided
+    int32_t chosen; // the method that determined the levels
     double high, low, amplitude;
     double min, range; // of the samples
 };
@@ -33,17 +33,17 @@ struct StateLevelsFound {
 // ErrMeasureEmpty, ErrMeasureLevelsReversed (dt), ErrInvalidSelector (limit).
 ErrorCode CheckWaveform(const Waveform &waveform, int32_t limit);
 
-// Those of CheckWaveform, ErrMeasureTooManyChannels (method), ErrMeasureNotPositive;
+// The codes of CheckWaveform, ErrMeasureTooManyChannels (method), ErrMeasureNotPositive;
 // WarnMeasurePartial.
 ErrorCode ComputeLevels(const Waveform &waveform, const LevelSearch &search,
                         StateLevelsFound *levels);
 
-// The levels replaced by those of the histogram, which is built first where no method has done so.
-// 0 or WarnMeasurePartial.
+// Replaces the levels by those of the histogram, which is built first unless isBuilt. 0 or
+// WarnMeasurePartial.
 ErrorCode TakeHistogramLevels(const Waveform &waveform, const LevelSearch &search, bool isBuilt,
                               StateLevelsFound *levels);
 
-// References in percent as absolute values.
+// Converts references in percent to absolute values.
 void MakeAbsolute(const StateLevelsFound &levels, ReferenceLevels *references);
 
 } // namespace qx

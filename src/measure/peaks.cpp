@@ -16,15 +16,15 @@ namespace {
 constexpr double epsilon = 2.220446049250313e-16;
 constexpr double smallestCurvature = 1e-10; // of the second derivative
 constexpr double widestFlat = 1e-8;
-// From this width on a change of the slope's sign is asked for. Narrower windows rely on the list,
-// which keeps one of neighbours.
+// From this width on a change of sign of the slope is required. For narrower windows the list keeps
+// only one of neighbouring peaks.
 constexpr int32_t slopeWidth = 5;
 
 void Copy(DBL *to, const DBL *from, std::ptrdiff_t count) {
     std::memcpy(to, from, static_cast<std::size_t>(count) * sizeof(DBL));
 }
 
-// Divides a window by the size of its extreme that is sought, and gives that size.
+// Divides a window by the magnitude of the extreme that is sought, and returns that magnitude.
 double PeakNormalize(DBL *window, int32_t w, bool ofValleys) {
     double extreme = window[0];
     for (int32_t j = 1; j < w; ++j)
@@ -49,7 +49,7 @@ public:
             return 0;
         if (w_ >= slopeWidth)
             return runBySlope(x, windows);
-        // The exact parabola through three samples is what most callers want, and is unrolled.
+        // Most callers want the exact parabola through three samples, so it is unrolled.
         return w_ == 3 ? runByVertex<3>(x, windows) : runByVertex<4>(x, windows);
     }
     // The same with each window scaled to 1, in `work` of a window's length.
@@ -59,16 +59,21 @@ private:
     ErrorCode runBySlope(const DBL *x, std::ptrdiff_t windows);
     template <int32_t W>
     ErrorCode runByVertex(const DBL *x, std::ptrdiff_t windows);
+    template <int32_t W>
+    ErrorCode runOneByOne(const DBL *fitMatrix, const DBL *x, std::ptrdiff_t first,
+                          std::ptrdiff_t windows, const uint64_t *masks, bool *mayTakeFormer);
     template <class Previous>
     ErrorCode refine(const Parabola &now, const Previous &previous, double scale, double position,
                      bool &tookOwn);
 
+    // A vertex from the centre of its window.
+    double furthest() const { return 0.5 * centre_ + 10 * epsilon; }
     bool isSought(double curvature) const { return ofValleys_ ? curvature > 0 : curvature < 0; }
     Parabola previous() const {
         const DBL *const c = state_->previous;
         return {c[0], c[1], c[2]};
     }
-    // The parabola of window i of a run, and of the one before.
+    // The parabola of window i of a run, and that of the window before it.
     template <int32_t W = 0>
     Parabola fit(const DBL *x, std::ptrdiff_t i) const {
         return FitWindow(fitMatrix_, W > 0 ? W : w_, x + i);
@@ -98,7 +103,7 @@ int32_t WindowsFrom(std::ptrdiff_t first, std::ptrdiff_t windows) {
     return static_cast<int32_t>(std::min<std::ptrdiff_t>(maskWidth, windows - first));
 }
 
-// Wide windows: where the slope changes its sign.
+// Wide windows: candidates are where the slope changes its sign.
 ErrorCode PeakScan::runBySlope(const DBL *x, std::ptrdiff_t windows) {
     uint64_t wasRising = state_->slopeSign != 0;
     const double position = state_->position;
@@ -121,28 +126,57 @@ ErrorCode PeakScan::runBySlope(const DBL *x, std::ptrdiff_t windows) {
     return 0;
 }
 
-// Narrow windows: every window with the curvature that is sought. Only those whose own vertex is
-// near and beyond the threshold come into question, and those behind them, which may take their
-// vertex; they do so to no effect where it has been judged already.
+// Narrow windows: candidates are windows with the required curvature. Only those whose own vertex
+// is near the centre and beyond the threshold need to be tested, and the windows after them, which
+// may use their vertex; this has no effect if that vertex has been tested already.
 template <int32_t W>
 ErrorCode PeakScan::runByVertex(const DBL *x, std::ptrdiff_t windows) {
-    // Twice the limit of the vertex, because c1 is held against c2; more than rounding could hide.
+    // Twice the limit of the vertex position, because c1 is compared with c2, plus more than
+    // rounding could hide.
     const double reach = centre_ * (1 + 1e-9);
-    const double position = state_->position;
-    DBL fitMatrix[3 * W]; // which no store of a result could change
+    const double sign = ofValleys_ ? 1.0 : -1.0;
+    DBL fitMatrix[3 * W]; // a local copy, which no store of a result can change
     Copy(fitMatrix, fitMatrix_, 3 * W);
-    bool mayTakeFormer = true;
-    for (std::ptrdiff_t first = 0; first < windows; first += maskWidth) {
-        const int32_t count = WindowsFrom(first, windows);
-        const uint64_t all = ~uint64_t{0} >> (maskWidth - count);
-        uint64_t left = NarrowWindowsAtVertex(fitMatrix, W, x + first, count, reach,
-                                              ofValleys_ ? 1.0 : -1.0, threshold_);
-        left |= uint64_t{mayTakeFormer};
-        mayTakeFormer = false;
+    bool mayTakeFormer = true, isPlain = true;
+    FoundVertices found;
+    std::ptrdiff_t end;
+    for (std::ptrdiff_t first = 0; first < windows; first += end) {
+        end = std::min<std::ptrdiff_t>(windows - first,
+                                       first == 0 ? maskWidth : FoundVertices::windows);
+        uint64_t masks[FoundVertices::windows / maskWidth];
+        int32_t count = 0;
+        for (std::ptrdiff_t i = 0; i < end; i += maskWidth)
+            masks[count++] = NarrowWindowsAtVertex(fitMatrix, W, x + first + i, WindowsFrom(i, end),
+                                                   reach, sign, threshold_);
+        const double position = static_cast<double>(state_->position) + static_cast<double>(first);
+        const VertexLimits limits = {position, centre_,    furthest(), smallestCurvature,
+                                     sign,     threshold_, mean_};
+        isPlain = isPlain && (mayTakeFormer ||
+                              FindVertices(fitMatrix, W, x + first, masks, count, &limits, &found));
+        if (const ErrorCode failed =
+                isPlain && !mayTakeFormer
+                    ? found_->store(found)
+                    : runOneByOne<W>(fitMatrix, x, first, end, masks, &mayTakeFormer))
+            return failed;
+    }
+    passed(fit<W>(x, windows - 1), 1.0, windows);
+    return 0;
+}
+
+// The windows of `masks` from number `first` of a run on.
+template <int32_t W>
+ErrorCode PeakScan::runOneByOne(const DBL *fitMatrix, const DBL *x, std::ptrdiff_t first,
+                                std::ptrdiff_t windows, const uint64_t *masks,
+                                bool *mayTakeFormer) {
+    const double position = state_->position;
+    for (std::ptrdiff_t done = 0; done < windows; done += maskWidth) {
+        const uint64_t all = ~uint64_t{0} >> (maskWidth - WindowsFrom(done, windows));
+        uint64_t left = masks[done / maskWidth] | uint64_t{*mayTakeFormer};
+        *mayTakeFormer = false;
         while (left != 0) {
             const uint64_t bit = left & -left;
             left ^= bit;
-            const std::ptrdiff_t i = first + std::countr_zero(bit);
+            const std::ptrdiff_t i = first + done + std::countr_zero(bit);
             const Parabola now = FitWindow(fitMatrix, W, x + i);
             if (!isSought(now.c2))
                 continue;
@@ -153,11 +187,10 @@ ErrorCode PeakScan::runByVertex(const DBL *x, std::ptrdiff_t windows) {
                 return failed;
             if (__builtin_expect(!tookOwn, 0)) {
                 left |= bit << 1 & all;
-                mayTakeFormer |= bit << 1 == 0;
+                *mayTakeFormer |= bit << 1 == 0;
             }
         }
     }
-    passed(fit<W>(x, windows - 1), 1.0, windows);
     return 0;
 }
 
@@ -178,8 +211,8 @@ ErrorCode PeakScan::runScaled(const DBL *x, std::ptrdiff_t windows, DBL *work) {
     return 0;
 }
 
-// The vertex of a candidate at `position`, or that of the window before where it is nearer.
-// `tookOwn` tells whether its own vertex has been judged, accepted or not.
+// The vertex of a candidate at `position`, or that of the previous window if it is nearer.
+// `tookOwn` is set to whether the candidate's own vertex was tested, accepted or not.
 template <class Previous>
 ErrorCode PeakScan::refine(const Parabola &now, const Previous &previous, double scale,
                            double position, bool &tookOwn) {
@@ -206,11 +239,11 @@ ErrorCode PeakScan::refine(const Parabola &now, const Previous &previous, double
             scale = 1.0;
         }
     }
-    if (std::fabs(t) > 0.5 * centre_ + 10 * epsilon || !isSought(d))
+    if (std::fabs(t) > furthest() || !isSought(d))
         return 0;
     if (!(ofValleys_ ? scale * y < threshold_ : scale * y > threshold_))
         return 0;
-    return found_->store({position + centre_ + t, scale * y + mean_, scale * d});
+    return found_->store(Peak{position + centre_ + t, scale * y + mean_, scale * d});
 }
 
 ErrorCode BeginStream(const PeakBlock &block, PeakDState *state) {
@@ -252,7 +285,7 @@ Flatness LookForFlat(const PeakBlock &block, const PeakDState &state) {
     if (!isWithin(state.history, state.historyCount) || !isWithin(block.data, block.n))
         return {false, 0};
     const double mean = sum / (static_cast<double>(state.historyCount) + block.n);
-    // With a NaN, or beyond the doubles, there is no mean that could be subtracted.
+    // With NaN, or if the sum overflows, there is no mean to subtract.
     return std::isfinite(mean) ? Flatness{true, mean} : Flatness{false, 0};
 }
 
@@ -261,7 +294,7 @@ void Subtract(double mean, DBL *x, int32_t n) {
         x[i] -= mean;
 }
 
-// The windows that start in the history, in `seam`, and those that start in the new samples.
+// Scans the windows that start in the history, in `seam`, and those that start in the new samples.
 ErrorCode ScanAll(PeakScan &scan, const PeakDState &state, const DBL *seam, int64_t windows,
                   bool isScaled) {
     const int32_t w = state.width;
@@ -278,7 +311,7 @@ ErrorCode ScanAll(PeakScan &scan, const PeakDState &state, const DBL *seam, int6
     return failed ? failed : scan.runScaled(state.incoming, behind, work.data());
 }
 
-// The last w samples of the stream. `seam` has the old history and new samples behind it.
+// Stores the last w samples of the stream. `seam` contains the old history followed by new samples.
 void StoreHistory(PeakDState *state, const DBL *seam, double mean) {
     const int32_t w = state->width;
     const DBL *const last =
@@ -306,13 +339,61 @@ int32_t FindRuns(const DBL *x, int32_t n, double threshold, int32_t width, I32 *
 }
 
 ErrorCode PeakList::grow() {
-    // In steps of 512, and of half as much again, so that a long list is not copied too often.
-    constexpr int32_t step = 512;
-    const int64_t grown = int64_t{capacity_} + step + capacity_ / 2 / step * step;
+    // By half as much again, so that a long list is not copied too often.
+    const int64_t grown = int64_t{capacity_} + chunk + capacity_ / 2 / chunk * chunk;
     if (const ErrorCode failed = memory_.resize(grown * int64_t{sizeof(Peak)}))
         return failed;
     capacity_ = static_cast<int32_t>(grown);
     return 0;
+}
+
+ErrorCode PeakList::store(const FoundVertices &found) {
+    for (int32_t first = 0; first < found.count; first += maskWidth) {
+        const int32_t count = std::min(maskWidth, found.count - first);
+        uint64_t kept;
+        if (KeptOfClose(found.locations + first, found.amplitudes + first, count,
+                        ofValleys_ ? 1.0 : -1.0, lastLocation_, &kept)) {
+            if (const ErrorCode failed = append(found, first, kept))
+                return failed;
+            continue;
+        }
+        for (int32_t i = first; i < first + count; ++i)
+            if (const ErrorCode failed =
+                    store(Peak{found.locations[i], found.amplitudes[i], found.curvatures[i]}))
+                return failed;
+    }
+    return 0;
+}
+
+ErrorCode PeakList::append(const FoundVertices &found, int32_t first, uint64_t kept) {
+    while (kept != 0) {
+        if (size_ == capacity_)
+            if (const ErrorCode failed = grow())
+                return failed;
+        DBL *to = place(size_);
+        DBL *const end = to + chunk - size_ % chunk;
+        DBL *const begin = to;
+        for (; kept != 0 && to != end; kept &= kept - 1, ++to) {
+            const int32_t i = first + std::countr_zero(kept);
+            to[0] = found.locations[i];
+            to[chunk] = found.amplitudes[i];
+            to[2 * chunk] = found.curvatures[i];
+        }
+        size_ += static_cast<int32_t>(to - begin);
+        lastLocation_ = to[-1];
+        lastAmplitude_ = to[chunk - 1];
+    }
+    return 0;
+}
+
+void PeakList::copyTo(DBL *locations, DBL *amplitudes, DBL *derivatives) const {
+    for (int32_t i = 0; i < size_; i += chunk) {
+        const int32_t count = std::min(chunk, size_ - i);
+        const DBL *const from = place(i);
+        Copy(locations + i, from, count);
+        Copy(amplitudes + i, from + chunk, count);
+        Copy(derivatives + i, from + 2 * chunk, count);
+    }
 }
 
 void PointInto(DBL *buffer, int32_t w, PeakDState *state) {
@@ -340,7 +421,8 @@ ErrorCode PeakDetectStep(const PeakBlock &block, PeakDState *state, PeakList *fo
         state->incoming = block.data;
         state->tailCount = block.n;
     }
-    // The window that the block ends with is the first of the next block, or is scanned now.
+    // The last window of the block is the first one of the next block, unless this block is the
+    // last.
     const int64_t windows = int64_t{state->tailCount} + block.isLast;
     if (state->position + windows > std::numeric_limits<int32_t>::max())
         return ErrOverflow;
@@ -350,8 +432,8 @@ ErrorCode PeakDetectStep(const PeakBlock &block, PeakDState *state, PeakList *fo
         Subtract(flat.mean, block.data, block.n);
         Subtract(flat.mean, state->history, w);
     }
-    // The work window and the history lie side by side in the buffer: with the history moved to the
-    // former and new samples in the place of the latter all windows are runs of neighbours.
+    // The work window and the history are adjacent in the buffer. With the history copied into the
+    // former and new samples in place of the latter, all windows are contiguous.
     DBL *const seam = state->window;
     Copy(seam, state->history, w);
     Copy(seam + w, state->incoming, std::min(w, state->tailCount));

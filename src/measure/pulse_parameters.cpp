@@ -13,8 +13,8 @@ namespace {
 constexpr int32_t pulseBins = 101;
 constexpr double none = std::numeric_limits<double>::quiet_NaN();
 
-// Base and top: the fullest bins on the ways from both ends to the middle, the outer one of
-// several. The middle bin belongs to the top.
+// Base and top: the fullest bins between each end and the middle; the outermost one if several are
+// equally full. The middle bin belongs to the top.
 void FindBaseAndTop(const DBL *y, int32_t n, double min, double max, PulseParametersFound *found) {
     I32 counts[pulseBins];
     DBL centres[pulseBins];
@@ -35,14 +35,15 @@ void FindBaseAndTop(const DBL *y, int32_t n, double min, double max, PulseParame
     }
 }
 
-// A waveform that begins below its pulse: the given one, or it turned over. Every sample is looked
-// at through here.
+// A waveform that begins below its pulse: the given waveform, or its negative. All samples are read
+// through this class.
 class RisingFirst {
 public:
     RisingFirst(const DBL *y, int32_t n, bool isTurned) : y_(y), n_(n), isTurned_(isTurned) {}
     int32_t size() const { return n_; }
 
-    // The first sample from `from` on at or above, at or below a level; n if there is none.
+    // The first sample from `from` on that is at or above a level, or at or below it; n if there is
+    // none.
     int32_t firstAbove(int32_t from, double level) const {
         return isTurned_ ? FirstBeyond(y_, from, n_, -level, none)
                          : FirstBeyond(y_, from, n_, none, level);
@@ -63,7 +64,7 @@ public:
         }
         return before > fallback ? before : fallback;
     }
-    // Where the waveform meets the level on its way to sample i.
+    // The position at which the waveform crosses the level on its way to sample i.
     double crossing(int32_t i, double level) const {
         if (i == 0)
             return 0;
@@ -86,7 +87,7 @@ void MeasureTimes(const RisingFirst &y, double base, double amplitude,
     const double level50 = base + 0.5 * amplitude;
     const double level90 = base + 0.9 * amplitude;
 
-    // A waveform that never is below 10% rises from its first sample on.
+    // A waveform that is never below 10% rises from its first sample on.
     const int32_t at50 = y.firstAbove(0, level50);
     const int32_t below10 = y.lastBelow(at50, level10, -1);
     found->delay = at50 < n ? y.crossing(at50, level50) : n - 1;
@@ -100,7 +101,7 @@ void MeasureTimes(const RisingFirst &y, double base, double amplitude,
     const int32_t above90 = y.lastAbove(back50, level90, at90 < n ? at90 : n - 1);
     found->width = (back50 < n ? y.crossing(back50, level50) : n - 1) - found->delay;
 
-    // The way down from above90 begins behind it, unless the pulse never comes above 50% at all.
+    // The fall begins after above90, unless the pulse never exceeds 50%.
     const int32_t back10 = y.firstBelow(back50, level10);
     found->fallTime =
         back10 < n ? y.crossing(back10, level10) - y.crossing(above90 + (back50 > at90), level90)

@@ -12,16 +12,17 @@ namespace {
 
 bool IsDirection(int32_t direction) { return direction == falling || direction == rising; }
 
-// A list of `2 number + 1` entries: the period or transition asked for, whichever way the waveform
-// begins, and the entry behind it. No two entries lie between the same samples, so the list need
-// not be longer than the waveform.
+// A list of `2 number + 1` entries: enough for the requested period or transition, whichever way
+// the waveform begins, and the entry after it. No two entries lie between the same samples, so the
+// list need not be longer than the waveform.
 template <class Entry>
 class List {
 public:
     ErrorCode allocate(int32_t number, const Waveform &waveform) {
         constexpr int64_t size = sizeof(Entry);
         const int64_t wanted = 2 * int64_t{number} + 1;
-        // kept: a list that no scratch block could hold is refused, though it needs none so long.
+        // kept: a count whose list would exceed a scratch block is refused, although the list is
+        // never that long.
         if (wanted * size > std::numeric_limits<int32_t>::max())
             return ErrMeasureOutOfMemory;
         length_ = static_cast<int32_t>(std::min<int64_t>(wanted, waveform.n));
@@ -31,7 +32,7 @@ public:
     Entry *data() const { return static_cast<Entry *>(memory_.bytes()); }
     const Entry &operator[](int32_t i) const { return data()[i]; }
 
-    // The place of the entry of this number in a direction, or `count`.
+    // The index of the entry with this number among those of a direction, or `count`.
     int32_t find(int32_t number, int32_t direction, int32_t count) const {
         int32_t place = 0;
         for (; place < count; ++place)
@@ -50,7 +51,7 @@ ErrorCode SelectPulse(const Waveform &waveform, double h, int32_t direction, boo
     List<Crossing> list;
     if (const ErrorCode failed = list.allocate(number, waveform))
         return failed;
-    const int32_t wanted = 2 * number + 1; // fits, since the list could
+    const int32_t wanted = 2 * number + 1; // fits, because the list did
     const int32_t count =
         FindMidCrossings(waveform.t0, waveform.y, waveform.n, mid, h, list.data(), list.length());
     const bool isEnough = count == wanted || (mayBePartial && count == wanted - 1 &&
@@ -59,14 +60,14 @@ ErrorCode SelectPulse(const Waveform &waveform, double h, int32_t direction, boo
         return ErrMeasureSearchShort;
     const int32_t first =
         direction == either ? 2 * number - 2 : list.find(number, direction, count);
-    if (first + 1 >= count) // only with NaN among the samples do directions not alternate
+    if (first + 1 >= count) // directions alternate unless there is NaN among the samples
         return ErrMeasureSearchShort;
 
     const double begin = list[first].position;
     const double end = list[first + 1].position;
     *found = {0, end - begin, 0, (begin + end) * 0.5};
     if (!mayBePartial) {
-        // kept: the period counts by the place in the list, whichever edges the pulse has.
+        // kept: the period is counted by the index in the list, whichever edges the pulse has.
         found->period = list[2 * number].position - list[2 * number - 2].position;
         found->dutyCycle = found->duration / found->period;
     }
@@ -77,7 +78,7 @@ ErrorCode SelectPulse(const Waveform &waveform, double h, int32_t direction, boo
     return 0;
 }
 
-// A state's level and the bin of the histogram around it.
+// The level of a state and the bin of the histogram around it.
 struct StateBand {
     double level, lower, upper;
     bool isHigh;
@@ -91,7 +92,7 @@ struct Aberration {
     double under, over;
 };
 
-// Of y[first..last], in percent of the amplitude.
+// The aberration of y[first..last] in percent of the amplitude.
 Aberration AberrationIn(const DBL *y, int32_t first, int32_t last, const StateBand &state,
                         double amplitude) {
     double max = y[first];
@@ -104,10 +105,10 @@ Aberration AberrationIn(const DBL *y, int32_t first, int32_t last, const StateBa
             max > state.upper ? (max - state.level) * 100 / amplitude : 0.0};
 }
 
-// What the regions of aberrations are bounded by.
+// The bounds of the regions of aberrations.
 struct Neighbours {
     const Transition *before, *behind; // null at an end of the waveform
-    int64_t reach;                     // in samples; the waveform's length where there is no limit
+    int64_t reach; // in samples; the length of the waveform if there is no limit
 };
 
 int32_t Middle(int32_t a, int32_t b) { return a + (b - a) / 2; }
@@ -137,8 +138,8 @@ Aberration BehindTransition(const Waveform &waveform, const Transition &transiti
     return AberrationIn(waveform.y, first, last, state, amplitude);
 }
 
-// The levels of a transition's states: in the end always of the histogram, unless one of the
-// automatic method's extremes stands for a state.
+// The levels of a transition's states. In the end they always come from the histogram, unless the
+// automatic method uses an extreme for a state.
 ErrorCode TransitionLevels(const Waveform &waveform, const LevelSearch &search,
                            ReferenceLevels *references, StateLevelsFound *levels) {
     ErrorCode status = ComputeLevels(waveform, search, levels);
@@ -155,7 +156,7 @@ ErrorCode TransitionLevels(const Waveform &waveform, const LevelSearch &search,
         const ErrorCode warning = TakeHistogramLevels(waveform, search, !isByPeaks, levels);
         status = Merge(status, warning);
     }
-    // A single bin has both states.
+    // The amplitude is 0 if both states are in one bin.
     return levels->amplitude > 0 ? status : ErrMeasureNotPositive;
 }
 
@@ -181,7 +182,7 @@ void MeasureAberrations(const Waveform &waveform, const LevelSearch &search,
     found->postOvershoot = post.over;
 }
 
-// From a time in samples, rounded, into [0, most].
+// A time in samples, rounded and limited to [0, most].
 int32_t Rounded(double samples, int32_t most) {
     const double rounded = std::trunc(samples + 0.5);
     return rounded > 0 ? static_cast<int32_t>(std::min<double>(rounded, most)) : 0;
@@ -224,7 +225,7 @@ ErrorCode MeasureCycle(const Waveform &waveform, const LevelSearch &search, int3
         return status;
     found->start = pulse.center - pulse.duration / 2;
     found->end = found->start + pulse.period;
-    // Far from 0 the times are rounded, so the samples are held within the waveform.
+    // Times far from 0 are rounded, so the samples are limited to the waveform.
     const int32_t count = Rounded(pulse.period / waveform.dt, waveform.n);
     if (count == 0)
         return ErrMeasureNotFound;

@@ -6,13 +6,13 @@
 
 namespace qx {
 
-// Each takes the references as the caller has them and leaves absolute ones. Codes: those of
-// CheckWaveform and ComputeLevels, and what is told here.
+// Each function takes the references as the caller has them and replaces them by absolute ones.
+// Codes: those of CheckWaveform and ComputeLevels, and those listed here.
 
 struct PulseFound {
     double period, duration, dutyCycle, center;
 };
-// With a direction of `either` the pulse begins with whatever edge has its place.
+// With the direction `either`, the pulse begins with whichever edge has its place in the list.
 // ErrMeasureBadCount, ErrInvalidSelector (direction), ErrMeasureRangeReversed,
 // ErrMeasureOutOfMemory, ErrMeasureSearchShort.
 ErrorCode MeasurePulse(const Waveform &waveform, const LevelSearch &search, int32_t direction,
@@ -22,7 +22,7 @@ ErrorCode MeasurePulse(const Waveform &waveform, const LevelSearch &search, int3
 struct CycleFound {
     double mean, rms, start, end;
 };
-// Those of MeasurePulse, ErrMeasureNotFound.
+// The codes of MeasurePulse, ErrMeasureNotFound.
 ErrorCode MeasureCycle(const Waveform &waveform, const LevelSearch &search, int32_t number,
                        ReferenceLevels *references, CycleFound *found);
 

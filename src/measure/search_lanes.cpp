@@ -6,10 +6,10 @@ namespace qx::QX_WIDTH {
 namespace {
 
 typedef Lanes<nativeLanes> L;
-constexpr int together = 4; // vectors that are looked at before a branch
+constexpr int together = 4; // vectors that are tested before a branch
 constexpr int32_t stride = together * nativeLanes;
 
-// Each test once for a sample and once for those of a vector.
+// Each test for a single sample and for a vector of samples.
 struct Beyond {
     const DBL *y;
     double lower, upper;
@@ -49,7 +49,8 @@ struct BeyondOrCrossing {
 
 template <class Test>
 QX_INLINE int32_t First(int32_t from, int32_t end, const Test &test) {
-    // The next event of a lively waveform is near, so the first vectors are looked at one by one.
+    // In a waveform with many events the next one is near, so the first vectors are tested one by
+    // one.
     int32_t i = from;
     for (int k = 0; k < together && end - i >= nativeLanes; ++k, i += nativeLanes)
         if (const unsigned bits = MaskBits(test.many(i)))

@@ -16,7 +16,7 @@ namespace {
 // s r sin.
 constexpr int32_t momentsOfLine = 4;
 
-// For theta of 2 pi turns.
+// The kernel at theta = 2 pi turns.
 Kernel SumDirectly(double turns, int32_t n) {
     Kernel sum = {0, 0, 0};
     const double middle = 0.5 * (n - 1);
@@ -31,11 +31,12 @@ Kernel SumDirectly(double turns, int32_t n) {
     return sum;
 }
 
-// Nearer to 0 the derivatives of the quotient lose their digits, and so near to each other are
-// hardly ever two lines.
+// Below this the derivatives of the quotient lose digits; two lines are hardly ever so close to
+// each other.
 constexpr double nearZero = 0.05;
 
-// Of N(x) / sin x with x = theta / 2 and N(x) = sin(n x): first and second derivative by x.
+// The kernel from N(x) / sin x with x = theta / 2 and N(x) = sin(n x), and its first and second
+// derivatives with respect to x.
 Kernel FromHalfAngle(Phasor x, Phasor nx, int32_t n) {
     const double count = n;
     const double slope = count * nx.cosine;
@@ -57,13 +58,13 @@ Phasor Difference(Phasor a, Phasor b) {
     return {a.cosine * b.cosine + a.sine * b.sine, a.sine * b.cosine - a.cosine * b.sine};
 }
 
-// turns is from -1/2 to 1.
+// turns is between -1/2 and 1.
 Kernel KernelAt(double turns, int32_t n) {
     const double count = n;
     if (turns == 0)
         return {count, 0, count * (count * count - 1) / 12};
     if (turns > 0.5) {
-        // The middle of an even number of samples lies between two of them.
+        // The middle of an even number of samples lies between two samples.
         const Kernel k = KernelAt(turns - 1, n);
         const double sign = n % 2 == 0 ? -1 : 1;
         return {sign * k.cosines, sign * k.sines, sign * k.squares};
@@ -119,7 +120,7 @@ ErrorCode SinusoidFit::reserve(int32_t lines) {
     return 0;
 }
 
-// The waves of a block from phase 0, as products of two out of 14 phasors.
+// The waves of a block with phase 0, as products of two out of 14 phasors.
 void SinusoidFit::layTable(const Line &line, DBL *table) {
     constexpr int32_t step = 8;
     Phasor near[step], far[waveBlock / step];
@@ -134,9 +135,9 @@ void SinusoidFit::layTable(const Line &line, DBL *table) {
     }
 }
 
-// The phases of a block are those of its first sample, turned by those of 0, 1, ... from the table.
-// Those of every 16th block are exact to the last bits, however long the record is, and the others
-// turned from block to block.
+// The phases in a block are that of its first sample, rotated by the table's phases for 0, 1, ....
+// Every 16th block starts with a phase that is exact to the last bits, however long the record is;
+// the phases of the other blocks follow by rotation from block to block.
 double SinusoidFit::sumOfSquares(const Line *lines, int32_t count, double constant, DBL *moments,
                                  DBL *residual) {
     constexpr std::ptrdiff_t wave = 2 * waveBlock;
@@ -174,7 +175,7 @@ double SinusoidFit::sumOfSquares(const Line *lines, int32_t count, double consta
     return squares;
 }
 
-// Of a block whose waves are at hand.
+// Adds the moments of a block whose waves have been computed.
 void SinusoidFit::addMoments(const DBL *left, int32_t count, double s0, double sum, DBL *moments) {
     moments[0] += sum;
     for (std::ptrdiff_t l = 0; l < count; ++l) {
@@ -188,7 +189,7 @@ void SinusoidFit::addMoments(const DBL *left, int32_t count, double s0, double s
     }
 }
 
-// The order of the step before is nearly right.
+// The order of the previous step is nearly right.
 void SinusoidFit::sortByFrequency(const Line *lines) {
     for (int32_t i = 1; i < layout_.count; ++i) {
         const int32_t moved = order_[i];
@@ -225,8 +226,8 @@ void SinusoidFit::buildNormal(const Line *lines) {
     }
 }
 
-// The kernels of the difference and of the sum of the frequencies of two lines, of which p has the
-// higher one.
+// The kernels of the difference and of the sum of the frequencies of two lines; p has the higher
+// frequency.
 void SinusoidFit::kernelsOf(const Line *lines, int32_t p, int32_t q, Kernel &less,
                             Kernel &more) const {
     const Phasor *const ofP = halfAngles_ + 2 * std::ptrdiff_t{p};
@@ -240,7 +241,8 @@ void SinusoidFit::kernelsOf(const Line *lines, int32_t p, int32_t q, Kernel &les
                                      : FromHalfAngle(Sum(ofP[0], ofQ[0]), Sum(ofP[1], ofQ[1]), n_);
 }
 
-// Of the derivatives by the parameters of two lines, in the order of their frequencies.
+// Adds the products of the derivatives with respect to the parameters of two lines, in the order of
+// their frequencies.
 void SinusoidFit::addProducts(const Line *lines, int32_t placeOfP, int32_t placeOfQ) {
     const Line &p = lines[order_[placeOfP]], &q = lines[order_[placeOfQ]];
     const std::ptrdiff_t ofP = layout_.ofPlace(placeOfP), ofQ = layout_.ofPlace(placeOfQ);
@@ -287,10 +289,10 @@ void SinusoidFit::buildGradient(const Line *lines) {
     }
 }
 
-// Cholesky's method on the matrix scaled to a diagonal of 1 + damping. A parameter on which nothing
-// depends, such as the frequency of a line without amplitude, stays.
+// Cholesky factorisation of the matrix scaled to a diagonal of 1 + damping. A parameter that has no
+// influence, such as the frequency of a line without amplitude, stays as it is.
 bool SinusoidFit::factor(double damping) {
-    constexpr double nothing = 1e-40; // of the number of samples
+    constexpr double nothing = 1e-40; // relative to the number of samples
     for (std::ptrdiff_t i = 0; i < layout_.size(); ++i) {
         const DBL *const normal = layout_.row(normal_, i);
         DBL *const row = layout_.row(factor_, i);
@@ -314,7 +316,8 @@ bool SinusoidFit::factor(double damping) {
     return true;
 }
 
-// The step by the factored matrix, and by how much a linear model would lower the sum of squares.
+// Solves for the step with the factored matrix; returns by how much a linear model would lower the
+// sum of squares.
 double SinusoidFit::solve() {
     const std::ptrdiff_t n = layout_.size();
     for (std::ptrdiff_t i = 0; i < n; ++i) {
@@ -338,13 +341,13 @@ double SinusoidFit::solve() {
     return promised;
 }
 
-// False where a frequency leaves what a record of this length tells from 0 and from half the
-// sampling rate.
+// Returns false if a frequency is too close to 0 or to half the sampling rate for a record of this
+// length.
 bool SinusoidFit::takeStep(const Line *from, Line *to) {
     double widest = 0;
     for (std::ptrdiff_t place = 0; place < layout_.count; ++place)
         widest = std::max(widest, std::fabs(step_[layout_.frequencyOf(place)]));
-    if (widest > kPi) // a bin at most
+    if (widest > kPi) // at most a bin
         for (std::ptrdiff_t i = 0; i < layout_.size(); ++i)
             step_[i] *= kPi / widest;
     for (std::ptrdiff_t place = 0; place < layout_.count; ++place) {
@@ -366,7 +369,7 @@ double SinusoidFit::refine(Line *lines, int32_t count, Frequencies frequencies,
                            const FitEffort &effort, double &constant) {
     constexpr double mostDamping = 1e6;
     constexpr double firstDamping = 1e-3;
-    constexpr double rounding = 1e-27; // of the samples' own squares
+    constexpr double rounding = 1e-27; // of the samples' sum of squares
 
     layout_ = {count, frequencies, std::min(effort.reach, count)};
     for (int32_t l = 0; l < count; ++l)

@@ -11,8 +11,8 @@ namespace qx {
 
 // A line of a record of n samples: cosine cos(2 pi frequency s) + sine sin(2 pi frequency s), with
 // s the sample number counted from the middle of the record, (n - 1) / 2, and the frequency in
-// cycles per sample. Where lines have one frequency in common that changes by d, that of the line
-// changes by slope d.
+// cycles per sample. If lines share a common frequency, a change of it by d changes the frequency
+// of this line by slope d.
 struct Line {
     DBL frequency;
     DBL cosine, sine;
@@ -28,20 +28,21 @@ struct Kernel {
     double cosines, sines, squares;
 };
 
-// Of the lines of a fit: each has its own, as tones have, or all have one, as harmonics have.
+// The frequencies of the lines of a fit: independent ones, as for tones, or a common one, as for
+// harmonics.
 enum class Frequencies { Own, Common };
 
 double Amplitude(const Line &line);
-// The phase of the line as a cosine at the first of n samples, above -pi and at most pi.
+// The phase of the line as a cosine at the first of n samples, in (-pi, pi].
 double PhaseAtStart(const Line &line, int32_t n);
 
-// value count - its nearest integer; count is a multiple of 1/2.
+// value count minus its nearest integer; count is a multiple of 1/2.
 double PartOfTurn(double value, double count);
 
-// How far a fit goes. It ends before a step that would take less than the part `settled` of the sum
-// of squares, or after mostSteps. The matrix of a step leaves out what lines more than `reach`
-// places apart in the order of their frequencies have in common, which makes the steps less good,
-// not the fit.
+// The effort of a fit. It ends before a step that would reduce the sum of squares by less than the
+// fraction `settled`, or after mostSteps. The matrix of a step neglects the products of lines that
+// are more than `reach` places apart in the order of their frequencies, which makes the steps less
+// good, but not the fit.
 struct FitEffort {
     double settled;
     int32_t mostSteps;
@@ -49,33 +50,34 @@ struct FitEffort {
 };
 
 // A constant and lines, fitted to samples by least squares: the sine fit of IEEE 1057 extended to
-// several lines. Damped Gauss-Newton steps (D. W. Marquardt, 1963) in all parameters at once; the
-// products of the derivatives with each other have closed forms, so that a step takes time in
-// proportion to samples times lines.
+// several lines. Uses damped Gauss-Newton steps (D. W. Marquardt, 1963) in all parameters together.
+// The products of the derivatives have closed forms, so that the time of a step is proportional to
+// samples times lines.
 class SinusoidFit {
 public:
     static constexpr int32_t farthestReach = 32;
 
-    // Samples of magnitude about 1 that stay where they are.
+    // Samples of magnitude about 1, which must remain in place.
     void begin(const DBL *samples, int32_t n);
 
-    // Memory for so many lines, of which the rest of the calls may have fewer. ErrOutOfMemory.
+    // Allocates memory for `lines` lines; later calls may use fewer. ErrOutOfMemory.
     ErrorCode reserve(int32_t lines);
 
-    // Moves the lines and the constant from where they are to the least squares nearby. What is
-    // left of the sum of squares.
+    // Moves the lines and the constant from their start values to the nearby least-squares
+    // solution. Returns the remaining sum of squares.
     double refine(Line *lines, int32_t count, Frequencies frequencies, const FitEffort &effort,
                   double &constant);
 
-    // What is left of the samples, and the sum of its squares; residual may be null, or the
+    // Computes the residual and returns the sum of its squares; residual may be null, or the
     // samples.
     double residualOf(const Line *lines, int32_t count, double constant, DBL *residual);
 
 private:
-    // The parameters are the constant, then cosine, sine and, unless it is in common, frequency of
-    // each line in the order of the frequencies, and last the common frequency. Frequencies are in
-    // units of 1 / (pi n). Of the symmetric matrix of their products the rows of the lower triangle
-    // are kept from the first line within reach on, that of the common frequency as a whole.
+    // The parameters are the constant, then the cosine, the sine and, unless it is common, the
+    // frequency of each line in the order of the frequencies, and last the common frequency.
+    // Frequencies are in units of 1 / (pi n). Of the symmetric matrix of their products, each row
+    // of the lower triangle is stored from the first line within reach on; the row of the common
+    // frequency is stored in full.
     struct Layout {
         int32_t count;
         Frequencies frequencies;
@@ -93,12 +95,12 @@ private:
             return row == 0 || row == common() || place < reach ? 0 : ofPlace(place - reach);
         }
         std::ptrdiff_t width() const { return 1 + perLine() * (std::ptrdiff_t{reach} + 1); }
-        // Where the row begins; element (row, col) is col places on.
+        // Where the row begins; element (row, col) is at offset col.
         DBL *row(DBL *matrix, std::ptrdiff_t row) const {
             return matrix + row * width() - firstInRow(row);
         }
-        // Of the products of lines so many places apart: 1, or weights that fall to 0 beyond the
-        // reach and so leave the matrix positive (I. Schur, 1911).
+        // The weight of the products of lines that are `apart` places apart: 1, or a weight that
+        // falls to 0 beyond the reach, which keeps the matrix positive (I. Schur, 1911).
         double weight(std::ptrdiff_t apart) const {
             return count <= reach ? 1.0 : 1.0 - static_cast<double>(apart) / (reach + 1.0);
         }
@@ -123,12 +125,11 @@ private:
     int32_t n_ = 0;
     Layout layout_ = {};
     ScratchParts memory_;
-    VectorView<ElementType::I32> order_; // the lines by rising frequency
-    // By line: at the first sample of the block at hand, of a block, and two of half the angle of a
-    // sample and of all.
+    VectorView<ElementType::I32> order_; // the lines by ascending frequency
+    // For each line: the phasor at the first sample of the current block, the phasor of a block,
+    // and two of half the angle, of one sample and of all.
     Phasor *atBlock_ = nullptr, *ofBlock_ = nullptr, *halfAngles_ = nullptr;
-    // Of the block at hand, by line: cosines and sines; and those of a wave from
-    // phase 0.
+    // For each line: cosines and sines of the current block, and those of a wave with phase 0.
     DBL *waves_ = nullptr, *table_ = nullptr;
     DBL *normal_ = nullptr, *factor_ = nullptr;
     DBL *gradient_ = nullptr, *step_ = nullptr, *scale_ = nullptr;

@@ -13,17 +13,18 @@
 namespace qx {
 namespace {
 
-// Lines below this part of the largest tone are rounding.
+// Lines below this fraction of the largest tone are rounding errors.
 constexpr double smallestPart = 1e-12;
 
-// How far fits go: while tones are still sought, what is off must not be seen as a line; in the end
-// it must be far below what noise does. The bounds of the steps are for records that are no tones.
+// The effort of fits. While tones are still being searched for, the error must not look like a
+// line; in the end it must be far below that of the noise. The limits on steps are for records that
+// are not made of tones.
 constexpr FitEffort nearby = {1e-6, 20, SinusoidFit::farthestReach};
 constexpr FitEffort searching = {1e-6, 3, 12};
 constexpr FitEffort forGood = {1e-20, 100, SinusoidFit::farthestReach};
 
-// The vertex of the parabola through three neighbours, of which the second is the largest, from
-// that.
+// The vertex of the parabola through three neighbours, relative to the middle one, which is the
+// largest.
 double Vertex(double before, double at, double behind) {
     const double curvature = before - 2 * at + behind;
     return curvature < 0 ? 0.5 * (before - behind) / curvature : 0;
@@ -44,7 +45,7 @@ ErrorCode ToneSearch::begin(const DBL *y, int32_t n) {
     if (const ErrorCode failed = samples_.allocate(n))
         return failed;
 
-    // From the first sample, so that a constant leaves nothing but zeros.
+    // Relative to the first sample, so that a constant leaves nothing but zeros.
     const double first = y[0] / unit_;
     double sum = 0;
     for (int32_t t = 0; t < n; ++t)
@@ -80,7 +81,7 @@ ErrorCode ToneSearch::reserve(int32_t count) {
     return 0;
 }
 
-// The spectrum is at half a bin or less.
+// The spectrum has a spacing of half a bin or less.
 ErrorCode ToneSearch::reserveSpectrum() {
     if (spectrumLength_ > 0)
         return 0;
@@ -96,7 +97,7 @@ ErrorCode ToneSearch::reserveSpectrum() {
     if (!*plan_)
         return ErrOutOfMemory;
 
-    // Von Hann's, without zeros at its ends: what 0 leaves of its negative.
+    // Von Hann's window without zeros at its ends, computed as zeros minus its negative.
     const Line wave = {1.0 / n_, -0.5, 0, 0};
     Fill(window_.data(), n_, 0.0);
     SinusoidFit window;
@@ -108,8 +109,8 @@ ErrorCode ToneSearch::reserveSpectrum() {
     return 0;
 }
 
-// The mean power of noise: its powers have an exponential distribution, whose median is ln 2 of its
-// mean. Of many powers every so many are taken. The spectrum is lost.
+// The mean power of the noise: its powers have an exponential distribution, whose median is ln 2
+// times its mean. If there are many powers, only every k-th one is used. Overwrites the spectrum.
 double ToneSearch::noiseOf(const DBL *power, int32_t count) {
     constexpr double medianOfMean = 0.6931471805599453;
     constexpr int32_t enough = 1 << 15;
@@ -121,7 +122,8 @@ double ToneSearch::noiseOf(const DBL *power, int32_t count) {
     return spectrum_[taken / 2] / medianOfMean;
 }
 
-// The spectrum of the windowed residual, which stays in residual_.
+// Finds the largest line in the spectrum of the windowed residual; the residual itself stays in
+// residual_.
 ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
     if (const ErrorCode failed = reserveSpectrum())
         return failed;
@@ -163,7 +165,7 @@ ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
     return 0;
 }
 
-// What a rectangular window lets through from farther away is left to the fit of all.
+// Leakage of the rectangular window from lines farther away is left to the fit of all lines.
 ToneSearch::Neighbourhood ToneSearch::linesAround(double frequency) const {
     constexpr double farthest = 16; // bins
     Neighbourhood around;
@@ -187,8 +189,9 @@ ToneSearch::Neighbourhood ToneSearch::linesAround(double frequency) const {
     return around;
 }
 
-// One start of the fit: a new line at `frequency` without amplitude, and where `split` is one of
-// the others, that moved to the other side. The best result so far is kept in `least`.
+// One start of the fit: a new line at `frequency` without amplitude. If `split` is the index of
+// another line, the two are moved to opposite sides of `frequency`. The best result so far is in
+// `least`.
 void ToneSearch::fitFrom(const Neighbourhood &around, double frequency, int32_t split,
                          double offset, Neighbourhood &least) {
     Neighbourhood trial = around;
@@ -205,7 +208,7 @@ void ToneSearch::fitFrom(const Neighbourhood &around, double frequency, int32_t 
         least = trial;
 }
 
-// Fits a new line to what the lines that are not around it leave.
+// Fits a new line to the residual of all lines that are not in `around`.
 ToneSearch::Neighbourhood ToneSearch::fitNearby(const Neighbourhood &around, double frequency) {
     Line negatives[mostNearby];
     for (int32_t i = 0; i < around.count; ++i) {
@@ -217,7 +220,7 @@ ToneSearch::Neighbourhood ToneSearch::fitNearby(const Neighbourhood &around, dou
     fit_.residualOf(negatives, around.count, 0, residual_.data());
     Neighbourhood least = around;
     fitFrom(around, frequency, -1, 0, least);
-    // A line near it may stand for two that the spectrum does not resolve.
+    // A line near it may represent two that the spectrum does not resolve.
     constexpr double resolved = 4; // bins
     constexpr int32_t mostSplit = 2;
     for (int32_t i = 0; i < std::min(around.count, mostSplit); ++i) {
@@ -230,9 +233,9 @@ ToneSearch::Neighbourhood ToneSearch::fitNearby(const Neighbourhood &around, dou
     return least;
 }
 
-// By its height above the median of the spectrum; and, where the record is too short for that or
-// the spectrum does not resolve the line, by how much the fit gains of what is left (the likelihood
-// ratio), against the largest that noise alone makes of so many frequencies.
+// Judged by the height above the median of the spectrum and, if the record is too short for that or
+// the spectrum does not resolve the line, by how much the fit reduces the residual (the likelihood
+// ratio), compared with the largest value that noise alone produces for so many frequencies.
 bool ToneSearch::isAboveNoise(const Peak &peak, double squaresBefore) const {
     constexpr double margin = 9.0;
     const double threshold = std::log(static_cast<double>(n_)) + margin;

@@ -19,49 +19,50 @@ struct Band {
 };
 constexpr Band wholeBand = {0.0, 0.5};
 
-// Tones of a record, found one after the other as the largest line in the spectrum of what the
-// former have left, and fitted together.
+// The tones of a record. They are found one after the other, each as the largest line in the
+// spectrum of the residual of the previous ones, and are fitted together.
 class ToneSearch {
 public:
-    // At least 4 finite samples. ErrMeasureNotFound (nothing but a constant), ErrOutOfMemory.
+    // At least 4 finite samples. ErrMeasureNotFound (only a constant), ErrOutOfMemory.
     ErrorCode begin(const DBL *y, int32_t n);
 
     enum class Step {
         Added,
         OnlyNoise, // the largest line of the band is not above the noise, and was not added
-        Exhausted  // nothing above the rounding is left, or as many tones as the samples can tell
+        Exhausted // nothing above rounding is left, or there are as many tones as the samples can determine
     };
-    // Adds the largest line of the band; the first one of all, and one `evenInNoise`, also where
-    // noise alone could have made it. ErrOutOfMemory.
+    // Adds the largest line of the band. The very first line, and any line if `evenInNoise`, is
+    // added even if noise alone could have produced it. ErrOutOfMemory.
     ErrorCode add(const Band &band, bool evenInNoise, Step &step);
 
     int32_t count() const { return count_; }
     const Line &operator[](int32_t i) const { return lines()[i]; }
     double constant() const { return constant_; }
 
-    // Fits the tones to the last digits, when all are found.
+    // Fits the tones to the last digits, once all have been found.
     void settle();
-    // Lines with a common frequency, from here on in the place of the tones; fitted.
+    // Replaces the tones by lines with a common frequency, and fits them.
     ErrorCode replace(const Line *lines, int32_t count);
-    // The root mean square of what constant and tones leave; residual, if not null, gets all of it.
+    // The root mean square of the residual of the constant and the tones; the residual itself is
+    // stored in `residual` unless that is null.
     double residualRms(DBL *residual);
-    // The same without the tones but the first `count`, or but this one.
+    // The same with only the first `count` tones, or with only this tone.
     double residualRmsOf(int32_t count);
     double residualRmsOf(const Line &tone);
 
-    // The samples are measured in this unit, a power of 2, from this level.
+    // The samples are scaled by this unit, a power of 2, after subtraction of the level.
     double unit() const { return unit_; }
     double level() const { return level_; }
 
 private:
     struct Peak {
         double frequency, amplitude;
-        double overNoise; // of its power
+        double overNoise; // the ratio of its power to the noise
     };
-    // The lines that are fitted together with a new one, which is the last; the others stay.
+    // The lines that are fitted together with a new one, which comes last; the others are fixed.
     static constexpr int32_t mostNearby = 8;
     struct Neighbourhood {
-        I32 places[mostNearby]; // in the list of tones, from the nearest on
+        I32 places[mostNearby]; // in the list of tones, nearest first
         Line lines[mostNearby + 1];
         int32_t count;
         double constant, squares;

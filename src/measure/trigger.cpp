@@ -8,8 +8,8 @@
 namespace qx {
 namespace {
 
-// Where the line between two neighbours passes the level; at the second one where both lie on the
-// same side. Halves keep the differences finite.
+// The position at which the line between two neighbours crosses the level; the second one if both
+// lie on the same side. Halving keeps the differences finite.
 double Passage(const TriggerState &state, double value, int32_t index, double level) {
     if (!state.hasLast)
         return index;

@@ -22,8 +22,8 @@ struct TriggerHit {
     double position;
 };
 
-// The first trigger from sample `from` on; state moves behind it, or behind the block.
-// ErrNonFiniteInput, with the state as it was.
+// Finds the first trigger from sample `from` on; state moves past it, or past the end of the block.
+// ErrNonFiniteInput leaves the state unchanged.
 ErrorCode FindTrigger(const DBL *y, int32_t n, int32_t from, const TriggerSettings &settings,
                       TriggerState &state, TriggerHit &hit);
 

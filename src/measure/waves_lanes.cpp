@@ -9,7 +9,7 @@ typedef Lanes<nativeLanes> L;
 constexpr int32_t sumsOfEach = 4;
 constexpr int32_t parts = sumsOfEach / nativeLanes;
 
-// Four sums of every fourth term.
+// Four partial sums, each of every fourth term.
 struct Fourfold {
     L sums[parts];
 

@@ -8,7 +8,7 @@ namespace qx {
 
 namespace {
 
-// Samples at the high rate go through the cascade in pieces that stay in the first cache.
+// Samples at the high rate pass through the cascade in pieces that stay in the first-level cache.
 constexpr int32_t pieceSize = 512;
 
 class Cascade {

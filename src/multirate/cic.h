@@ -8,8 +8,8 @@
 
 namespace qx {
 
-// Cascaded integrator-comb filters as cascades of moving averages over width samples at the high
-// rate.
+// Cascaded integrator-comb filters, implemented as cascades of moving averages over `width` samples
+// at the high rate.
 
 struct CICShape {
     int32_t stages;
@@ -17,15 +17,16 @@ struct CICShape {
     int32_t width;
     bool alternate; // shifted by half of the high sampling rate
 
-    // In the state a stage has its latest `width` inputs, oldest first, and its running value.
+    // The state of a stage consists of its latest `width` inputs, oldest first, and its running
+    // value.
     int64_t stateSize() const { return (int64_t{width} + 1) * stages; }
 };
 
-// Runs the n samples of x through the filter. y gets the outputs first, first + factor, ...
+// Runs the n samples of x through the filter. y receives the outputs at first, first + factor, ...
 void CICDecimate(const CICShape &shape, DBL *state, const DBL *x, int32_t n, int64_t first, DBL *y);
 
-// Runs x, factor - 1 zeros after each sample and each sample times factor, through the filter. y
-// gets the outputs from `dropped` on.
+// Runs each sample of x, multiplied by factor and followed by factor - 1 zeros, through the filter.
+// y receives the outputs from `dropped` on.
 void CICInterpolate(const CICShape &shape, DBL *state, const DBL *x, int32_t n, int64_t dropped,
                     DBL *y);
 

@@ -8,7 +8,7 @@ namespace qx {
 
 namespace {
 
-// start + x[0] + x[1] + ..., in this order, so that a sum goes on where a block has cut it.
+// start + x[0] + x[1] + ..., in this order, so that a sum continues across the end of a block.
 template <ElementType Code>
 typename Element<Code>::type Summed(typename Element<Code>::type start,
                                     const typename Element<Code>::type *x, int64_t count) {
@@ -55,7 +55,7 @@ template <ElementType Code>
 int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor, int32_t *start,
                       int32_t *partialCount, typename Element<Code>::type *partialSum) {
     typedef typename Element<Code>::type T;
-    if (n < 1) // nothing comes and nothing can go, whatever the caller holds as the part's count
+    if (n < 1) // there is neither input nor output, whatever partial count the caller has
         return 0;
     int32_t outputs = 0;
     int32_t used = std::min(*start, n);
@@ -71,7 +71,7 @@ int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor
         *start -= n;
         return 0;
     }
-    // The bound holds by itself unless the caller's count does not fit its start.
+    // The bound on outputs matters only if the caller's count does not fit its start.
     for (; n - used >= factor && outputs < n; used += factor)
         x[outputs++] = Divided<Code>(Summed<Code>(T{}, x + used, factor), factor);
     *partialCount = n - used;
@@ -85,7 +85,7 @@ int32_t SumGroups(typename Element<Code>::type *x, int32_t n, int32_t factor,
                   typename Element<Code>::type *sum, int32_t *count) {
     int32_t outputs = 0;
     int32_t used = 0;
-    // The first group lacks what earlier blocks have put into the sum.
+    // The first group lacks the samples that earlier blocks have added to the sum.
     int64_t missing = factor - Modulo(*count, factor);
     for (; n - used >= missing; missing = factor) {
         x[outputs++] = Summed<Code>(*sum, x + used, missing);

@@ -7,24 +7,25 @@
 
 namespace qx {
 
-// Decimation by picking samples and by means and sums of groups. All work in place, x holding the
-// outputs in front afterwards, and return the count of these. Instances for DBL and CDB.
+// Decimation by picking samples and by means and sums of groups. All functions work in place, leave
+// the outputs at the front of x, and return their number. Instances for DBL and CDB.
 
-// Sample 0, factor, 2 factor ..., or the means of the `factor` samples from there on; n is at least
-// `factor`, and what is behind the last whole group is left out.
+// Samples 0, factor, 2 factor, ..., or the means of the `factor` samples from each of these on. n
+// is at least `factor`; samples after the last whole group are ignored.
 template <ElementType Code>
 int32_t DecimateBlock(typename Element<Code>::type *x, int32_t n, int32_t factor, bool average);
 
-// The same for a stream. Before the next output or the next group *start samples are skipped.
+// The same for a stream. *start samples are skipped before the next output or the next group.
 template <ElementType Code>
 int32_t PickFromStream(typename Element<Code>::type *x, int32_t n, int32_t factor, int32_t *start);
-// A group that the block does not end goes on as a partial sum; *start then tells how many samples
-// it still needs.
+// A group that the block does not complete continues as a partial sum; *start is then the number of
+// samples that it still needs.
 template <ElementType Code>
 int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor, int32_t *start,
                       int32_t *partialCount, typename Element<Code>::type *partialSum);
 
-// The sums of groups of a stream, factor at least 2; *count samples are in *sum.
+// The sums of groups of a stream, factor at least 2. *sum is the sum of the *count samples of the
+// current group.
 template <ElementType Code>
 int32_t SumGroups(typename Element<Code>::type *x, int32_t n, int32_t factor,
                   typename Element<Code>::type *sum, int32_t *count);

@@ -10,9 +10,9 @@
 
 namespace qx {
 
-// The outputs of a filter at changed rate, computed at kept positions only.
+// The outputs of a filter at a changed rate, computed only at the positions that are kept.
 
-// Which taps meet which samples in one output: terms j = 0, 1, ... of tap + j tapStep and
+// The taps and samples of one output: terms j = 0, 1, ... of tap + j tapStep and
 // sample + j sampleStep, added to 0 in this order.
 struct OutputSum {
     int64_t sample;
@@ -27,7 +27,7 @@ struct OutputSum {
     }
 };
 
-// Output m + period takes the taps of output m, `advance` samples further on.
+// Output m + period uses the taps of output m, with samples `advance` later.
 struct Rhythm {
     int32_t period;
     int32_t advance;
@@ -35,7 +35,7 @@ struct Rhythm {
     int32_t sampleStep;
 };
 
-// One output by itself.
+// A single output.
 template <ElementType Code>
 void FilteredSum(const Samples<Code> &samples, const RealOf<Code> *h, const Rhythm &rhythm,
                  OutputSum output, RealOf<Code> scale, typename Element<Code>::type *y) {
@@ -52,9 +52,9 @@ void FilteredSum(const Samples<Code> &samples, const RealOf<Code> *h, const Rhyt
         Reals<Code>(y)[part] = scale * sum[part];
 }
 
-// Whole periods of outputs side by side: output r of every period is one row of neighbouring sums,
-// once the samples stand in rows of every advance-th one. Order and bits of each sum are those of
-// FilteredSum.
+// Whole periods of outputs together: output r of every period forms one row of adjacent sums, once
+// the samples are arranged in rows of every advance-th one. The order and the bits of each sum are
+// those of FilteredSum.
 template <ElementType Code>
 class PeriodRows {
     typedef typename Element<Code>::type T;
@@ -67,7 +67,7 @@ public:
     PeriodRows(const Samples<Code> &samples, const Real *h, const Rhythm &rhythm, Real scale)
         : samples_(samples), h_(h), rhythm_(rhythm), scale_(scale) {}
 
-    // y holds the outputs from `first` on; sumOf(m) tells output m.
+    // y contains the outputs from `first` on; sumOf(m) describes output m.
     template <class SumOf>
     ErrorCode run(const SumOf &sumOf, int32_t first, int32_t periods, T *y) {
         findSpan(sumOf, first);
@@ -88,7 +88,7 @@ public:
     }
 
 private:
-    // The samples that the first period meets.
+    // Finds the samples that the first period uses.
     template <class SumOf>
     void findSpan(const SumOf &sumOf, int32_t first) {
         int64_t highest = -1;
@@ -104,9 +104,9 @@ private:
     }
 
     ErrorCode prepare(int32_t periods) {
-        // A chunk's samples stay in the cache, unless its windows are too long: then it is as long
-        // as they are, since each chunk arranges the samples of its windows anew. Its rows are long
-        // enough for the widest lanes.
+        // The samples of a chunk stay in the cache unless its windows are too long. In that case
+        // the chunk is as long as the windows, because each chunk rearranges the samples of its
+        // windows. The rows are long enough for the widest lanes.
         constexpr int64_t samplesAtOnce = 4096, shortestRow = 64;
         rows_ = static_cast<int32_t>(std::min<int64_t>(rhythm_.advance, span_));
         chunk_ = static_cast<int32_t>(std::min<int64_t>(
@@ -123,14 +123,15 @@ private:
         return 0;
     }
 
-    // The reals of a row of sums, made up to whole vectors of the widest lanes: what is computed
-    // behind its end goes nowhere.
+    // The reals of a row of sums, rounded up to whole vectors of the widest lanes; values computed
+    // beyond the end of the row are not used.
     static int32_t paddedWidth(int32_t periods) {
         constexpr int32_t vector = 32 / sizeof(Real);
         return (parts * periods + vector - 1) / vector * vector;
     }
 
-    // Row r holds the samples base + r, base + r + advance, ... as far as `periods` periods reach.
+    // Row r consists of the samples base + r, base + r + advance, ..., as many as `periods` periods
+    // need.
     void fillRows(int64_t base, int32_t periods) {
         const int64_t used = span_ + int64_t{periods - 1} * rhythm_.advance;
         for (int32_t r = 0; r < rows_; ++r)
@@ -172,7 +173,7 @@ private:
                     y[int64_t{s} * rhythm_.period + r] =
                         reinterpret_cast<const T *>(rows[r].sums)[s];
     }
-    // Whole short periods: known to the compiler, this becomes shuffles.
+    // Interleaves short periods: with the period known to the compiler, this becomes shuffles.
     template <int Period>
     void interleave(int32_t width, int32_t periods, T *y) const {
         const T *sums = reinterpret_cast<const T *>(sums_.data());
@@ -193,8 +194,8 @@ private:
     ScratchParts memory_;
 };
 
-// Outputs `first` to `end` - 1 into y. Before `regular` they may lack terms that the rhythm
-// promises.
+// Writes outputs `first` to `end` - 1 into y. Outputs before `regular` may lack terms that the
+// rhythm has.
 template <ElementType Code, class SumOf>
 ErrorCode FilteredSums(const Samples<Code> &samples, const RealOf<Code> *h, const Rhythm &rhythm,
                        const SumOf &sumOf, RealOf<Code> scale, int32_t first, int32_t regular,

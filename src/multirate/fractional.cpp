@@ -35,7 +35,7 @@ TapSpan ComputeTapSpan(int32_t len, int32_t oversample, double ratio, double fra
 
 namespace {
 
-// Rounding may carry the last positions past the ends of the table; nothing is read there.
+// Rounding may move the last positions beyond the ends of the table, where nothing must be read.
 double Nearest(const ResampleFilter &filter, double q) {
     return filter.proto[std::clamp(Truncated(q + 0.5), 0, filter.len - 1)];
 }
@@ -78,7 +78,7 @@ typename Element<Code>::type ResampleDot(const ResampleCore<Code> &core,
                                          const typename Element<Code>::type *x) {
     constexpr int parts = SampleParts<Code>::count;
     double sum[parts] = {};
-    // From the sample `newest` down to `oldest` of an array that begins at sample `origin`.
+    // Adds from the sample `newest` down to `oldest` of an array that begins at sample `origin`.
     const auto add = [&](const typename Element<Code>::type *samples, int64_t origin,
                          int64_t newest, int64_t oldest) {
         const int64_t firstTap = core.firstNeeded();
@@ -115,10 +115,11 @@ ErrorCode AdvanceHistory(ResampleCore<Code> &core, const typename Element<Code>:
 
 template <ElementType Code>
 ErrorCode ResampleConstant(const ResampleFilter &filter, ResampleCore<Code> &core, double ratio,
-                           bool antiAlias, const typename Element<Code>::type *x, int32_t n,
-                           typename Element<Code>::type *y, int32_t room, int32_t *outCount) {
+                           bool antiAlias, ConstVectorView<Code> x, VectorView<Code> y,
+                           int32_t *outCount) {
+    const auto n = static_cast<int32_t>(x.size());
     double start = core.position + core.fraction;
-    if (start < 0) // kept: later outputs count from here, and not from the first one's time
+    if (start < 0) // kept: later outputs count from here, not from the time of the first one
         start = core.historyCount - 1.0;
     // Without anti-aliasing the kernel keeps its natural width.
     const double tapRatio = antiAlias || ratio < 1.0 ? ratio : 1.0;
@@ -126,17 +127,18 @@ ErrorCode ResampleConstant(const ResampleFilter &filter, ResampleCore<Code> &cor
     *outCount = 0;
     ErrorCode status = LoadFractionalTaps(filter, core, tapRatio, core.position, core.fraction);
     while (status == 0 && core.canServe(n)) {
-        if (*outCount >= room)
+        if (*outCount >= y.size())
             return ErrIndexNotBelowSize;
-        y[(*outCount)++] = ResampleDot(core, x);
-        // From the count and not from the last position, so that rounding does not accumulate.
+        y[(*outCount)++] = ResampleDot(core, x.data());
+        // Computed from the count and not from the last position, so that rounding does not
+        // accumulate.
         const double time = *outCount * ratio + start;
         const double whole = std::floor(time);
         core.position = Truncated(whole);
         if (time - whole != core.fraction)
             status = LoadFractionalTaps(filter, core, tapRatio, core.position, time - whole);
     }
-    return status != 0 ? status : AdvanceHistory(core, x, n);
+    return status != 0 ? status : AdvanceHistory(core, x.data(), n);
 }
 
 namespace {
@@ -144,11 +146,11 @@ namespace {
 DBL &TimeOf(DBL &time) { return time; }
 DBL &TimeOf(CDB &time) { return time.re; }
 
-// The kernel's stretch where none of the gaps is wider.
+// The stretch of the kernel for the widest gap; 1 if no gap is wider.
 template <ElementType TimeCode>
-double WidestGap(typename Element<TimeCode>::type *t, int32_t m, double lastTime) {
+double WidestGap(VectorView<TimeCode> t, double lastTime) {
     double widest = 1.0;
-    for (int32_t i = 0; i < m; ++i) {
+    for (int64_t i = 0; i < t.size(); ++i) {
         const double gap = TimeOf(t[i]) - lastTime;
         if (gap > widest)
             widest = gap;
@@ -161,16 +163,15 @@ double WidestGap(typename Element<TimeCode>::type *t, int32_t m, double lastTime
 
 template <ElementType Code, ElementType TimeCode>
 ErrorCode ResampleAtTimes(const ResampleFilter &filter, bool antiAlias,
-                          const typename Element<Code>::type *x, int32_t n, int32_t channels,
-                          typename Element<TimeCode>::type *t, int32_t m, double *lastTime,
-                          int32_t *outCount, int32_t *consumed, typename Element<Code>::type *y,
-                          int32_t pitch) {
+                          const ConstMatrixView<Code> &x, VectorView<TimeCode> t, double *lastTime,
+                          const MatrixView<Code> &y, int32_t *outCount, int32_t *consumed) {
+    const auto m = static_cast<int32_t>(t.size());
     *outCount = 0;
     *consumed = 0;
     if (m < 1)
         return 0;
-    const TapSpan widest = ComputeTapSpan(
-        filter.len, filter.oversample, antiAlias ? WidestGap<TimeCode>(t, m, *lastTime) : 1.0, 0);
+    const TapSpan widest = ComputeTapSpan(filter.len, filter.oversample,
+                                          antiAlias ? WidestGap<TimeCode>(t, *lastTime) : 1.0, 0);
     const int64_t room = std::max<int64_t>(widest.taps() + 1, 0);
     if (room > std::numeric_limits<int32_t>::max())
         return ErrBufferOverrun;
@@ -189,11 +190,11 @@ ErrorCode ResampleAtTimes(const ResampleFilter &filter, bool antiAlias,
                 LoadFractionalTaps(filter, core, gap, Truncated(whole), time - whole))
             return failed;
         *consumed = static_cast<int32_t>(std::clamp<int64_t>(core.firstNeeded(), 0, INT32_MAX));
-        if (!core.canServe(n))
+        if (!core.canServe(x.cols()))
             break;
         *lastTime = time;
-        for (int32_t c = 0; c < channels; ++c)
-            y[int64_t{c} * pitch + i] = ResampleDot(core, x + int64_t{c} * n);
+        for (int32_t c = 0; c < x.rows(); ++c)
+            y(c, i) = ResampleDot(core, x.row(c));
         ++*outCount;
     }
     for (int32_t i = *outCount; i < m; ++i)
@@ -204,16 +205,15 @@ ErrorCode ResampleAtTimes(const ResampleFilter &filter, bool antiAlias,
 
 #define QX_RESAMPLE(Code)                                                                          \
     template ErrorCode ResampleConstant<Code>(const ResampleFilter &, ResampleCore<Code> &,        \
-                                              double, bool, const Element<Code>::type *, int32_t,  \
-                                              Element<Code>::type *, int32_t, int32_t *);
+                                              double, bool, ConstVectorView<Code>,                 \
+                                              VectorView<Code>, int32_t *);
 QX_RESAMPLE(ElementType::DBL)
 QX_RESAMPLE(ElementType::CDB)
 #undef QX_RESAMPLE
 #define QX_RESAMPLE(Code, TimeCode)                                                                \
     template ErrorCode ResampleAtTimes<Code, TimeCode>(                                            \
-        const ResampleFilter &, bool, const Element<Code>::type *, int32_t, int32_t,               \
-        Element<TimeCode>::type *, int32_t, double *, int32_t *, int32_t *, Element<Code>::type *, \
-        int32_t);
+        const ResampleFilter &, bool, const ConstMatrixView<Code> &, VectorView<TimeCode>,         \
+        double *, const MatrixView<Code> &, int32_t *, int32_t *);
 QX_RESAMPLE(ElementType::DBL, ElementType::DBL)
 QX_RESAMPLE(ElementType::CDB, ElementType::CDB)
 QX_RESAMPLE(ElementType::CDB, ElementType::DBL)

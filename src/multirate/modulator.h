@@ -8,8 +8,8 @@
 namespace qx {
 
 // y[i] = x[i] exp(i (phase + i step)) with step = 2 pi ratio, by rotation from sample to sample;
-// *phase becomes that of the sample after the last, in 0 to 2 pi. y may be x. A ratio of exactly 0
-// shifts nothing, whatever *phase holds. Instances for DBL and CDB.
+// *phase is set to the phase of the sample after the last, in 0 to 2 pi. y may be x. With a ratio
+// of exactly 0 the samples are unchanged, whatever *phase is. Instances for DBL and CDB.
 template <ElementType Code>
 void Modulate(const typename Element<Code>::type *x, int32_t n, double ratio, double *phase,
               CDB *y);

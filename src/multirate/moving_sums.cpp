@@ -56,7 +56,7 @@ void Passes(const MovingSumState<Code> &state, double scale, typename Element<Co
             int32_t n) {
     int32_t k = 0;
     if constexpr (Code == ElementType::DBL)
-        // What it costs to lay the rings side by side and back is worth it for blocks longer than they.
+        // Rearranging the rings and back pays only for blocks longer than the rings.
         if (state.width <= wavefrontWidth && n >= wavefrontSamples && n / 2 >= state.width)
             for (; k + wavefrontStages <= state.stages; k += wavefrontStages)
                 MovingSumWavefront(state, k, Kind, scale, x, n);

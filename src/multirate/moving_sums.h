@@ -8,15 +8,15 @@
 
 namespace qx {
 
-// Cascades of moving sums, each a running value v over the last `width` inputs of its stage.
+// Cascades of moving sums, each with a running value v over the last `width` inputs of its stage.
 enum class MovingSum {
     Plain,         // v + x[i] - x[i - width]
     AlternateEven, // x[i] - v - x[i - width]: shifted by half the sampling rate, for an even width
     AlternateOdd,  // x[i] - v + x[i - width]: the same for an odd width
 };
 
-// Where a cascade keeps its state. Stage k has a ring of its latest `width` inputs at
-// rings[k ringStep], the oldest at `position`, and its running value at sums[k sumStep].
+// The state of a cascade. Stage k has a ring of its latest `width` inputs at rings[k ringStep], the
+// oldest at `position`, and its running value at sums[k sumStep].
 template <ElementType Code>
 struct MovingSumState {
     typename Element<Code>::type *rings;
@@ -28,14 +28,14 @@ struct MovingSumState {
     int32_t position; // in 0 to width - 1; moves on with the samples
 };
 
-// Replaces x by the output of the last stage. Each stage gives v * scale, while v itself stays a
-// plain sum. Instances for DBL and CDB.
+// Replaces x by the output of the last stage. Each stage outputs v * scale, while v itself remains
+// a plain sum. Instances for DBL and CDB.
 template <ElementType Code>
 void MovingSumStages(MovingSumState<Code> &state, MovingSum kind, double scale,
                      typename Element<Code>::type *x, int32_t n);
 
-// Eight stages from `first` on as one wavefront, in lanes: the same for rings of at most
-// wavefrontWidth and blocks of at least wavefrontSamples.
+// Eight stages from `first` on as one wavefront, in lanes, with the same results, for rings of at
+// most wavefrontWidth and blocks of at least wavefrontSamples.
 constexpr int wavefrontStages = 8;
 constexpr int32_t wavefrontWidth = 256;
 constexpr int32_t wavefrontSamples = 64;
@@ -43,7 +43,7 @@ QX_BY_WIDTH(void, MovingSumWavefront,
             (const MovingSumState<ElementType::DBL> &state, int32_t first, MovingSum kind,
              double scale, DBL *x, int32_t n))
 
-// Turns the rings so that the oldest input stands first.
+// Rotates the rings so that the oldest input comes first.
 void StraightenRings(MovingSumState<ElementType::DBL> &state);
 
 } // namespace qx

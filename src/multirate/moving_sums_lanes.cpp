@@ -9,8 +9,8 @@ namespace {
 typedef Lanes<nativeLanes> L;
 constexpr int stages = wavefrontStages;
 constexpr int vectors = stages / nativeLanes;
-// Stage k is at sample t - skew k while the first is at sample t, so that what a stage gives has the
-// time of three pairs of additions to become the input of the next.
+// Stage k processes sample t - skew k while the first stage processes sample t, so that the output
+// of a stage has the time of three pairs of additions before it is the input of the next stage.
 constexpr int skew = 3;
 constexpr int32_t behind = skew * (stages - 1);
 
@@ -24,8 +24,8 @@ QX_INLINE V Next(V v, V x, V oldest) {
         return x - v + oldest;
 }
 
-// The rings side by side: row r has for each stage the input that it meets when the first one meets
-// that at place r of its own ring.
+// The rings interleaved: row r contains for each stage the input that it needs when the first stage
+// needs the one at index r of its own ring.
 class Rows {
 public:
     Rows(const MovingSumState<ElementType::DBL> &state, int32_t first)
@@ -55,13 +55,13 @@ private:
     DBL rows_[wavefrontWidth * stages];
 };
 
-// Running values of all stages, and what they gave at the latest `skew` times, latest first.
+// The running values of all stages, and their outputs at the latest `skew` times, latest first.
 struct Front {
     DBL v[stages];
     DBL given[skew][stages];
 };
 
-// One time of the stages from `from` to `to` - 1.
+// One time step of the stages from `from` to `to` - 1.
 template <MovingSum Kind>
 void StepSome(int from, int to, double scale, const DBL *x, DBL *row, Front &front) {
     DBL given[stages] = {};
@@ -75,7 +75,8 @@ void StepSome(int from, int to, double scale, const DBL *x, DBL *row, Front &fro
     __builtin_memcpy(front.given[0], given, sizeof given);
 }
 
-// All stages, for `count` times from row r on; x is the first one's sample. Returns the row after.
+// All stages, for `count` time steps from row r on; x is the first stage's sample. Returns the next
+// row.
 template <MovingSum Kind>
 int32_t StepAll(int32_t count, int32_t r, int32_t width, double scale, DBL *x, Rows &rows,
                 Front &front) {

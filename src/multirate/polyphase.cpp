@@ -54,7 +54,8 @@ ErrorCode PolyphaseRational(const FIRBlock<Code> &block, int32_t L, int32_t M, i
 
 namespace {
 
-// What the block adds to a sum that ends with input `last`, which may lie behind the block.
+// Adds the block's contribution to a sum that ends with input `last`, which may be after the end of
+// the block.
 template <ElementType Code>
 void AddWindow(const FIRBlock<Code> &block, int64_t last, typename Element<Code>::type *sum) {
     const int64_t end = std::min<int64_t>(last + 1, block.n);
@@ -73,7 +74,7 @@ ErrorCode PolyphaseDecimate(const FIRBlock<Code> &block, int32_t M, int32_t firs
     const int32_t underWay = (block.taps - 1) / M + 1;
     const auto due = static_cast<int32_t>(outputs.dropped + outputs.count);
     const auto lastInput = [&](int64_t m) { return first + m * M; };
-    // From output `whole` on a window lies in the block or behind its start.
+    // From output `whole` on, a window lies within the block or after its start.
     const auto begun = (int64_t{block.taps} - 1 - first + M - 1) / M;
     const auto whole = static_cast<int32_t>(std::clamp<int64_t>(begun, 0, due));
     const auto dropped = static_cast<int32_t>(outputs.dropped);

@@ -9,8 +9,8 @@
 
 namespace qx {
 
-// FIR filters at changed rate for streams in blocks, with the caller's state. Instances exist for
-// SGL, DBL, CSG and CDB.
+// FIR filters at a changed rate for streams in blocks, with the caller's state. Instances for SGL,
+// DBL, CSG and CDB.
 
 // A block of input and the taps, at least one.
 template <ElementType Code>
@@ -21,11 +21,11 @@ struct FIRBlock {
     int32_t taps;
 };
 
-// The outputs of a block: those that stand at first, first + step ... below `positions`; of them
-// the earliest are dropped while a delay is left.
+// The outputs of a block: those at positions first, first + step, ... below `positions`. The
+// earliest of them are dropped while a delay is left.
 struct OutputRange {
     int64_t dropped;
-    int64_t count; // behind those dropped
+    int64_t count; // after those dropped
     int32_t delayLeft;
 
     OutputRange(int64_t positions, int32_t first, int32_t step, int32_t delay) {
@@ -37,21 +37,21 @@ struct OutputRange {
 };
 
 // y[i] = gain * sum over k of h[k] u[i + dropped - k], summed from the oldest sample to the newest;
-// u is the input with the taps - 1 samples of the state before it. The state follows.
+// u is the input preceded by the taps - 1 samples of the state. Updates the state.
 template <ElementType Code>
 ErrorCode PolyphaseSameRate(const FIRBlock<Code> &block, RealOf<Code> gain, OutputRange outputs,
                             typename Element<Code>::type *state, typename Element<Code>::type *y);
 
-// The same for taps that stand `spacing` samples apart, summed from the newest sample to the
-// oldest; the state has (taps - 1) spacing samples.
+// The same with taps `spacing` samples apart, summed from the newest sample to the oldest; the
+// state has (taps - 1) spacing samples.
 template <ElementType Code>
 ErrorCode PolyphaseSpaced(const FIRBlock<Code> &block, int32_t spacing, RealOf<Code> gain,
                           OutputRange outputs, typename Element<Code>::type *state,
                           typename Element<Code>::type *y);
 
 // Outputs at positions first + m M of the input stuffed with L - 1 zeros after each sample,
-// gain L times the filter's sum there, summed from the newest sample to the oldest. The state has
-// ceil(taps / L) places, of which the last is spare.
+// gain * L times the filter's sum, added up from the newest sample to the oldest. The state has
+// ceil(taps / L) elements; the last is not used.
 template <ElementType Code>
 ErrorCode PolyphaseRational(const FIRBlock<Code> &block, int32_t L, int32_t M, int32_t first,
                             RealOf<Code> gain, OutputRange outputs,
@@ -64,8 +64,8 @@ ErrorCode PolyphaseInterpolate(const FIRBlock<Code> &block, int32_t L, RealOf<Co
     return PolyphaseRational<Code>(block, L, 1, 0, gain, outputs, state, y);
 }
 
-// Outputs at inputs first + m M, without scale, summed from the oldest sample to the newest. `sums`
-// has the ceil(taps / M) outputs under way, next output first.
+// Outputs at inputs first + m M, without scaling, summed from the oldest sample to the newest.
+// `sums` contains the ceil(taps / M) outputs in progress, the next output first.
 template <ElementType Code>
 ErrorCode PolyphaseDecimate(const FIRBlock<Code> &block, int32_t M, int32_t first,
                             OutputRange outputs, typename Element<Code>::type *sums,

@@ -12,7 +12,7 @@ namespace {
 
 int Bits(int64_t v) { return v < 2 ? 0 : std::bit_width(static_cast<uint64_t>(v - 1)); }
 
-// The first sample that the window of an output at `offset` meets.
+// The first sample in the window of an output at `offset`.
 int64_t FirstSample(int64_t offset, int32_t half, int32_t L) {
     const int64_t p = offset - half - 1;
     return p < 0 ? 0 : p / L + 1;
@@ -53,21 +53,21 @@ ErrorCode RationalResample(const RationalStream &stream, const typename Element<
         const auto terms = tap < taps ? static_cast<int32_t>((taps - 1 - tap) / up + 1) : 0;
         return OutputSum{first, terms > 0 ? static_cast<int32_t>(tap) : 0, terms};
     };
-    // Outputs before this one have their window cut off by the first sample in hand.
+    // The windows of outputs before this one are cut off at the first available sample.
     const auto regular =
         static_cast<int32_t>(start > half ? 0 : std::min<int64_t>(count, (half - start) / M + 1));
     const int32_t common = std::gcd(L, M);
     const Rhythm rhythm{L / common, M / common, L, 1};
 
-    // Where the next window lies wholly behind what is in hand, the stream moves on to the next
-    // block and the rest of the way remains in the offset. Where it begins behind the output's own
-    // position, as that of few taps on a wide grid may, the sample before stays, so that the offset
-    // does not become negative.
+    // If the next window lies entirely after the available samples, the stream moves on to the next
+    // block and the offset keeps the remaining distance. If the window begins after the position of
+    // its own output, which is possible with few taps on a fine grid, the sample before that
+    // position is kept, so that the offset does not become negative.
     const int64_t inHand = int64_t{*stateCount} + n;
     const int64_t next = start + int64_t{count} * M;
     int64_t first = std::min({FirstSample(next, half, L), next / L, inHand});
-    // kept: a block that yields nothing is appended whole, if it can be, to a state that is not
-    // empty. Of a stream whose offset nobody has changed, it would be kept whole in any case.
+    // kept: a block without outputs is appended to a nonempty state in full if it fits. If the
+    // caller has not changed the offset, it would be kept in full anyway.
     if (count < 1 && *stateCount > 0 && inHand <= capacity)
         first = 0;
     if (inHand - first > capacity)

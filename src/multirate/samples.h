@@ -9,7 +9,7 @@
 
 namespace qx {
 
-// A sample type as reals: filters with real taps treat the parts of a complex sample alike.
+// A sample type as reals: filters with real taps treat both parts of a complex sample alike.
 template <ElementType Code>
 struct SampleParts {
     static constexpr ElementType real = Code;
@@ -49,12 +49,12 @@ void ClearSamples(typename Element<Code>::type *samples, int64_t count) {
         std::memset(samples, 0, static_cast<std::size_t>(count) * sizeof *samples);
 }
 
-// `value` in 0 to modulus - 1.
+// `value` modulo `modulus`, in 0 to modulus - 1.
 inline int32_t Modulo(int64_t value, int32_t modulus) {
     return static_cast<int32_t>((value % modulus + modulus) % modulus);
 }
 
-// The samples of a stream in hand, oldest first: those that its state kept, then the block.
+// The available samples of a stream, oldest first: those kept in its state, then the block.
 template <ElementType Code>
 struct Samples {
     typedef typename Element<Code>::type T;
@@ -77,7 +77,7 @@ struct Samples {
         } else {
             const T *from = block + (first - keptCount);
             const int64_t left = number - i;
-            if (stride == 2) // known to the compiler, this becomes shuffles
+            if (stride == 2) // known to the compiler, this stride becomes shuffles
                 for (int64_t k = 0; k < left; ++k)
                     to[i + k] = from[2 * k];
             else
@@ -86,7 +86,7 @@ struct Samples {
         }
     }
 
-    // Makes `state`, where the samples kept may stand, the `number` newest of all.
+    // Stores the `number` newest samples in `state`, which may overlap the kept samples.
     void keepNewest(T *state, int64_t number) const {
         const int64_t fromBlock = std::min<int64_t>(number, blockCount);
         const int64_t fromKept = number - fromBlock;

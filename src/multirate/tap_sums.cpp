@@ -6,7 +6,7 @@ namespace qx::QX_WIDTH {
 
 namespace {
 
-// The lanes of an element's type.
+// Lanes for the type of an element.
 template <ElementType Code, int N>
 struct LanesOf {
     typedef Lanes<N> type;
@@ -18,7 +18,8 @@ struct LanesOf<ElementType::SGL, N> {
     static constexpr int most = nativeFloatLanes;
 };
 
-// Keyed by the element's code, since a template argument would drop the alignment of its type.
+// Keyed by the element's code, because a template argument would drop the alignment attribute of
+// its type.
 template <ElementType Code, class PlainReal>
 struct Problem {
     typedef PlainReal Real;
@@ -43,7 +44,7 @@ struct Problem {
             }
     }
 
-    // Several chains of additions side by side hide the latency of each.
+    // Several independent chains of additions hide the latency of each.
     template <int Rows, int Parts, class Lane>
     void sumAt(const TapRow<Code> *rows, int32_t at) const {
         Lane sum[Rows][Parts];

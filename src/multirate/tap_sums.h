@@ -9,12 +9,12 @@
 
 namespace qx {
 
-// The inner loop of every filter here: rows of neighbouring outputs that share their taps,
+// The inner loop of all filters in this family: rows of adjacent outputs with the same taps,
 //
 //     sums[w] = scale * sum over j < terms of taps[j tapStep] * samples[offsets[j offsetStep] + w],
 //
-// for each row and w below `width`, the terms added to 0 in ascending order of j. Samples of
-// complex streams are pairs of reals, so that real taps make them a stream of twice the width.
+// for each row and w below `width`, with the terms added to 0 in ascending order of j. Samples of
+// complex streams are pairs of reals, so that with real taps they form a stream of twice the width.
 template <ElementType Code>
 struct TapRow {
     typedef typename Element<Code>::type T;

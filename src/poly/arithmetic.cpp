@@ -12,7 +12,7 @@ namespace qx {
 
 namespace {
 
-// x (k + 1) ... (k + order), in twice the precision and with an exponent apart.
+// x (k + 1) ... (k + order), in twice the precision and with a separate exponent.
 double TimesFactorials(double x, int32_t k, int32_t order) {
     if (x == 0.0)
         return x;
@@ -44,7 +44,7 @@ int32_t LengthWithoutZeros(ConstVectorView<E> p) {
     return n;
 }
 
-// The window slides along the longer one; either way the index of p ascends.
+// The window slides along the longer polynomial; in both cases the index of p ascends.
 template <ElementType E>
 void PolynomialProduct(ConstVectorView<E> p, ConstVectorView<E> q, VectorView<E> r) {
     const auto m = static_cast<int32_t>(p.size()), n = static_cast<int32_t>(q.size());

@@ -32,7 +32,7 @@ void LeastSquaresSystem::addProductBy(const CDB *a, int32_t degree, int32_t shif
             at(row + s + i, col + s) += a[i];
 }
 
-// The right side as one more column becomes Q^H times it.
+// The right side is factored as an additional column and so becomes Q^H times itself.
 ErrorCode LeastSquaresSystem::solve(CDB *x) {
     CDB *const r = triangle_.data();
     const auto rows = static_cast<int32_t>(rows_), cols = static_cast<int32_t>(width());
@@ -59,7 +59,8 @@ ErrorCode CommonDivisor::allocate(int32_t maxDegree) {
 }
 
 ErrorCode CommonDivisor::find(const CDB *p, int32_t n, int32_t largest, double tolerance) {
-    // A singular value that is no larger, relative to the polynomial, is worth a trial.
+    // A degree is tried if the singular value, relative to the polynomial, is at most this many
+    // tolerances.
     constexpr double trialFactor = 100.0;
     p_ = p;
     n_ = n;
@@ -101,7 +102,7 @@ ErrorCode CommonDivisor::tryDegree(int32_t k, double tolerance, bool *isDivisor)
     return 0;
 }
 
-// v and w from the vector that the Sylvester matrix maps to nearly 0, u by division.
+// Takes v and w from the vector that the Sylvester matrix maps to nearly 0, and u by division.
 ErrorCode CommonDivisor::firstGuess() {
     const int32_t k = degree_, degreeOfU = n_ - k;
     const CDB *const x = sylvester_.singularVector();
@@ -119,7 +120,7 @@ ErrorCode CommonDivisor::firstGuess() {
     return system_.solve(u());
 }
 
-// Gauss-Newton steps for u v = p and u w = p' / n with u[0] = 1, as long as they help.
+// Gauss-Newton steps for u v = p and u w = p' / n with u[0] = 1, as long as they reduce the error.
 ErrorCode CommonDivisor::refine() {
     constexpr int32_t stepLimit = 10;
     const int32_t unknowns = n_ + degree_ + 2;
@@ -161,7 +162,7 @@ void CommonDivisor::setUpStep() {
     }
 }
 
-// The largest error of a coefficient of either product; NaN where one is.
+// The largest error of a coefficient of either product; NaN if one is NaN.
 double CommonDivisor::residual() const {
     const int32_t k = degree_, degreeOfU = n_ - k;
     double worst = 0.0;

@@ -11,11 +11,11 @@
 
 namespace qx {
 
-// A dense system of more equations than unknowns, solved in the sense of least squares.
+// A dense overdetermined system, solved in the least-squares sense.
 class LeastSquaresSystem {
 public:
     ErrorCode allocate(int64_t maxRows, int64_t maxCols);
-    // All zero.
+    // Sets all elements to zero.
     void reset(int32_t rows, int32_t cols);
 
     CDB &at(std::ptrdiff_t row, std::ptrdiff_t col) const {
@@ -23,11 +23,12 @@ public:
     }
     CDB &right(std::ptrdiff_t row) const { return at(row, cols_); }
     void scaleRow(std::ptrdiff_t row, double factor);
-    // Column col + s becomes a[0..degree] from `row` + s on, for s = 0 to `shift`: the matrix that
-    // multiplies by the polynomial.
+    // Adds a[0..degree] to column col + s from row `row` + s on, for s = 0 to `shift`: this is the
+    // matrix of the multiplication by the polynomial.
     void addProductBy(const CDB *a, int32_t degree, int32_t shift, int32_t row, int32_t col);
 
-    // ErrNonFiniteInput, ErrOutOfMemory. What depends on other columns comes out as no number.
+    // ErrNonFiniteInput, ErrOutOfMemory. Unknowns whose columns depend on others become NaN or
+    // infinite.
     ErrorCode solve(CDB *x);
 
 private:
@@ -38,14 +39,15 @@ private:
 };
 
 // The greatest common divisor of a monic polynomial p and its derivative, with descending
-// coefficients: p = u v and p' / n = u w, nearly. Step k asks whether a v of degree k will do.
+// coefficients: p = u v and p' / n = u w, nearly. Step k tests whether degree k is sufficient for
+// v.
 class CommonDivisor {
 public:
     ErrorCode allocate(int32_t maxDegree);
 
-    // Takes the smallest degree of v, up to `largest`, for which the coefficients of the products
-    // are off by no more than `tolerance`, relative to those above 1. Degree n always is one, with
-    // u = 1.
+    // Finds the smallest degree of v, up to `largest`, for which the errors of the coefficients of
+    // the products are at most `tolerance`, relative to coefficients above 1 and absolute for
+    // others. Degree n always qualifies, with u = 1.
     ErrorCode find(const CDB *p, int32_t n, int32_t largest, double tolerance);
     bool isFound() const { return quotientDegree_ >= 0; }
     int32_t quotientDegree() const { return quotientDegree_; }

@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// The quotient of this family: as the operator of linalg/scalar.h it neither overflows nor
-// underflows early, but its denominator is formed in another order.
+// The quotient of this family. Like the operator of linalg/scalar.h it avoids premature overflow
+// and underflow, but it forms its denominator in another order.
 inline CDB Quotient(CDB a, CDB b) {
     if (std::fabs(b.re) >= std::fabs(b.im)) {
         const double ratio = b.im / b.re;

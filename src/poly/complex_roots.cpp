@@ -20,7 +20,7 @@ CDB Evaluate(const CDB *a, int32_t count, CDB z) {
 // The search for one root of a polynomial of degree 3 or more with a constant term other than 0.
 class RootSearch {
 public:
-    // `derivative` has count - 1 places.
+    // `derivative` has count - 1 elements.
     RootSearch(const CDB *a, int32_t count, CDB *derivative, int32_t maxIterations)
         : a_(a), derivative_(derivative), count_(count), maxIterations_(maxIterations) {
         for (int32_t k = 1; k < count; ++k)
@@ -28,8 +28,8 @@ public:
     }
 
     ErrorCode find(CDB *root) {
-        // At the level of rounding errors the steps may go in circles: then the best point is a
-        // root if its value may count as zero.
+        // At the level of rounding errors the steps may cycle; the best point is then a root if its
+        // value is small enough to count as zero.
         constexpr int32_t idleLimit = 100;
         Progress progress = takeFirstStep();
         Point best = at_;
@@ -53,7 +53,8 @@ private:
         CDB z, value;
         double size; // |value|
     };
-    // MovedPlainly: by the very step of Newton's method. Turned: the next direction is set.
+    // MovedPlainly: by exactly the step of Newton's method. Turned: the next direction is already
+    // set.
     enum class Progress { Moved, MovedPlainly, Turned, Found, Stuck, NotANumber };
 
     Point pointAt(CDB z) const {
@@ -64,7 +65,7 @@ private:
     Progress takeFirstStep() {
         const double sizeAtZero = ScaledHypot(a_[0]);
         const CDB direction = IsZero(a_[1]) ? CDB{1.0, 0.0} : Quotient(-a_[0], a_[1]);
-        // Half as far as a root can be found for certain, and at most 1/2.
+        // No root is nearer to 0 than half of `radius`, which is the length of the first step.
         double radius = 1.0;
         for (int32_t k = 1; k < count_; ++k)
             if (!IsZero(a_[k]))
@@ -75,7 +76,7 @@ private:
         return isRoot(at_, sizeAtZero) ? Progress::Found : Progress::Moved;
     }
 
-    // No further change within what counts as zero.
+    // Whether the value is 0, or no longer changes and is small enough to count as zero.
     bool isRoot(const Point &point, double sizeBefore) const {
         return point.size == 0.0 || (point.size == sizeBefore && point.size <= acceptance_);
     }
@@ -91,7 +92,8 @@ private:
         return searchLine();
     }
 
-    // Newton's direction, held to three times the last step and turned where it is longer.
+    // Newton's direction; if it is longer than three times the last step, it is shortened to that
+    // and rotated.
     bool setDirection() {
         const CDB slope = Evaluate(derivative_, count_ - 1, at_.z);
         if (IsNaN(slope) || IsNaN(at_.value))
@@ -129,7 +131,7 @@ private:
             }
             if (whole.size > half.size)
                 return shorten(start, half);
-            // Without a direction left all further trials would be this one.
+            // If no direction is left, all further trials would be the same as this one.
             const double last = ScaledHypot(lastStep_);
             if (!(last > 0.0 && std::isfinite(last)))
                 break;
@@ -138,7 +140,7 @@ private:
         return Progress::Stuck;
     }
 
-    // As many times the step as make the value fall.
+    // Takes multiples of the step as long as the value decreases.
     Progress stretch(const Point &start, const Point &whole) {
         CDB step = direction_;
         bool isStretched = false;
@@ -157,7 +159,7 @@ private:
         return isStretched ? Progress::Moved : Progress::MovedPlainly;
     }
 
-    // Half the step, or less and turned a little. The value may rise by it.
+    // Takes half the step, or a smaller one that may be slightly rotated. The value may increase.
     Progress shorten(const Point &start, const Point &half) {
         const CDB quarterStep = direction_ * 0.25, turnedStep = CDB{0.2, 0.15} * direction_;
         CDB step = direction_ * 0.5;
@@ -180,7 +182,7 @@ private:
         return isSettled(at_, start.size, step) ? Progress::Found : Progress::Moved;
     }
 
-    // Near a root, as long as the value falls.
+    // Newton steps near a root, as long as the value decreases.
     Progress newtonSteps() {
         while (true) {
             const CDB slope = Evaluate(derivative_, count_ - 1, at_.z);
@@ -207,10 +209,10 @@ private:
     int32_t count_, maxIterations_;
     Point at_ = {};
     CDB direction_ = {}, lastStep_ = {};
-    double acceptance_ = 0.0; // values up to it may count as zero
+    double acceptance_ = 0.0; // values up to it count as zero
 };
 
-// Division by x - root, from the top down; the quotient has one coefficient less.
+// Division by x - root, from the top down; the quotient has one coefficient fewer.
 void Deflate(CDB *a, int32_t count, CDB root) {
     CDB carried = a[count - 1];
     for (int32_t k = count - 2; k >= 0; --k) {
@@ -220,7 +222,8 @@ void Deflate(CDB *a, int32_t count, CDB root) {
     }
 }
 
-// Takes the roots out of the polynomial one after the other, or the last two together.
+// Finds the roots and divides the polynomial by them one after the other; the last two are found
+// together.
 ErrorCode TakeRoots(CDB *a, int32_t count, CDB *derivative, int32_t maxIterations, CDB *roots) {
     while (count > 1) {
         if (count == 2) {
@@ -272,7 +275,7 @@ ErrorCode CxPolynomialRoots(ConstComplexVector coef, int32_t maxIterations, Comp
     for (int32_t k = 0; k < n; ++k)
         work[k] = coef[k];
     int32_t zeros = 0;
-    while (IsZero(work[zeros])) // the top coefficient is none
+    while (IsZero(work[zeros])) // the top coefficient is not zero
         roots[zeros++] = {0.0, 0.0};
     *rootCount = n - 1;
     const ErrorCode status =

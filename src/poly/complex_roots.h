@@ -9,10 +9,11 @@
 namespace qx {
 
 // All roots of a complex polynomial of ascending coefficients, at least one, in the order in which
-// they are found: Newton's method with a line search and steps that turn where it leads nowhere,
-// and deflation. `roots` has as many places and may be `coef`; *rootCount is the degree, which
-// counts no vanishing top coefficients. A search may turn `maxIterations` times between two of its
-// steps. It can be stuck where the polynomial is flat to the last bit.
+// they are found: Newton's method with a line search, which changes direction when it makes no
+// progress, and deflation. `roots` has as many elements as `coef` and may be `coef`; *rootCount is
+// the degree without vanishing top coefficients. A search may change direction `maxIterations`
+// times between two of its steps. It can get stuck where the polynomial is constant to the last
+// bit.
 //
 // ErrBadCoefficients: NaN, or a constant; ErrNonFiniteFunction: NaN in a search;
 // ErrIterationLimit; ErrOutOfMemory.

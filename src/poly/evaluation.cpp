@@ -45,8 +45,8 @@ private:
     MatrixView<E> square(T *elements) const { return {elements, order_, order_}; }
     ConstMatrixView<E> square(const T *elements) const { return {elements, order_, order_}; }
 
-    // The root of the degree makes the fewest products; the powers keep within 32 MB or eight
-    // matrices.
+    // About the square root of the degree gives the fewest products; the memory of the powers is
+    // limited to 32 MB or eight matrices.
     void chooseBlocks() {
         const int64_t room = std::max<int64_t>(8, (int64_t{1} << 22) / elements_);
         const int64_t best = static_cast<int64_t>(std::ceil(std::sqrt(double(degree_))));

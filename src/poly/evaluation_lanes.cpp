@@ -45,7 +45,7 @@ QX_INLINE double Corrected(double value, double correction) {
     return correction - correction == 0.0 ? value + correction : value;
 }
 
-// Two groups of lanes at once keep the units busy.
+// Two groups of lanes at once keep the arithmetic units busy.
 template <class V, int Groups>
 QX_INLINE void RealPoints(const DBL *p, int32_t n, const DBL *x, DBL *y) {
     Split<V> points[Groups];

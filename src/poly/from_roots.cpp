@@ -10,8 +10,8 @@ namespace qx {
 
 namespace {
 
-// Equal roots are as good as next to each other: then the second round of each follows Leja's order
-// like the first.
+// Equal roots count as very close to each other, so that the second occurrences follow Leja's order
+// like the first ones.
 double LogDistance(CDB a, CDB b) {
     constexpr double least = 0x1p-1022;
     const double distance = ScaledHypot(a - b);
@@ -19,10 +19,11 @@ double LogDistance(CDB a, CDB b) {
 }
 double LogSize(CDB a) { return LogDistance(a, {}); }
 
-// A real root, or one above the real axis that stands for its conjugate, too.
+// Whether a root is above the real axis, and so represents its conjugate, too; otherwise it is real.
 bool IsPair(CDB root) { return root.im != 0.0; }
 
-// Real roots, and the means of conjugates with the imaginary part above 0.
+// The real roots, and for each conjugate pair the mean of the upper root and the conjugate of the
+// lower one.
 class ConjugatePairs {
 public:
     // ErrOutOfMemory; ErrBadCoefficients.

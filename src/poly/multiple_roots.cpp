@@ -35,7 +35,7 @@ bool ComesBefore(int32_t timesA, CDB a, int32_t timesB, CDB b) {
     return timesA != timesB ? timesA < timesB : ScaledHypot(a) > ScaledHypot(b);
 }
 
-// By rising multiplicity and falling modulus; equal ones keep their order.
+// Sorts by ascending multiplicity and descending modulus; equal roots keep their order.
 void Sort(MultipleRoots &roots) {
     for (int32_t i = 1; i < roots.count; ++i) {
         const CDB root = roots.simple[i];
@@ -51,7 +51,7 @@ void Sort(MultipleRoots &roots) {
     }
 }
 
-// p[k] / sigma^k, the polynomial whose roots are sigma times smaller; false where that overflows.
+// p[k] / sigma^k, the polynomial whose roots are sigma times smaller; returns false on overflow.
 bool DividePowers(const CDB *p, int32_t degree, double sigma, CDB *scaled) {
     double power = 1.0;
     for (int32_t k = 0; k <= degree; ++k) {
@@ -63,8 +63,8 @@ bool DividePowers(const CDB *p, int32_t degree, double sigma, CDB *scaled) {
     return true;
 }
 
-// A monic polynomial with descending coefficients whose roots are around 1 in size, and by how much
-// they are smaller.
+// A monic polynomial with descending coefficients whose roots have magnitudes near 1, and the
+// factor by which they are smaller than the original roots.
 class NormalisedPolynomial {
 public:
     ErrorCode assign(const CDB *ascending, int32_t degree) {
@@ -91,9 +91,9 @@ private:
     double sigma_ = 1.0;
 };
 
-// What is told apart is told by the bits.
+// Roots count as distinct unless they are exactly equal.
 ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, MultipleRoots &roots) {
-    CDB *const values = roots.simple.data(); // read ahead of what is written
+    CDB *const values = roots.simple.data(); // read before they are overwritten
     if (const ErrorCode failed = CompanionRoots(p, degree, values))
         return failed;
     roots.count = 0;
@@ -111,7 +111,7 @@ ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, MultipleRoots &roots) {
     return 0;
 }
 
-// ErrIterationLimit where the steps do not converge.
+// ErrIterationLimit if the steps do not converge.
 ErrorCode Refine(const CDB *p, int32_t degree, double tolerance, MultipleRoots &roots) {
     Sort(roots);
     for (int32_t i = 0; i < roots.count; ++i)
@@ -120,14 +120,14 @@ ErrorCode Refine(const CDB *p, int32_t degree, double tolerance, MultipleRoots &
                             roots.count);
 }
 
-// Real roots stay real where the refinement moved them off the axis by rounding errors alone.
+// Real roots stay real if the refinement moved them off the axis only by rounding errors.
 void DropRoundingErrors(int32_t degree, MultipleRoots &roots) {
     for (int32_t i = 0; i < roots.count; ++i)
         if (roots.simple[i].im == 0.0 && std::fabs(roots.refined[i].im) < degree * kEpsilon)
             roots.refined[i].im = 0.0;
 }
 
-// Degree 3 and above, no root at 0.
+// For degree 3 and above, without roots at 0.
 ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, double tolerance,
                         MultipleRoots &roots) {
     NormalisedPolynomial normalised;
@@ -156,7 +156,7 @@ ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, doub
     return 0;
 }
 
-// kept: a double root of a quadratic is two roots here.
+// kept: a double root of a quadratic counts as two roots.
 void SolveDirectly(const CDB *a, int32_t degree, MultipleRoots &roots) {
     CDB found[2] = {};
     if (degree == 1)

@@ -8,8 +8,8 @@
 
 namespace qx {
 
-// Distinct roots as they come along, in as many places as there are coefficients. `refined` follows
-// `simple` where it is not refined.
+// The distinct roots, in arrays with as many elements as there are coefficients. `refined` is a
+// copy of `simple` if nothing is refined.
 struct MultipleRoots {
     ComplexVector refined, simple;
     VectorView<ElementType::I32> multiplicity;
@@ -18,10 +18,11 @@ struct MultipleRoots {
 
 // The distinct roots of a complex polynomial of ascending coefficients, at least one, with their
 // multiplicities (poly/root_structure.h), for which errors of the coefficients up to `tolerance`
-// are allowed; one not above 0 is 1e-10. `simple` holds the roots as the structure gives them, and
-// `refined` the same again or, with `refines`, the refined ones; then all are sorted, by rising
-// multiplicity and falling modulus. Without a structure that adds up, or without convergence, the
-// eigenvalues of the companion matrix are taken, of which exactly equal ones count as one.
+// are allowed; a tolerance not above 0 means 1e-10. `simple` holds the roots that belong to the
+// structure of multiplicities, and `refined` the same roots or, with `refines`, the refined ones;
+// all are then sorted by ascending multiplicity and descending modulus. If the multiplicities do
+// not add up to the degree, or if the refinement does not converge, the roots are the eigenvalues
+// of the companion matrix, of which exactly equal ones count as one.
 //
 // ErrBadCoefficients (a coefficient is not finite); ErrAllCoefficientsZero; ErrOrderNotPositive (a
 // constant); ErrOutOfMemory; ErrNonFiniteInput (the monic polynomial overflows); ErrIterationLimit

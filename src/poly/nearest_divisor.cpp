@@ -11,27 +11,25 @@ namespace qx {
 namespace {
 
 // Descending coefficients of norm 1.
-void Normalise(const CDB *ascending, int32_t count, CDB *descending) {
+void Normalise(ConstComplexVector ascending, CDB *descending) {
+    const std::ptrdiff_t count = ascending.size();
     double largest = 0.0;
-    for (int32_t i = 0; i < count; ++i)
-        largest = std::max({largest, std::fabs(ascending[i].re), std::fabs(ascending[i].im)});
-    for (int32_t i = 0; i < count; ++i)
+    for (const CDB &coefficient : ascending)
+        largest = std::max({largest, std::fabs(coefficient.re), std::fabs(coefficient.im)});
+    for (std::ptrdiff_t i = 0; i < count; ++i)
         descending[i] = ascending[count - 1 - i] / largest;
     const double norm = CoefficientNorm(descending, count);
-    for (int32_t i = 0; i < count; ++i)
+    for (std::ptrdiff_t i = 0; i < count; ++i)
         descending[i] = descending[i] / norm;
 }
 
 } // namespace
 
-ErrorCode NearestDivisor::find(const CDB *p, int32_t pCount, const CDB *q, int32_t qCount,
-                               double tolerance) {
-    isSwapped_ = pCount < qCount;
-    if (isSwapped_) {
+ErrorCode NearestDivisor::find(ConstComplexVector p, ConstComplexVector q, double tolerance) {
+    isSwapped_ = p.size() < q.size();
+    if (isSwapped_)
         std::swap(p, q);
-        std::swap(pCount, qCount);
-    }
-    if (const ErrorCode failed = assign(p, pCount, q, qCount))
+    if (const ErrorCode failed = assign(p, q))
         return failed;
     if (n_ > 0) {
         if (const ErrorCode failed = search(tolerance))
@@ -48,21 +46,22 @@ ErrorCode NearestDivisor::find(const CDB *p, int32_t pCount, const CDB *q, int32
     return 0;
 }
 
-ErrorCode NearestDivisor::assign(const CDB *p, int32_t pCount, const CDB *q, int32_t qCount) {
-    m_ = pCount - 1;
-    n_ = qCount - 1;
+ErrorCode NearestDivisor::assign(ConstComplexVector p, ConstComplexVector q) {
+    m_ = static_cast<int32_t>(p.size() - 1);
+    n_ = static_cast<int32_t>(q.size() - 1);
     degree_ = 0;
     const int64_t sum = int64_t{m_} + n_;
     if (const ErrorCode failed =
             memory_.take(Sized(inputs_, sum + 2), Sized(unknowns_, sum + 3), Sized(step_, sum + 3)))
         return failed;
-    Normalise(p, pCount, this->p());
-    Normalise(q, qCount, this->q());
+    Normalise(p, this->p());
+    Normalise(q, this->q());
     return 0;
 }
 
-// Where a divisor of this degree is within the tolerance, the singular value is below it times the
-// root of the number of columns; ten times as much leaves room for the estimate.
+// If there is a divisor of this degree within the tolerance, the singular value is below the
+// tolerance times the square root of the number of columns; ten times as much leaves room for the
+// estimate.
 ErrorCode NearestDivisor::search(double tolerance) {
     constexpr double trialFactor = 10.0;
     const int64_t sum = int64_t{m_} + n_;
@@ -95,8 +94,8 @@ ErrorCode NearestDivisor::tryDegree(int32_t degree) {
     return refine();
 }
 
-// v and w from the vector that the Sylvester matrix maps to nearly 0, u from both products, of
-// norm 1.
+// Takes v and w from the vector that the Sylvester matrix maps to nearly 0, and u, of norm 1, from
+// both products.
 ErrorCode NearestDivisor::firstGuess() {
     const int32_t gap = m_ - n_, steps = n_ - degree_;
     const CDB *const x = sylvester_.singularVector();
@@ -123,8 +122,8 @@ ErrorCode NearestDivisor::firstGuess() {
     return 0;
 }
 
-// Gauss-Newton steps for u v = p and u w = q with the product of u and its first direction held at
-// 1, as long as they help.
+// Gauss-Newton steps for u v = p and u w = q, with the inner product of u and its initial direction
+// held at 1, as long as they reduce the error.
 ErrorCode NearestDivisor::refine() {
     constexpr int32_t stepLimit = 10;
     double sum = residual();

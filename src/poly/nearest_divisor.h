@@ -12,17 +12,17 @@
 namespace qx {
 
 // The greatest common divisor u of polynomials near p and q: p = u v and q = u w, nearly. Degrees
-// of u are tried from above by the singular values of Sylvester matrices; Gauss-Newton steps then
-// move u, v and w to where the products come nearest to p and q in the 2-norm, and u has the first
-// degree for which both are within the tolerance.
+// of u are tried in descending order, guided by the singular values of Sylvester matrices;
+// Gauss-Newton steps then move u, v and w to where the products come nearest to p and q in the
+// 2-norm, and u has the first degree for which both products are within the tolerance.
 //
-// CommonDivisor does the same for a monic polynomial and its derivative, where errors count by
-// coefficient.
+// CommonDivisor does the same for a monic polynomial and its derivative, with errors measured
+// coefficient by coefficient.
 class NearestDivisor {
 public:
-    // Ascending coefficients with a nonzero last one, at least one each; all finite. The tolerance
-    // is above 0. ErrOutOfMemory.
-    ErrorCode find(const CDB *p, int32_t pCount, const CDB *q, int32_t qCount, double tolerance);
+    // p and q have at least one coefficient each, in ascending order, all finite and the last one
+    // not 0. The tolerance is above 0. ErrOutOfMemory.
+    ErrorCode find(ConstComplexVector p, ConstComplexVector q, double tolerance);
 
     // Descending coefficients.
     int32_t degree() const { return degree_; }
@@ -33,7 +33,7 @@ public:
     double distance() const { return distance_; }
 
 private:
-    ErrorCode assign(const CDB *p, int32_t pCount, const CDB *q, int32_t qCount);
+    ErrorCode assign(ConstComplexVector p, ConstComplexVector q);
     ErrorCode search(double tolerance);
     ErrorCode tryDegree(int32_t degree);
     ErrorCode firstGuess();
@@ -49,7 +49,7 @@ private:
     int32_t unknowns() const { return m_ + n_ - degree_ + 3; }
 
     bool isSwapped_ = false;
-    int32_t m_ = 0, n_ = 0, degree_ = 0; // m >= n: the first of the two is the longer
+    int32_t m_ = 0, n_ = 0, degree_ = 0; // m >= n: degrees of the longer and the shorter one
     double distance_ = 0.0;
     ComplexVector inputs_, unknowns_, step_;
     Scratch<ElementType::CDB> direction_;

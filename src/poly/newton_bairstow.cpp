@@ -15,7 +15,7 @@ double Evaluate(ConstRealVector coef, double x) {
     return value;
 }
 
-// The quadratic factor x^2 - r x - s of a polynomial, and what changes it.
+// The quadratic factor x^2 - r x - s of a polynomial, and its iteration.
 class QuadraticFactor {
 public:
     QuadraticFactor(CDB first, CDB second)
@@ -24,7 +24,7 @@ public:
         limitS_ = std::fabs(r_) * 1e-12 > std::fabs(s_) ? 1.2 : 0.1;
     }
 
-    // a has at least 4 coefficients; b and c have as many places.
+    // a has at least 4 coefficients; b and c have as many elements.
     void refine(ConstRealVector a, const RootLimits &limits, RealVector b, RealVector c) {
         for (int32_t left = limits.iterations; left > 0; --left) {
             divide(a, b, c);
@@ -63,8 +63,8 @@ public:
     }
 
 private:
-    // b becomes the quotient by the factor, with the remainder in its first two places, and c the
-    // same for b, which holds the derivatives of the remainder.
+    // b becomes the quotient by the factor, with the remainder in its first two elements, and c the
+    // same for b; it contains the derivatives of the remainder.
     void divide(ConstRealVector a, RealVector b, RealVector c) const {
         const std::ptrdiff_t n = a.size();
         b[n - 1] = a[n - 1];
@@ -113,7 +113,8 @@ double NewtonRoot(ConstRealVector coef, ConstRealVector derivative, double guess
             best = std::fabs(value);
             stalled = 0;
         }
-        // A step five times as long as the last one is refused, and that is taken again.
+        // A step of at least five times the length of the last one is refused, and the last one is
+        // repeated.
         if (slope != 0.0 && std::fabs(value / slope) < 5.0 * size) {
             step = value / slope;
             size = std::fabs(step);
@@ -140,7 +141,8 @@ ErrorCode BairstowRoots(ConstRealVector coef, ConstComplexVector guesses, const 
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(b, n), Sized(c, n), Sized(pairs, count)))
         return failed;
-    // Real pairs go straight to the output and conjugate ones wait for their place behind them.
+    // Real pairs are written to the output directly; conjugate pairs are stored until they can
+    // follow them.
     std::ptrdiff_t realCount = 0, complexCount = 0;
     for (std::ptrdiff_t i = 0; i + 1 < count; i += 2) {
         QuadraticFactor factor(guesses[i], guesses[i + 1]);

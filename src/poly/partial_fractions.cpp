@@ -47,7 +47,7 @@ public:
     }
 
 private:
-    // Roots at 0 apart, the search for multiple roots leaves out quadratics.
+    // The search for multiple roots does not treat quadratics, not counting roots at 0.
     void joinQuadratic(const DBL *denominator, int32_t n, double tolerance) {
         int32_t zeros = 0;
         while (denominator[zeros] == 0.0)
@@ -81,8 +81,8 @@ private:
         }
         count_ = kept;
     }
-    // The polynomial is real, so a root off the axis has a conjugate; one that is nearer to the
-    // axis than to a partner is real but for rounding errors.
+    // The polynomial is real, so a root off the axis has a conjugate; a root that is nearer to the
+    // axis than to a partner is real except for rounding errors.
     void pairConjugates() {
         for (int32_t i = 0; i < count_; ++i) {
             if (roots_[i].im == 0.0 || conjugate(i) >= 0)
@@ -111,7 +111,7 @@ private:
     ScratchParts memory_;
 };
 
-// The first terms of a power series in t = x - pole, with an exponent of 2 apart.
+// The first terms of a power series in t = x - pole, with a separate exponent of 2.
 class Series {
 public:
     ErrorCode allocate(int32_t coefficients) { return a_.allocate(coefficients); }
@@ -176,7 +176,7 @@ ErrorCode PolesAndResidues(ConstRealVector numerator, ConstRealVector denominato
     for (int32_t i = 0, first = 0; i < found.count(); first += found.multiplicity(i), ++i) {
         const int32_t times = found.multiplicity(i);
         const CDB pole = found[i];
-        // Below the axis the conjugates of what is found above.
+        // Below the axis, the residues are the conjugates of those above it.
         const CDB above = pole.im < 0.0 ? Conj(pole) : pole;
         series.expand(numerator.data(), n - 1, above, times);
         for (int32_t j = 0; j < found.count(); ++j) {

@@ -8,10 +8,10 @@
 
 namespace qx {
 
-// Poles and residues of numerator / denominator, as PartialFractionsH of
-// include/qx/polynomial_arithmetic.h has them. The denominator has at least 2 ascending
-// coefficients, finite and the last one other than 0, all others have one less; the tolerance is
-// above 0.
+// Poles and residues of numerator / denominator, as documented for PartialFractionsH in
+// include/qx/polynomial_arithmetic.h. The denominator has at least 2 ascending coefficients, which
+// are finite and of which the last is not 0; the other arrays have one element fewer. The tolerance
+// is above 0.
 //
 // ErrOverflow (the monic denominator is not finite); ErrIterationLimit; ErrOutOfMemory.
 ErrorCode PolesAndResidues(ConstRealVector numerator, ConstRealVector denominator, double tolerance,

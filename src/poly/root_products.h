@@ -4,13 +4,14 @@
 #include "frame/complex.h"
 #include "frame/elements.h"
 #include "linalg/scalar.h"
+#include "poly/sylvester_matrices.h"
 #include "qx/types.h"
 
 #include <cstdint>
 
 namespace qx {
 
-// Descending coefficients of a product, to which a factor x - root is added at a time.
+// The descending coefficients of a product to which factors x - root are added one by one.
 class GrowingProduct {
 public:
     GrowingProduct(CDB *coefficients) : a_(coefficients) { a_[0] = {1.0, 0.0}; }
@@ -21,8 +22,7 @@ public:
     }
     void multiply(CDB root) {
         a_[degree_ + 1] = {};
-        for (int32_t i = degree_ + 1; i > 0; --i)
-            a_[i] -= root * a_[i - 1];
+        SubtractShifted(root, degree_ + 1, a_);
         ++degree_;
     }
 
@@ -31,10 +31,10 @@ private:
     int32_t degree_ = 0;
 };
 
-// Leja's order, in which factors keep the coefficients of their product accurate: each root is the
-// one farthest from those before it, by the product of the distances; the first is the largest.
-// logSize(j) and logDistance(j, i) are logarithms of the modulus of root j and of its distance from
-// root i. `sums` is work memory.
+// Leja's order, in which multiplying the factors keeps the coefficients of their product accurate:
+// each root is the one farthest from those before it, by the product of the distances; the first is
+// the largest. logSize(j) and logDistance(j, i) are logarithms of the modulus of root j and of its
+// distance from root i. `sums` is work memory.
 template <class LogSize, class LogDistance>
 void LejaOrder(int32_t count, LogSize logSize, LogDistance logDistance, I32 *order, DBL *sums) {
     for (int32_t j = 0; j < count; ++j) {

@@ -33,7 +33,8 @@ ErrorCode EigenvaluesOfCompanion(const CDB *p, int32_t degree, CDB *roots) {
     return Merge(status, companion.release());
 }
 
-// Each root of the next level raises the nearest one of those that have come along so far.
+// Each root of the next level raises the multiplicity of the nearest root that has reached the
+// level before.
 void RaiseNearest(const CDB *found, int32_t foundCount, int32_t level, const CDB *roots,
                   I32 *multiplicities, int32_t rootCount) {
     for (int32_t i = 0; i < foundCount; ++i) {
@@ -62,7 +63,7 @@ public:
     ErrorCode allocate() {
         const int64_t length = int64_t{degree_} + 1;
         DBL *distances;
-        if (const ErrorCode failed = memory_.take(Sized(powers_, length), Sized(product_, length),
+        if (const ErrorCode failed = memory_.take(Sized(product_, length), Sized(others_, length),
                                                   Sized(change_, count_), Sized(best_, count_),
                                                   Sized(order_, count_), Sized(distances, count_)))
             return failed;
@@ -73,7 +74,7 @@ public:
         return system_.allocate(degree_, count_);
     }
 
-    // The relative size of the step, or the code with which it failed.
+    // Takes the step and sets its relative size, or returns the code with which it failed.
     ErrorCode step(double *size) {
         if (const ErrorCode failed = system_.solve(change_))
             return failed;
@@ -86,7 +87,7 @@ public:
         *size = std::sqrt(ofChange / ofRoots);
         return 0;
     }
-    // The best roots so far. Errors of the size of rounding errors are equally good.
+    // Keeps the roots if they are the best so far. Errors within rounding errors are equally good.
     void keepIfBest() {
         const double rounding = degree_ * kEpsilon;
         if (!(error_ <= (leastError_ > rounding ? leastError_ : rounding)))
@@ -101,25 +102,29 @@ public:
         return leastError_;
     }
 
-    // The next step, and the backward error of the roots as they stand. With s the product of (x -
-    // root)^(multiplicity - 1), the polynomial is s times all x - root, and its derivative by root
-    // j is -multiplicity s times all but the j-th.
+    // Sets up the next step, and the backward error of the current roots. With s the product of (x
+    // - root)^(multiplicity - 1), the polynomial is s times all x - root, and its derivative with
+    // respect to root j is -multiplicity s times all of these but the j-th.
     void setUp() {
-        const GrowingProduct base = multiplyPowers(powers_);
+        GrowingProduct before =
+            multiplyPowers(product_); // times the factors before the one left out
         system_.reset(degree_, count_);
-        for (int32_t j = 0; j < count_; ++j) {
-            multiplyAllBut(j, GrowingProduct(product_, base));
+        for (int32_t k = 0; k < count_; ++k) {
+            GrowingProduct rest(others_, before);
+            for (int32_t i = k + 1; i < count_; ++i)
+                rest.multiply(roots_[order_[i]]);
+            const int32_t j = order_[k];
             for (int32_t i = 0; i < degree_; ++i)
-                system_.at(i, j) = product_[i] * -double(multiplicities_[j]);
+                system_.at(i, j) = others_[i] * -double(multiplicities_[j]);
+            before.multiply(roots_[j]);
         }
-        multiplyAllBut(count_, GrowingProduct(product_, base));
         error_ = 0.0;
         for (int32_t i = 0; i < degree_; ++i) {
             const double size = Modulus(p_[i + 1]), weight = size > 1.0 ? 1.0 / size : 1.0;
             system_.right(i) = product_[i + 1] - p_[i + 1];
             const double off = Modulus(system_.right(i)) * weight;
             if (!(off <= error_) && error_ == error_)
-                error_ = off; // NaN stays
+                error_ = off; // a NaN is kept
             system_.scaleRow(i, weight);
         }
     }
@@ -139,18 +144,13 @@ private:
         }
         return product;
     }
-    void multiplyAllBut(int32_t j, GrowingProduct product) const {
-        for (int32_t i = 0; i < count_; ++i)
-            if (order_[i] != j)
-                product.multiply(roots_[order_[i]]);
-    }
 
     const CDB *p_;
     CDB *roots_;
     const I32 *multiplicities_;
     int32_t degree_, count_;
     double error_ = 0.0, leastError_ = kInfinity;
-    CDB *powers_ = nullptr, *product_ = nullptr, *change_ = nullptr, *best_ = nullptr;
+    CDB *product_ = nullptr, *others_ = nullptr, *change_ = nullptr, *best_ = nullptr;
     I32 *order_ = nullptr;
     ScratchParts memory_;
     LeastSquaresSystem system_;
@@ -163,7 +163,7 @@ ErrorCode CompanionRoots(const CDB *p, int32_t degree, CDB *roots) {
         if (p[i].im != 0.0)
             return EigenvaluesOfCompanion<Complex>(p, degree, roots);
     const ErrorCode status = EigenvaluesOfCompanion<Real>(p, degree, roots);
-    // The complex iteration has other shifts.
+    // The complex iteration uses other shifts, and may converge.
     return status != ErrIterationLimit ? status : EigenvaluesOfCompanion<Complex>(p, degree, roots);
 }
 
@@ -219,7 +219,7 @@ ErrorCode PejorativeRefine(const CDB *p, int32_t degree, double tolerance, CDB *
         if (const ErrorCode failed = refinement.step(&size))
             return failed == ErrOutOfMemory ? failed : ErrIterationLimit;
         refinement.setUp();
-        // Steps that shrink no more are rounding errors, if they are small.
+        // Small steps that no longer decrease are rounding errors.
         if (!(size > 4.0 * kEpsilon && size < 0.5 * before) && turn > 0)
             break;
         before = size;

@@ -49,16 +49,16 @@ struct Value {
 };
 
 // b[0] + b[1] t + ... with t = z / 2^k: the coefficients a[i] 2^(k i), all times one power of two
-// that brings the largest next to 1.
+// that brings the largest near 1.
 class ScaledPolynomial {
 public:
-    // `exponents` has the binary exponents of the coefficients; b and sizes are memory.
+    // `exponents` holds the binary exponents of the coefficients; b and sizes are work memory.
     ScaledPolynomial(ConstComplexVector a, Integers exponents, ComplexVector b, RealVector sizes)
         : a_(a), exponents_(exponents), b_(b), sizes_(sizes), n_(int32_t(a.size()) - 1) {}
 
     int32_t degree() const { return n_; }
 
-    // t of z, for which the coefficients are scaled.
+    // Returns t for z, and scales the coefficients accordingly.
     CDB at(CDB z) {
         int k;
         const double fraction = std::frexp(Size(z), &k);
@@ -82,7 +82,7 @@ public:
         return v;
     }
 
-    // The value as if it were computed with twice the digits and then rounded.
+    // The value as if computed in twice the precision and then rounded.
     Value accurateValue(CDB t) const {
         const double r = Size(t);
         const Split re(t.re), im(t.im);
@@ -107,10 +107,10 @@ public:
         return v;
     }
 
-    // Whether the value is one that rounding errors of the coefficients can make.
+    // Whether rounding errors of the coefficients can explain the value.
     bool isRoot(const Value &v) const { return Size(v.p) <= 4.0 * n_ * epsilon * v.sum; }
 
-    // What accurateValue may be off by.
+    // The error bound of accurateValue.
     double uncertainty(const Value &v) const {
         return epsilon * Size(v.p) + 8.0 * n_ * n_ * (epsilon * epsilon) * v.sum;
     }
@@ -141,7 +141,7 @@ private:
     int k_ = std::numeric_limits<int>::min();
 };
 
-// The binary exponent and the logarithm to base 2 of a modulus that may overflow.
+// The binary exponent and the base-2 logarithm of a modulus that may overflow.
 int ExponentOf(CDB z) {
     int exponent;
     std::frexp(std::max(std::fabs(z.re), std::fabs(z.im)), &exponent);
@@ -152,10 +152,11 @@ double Log2(CDB z) {
     return exponent + std::log(Size(TimesPower(z, -exponent))) * (1.0 / ln2);
 }
 
-// Points on circles whose radii are the slopes of the upper convex hull of log |a[i]| over i.
+// Points on circles whose radii follow from the slopes of the upper convex hull of log |a[i]| over
+// i.
 class Start {
 public:
-    // `logs` and `hull` are memory for as many elements as there are coefficients.
+    // `logs` and `hull` are work memory with as many elements as there are coefficients.
     Start(ConstComplexVector a, RealVector logs, Integers hull)
         : n_(int32_t(a.size()) - 1), logs_(logs), hull_(hull) {
         for (int32_t i = 0; i <= n_; ++i)
@@ -211,11 +212,12 @@ public:
         constexpr int32_t sweeps = 600;
         if (!sweep(sweeps, [this](int32_t i) { return improve(i); }))
             return ErrIterationLimit;
-        // Clusters may be on their way still, which is no failure.
+        // Clusters may not have converged yet, which is not a failure.
         sweep(accurateSweeps, [this](int32_t i) { return refine(i); });
         return 0;
     }
-    // What is left to do once roots in clusters were made conjugate, partner[i] that of root i.
+    // Finishes the iteration after roots in clusters have been made conjugate; partner[i] is the
+    // partner of root i.
     void settle(Integers partner) {
         sweep(accurateSweeps, [this, partner](int32_t i) {
             const CDB t = polynomial_.at(z_[i]);
@@ -248,7 +250,8 @@ private:
         return left == 0;
     }
 
-    // A step in which the value needs no more digits; true where it is down to rounding errors.
+    // A step for which plain precision suffices; returns true if the value is within rounding
+    // errors.
     bool improve(int32_t i) {
         const CDB t = polynomial_.at(z_[i]);
         const Value v = polynomial_.value(t);
@@ -275,13 +278,13 @@ private:
             if (j != i) {
                 const CDB difference = z - z_[j];
                 if (IsZero(difference))
-                    return z * 0x1p-30; // apart from the other
+                    return z * 0x1p-30; // moves away from the other root
                 sum = sum + Reciprocal(difference);
             }
         const CDB slope = TimesPower(Quotient(v.slope, v.p), -polynomial_.power());
         return Reciprocal(slope - sum);
     }
-    // Aside from a point between two roots, and from another point that has come too near for a step.
+    // Moves the point by the step, or aside if it lies between two roots or too near another point.
     void move(int32_t i, CDB change, const Value &v) {
         if (!IsFinite(change))
             change = CDB{0.0, 0.125} * z_[i];
@@ -296,9 +299,9 @@ private:
     int32_t n_;
 };
 
-// Makes the roots of a real polynomial real or conjugate pairs: the ones farthest from the real axis
-// first, each with the nearest to its conjugate, or alone where the axis is nearer. partner[i] is the
-// other one of a pair, or i.
+// Makes the roots of a real polynomial real or conjugate pairs: starting with those farthest from the
+// real axis, each is paired with the root nearest to its conjugate, or made real if the axis is
+// nearer. partners[i] is the other root of a pair, or i.
 void MakeConjugate(ComplexVector z, Integers partners) {
     constexpr int32_t none = -1;
     const auto n = static_cast<int32_t>(z.size());
@@ -336,14 +339,14 @@ void MakeConjugate(ComplexVector z, Integers partners) {
 
 // A radius around z in which the polynomial has a root: the least of (binomial(n, k) |p| / |p^(k) /
 // k!|)^(1/k) over the derivatives (P. Henrici, "Applied and Computational Complex Analysis", 1974).
-// The first one says most of a simple root; others are asked where it says little.
+// For a simple root the first derivative suffices; the others are used where its radius is large.
 class Radius {
 public:
-    // taylor and sizes are memory for as many elements as there are coefficients.
+    // taylor and sizes are work memory with as many elements as there are coefficients.
     Radius(ScaledPolynomial &polynomial, ComplexVector taylor, RealVector sizes)
         : polynomial_(polynomial), taylor_(taylor), sizes_(sizes), n_(polynomial.degree()) {}
 
-    // ErrIterationLimit where z is no root.
+    // ErrIterationLimit if z is not a root.
     ErrorCode around(CDB z, DBL *result) {
         const CDB t = polynomial_.at(z);
         const Value v = polynomial_.accurateValue(t);
@@ -377,7 +380,7 @@ private:
             if (k == 0)
                 continue;
             logBinomial += std::log(double(n_ - k + 1) / k);
-            // Less what rounding may have added to it.
+            // Subtracts what rounding may have added to it.
             const double derivative = Size(taylor_[k]) - 8.0 * n_ * epsilon * sizes_[k];
             if (derivative > 0.0)
                 least = std::min(least, std::exp((std::log(size / derivative) + logBinomial) / k));
@@ -391,7 +394,7 @@ private:
     int32_t n_;
 };
 
-// By rising modulus; the conjugates of a pair, which have one modulus, stay together.
+// Sorts by ascending modulus; the conjugates of a pair, which have the same modulus, stay together.
 void SortByModulus(ComplexVector z, RealVector moduli) {
     const auto n = static_cast<int32_t>(z.size());
     const auto isBefore = [&](int32_t i, CDB root, double modulus) {

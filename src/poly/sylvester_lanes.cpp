@@ -34,6 +34,19 @@ constexpr int vectors = 4 / nativeLanes; // of a pair of complex numbers
 
 } // namespace
 
+void SubtractShifted(CDB factor, int32_t count, CDB *a) {
+    constexpr int32_t together = nativeLanes / 2;
+    int32_t i = count;
+    for (; i >= together; i -= together) {
+        DBL *const at = Parts(a + i - together + 1);
+        (L::load(at) - Product(factor.re, factor.im, L::load(at - 2))).store(at);
+    }
+    for (; i > 0; --i) {
+        DBL *const at = Parts(a + i);
+        (Lanes<2>::load(at) - Product(factor.re, factor.im, Lanes<2>::load(at - 2))).store(at);
+    }
+}
+
 void SubtractFourColumns(const CDB *columns, std::ptrdiff_t stride, const CDB *factors,
                          std::ptrdiff_t n, CDB *x) {
     std::ptrdiff_t j = 0;

@@ -82,8 +82,9 @@ void SylvesterMatrices::finishColumn(std::ptrdiff_t j, int32_t rows) {
     ++columns_;
 }
 
-// The columns stand side by side, and the products of the next reflector are summed in the pass that
-// reflects: most of the time goes into waiting for sums, and so four of them grow at once.
+// The two columns are interleaved, and the products with the next reflector are summed in the pass
+// that applies the current one: most of the time is latency of sums, so four of them are formed at
+// once.
 void SylvesterMatrices::reflectPair(int32_t rows) {
     CDB *const first = column(columns_), *const second = column(columns_ + 1);
     for (std::ptrdiff_t i = 0; i < rows; ++i) {
@@ -121,7 +122,7 @@ void SylvesterMatrices::reflectPair(int32_t rows) {
 // Inverse iteration with R^H R.
 double SylvesterMatrices::smallestSingularValue() {
     CDB *const x = vectors_.data(), *const y = x + columns_;
-    for (int32_t i = 0; i < columns_; ++i) // nothing that a structure could be orthogonal to
+    for (int32_t i = 0; i < columns_; ++i) // irregular: orthogonal to no structure
         x[i] = {1.0 + i * 7 % 5 * 0.25, 0.0};
     double value = kInfinity;
     for (int32_t turn = 0; turn < 4; ++turn) {
@@ -138,7 +139,7 @@ double SylvesterMatrices::smallestSingularValue() {
     return value;
 }
 
-// Diagonal elements that vanish are as good as these.
+// Diagonal elements that vanish are replaced by this limit.
 double SylvesterMatrices::pivot(std::ptrdiff_t i) const {
     const double least = 1e-30 * std::fabs(diagonal_[0]);
     return std::fabs(diagonal_[i]) > least ? double(diagonal_[i]) : least;

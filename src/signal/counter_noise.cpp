@@ -12,10 +12,11 @@ namespace {
 constexpr int32_t atOnce = 256;
 constexpr double kHalfLnTwoPi = 0x1.d67f1c864beb5p-1;
 
-// In (0, 1), exact, of the upper 52 bits.
+// A number in (0, 1), exact, from the upper 52 bits.
 double Uniform(uint64_t bits) { return (static_cast<double>(bits >> 12) + 0.5) * 0x1p-52; }
 
-// Blocks of attempt 0 for all values, in pieces; `draw` makes x[i] of the block and of i.
+// Generates the blocks of attempt 0 for all values, in pieces; `draw` computes x[i] from the block
+// and i.
 template <class Draw>
 void ForEachBlock(RealVector x, const NoisePlace &place, const Draw &draw) {
     uint64_t a[atOnce], b[atOnce];
@@ -24,13 +25,13 @@ void ForEachBlock(RealVector x, const NoisePlace &place, const Draw &draw) {
         const int32_t count = std::min(atOnce, n - start);
         NoisePlace piece = place;
         piece.position += static_cast<uint64_t>(start);
-        PhiloxBlocks(piece, count, a, b);
+        PhiloxBlocks(piece, 0, count, a, b);
         for (int32_t i = 0; i < count; ++i)
             x[start + i] = draw(NoiseBlock{a[i], b[i]}, static_cast<uint64_t>(start + i));
     }
 }
 
-// attempt(block, x) says whether it has accepted.
+// attempt(block, x) returns whether it has accepted.
 template <class Attempt>
 double UntilAccepted(NoiseBlock block, const NoisePlace &place, uint64_t i,
                      const Attempt &attempt) {
@@ -40,7 +41,7 @@ double UntilAccepted(NoiseBlock block, const NoisePlace &place, uint64_t i,
     return x;
 }
 
-// ln n! less Stirling's formula (n + 1/2) ln n - n + ln(2 pi) / 2, for n >= 1.
+// ln n! minus Stirling's formula (n + 1/2) ln n - n + ln(2 pi) / 2, for n >= 1.
 double StirlingRest(double n) {
     constexpr double tabulated[16] = {0.0,
                                       0.08106146679532726,
@@ -83,7 +84,7 @@ double Deviance(double x, double mean) {
     }
 }
 
-// Of k events, k >= 0.
+// The logarithm of the probability of k events, k >= 0.
 double LnPoisson(double k, double mean) {
     if (k == 0.0)
         return -mean;
@@ -104,8 +105,8 @@ struct BinomialLaw {
     }
 };
 
-// The first k from 0 on at which the sum of probabilities exceeds u: probability(0) = first, and
-// following(k) is the quotient of that of k + 1 and that of k.
+// The first k from 0 on at which the sum of probabilities exceeds u, where probability(0) = first
+// and following(k) = probability(k + 1) / probability(k).
 template <class Following>
 double BySum(double u, double first, double most, const Following &following) {
     double k = 0.0, probability = first;
@@ -118,7 +119,7 @@ double BySum(double u, double first, double most, const Following &following) {
 }
 
 // Hörmann's hat: k = floor((2 a / (1/2 - |u|) + b) u + c), with c in two parts, of which the whole
-// one may be near 2^53.
+// part may be near 2^53.
 struct Hat {
     double a, b, whole, part, quick;
 
@@ -126,7 +127,7 @@ struct Hat {
         return whole + std::floor((2.0 * a / middle + b) * u + part);
     }
     bool acceptsAtOnce(double middle, double v) const { return middle >= 0.07 && v <= quick; }
-    // The density of the hat at u, up to its factor.
+    // The density of the hat at u, up to a factor.
     double slope(double middle) const { return a / (middle * middle) + b; }
 };
 
@@ -215,7 +216,7 @@ struct GammaAttempt {
 } // namespace
 
 void CounterGamma(RealVector x, double shape, const NoisePlace &place) {
-    constexpr uint32_t powerAttempt = 0xffffffff; // of a shape below 1: its uniform number
+    constexpr uint32_t powerAttempt = 0xffffffff; // of the uniform number for a shape below 1
     const bool isBelow1 = shape < 1.0;
     const GammaAttempt attempt(isBelow1 ? shape + 1.0 : shape);
     uint64_t a[atOnce], b[atOnce];
@@ -226,7 +227,7 @@ void CounterGamma(RealVector x, double shape, const NoisePlace &place) {
         const int32_t filled = (count + 3) / 4 * 4;
         NoisePlace piece = place;
         piece.position += static_cast<uint64_t>(start);
-        PhiloxBlocks(piece, filled, a, b);
+        PhiloxBlocks(piece, 0, filled, a, b);
         for (int32_t i = 0; i < filled; ++i)
             z[i] = CentredUniform(a[i]);
         NormalQuantiles(z, filled, z);
@@ -240,9 +241,12 @@ void CounterGamma(RealVector x, double shape, const NoisePlace &place) {
                 NormalQuantiles(again, 4, again);
                 isAccepted = attempt(again[0], Uniform(block.b), value);
             }
-            if (isBelow1)
-                value *= std::pow(Uniform(PhiloxBlock(piece, offset, powerAttempt).a), 1.0 / shape);
             x[start + i] = value;
+        }
+        if (isBelow1) {
+            PhiloxBlocks(piece, powerAttempt, filled, a, b);
+            for (int32_t i = 0; i < count; ++i)
+                x[start + i] *= std::pow(Uniform(a[i]), 1.0 / shape);
         }
     }
 }
@@ -252,7 +256,7 @@ uint32_t CounterIndex(uint64_t bits, uint32_t count, const NoisePlace &place, ui
         const uint64_t lower = (bits & 0xffffffff) * count;
         const uint64_t upper = (bits >> 32) * count + (lower >> 32);
         const uint64_t rest = upper << 32 | (lower & 0xffffffff);
-        // Below 2^64 mod count some numbers would come once too often.
+        // Below 2^64 mod count some numbers would occur once too often.
         if (rest >= count || rest >= (0 - uint64_t{count}) % count)
             return static_cast<uint32_t>(upper >> 32);
         bits = PhiloxBlock(place, offset, next).a;

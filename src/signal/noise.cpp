@@ -46,16 +46,16 @@ void UniformNoise(RealVector x, double amplitude, RandomState &state) {
 
 namespace {
 
-// The numbers of accepted points of the disc, pair by pair.
+// The coordinates of accepted points in the disc.
 constexpr int32_t pairsAtOnce = 256;
 struct PolarPoints {
     double a[pairsAtOnce], b[pairsAtOnce], r[pairsAtOnce];
     int32_t count;
 };
 
-// Takes pairs of numbers until `wanted` points have been accepted or the block ends. A point
-// stands behind the last accepted one until the next overwrites it, so that nothing depends on a
-// branch that cannot be foreseen.
+// Takes pairs of numbers until `wanted` points have been accepted or the block ends. Each point is
+// stored after the last accepted one and is overwritten by the next if it is not accepted, which
+// avoids an unpredictable branch.
 void TakePoints(RandomStream &stream, int32_t wanted, PolarPoints &points) {
     const int32_t pairs = stream.available(2) / 2;
     const double *u = stream.numbers();
@@ -91,7 +91,7 @@ void GaussianNoise(RealVector x, double sigma, RandomState &state, GaussSpare &s
         x[i++] = spare.spare * sigma;
         spare.hasSpare = 0;
     }
-    if (RandomIsStill(state)) { // the disc would never be met
+    if (RandomIsStill(state)) { // no point would ever be in the disc
         Fill(&x[i], n - i, 0.0);
         return;
     }
@@ -136,7 +136,8 @@ ErrorCode PeriodicNoise(RealVector x, double amplitude, RandomState &state) {
 
 namespace {
 
-// -ln of a product of `order` uniform numbers: the sum of so many exponential ones.
+// -ln of a product of `order` uniform numbers: the sum of `order` exponentially distributed
+// numbers.
 double SumOfExponentials(RandomStream &stream, int32_t order) {
     double product = 1.0;
     for (int32_t j = 0; j < order; ++j)
@@ -251,8 +252,8 @@ int32_t BinomialByCounting(RandomStream &stream, int32_t trials, double limit) {
     return std::min(successes, trials);
 }
 
-// A cache that was not kept as the last call left it may promise more successes than trials, or
-// numbers with which none is ever accepted; what can be seen at a glance is made anew.
+// A cache that the caller has changed since the last call could lead to more successes than trials,
+// or to a rejection that never accepts; values that are visibly wrong are recomputed.
 void Refresh(BinomialCache &cache, int32_t trials, double q) {
     if (trials != cache.nOld || cache.enOld != trials) {
         cache.enOld = trials;
@@ -267,7 +268,7 @@ void Refresh(BinomialCache &cache, int32_t trials, double q) {
     }
 }
 
-// What the caller keeps decides how often a number is drawn, and never whether it is one of 0 to
+// The caller's cache influences how often numbers are drawn, but the result is always from 0 to
 // trials.
 double BinomialByRejection(RandomStream &stream, int32_t trials, double mean,
                            const BinomialCache &cache) {

@@ -7,11 +7,11 @@
 
 namespace qx {
 
-// Fills x, which is not empty, from the state as it is; seeds are the exports' business.
-// include/qx/noise.h says what the numbers are.
+// Each fills x, which is not empty, from the current state; the exports handle seeds.
+// include/qx/noise.h documents the numbers.
 void UniformNoise(RealVector x, double amplitude, RandomState &state);
 void GaussianNoise(RealVector x, double sigma, RandomState &state, GaussSpare &spare);
-// ErrOutOfMemory: work memory or the transform's plan.
+// ErrOutOfMemory (no work memory, or no plan of the transform).
 ErrorCode PeriodicNoise(RealVector x, double amplitude, RandomState &state);
 // order >= 1.
 void GammaNoise(RealVector x, int32_t order, RandomState &state);

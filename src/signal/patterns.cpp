@@ -22,7 +22,8 @@ ErrorCode GenSquarePattern(double amp, double duty, double cycles, RealVector y)
         Fill(y.data(), n, amp);
         return 0;
     }
-    // Both may exceed every integer, as they compare with places in the period they stay doubles.
+    // Both may exceed every integer, and remain doubles because they are compared with positions in
+    // the period.
     const double period = std::trunc(n / cycles + 0.5);
     const double high = std::trunc(0.5 + duty * 0.01 * period);
     double place = 0.0;
@@ -95,7 +96,7 @@ void Evaluate(const TimeGrid &grid, RealVector y, const Shape &shape) {
         y[i] = shape(grid.at(y, i));
 }
 
-// The checks that all pulses share, around those of their own parameters.
+// The checks that all pulses share, and that of their own parameters.
 ErrorCode CheckPulse(const TimeGrid &grid, bool parametersArePositive) {
     return FirstFailed({{!parametersArePositive, ErrNotStrictlyPositive},
                         {!(grid.dt > 0.0), ErrSamplingNotPositive}});
@@ -134,7 +135,7 @@ ErrorCode GenAperiodicTriangle(double amp, const TimeGrid &grid, double width, d
         return bad;
     if (skew < 0.0 || skew > 1.0)
         return ErrProbabilityOutOfRange;
-    // kept: times of the caller's are shifted by half a width, the uniform ones are not.
+    // kept: times of the caller are shifted by half a width, uniform times are not.
     const double shift = grid.isUniform ? 0.0 : 0.5 * width;
     const double top = skew * width;
     Evaluate(grid, y, [=](double time) {
@@ -157,7 +158,7 @@ ErrorCode GenPeriodicSinc(double amp, const TimeGrid &grid, int32_t order, RealV
         const double x = 0.5 * t;
         const double sine = std::sin(x);
         if (!(std::fabs(sine) > 2.220446049250313e-16)) {
-            // The limit at x = k pi, 1 or -1 by the parity of k (order - 1).
+            // The limit at x = k pi is 1 or -1, by the parity of k (order - 1).
             const bool isOpposite = (std::cos(order * x) < 0.0) != (std::cos(x) < 0.0);
             return isOpposite ? -amp : amp;
         }
@@ -168,7 +169,7 @@ ErrorCode GenPeriodicSinc(double amp, const TimeGrid &grid, int32_t order, RealV
 
 namespace {
 
-// kept: the peaks are compared by their whole parts.
+// kept: peaks are compared by their integer parts.
 void FollowPeak(double value, double &peak) {
     if (std::fabs(std::trunc(value)) > std::fabs(std::trunc(peak)))
         peak = value;

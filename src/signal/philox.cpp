@@ -22,8 +22,8 @@ NoiseBlock PhiloxBlock(const NoisePlace &place, uint64_t offset, uint32_t attemp
 }
 
 // The lower tail has the probability (m + (b + 1/2) / 2^64) / 2^52 for the m of CentredUniform, and
-// the upper one mirrors it. Wichura's quotients, as in philox_lanes.cpp, and the one for tails
-// below exp(-25).
+// the upper one mirrors it. Uses the quotients of Wichura, as in philox_lanes.cpp, and his quotient
+// for tails below exp(-25).
 double NormalTailQuantile(const NoiseBlock &block) {
     constexpr uint64_t highest = (uint64_t{1} << 52) - 1;
     const uint64_t m = block.a >> 12;

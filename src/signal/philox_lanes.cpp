@@ -16,11 +16,12 @@ struct BlockLanes {
     Bits a, b;
 };
 
-// What all blocks of a place have in common: its key of each round.
+// The state that all blocks of a place share: the keys of the rounds.
 class PhiloxLanes {
 public:
-    explicit PhiloxLanes(const NoisePlace &place)
-        : position_(place.position), kind_(Same(static_cast<int64_t>(place.kind))) {
+    explicit PhiloxLanes(const NoisePlace &place, uint32_t attempt = 0)
+        : position_(place.position), attempt_(Same(attempt)),
+          kind_(Same(static_cast<int64_t>(place.kind))) {
         uint32_t key0 = static_cast<uint32_t>(place.key),
                  key1 = static_cast<uint32_t>(place.stream);
         for (int round = 0; round < rounds; ++round) {
@@ -33,12 +34,12 @@ public:
             lanes_[lane] = lane;
     }
 
-    // The blocks of L::count values, `offset` values on. The upper halves of the words are not kept
-    // clean: products and exclusive sums of the lower ones do not see them.
+    // The blocks of L::count values from position + offset on. The upper halves of the words are
+    // not cleared: products and exclusive-ors of the lower halves do not depend on them.
     QX_INLINE BlockLanes at(int32_t offset) const {
         const Bits counter =
             Same(static_cast<int64_t>(position_ + static_cast<uint64_t>(offset))) + lanes_;
-        Bits w0 = counter, w1 = ShiftedDown<L>(counter, 32), w2 = Bits{}, w3 = kind_;
+        Bits w0 = counter, w1 = ShiftedDown<L>(counter, 32), w2 = attempt_, w3 = kind_;
 #pragma GCC unroll 10
         for (int round = 0; round < rounds; ++round) {
             const Bits p0 = ProductOfLowerHalves<L>(w0, Same(0xd2511f53)),
@@ -54,10 +55,10 @@ public:
 private:
     static constexpr int rounds = 10;
     uint64_t position_;
-    Bits kind_, lanes_, keys_[rounds][2];
+    Bits attempt_, kind_, lanes_, keys_[rounds][2];
 };
 
-// (m + 1/2) / 2^52 - 1/2, exact, from m in the fraction of a number of [1, 2).
+// (m + 1/2) / 2^52 - 1/2, exact, with m as the fraction of a number in [1, 2).
 QX_INLINE L Centred(Bits a) {
     const L shifted = OfBits<L>(ShiftedDown<L>(a, 12) | Same(0x3ff0000000000000));
     return (shifted - L(1.5)) + L(0x1p-53);
@@ -76,7 +77,7 @@ QX_INLINE L Polynomial(const double (&c)[Count], L x) { // ascending
     return sum;
 }
 
-// ln x of normal numbers, as K. C. Ng has it in fdlibm (Sun Microsystems, 1993).
+// ln x of normal numbers, by the method of K. C. Ng in fdlibm (Sun Microsystems, 1993).
 QX_INLINE L Logarithm(L x) {
     constexpr double c[] = {0x1.5555555555593p-1, 0x1.999999997fa04p-2, 0x1.2492494229359p-2,
                             0x1.c71c51d8e78afp-3, 0x1.7466496cb03dep-3, 0x1.39a09d078c69fp-3,
@@ -130,8 +131,8 @@ QX_INLINE L OuterQuantile(L q) {
     return CopySign(Polynomial(above, r) / Polynomial(below, r), q);
 }
 
-// Quantiles of n numbers, a multiple of the lanes and at most atOnce: those outside of the middle,
-// 15 of 100, are collected and computed side by side.
+// Quantiles of n numbers, where n is a multiple of the number of lanes and at most atOnce. Those
+// outside the middle, 15 of 100, are collected and computed together.
 void Quantiles(const double *u, int n, double *x) {
     double outer[atOnce + L::count];
     int where[atOnce + L::count], count = 0;
@@ -153,8 +154,8 @@ void Quantiles(const double *u, int n, double *x) {
 
 } // namespace
 
-void PhiloxBlocks(const NoisePlace &place, int32_t n, uint64_t *a, uint64_t *b) {
-    const PhiloxLanes blocks(place);
+void PhiloxBlocks(const NoisePlace &place, uint32_t attempt, int32_t n, uint64_t *a, uint64_t *b) {
+    const PhiloxLanes blocks(place, attempt);
     for (int32_t i = 0; i < n; i += L::count) {
         const BlockLanes block = blocks.at(i);
         Store(block.a, a + i);
@@ -167,7 +168,7 @@ void PhiloxUniforms(const NoisePlace &place, double amplitude, DBL *x, int32_t n
     const L scale(amplitude);
     const auto at = [&](int32_t i) { return L(2.0) * Centred(blocks.at(i).a) * scale; };
     int32_t i = 0;
-    for (; i + 2 * L::count <= n; i += 2 * L::count) { // two side by side hide the multiplications
+    for (; i + 2 * L::count <= n; i += 2 * L::count) { // two at once hide the latency of products
         const L first = at(i), second = at(i + L::count);
         first.store(x + i);
         second.store(x + i + L::count);

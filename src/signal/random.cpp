@@ -7,13 +7,13 @@ namespace qx {
 
 namespace {
 
-// One step of one sequence. The product is meant to wrap.
+// One step of one sequence. The product wraps on purpose.
 int32_t Step(int32_t s, const RandomSequence &sequence) {
     const uint32_t product = static_cast<uint32_t>(sequence.multiplier) * static_cast<uint32_t>(s);
     return static_cast<int32_t>(product) % sequence.modulus;
 }
 
-// s a^count mod m for a sequence within its modulus, where no product wraps.
+// s a^count mod m for a sequence within its modulus; no product wraps.
 int32_t Skip(int32_t s, const RandomSequence &sequence, int64_t count) {
     int32_t power = sequence.multiplier;
     int32_t result = s;
@@ -65,7 +65,7 @@ int32_t RandomInt15(RandomState &state) {
 void RandomSkip(RandomState &state, int64_t count) {
     if (count < 1)
         return;
-    Advance(state); // from here on every sequence is within its modulus
+    Advance(state); // from here on all sequences are within their moduli
     state.s1 = Skip(state.s1, randomSequences[0], count - 1);
     state.s2 = Skip(state.s2, randomSequences[1], count - 1);
     state.s3 = Skip(state.s3, randomSequences[2], count - 1);
@@ -77,7 +77,7 @@ bool RandomIsStill(const RandomState &state) {
     return next.s1 == 0 && next.s2 == 0 && next.s3 == 0;
 }
 
-// One number may be left when two are wanted: it moves to the front.
+// If one number is left when two are needed, it moves to the front.
 void RandomStream::refill() {
     const int32_t left = size_ - next_;
     atBlock_ = here();

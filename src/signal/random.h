@@ -10,8 +10,8 @@
 namespace qx {
 
 // The generator of Wichmann and Hill (1982). Its three sequences are s = a s mod m, in 32-bit
-// arithmetic with the remainder of the sign of the dividend: a seed above 2^31 / 170 wraps in the
-// first product, and a sequence that has become negative by that stays negative.
+// arithmetic, where the remainder has the sign of the dividend: a seed above 2^31 / 170 wraps in
+// the first product, and a sequence that becomes negative by this stays negative.
 struct RandomSequence {
     int32_t multiplier;
     int32_t modulus;
@@ -23,26 +23,26 @@ inline constexpr RandomSequence randomSequences[3] = {
     {170, 30323, 3.297826732183491e-05},
 };
 
-// A seed of 0 does nothing: the stream goes on.
+// A seed of 0 does nothing: the stream continues.
 void RandomSeed(int32_t seed, RandomState &state);
 // The next number: a double in [0, 1), or an integer in [0, 32768).
 double RandomUniform(RandomState &state);
 int32_t RandomInt15(RandomState &state);
 
-// The state after `count` more numbers, count >= 0, without drawing them.
+// Advances the state by `count` numbers, count >= 0, without drawing them.
 void RandomSkip(RandomState &state, int64_t count);
 
 // Whether every number of the stream is 0.
 bool RandomIsStill(const RandomState &state);
 
-// The next n numbers at once, the same as RandomUniform gives.
+// The next n numbers at once, the same as those of RandomUniform.
 QX_BY_WIDTH(void, RandomUniforms, (RandomState & state, DBL *u, int32_t n))
 
-// Numbers one after the other, drawn in blocks and given out singly. The state is brought to where
-// the numbers in use end when the stream does.
+// Numbers that are drawn in blocks and returned one by one. When the stream is destroyed, the state
+// is set to the position after the last number used.
 class RandomStream {
 public:
-    // `expected`: about how many numbers will be drawn.
+    // `expected` is roughly how many numbers will be drawn.
     RandomStream(RandomState &state, int64_t expected)
         : state_(state), atBlock_(state), behind_(state), expected_(expected) {}
     ~RandomStream() { state_ = here(); }
@@ -55,8 +55,8 @@ public:
         return numbers_[next_++];
     }
 
-    // Several at a time: `available` numbers stand at `numbers`, at least `least` of them, and
-    // `use` says how many are taken. `least` is at most 2.
+    // Several at a time: numbers() has available(least) numbers, at least `least` of them, and
+    // use() reports how many were taken. `least` is at most 2.
     int32_t available(int32_t least) {
         if (size_ - next_ < least)
             refill();
@@ -77,8 +77,8 @@ private:
     }
 
     RandomState &state_;
-    RandomState atBlock_; // where numbers_[0] is the next number
-    RandomState behind_;  // where the one behind numbers_[size_ - 1] is
+    RandomState atBlock_; // the state in which numbers_[0] is the next number
+    RandomState behind_;  // and that in which the one after numbers_[size_ - 1] is
     int64_t expected_;
     int32_t next_ = 0;
     int32_t size_ = 0;

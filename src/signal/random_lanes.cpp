@@ -5,10 +5,10 @@ namespace qx::QX_WIDTH {
 
 namespace {
 
-// Eight consecutive numbers are computed at once, each eight ahead of its lane's last one by
-// s = s a^8 mod m. The remainder is taken in double precision without an error: a product is
-// below 2^30, and the quotient, moved by half a remainder's weight, stays far enough from the
-// middle between two integers for its nearest integer to be the floor.
+// Eight consecutive numbers are computed at once, each eight steps ahead of the last one of its
+// lane by s = s a^8 mod m. The remainder is computed exactly in double precision: a product is
+// below 2^30, and the quotient, shifted by 1 / (2 m) - 1/2, stays far enough from the middle between
+// two integers for its nearest integer to be the floor.
 constexpr int block = 8;
 constexpr double toInteger = 0x1.8p52; // adding and subtracting it rounds to an integer
 
@@ -30,7 +30,8 @@ constexpr Powers powersOf[3] = {PowersOf(randomSequences[0]), PowersOf(randomSeq
 typedef Lanes<nativeLanes> L;
 constexpr int vectors = block / L::count;
 
-// Magnitudes within the modulus; the sign of a sequence never changes and goes to its weight.
+// The magnitudes of a sequence within its modulus; the sign never changes and is part of the
+// weight.
 struct SequenceLanes {
     L s[vectors];
     double modulus;
@@ -44,7 +45,7 @@ __attribute__((always_inline)) inline L Times(L s, L power, double modulus) {
     return s * power - whole * L(modulus);
 }
 
-// The first block behind one value, lane by lane.
+// The first block after one value, lane by lane.
 __attribute__((always_inline)) inline SequenceLanes Started(int32_t s, int which) {
     const RandomSequence &sequence = randomSequences[which];
     SequenceLanes lanes;
@@ -82,7 +83,7 @@ int32_t Value(const SequenceLanes &lanes, int lane) {
 void RandomUniforms(RandomState &state, DBL *u, int32_t n) {
     if (n < 1)
         return;
-    u[0] = RandomUniform(state); // a caller's state may lie beyond the moduli
+    u[0] = RandomUniform(state); // a caller's state may exceed the moduli
     if (n == 1)
         return;
     SequenceLanes lanes[3] = {Started(state.s1, 0), Started(state.s2, 1), Started(state.s3, 2)};

@@ -15,9 +15,9 @@ __attribute__((always_inline)) inline L Indices(int32_t i) {
     return L::load(indices);
 }
 
-// fmod(x, 360), raised by 360 where negative, for |x| below 2^50. The quotient is a whole number
-// near |x| / 360, its product with 360 has no error, and the remainder, between -180 and 180 or
-// just beyond, has none either.
+// fmod(x, 360), increased by 360 if negative, for |x| below 2^50. The quotient is a whole number
+// near |x| / 360, its product with 360 is exact, and so is the remainder, which is between -180 and
+// 180 or slightly beyond.
 template <class L>
 __attribute__((always_inline)) inline L Reduced(L x) {
     const L zero(0.0);
@@ -28,7 +28,7 @@ __attribute__((always_inline)) inline L Reduced(L x) {
     const L nearest = magnitude - quotient * turn;
     const L raised = nearest + turn;
     const L rest(nearest.v < zero.v ? raised.v : nearest.v);
-    // fmod gives a zero the sign of x, and a zero is not raised.
+    // fmod gives a zero the sign of x, and a zero is not increased.
     const L mirrored = turn - rest;
     const L minusZero(-0.0);
     const L ofNegative(rest.v == zero.v ? minusZero.v : mirrored.v);
@@ -40,8 +40,8 @@ __attribute__((always_inline)) inline L Unreduced(L indices, const WavePhases &p
     return indices * L(360.0) * L(phases.f) + L(phases.start);
 }
 
-// Where less than a turn in eight vectors passes, most vectors lie within a turn, and their phases
-// are less by whole turns than those before the remainder is taken, without an error.
+// If eight vectors cover less than a turn, most vectors lie within one turn, and their phases are
+// the unreduced ones minus the same number of whole turns, exactly.
 template <class Shape>
 __attribute__((always_inline)) inline int32_t ShapedSlowly(const WavePhases &phases, int32_t n,
                                                            DBL *y, Shape shape) {

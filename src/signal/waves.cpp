@@ -19,7 +19,8 @@ double PhaseAt(int32_t i, double f, double start) {
     return Raised(std::fmod(i * 360.0 * f + start, 360.0), 360.0);
 }
 
-// `samples` makes the wave of its phases. Phases too large for its remainder are made here.
+// `samples` computes the wave from its phases. Phases that are too large for its remainder are
+// computed here.
 template <class Samples>
 void GenShapedWave(double f, double &phase, RealVector y, const Samples &samples) {
     const int32_t n = Count(y);
@@ -54,8 +55,8 @@ void GenSawtoothWave(double amp, double f, double &phase, RealVector y) {
 }
 
 // Sine and cosine two samples apart: sin(a + 2w) = sin(a) + 2 sin(w) cos(a + w), and likewise for
-// the cosine. Clipping is part of the method, whose amplitude is not stable over long runs; as it
-// is rare, a branch takes it off the chain of additions.
+// the cosine. Clipping is part of the method, whose amplitude is not stable over long runs; as
+// clipping is rare, a branch keeps it out of the chain of additions.
 void GenSineWave(double amp, double f, double &phase, RealVector y) {
     const int32_t n = Count(y);
     const double w = 2.0 * kPi * f;
@@ -85,7 +86,7 @@ void GenSineWave(double amp, double f, double &phase, RealVector y) {
 
 namespace {
 
-// fmod(q, m), raised by m where negative, for a whole m and |q| / m below 2^44.
+// fmod(q, m), increased by m if negative, for a whole m and |q| / m below 2^44.
 double ReducedByWhole(double q, double m, double inverse) {
     const double magnitude = std::fabs(q);
     const double quotient = (magnitude * inverse + toInteger) - toInteger;
@@ -101,7 +102,7 @@ double ReadTable(double position, double step, double m, RealVector y, const Val
     for (int32_t i = 0; i < n; ++i) {
         double r =
             isNear ? ReducedByWhole(position, m, inverse) : Raised(std::fmod(position, m), m);
-        // A tiny negative remainder is rounded to m when it is raised.
+        // A tiny negative remainder becomes m by rounding when m is added.
         r = r < m ? r : 0.0;
         y[i] = value(r);
         position += step;
@@ -124,7 +125,8 @@ ErrorCode GenArbitraryWave(double amp, double f, double &phase, ConstRealVector 
     const double length = m;
     const double step = length * f;
     double position = length / 360.0 * phase;
-    // Beyond that the position would lose itself in infinity, and with it the place in the table.
+    // Beyond this limit the position would become infinite, and there would be no index into the
+    // table.
     if (!std::isfinite(2.0 * (std::fabs(position) + n * std::fabs(step))))
         return ErrNonFiniteInput;
     if (interpolate == 1)

@@ -9,19 +9,19 @@ namespace qx {
 
 inline int32_t Count(ConstRealVector y) { return static_cast<int32_t>(y.size()); }
 
-// Continuous waves of n samples, n >= 1, the size of y: f in cycles per sample, `phase` in degrees,
-// in and out.
+// Continuous waves of n samples, where n >= 1 is the size of y; f is in cycles per sample, and
+// `phase`, in degrees, is updated.
 void GenSineWave(double amp, double f, double &phase, RealVector y);
 void GenSquareWave(double amp, double f, double &phase, double duty, RealVector y);
 void GenTriangleWave(double amp, double f, double &phase, RealVector y);
 void GenSawtoothWave(double amp, double f, double &phase, RealVector y);
-// By the values of a table. ErrNonFiniteInput before anything is written.
+// A wave whose period is a table. ErrNonFiniteInput is returned before anything is written.
 ErrorCode GenArbitraryWave(double amp, double f, double &phase, ConstRealVector table,
                            int32_t interpolate, RealVector y);
 void GenChirp(double amp, double f1, double f2, RealVector y);
 
-// The phases of a wave: fmod(i 360 f + start, 360), raised by 360 where negative; or, `inPlace`,
-// what is in the output, for where the lanes' own remainder is not exact.
+// The phases of a wave: fmod(i 360 f + start, 360), increased by 360 if negative; or, with
+// `inPlace`, the phases that the output holds, for which the remainder in lanes would not be exact.
 struct WavePhases {
     double f;
     double start;

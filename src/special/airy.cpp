@@ -14,7 +14,7 @@ namespace {
 constexpr double kOverflow = 103.892;
 constexpr double kSeriesLimit = 2.09;
 constexpr double kGrowthFrom = 8.3203353;
-constexpr double kFar = 0.02; // of 1 / zeta^2
+constexpr double kFar = 0.02; // bound of 1 / zeta^2
 
 // 2/3 x sqrt(x) in two doubles.
 Extended Zeta(double x) {
@@ -31,7 +31,7 @@ double Exp(Extended x) {
 AiryValues Oscillating(double x) {
     const double a = -x;
     const Extended zeta = Zeta(a);
-    if (!std::isfinite(zeta.high) || std::isnan(zeta.low)) // the phase has no digit left
+    if (!std::isfinite(zeta.high) || std::isnan(zeta.low)) // the phase has no digits left
         return {0, 0, 0, 0};
     const double z = 1 / (zeta.high * zeta.high);
     const bool far = z < kFar;
@@ -39,7 +39,7 @@ AiryValues Oscillating(double x) {
     const double g = (far ? table::airyWaveGFar(z) : table::airyWaveGMid(z)) / zeta.high;
     const double fp = far ? table::airypWaveFFar(z) : table::airypWaveFMid(z);
     const double gp = (far ? table::airypWaveGFar(z) : table::airypWaveGMid(z)) / zeta.high;
-    // sine and cosine of zeta + pi / 4 without adding: s and c are sqrt(2) times too large
+    // sine and cosine of zeta + pi / 4 without forming the sum: s and c are sqrt(2) times too large
     const double s0 = std::sin(zeta.high);
     const double c0 = std::cos(zeta.high);
     const double sine = s0 + c0 * zeta.low;
@@ -64,7 +64,7 @@ AiryValues Series(double x) {
     double gp = 1;
     double termF = 1;
     double termG = x;
-    for (int k = 1; k < 100; ++k) { // 40 terms serve the largest argument
+    for (int k = 1; k < 100; ++k) { // 40 terms suffice for the largest argument
         const double n = 3 * k;
         const double slopeF = termF * (x * x) / (n - 1);
         const double slopeG = termG * (x * x) / n;
@@ -82,7 +82,7 @@ AiryValues Series(double x) {
             kRootThree * (c1 * fp + c2 * gp)};
 }
 
-// Ai and Ai' of the series in two doubles: their two parts cancel as x grows.
+// Ai and Ai' by the series in two doubles: their two parts cancel as x grows.
 void CarefulDecay(double x, AiryValues *values) {
     constexpr Extended c1 = {0.3550280538878172, 2.05233632436212e-17};
     constexpr Extended c2 = {0.2588194037928068, -2.522243111610832e-17};

@@ -7,8 +7,8 @@ struct AiryValues {
     double ai, aip, bi, bip;
 };
 
-// Ai, Ai', Bi, Bi'. The exponentials overflow for x > 103.892, where 0, 0 and the largest double
-// stand for them.
+// Ai, Ai', Bi, Bi'. The exponentials overflow for x > 103.892; there Ai and Ai' are 0, and Bi and
+// Bi' are the largest double.
 //
 //   x < -2.09            modulus and phase with rational forms in 1 / zeta^2, zeta = 2/3 |x|^1.5;
 //                        the phase is formed in two doubles, so the values keep their digits

@@ -20,17 +20,17 @@ constexpr ExtendedComplex kNone = {{0, 0}, {0, 0}};
 Complex Conjugate(Complex z) { return {z.re, -z.im}; }
 Complex TimesI(Complex z) { return {-z.im, z.re}; }
 
-// The values of exp(scale) times a function at z in the upper half-plane, the real axis included.
+// Functions at z in the closed upper half-plane, times exp(scale).
 struct UpperPlane {
-    double order; // of which the functions without the order's sign are
+    double order; // of the functions, without its sign
     Complex z;
     ExtendedComplex scale;
 
     Complex sum(const ExponentialPair &pair, Complex factor) const {
         return (Value(pair.first, scale) + Value(pair.second, scale)) * factor;
     }
-    // There J and Y are the parts of H1, and come without the long way of I around the turning
-    // point.
+    // Here J and Y are the real and imaginary parts of H1, so the long computation of I around the
+    // turning point is not needed.
     bool isOscillatingOnAxis() const { return z.im == 0 && z.re > kAxisFrom && z.re > order; }
     Complex turned() const { return {z.im, -z.re}; } // -i z
     Complex j() const {
@@ -95,7 +95,7 @@ Complex OfY(const UpperPlane &plane, bool isNegative) {
 Complex OfI(const UpperPlane &plane, bool isNegative) {
     if (!isNegative)
         return plane.i();
-    // I + 2 / pi sin(pi order) K, for Re z < 0 at -z and turned
+    // I + 2 / pi sin(pi order) K; for Re z < 0 evaluated at -z and rotated
     const double sine = SinPi(plane.order);
     const Complex place = plane.isLeft() ? -plane.z : plane.z;
     Complex sum;
@@ -108,8 +108,8 @@ Complex OfI(const UpperPlane &plane, bool isNegative) {
     return plane.isLeft() ? sum * TurnByPi(-plane.order) : sum;
 }
 
-// J + i Y on the positive real axis, where both are real. Below the turning point J is far smaller
-// than Y and would be lost in it.
+// J + i Y on the positive real axis, where both are real. For z below the order J is far smaller
+// than Y and would be lost in it, so it is computed separately.
 Complex OnAxis(const UpperPlane &plane) {
     const UpperPlane plain = {plane.order, plane.z, kNone};
     const Complex h1 = plain.h1();
@@ -250,9 +250,9 @@ Complex AirySeries(AiryKind kind, Complex z) {
 }
 
 // Ai = sqrt(z / 3) / pi K, Bi = sqrt(z / 3) (2 I + 2 / pi sin(pi / 3) K) at zeta of order 1/3 in
-// the right half-plane; turned, Ai = sqrt(z / 3) / pi (exp(-i pi / 3) K - i pi I) and
-// Bi = sqrt(z / 3) (I - i sqrt(3) / pi exp(i pi / 6) K). The derivatives likewise, with -z /
-// sqrt(3) and order 2/3: the phases of K are twice and minus those above.
+// the right half-plane; rotated, Ai = sqrt(z / 3) / pi (exp(-i pi / 3) K - i pi I) and
+// Bi = sqrt(z / 3) (I - i sqrt(3) / pi exp(i pi / 6) K). The derivatives are the same with
+// -z / sqrt(3) and order 2/3, where the phases of K are twice and minus those above.
 Complex AiryFromBessel(AiryKind kind, Complex z, const ExtendedComplex &zeta, bool isTurned,
                        const ExtendedComplex &scale) {
     const bool isDerivative = IsDerivative(kind);
@@ -318,7 +318,7 @@ ComplexValue ComplexAiry(AiryKind kind, CDB z, bool isScaled) {
     if (isScaled)
         scale =
             IsAi(kind) ? zeta : ExtendedComplex{{side * zeta.re.high, side * zeta.re.low}, {0, 0}};
-    // Ai is real on the negative axis, its scaled form is not.
+    // Ai is real on the negative axis; its scaled form is not.
     const bool isRealAxis = z.im == 0;
     const bool isScaledLast = modulus <= kSeriesLimit || (isRealAxis && z.re < 0);
     const ExtendedComplex inner = isScaledLast ? kNone : scale;

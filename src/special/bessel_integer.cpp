@@ -13,12 +13,13 @@ namespace qx {
 namespace {
 
 constexpr double kSmall = 8;
-constexpr double kLowTo = 16; // in x^2, of Y less its logarithm
+constexpr double kLowTo = 16; // in x^2, for Y without its logarithm
 constexpr double kFar = 20;
 constexpr double kUniformFrom = 200;
 constexpr double kTiny = 1e-8; // x^2 / 4 is below half an ulp of 1
 
-// x - zero, with the zero's square in two doubles: (x^2 - zero^2) keeps its digits near the zero.
+// x - zero, with the square of the zero in two doubles, so that (x^2 - zero^2) keeps its digits
+// near the zero.
 double FromZero(Extended square, const double (&zero)[2]) {
     return (square.high - zero[0]) + (square.low - zero[1]);
 }
@@ -27,8 +28,8 @@ struct Wave {
     double j, y;
 };
 
-// Modulus and phase for x >= 8: the phase x - (2 n + 1) pi / 4 is never formed, its sine and
-// cosine are sums of those of x.
+// Modulus and phase for x >= 8. The phase x - (2 n + 1) pi / 4 is never formed; its sine and cosine
+// are sums of those of x.
 Wave Wave0(double x) {
     const double z = 1 / (x * x);
     const bool far = x >= kFar;
@@ -92,9 +93,9 @@ ScaledK KScaled(double x) {
     return {table::k0Far(u) / root, table::k1Far(u) / root};
 }
 
-// f_(k+1) = (2 k / x) f_k - f_(k-1) for k below 2^20, upward, or downward with f_(k-1) and f_(k+1)
-// exchanged. Two hundred steps would lose a digit to rounding, so what each step rounds away is
-// carried along in a recurrence of its own.
+// f_(k+1) = (2 k / x) f_k - f_(k-1) for k below 2^20, upward; or downward, with f_(k-1) and f_(k+1)
+// exchanged. Two hundred steps would lose a digit to rounding, so the rounding error of each step
+// is carried along in a recurrence of its own.
 class Recurrence {
 public:
     Recurrence(double x, double before, double value) : before_(before), value_(value) {
@@ -123,7 +124,7 @@ public:
     double value() const { return Corrected(value_, restOfValue_); }
 
 private:
-    // Next to the ends of the range the rest is lost, but the value is not.
+    // Near the ends of the range the correction overflows, but the value does not.
     static double Corrected(double value, double rest) {
         return std::isfinite(rest) ? value + rest : value;
     }
@@ -196,7 +197,7 @@ double BesselJn(double n, double x) {
             j.step(k);
         return j.value();
     }
-    if (x * x < n + 1) { // the ascending series falls from its first term on
+    if (x * x < n + 1) { // the terms of the ascending series fall from the first on
         const double quarter = -0.25 * x * x;
         double term = 1;
         double sum = 1;
@@ -206,8 +207,8 @@ double BesselJn(double n, double x) {
         }
         return PowerOverGamma(0.5 * x, n) * sum;
     }
-    // Downward from an order where J has fallen so far that the trial values 0 and 1 there leave
-    // 1e-18 of Y at n; the fall is slowest, that of Airy's function, next to n = x.
+    // Downward from an order at which J is so small that the trial values 0 and 1 leave 1e-18
+    // of Y at n. The decay is slowest, that of Airy's function, near n = x.
     const double start = n + std::floor(10 * std::cbrt(0.5 * x)) + 3;
     Recurrence j(x, 0, 1);
     double k = start - 1;
@@ -231,7 +232,7 @@ double BesselYn(double n, double x) {
         return BesselY1(x);
     if (n >= kUniformFrom)
         return BesselLargeOrder(n, x).y;
-    const double scale = n > x ? 0x1p-512 : 1; // where Y grows, away from the end of the range
+    const double scale = n > x ? 0x1p-512 : 1; // where Y grows: away from the overflow limit
     Recurrence y(x, scale * BesselY0(x), scale * BesselY1(x));
     for (double k = 1; k < n && std::isfinite(y.value()); k += 1)
         y.step(k);
@@ -262,8 +263,8 @@ double BesselIn(double n, double x) {
         }
         return PowerOverGamma(0.5 * x, n) * sum;
     }
-    // Downward from an order where I has fallen by 1e-17 relative to I_n; the trial values are
-    // positive, so the recurrence is stable, and they cannot overflow: they grow by I0 / I_start.
+    // Downward from an order at which I is 1e-17 times I_n. The trial values are positive, so the
+    // recurrence is stable, and the values cannot overflow: they grow by I0 / I_start.
     const double start = n + std::sqrt(80 * (n + x)) + 20;
     double above = 0;
     double value = 1e-290;
@@ -287,7 +288,7 @@ double BesselKn(double n, double x) {
         return kInfinity;
     if (std::isinf(x))
         return 0;
-    if (n > 1000) // the recurrence would serve, at a cost without bound
+    if (n > 1000) // the recurrence would work, but its cost has no bound
         return ModifiedBesselLargeOrder(n, x).k;
     const ScaledK scaled = KScaled(x);
     const double half = std::exp(-0.5 * x);
@@ -300,7 +301,7 @@ double BesselKn(double n, double x) {
         before = value;
         value = next;
     }
-    if (!std::isfinite(value)) // exp(x) K overflows, K itself perhaps not
+    if (!std::isfinite(value)) // exp(x) K overflows, K itself may not
         return ModifiedBesselLargeOrder(n, x).k;
     return half * (value * half);
 }

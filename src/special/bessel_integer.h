@@ -5,11 +5,11 @@ namespace qx {
 
 // The Bessel functions of integer order, n >= 0, x >= 0.
 //
-// Orders 0 and 1, J and Y: up to x = 8 rational forms in x^2, with the zeros of J in that range
-// divided out and the logarithm of Y split off (broken at 4); from 8 on modulus and phase with
-// rational forms in 1 / x^2, broken at 20. I: rational forms in x^2 up to 8, in 1 / x from there,
-// broken at 24. K: up to 1 the logarithm is split off; from there rational forms in 1 / x, broken
-// at 5.
+// Orders 0 and 1. J and Y: up to x = 8 rational forms in x^2, with the zeros of J in that range
+// divided out and the logarithm of Y split off (two intervals, divided at 4); from 8 on modulus and
+// phase with rational forms in 1 / x^2 (divided at 20). I: rational forms in x^2 up to 8, in 1 / x
+// from there on (divided at 24). K: up to 1 with the logarithm split off; from there on rational
+// forms in 1 / x (divided at 5).
 //
 // Near the zeros of J and Y the error is absolute, a few eps of the modulus.
 double BesselJ0(double x);
@@ -17,15 +17,15 @@ double BesselJ1(double x);
 double BesselY0(double x); // -infinity at 0
 double BesselY1(double x);
 
-// Larger orders. J: upward recurrence while n <= x, where it is stable; below, downward
+// Larger orders. J: upward recurrence while n <= x, where it is stable; otherwise downward
 // recurrence from a higher order to the larger of J0 and J1 (Miller's method). Y: upward. The
-// recurrences carry their rounding errors along. From order 200 on both come from the expansions
-// for large order, which bounds the work.
+// recurrences carry their rounding errors along. From order 200 on both use the expansions for
+// large order, which bounds the work.
 double BesselJn(double n, double x);
 double BesselYn(double n, double x);
 
-// I: the ascending series while x^2 / 4 is not above its range, else the ratio to I0 by downward
-// recurrence. K: upward recurrence from e^x K0 and e^x K1 to order 1000, beyond it the expansion
+// I: the ascending series while x^2 / 4 < 10 (n + 1), otherwise the ratio to I0 by downward
+// recurrence. K: upward recurrence from e^x K0 and e^x K1 to order 1000; above that the expansion
 // for large order.
 double BesselIn(double n, double x);
 double BesselKn(double n, double x);

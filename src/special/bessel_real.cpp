@@ -17,8 +17,8 @@ constexpr double kLowestOrder = -200;
 constexpr double kLargeOrder = 200;
 constexpr int kMostTerms = 1000;
 
-// The sum of q^k / (k! (order + 1)_k), q = -x^2/4 or x^2/4, in two doubles: terms of both signs
-// may exceed the sum by many orders of magnitude.
+// The sum of q^k / (k! (order + 1)_k), q = -x^2/4 or x^2/4, in two doubles, because terms of both
+// signs may exceed the sum by many orders of magnitude.
 double CarefulSum(double order, Extended q) {
     Extended term = {1, 0};
     Extended sum = term;
@@ -33,7 +33,7 @@ double CarefulSum(double order, Extended q) {
     return sum.high;
 }
 
-// The same where the terms fall from the first or have one sign.
+// The same sum where the terms fall from the first on or have one sign.
 double PlainSum(double order, double q) {
     double term = 1;
     double sum = 1;
@@ -58,7 +58,7 @@ double BesselJSeries(double order, double x) {
     return factor * CarefulSum(order, {-0.25 * square.high, -0.25 * square.low});
 }
 
-// The two sums of Hankel's form, cut at the smallest term.
+// The two sums of Hankel's form, truncated at the smallest term.
 struct HankelSums {
     double p, q;
 };
@@ -71,7 +71,7 @@ HankelSums SumHankel(double order, double x, double sign) {
     for (int k = 1; k < 200; ++k) {
         const double odd = 2 * k - 1;
         const double next = term * ((square - odd * odd) / (8 * k * x));
-        // terms grow at first where the order is large; they end when they grow past it
+        // where the order is large the terms grow at first; the sum ends when they grow beyond that
         if (std::fabs(next) >= std::fabs(term) && odd * odd > square)
             break;
         term = next;
@@ -87,7 +87,7 @@ HankelSums SumHankel(double order, double x, double sign) {
 
 OscillatingPair Hankel(double order, double x) {
     const HankelSums sums = SumHankel(order, x, -1);
-    // the phase x - (order / 2 + 1 / 4) pi, each part reduced by itself
+    // the phase x - (order / 2 + 1 / 4) pi, with each part reduced separately
     const double turn = 0.5 * order + 0.25;
     const double st = SinPi(turn);
     const double ct = CosPi(turn);
@@ -125,8 +125,9 @@ double RatioAbove(double order, double x) {
     return 1 / f;
 }
 
-// The recurrence away from order 0: `value` is J of order `from`, `next` of the order one step
-// further, step 1 or -1; the result is J of `order`. J_(m+1) + J_(m-1) = (2 m / x) J_m.
+// The recurrence away from order 0, J_(m+1) + J_(m-1) = (2 m / x) J_m. `value` is J of order
+// `from`, `next` is J of the following order in the direction of `step`, 1 or -1; the result is J
+// of `order`.
 double Recur(double order, double from, double step, double x, double value, double next) {
     const int steps = static_cast<int>(std::lround(std::fabs(order - from)));
     double mu = from + step;
@@ -139,29 +140,29 @@ double Recur(double order, double from, double step, double x, double value, dou
     return value;
 }
 
-// An order that is higher than the shifted one and than x: downward from the continued fraction.
+// For an order above both the shifted order and x: downward from the continued fraction.
 double DownwardJ(double order, double from, double x) {
     double above = RatioAbove(order, x);
     const double start = above;
-    double value = 1; // of order - 1
+    double value = 1; // J of order - 1, up to scale
     const int steps = static_cast<int>(std::lround(order - 1 - from));
     for (int i = 0; i < steps; ++i) {
         const double below = 2 * (order - 1 - i) / x * value - above;
         above = value;
         value = below;
     }
-    // compared with the larger of the two orders at the end, which is away from its zero
+    // normalised by the larger of the two final orders, which is away from its zero
     return std::fabs(value) > std::fabs(above) ? start / value * UnshiftedJ(from, x)
                                                : start / above * UnshiftedJ(from + 1, x);
 }
 
-// The order near 3.6 sqrt(x) with the same fraction.
+// The order near 3.6 sqrt(x) with the same fractional part.
 double ShiftedOrder(double order, double x) {
     const double a = std::fabs(order);
     return std::floor(std::clamp(3.6 * std::sqrt(x), 2.0, 17.0)) + (a - std::floor(a));
 }
 
-// J for an order that is not an integer, not below -200, and x > 0.
+// J for x > 0 and an order that is not an integer and not below -200.
 double NonIntegerJ(double order, double x) {
     if (std::isinf(x))
         return 0;
@@ -185,7 +186,8 @@ double NonIntegerY(double order, double x) {
         return 0;
     if (order >= kLargeOrder)
         return x / order / order <= 0.3 ? BesselLargeOrder(order, x).y : Hankel(order, x).y;
-    // Where J would come from Hankel's form, Y comes from the same sums without the difference.
+    // Where J would come from Hankel's form, Y comes from the same sums, without the difference of
+    // J(order) and J(-order).
     const double shifted = ShiftedOrder(order, x);
     if (order > 0 && x > HankelFrom(std::min(order, shifted + 1) + 3)) {
         if (order <= shifted + 3)
@@ -200,7 +202,7 @@ double NonIntegerY(double order, double x) {
     return cosine == 0 ? -second / sine : (cosine * NonIntegerJ(order, x) - second) / sine;
 }
 
-// Orders above the range of int32 take the general way: there the expansion for large order.
+// Orders above the range of int32 take the same path; BesselJn uses the expansion for large order.
 double IntegerJ(double n, double x) {
     const double order = std::fabs(n);
     const bool negative = IsOdd(order) && (n < 0) != (x < 0);
@@ -220,7 +222,7 @@ double BesselJ(double order, double x) {
     if (x < 0)
         return kNaN;
     if (x < kEpsilon)
-        return 0; // kept: also where the order is negative or below 1
+        return 0; // kept: also if the order is negative or below 1
     return NonIntegerJ(order, x);
 }
 
@@ -234,7 +236,7 @@ double BesselY(double order, double x) {
         return order < 0 && IsOdd(order) ? -value : value;
     }
     const double value = NonIntegerY(order, x);
-    if (std::isnan(value)) // the recurrence in the order has left the range
+    if (std::isnan(value)) // the recurrence in the order has overflowed
         return order > 0 || CosPi(order) > 0 ? -kInfinity : kInfinity;
     return value;
 }
@@ -262,7 +264,7 @@ double SphericalBesselY(int32_t n, double x) {
     if (std::isinf(x))
         return 0;
     if (n < 0 && n + 0.5 >= kLowestOrder && std::isinf(kHalfPi / x))
-        return n == -1 ? 1 : 0; // up to the sign j of order -n - 1
+        return n == -1 ? 1 : 0; // up to sign, j of order -n - 1
     return std::sqrt(kHalfPi / x) * BesselY(n + 0.5, x);
 }
 

@@ -6,8 +6,8 @@
 namespace qx {
 
 // J of real order. NaN for NaN, for orders below -200 that are not integers, and for x < 0 with
-// such an order; integer orders fold both signs and use the kernels of integer order; |x| < eps
-// gives 0 for all other orders.
+// such an order. Integer orders reflect both signs and use the kernels for integer orders. |x| <
+// eps gives 0 for all other orders.
 //
 //   |order| > 17, x < 3.6 sqrt(|order|)   ascending series: its terms fall nearly from the start
 //   order >= 200                          expansion for large order up to x = 0.3 order^2, then
@@ -17,13 +17,13 @@ namespace qx {
 //   at the order k: ascending series up to x = (0.0083 k + 0.09) k + 12.9 (0.9 k from k = 26),
 //   then Hankel's form
 //
-// The series is summed in two doubles, so that its cancellation costs nothing. Hankel's form is
-// divergent: next to the threshold its smallest term, about exp(-2 x), bounds the accuracy.
+// The series is summed in two doubles, so that cancellation costs no digits. Hankel's form is
+// divergent: near the threshold its smallest term, about exp(-2 x), bounds the accuracy.
 double BesselJ(double order, double x);
 
-// Y of real order, by the kernels for integer orders and from J(order) and J(-order) otherwise;
-// close to integers that difference loses as many digits as the order shares with the integer.
-// NaN for x <= 0 and orders below -200.
+// Y of real order: for integer orders by the kernels for these, otherwise from J(order) and
+// J(-order). Close to integers that difference loses as many digits as the order has in common with
+// the integer. NaN for x <= 0 and orders below -200.
 double BesselY(double order, double x);
 
 // j_n and y_n: sqrt(pi / (2 x)) times J and Y of order n + 1/2.

@@ -15,7 +15,7 @@ namespace {
 
 constexpr int kDebyeTerms = 10;
 
-// u_k(t) / order^k for t^2 = square, all real: t^k sits in `power`.
+// The terms u_k(t) / order^k for t^2 = square, all real: t^k is in `power`.
 template <class Term>
 void DebyeTerms(double order, double t, double square, Term term) {
     double power = 1;
@@ -46,13 +46,13 @@ OscillatingPair Monotone(double order, double x) {
     return {scale * std::exp(-exponent) * sumJ, -2 * scale * std::exp(exponent) * sumY};
 }
 
-// x > order: the wave of phase order (tan beta - beta) - pi / 4, order / x = cos beta.
+// x > order: the oscillation with phase order (tan beta - beta) - pi / 4, order / x = cos beta.
 OscillatingPair Wave(double order, double x) {
     const Extended difference = ExactSum(x, -order);
     const Extended sum = ExactSum(x, order);
     const Extended s = SquareRoot(difference * sum); // order tan(beta)
     if (!std::isfinite(s.high) || std::isnan(s.low))
-        return {0, 0}; // x beyond 1e153: J and Y are below 1e-76 and their phase has no digit
+        return {0, 0}; // x above 1e153: J and Y are below 1e-76 and their phase has no digits
     const double beta = std::atan2(s.high, order);
     const Extended turn = ExactProduct(order, beta);
     const Extended phase = s + Extended{-turn.high, -turn.low};
@@ -67,13 +67,13 @@ OscillatingPair Wave(double order, double x) {
     const double cosine = std::cos(phase.high);
     const double s1 = sine + cosine * phase.low;
     const double c1 = cosine - sine * phase.low;
-    const double scale = std::sqrt(2 / (kTwoPi * s.high)); // 1 / sqrt(2) of the turn by pi / 4
+    const double scale = std::sqrt(2 / (kTwoPi * s.high)); // 1 / sqrt(2): rotation by pi / 4
     const double c = c1 + s1;
     const double q = s1 - c1;
     return {scale * (c * even + q * odd), scale * (q * even - c * odd)};
 }
 
-// About the turning point.
+// Near the turning point.
 OscillatingPair Turning(double order, double x) {
     const double w = (x - order) / order;
     const double slope = table::olverSlope(w);
@@ -81,7 +81,7 @@ OscillatingPair Turning(double order, double x) {
     const AiryValues airy = Airy(-w * slope * (third * third));
     const double r = 1 / (order * order);
     const double a = 1 + r * ((table::olverA1(w) - 1) + r * (table::olverA2(w) - 1));
-    // B stands with order^(-5/3), a factor order^(-1/3) of which is in the scale
+    // B has the factor order^(-5/3), of which order^(-1/3) is in the scale
     const double c = (table::olverB0(w) + r * (table::olverB1(w) - 1)) / (order * third);
     const double scale = table::olverFactor(w) / third;
     const double y = scale * (airy.bi * a + airy.bip * c);
@@ -119,7 +119,7 @@ namespace {
 Complex TimesExp(Complex factor, Complex exponent) {
     if (std::fabs(exponent.re) < 700)
         return Exp(exponent) * factor;
-    // An infinite modulus would leave no sign to the parts.
+    // With an infinite modulus the signs of the parts would be lost.
     const Complex direction = Exp(Complex{0, exponent.im}) * factor;
     const double half = std::exp(0.5 * exponent.re);
     return {direction.re * half * half, direction.im * half * half};

@@ -10,9 +10,9 @@ struct ModifiedPair {
     double i, k;
 };
 
-// J and Y for order >= 200 and any x > 0: the expansions of Debye away from the turning point
-// x = order, that of Olver for 0.6 order < x < 1.7 order, so called uniform because it holds
-// there. Phases are formed in two doubles. Where Y overflows it is -infinity.
+// J and Y for order >= 200 and any x > 0: Debye's expansions away from the turning point x = order,
+// and for 0.6 order < x < 1.7 order Olver's expansion, called uniform because it holds there.
+// Phases are formed in two doubles. Where Y overflows it is -infinity.
 // Source: F. W. J. Olver, Asymptotics and Special Functions, 1974, chapters 10 and 11.
 OscillatingPair BesselLargeOrder(double order, double x);
 

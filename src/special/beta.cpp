@@ -20,16 +20,16 @@ constexpr double kGammasTo = 33;
 constexpr double kHuge = 1e12;
 constexpr double kDirectTo = 50; // the product of three gammas stays in range
 
-// (p / s)^p, 0 < p < s, whose base is raised in two parts since the power multiplies its error by
-// p.
+// (p / s)^p, 0 < p < s. The quotient is raised to the power in two parts, because the power
+// multiplies its error by p.
 double PowerOfShare(Extended p, Extended s) {
     const Extended base = p / s;
     return std::pow(base.high, p.high) *
            std::exp(p.high * (base.low / base.high) + p.low * std::log(base.high));
 }
 
-// a moved up to Stirling's range by beta(a, b) = beta(a + 1, b) (a + b) / a, `b` being the other;
-// the factors are gathered in `product`.
+// Raises a to Stirling's range by beta(a, b) = beta(a + 1, b) (a + b) / a, where `b` is the other
+// parameter; the factors are collected in `product`.
 Extended MoveUp(double a, Extended b, Extended *product) {
     Extended moved = {a, 0};
     Extended numerator = {1, 0};
@@ -55,8 +55,8 @@ double ByStirling(double a, double b) {
            PowerOfShare(q, s) * std::exp(correction);
 }
 
-// 1e-20 < b <= a, a + b <= 33. A third of the time that Stirling's formula takes after it has
-// moved both arguments up, for an eps or two more.
+// 1e-20 < b <= a, a + b <= 33. Takes a third of the time of Stirling's formula with both arguments
+// raised, at the cost of an eps or two.
 double ByGammas(double a, double b) {
     const Extended s = ExactSum(a, b);
     double value = GammaFunction(a) / GammaFunction(s.high) * GammaFunction(b);
@@ -81,8 +81,8 @@ double OfPositive(double a, double b) {
 // sin(pi s) of a sum in two doubles.
 double SinPiOf(Extended s) { return SinPi(s.high) + kPi * s.low * CosPi(s.high); }
 
-// a <= 0, a <= b, with gammas that may leave the range: by the reflection of each gamma of a
-// negative argument the beta function of positive ones.
+// a <= 0, a <= b, where the gamma functions may overflow: each gamma function of a negative
+// argument is reflected, which leaves the beta function of positive arguments.
 double OfNegative(double a, double b) {
     if (IsInteger(a) || (b <= 0 && IsInteger(b)))
         return kNaN;
@@ -109,7 +109,7 @@ double CompleteBeta(double a, double b) {
         return a < b ? OfNegative(a, b) : OfNegative(b, a);
     const Extended s = ExactSum(a, b);
     double reciprocal = ReciprocalGamma(s.high);
-    if (s.low != 0 && !IsInteger(s.high)) // beside a pole of gamma the rounding of the sum counts
+    if (s.low != 0 && !IsInteger(s.high)) // next to a pole of gamma the rounding of the sum matters
         reciprocal -= reciprocal * (s.low * Digamma(s.high));
     return GammaFunction(a) * GammaFunction(b) * reciprocal;
 }

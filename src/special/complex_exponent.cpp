@@ -12,7 +12,7 @@ namespace {
 Extended Twice(Extended a) { return {2 * a.high, 2 * a.low}; }
 Extended Half(Extended a) { return {0.5 * a.high, 0.5 * a.low}; }
 
-// ln(a / b), both above 0: the quotient is brought to a power of 2 times a number near k / 32.
+// ln(a / b), both positive: the quotient is reduced to a power of 2 times a number near k / 32.
 Extended LogOfQuotient(Extended a, Extended b) {
     Extended q = a / b;
     int exponent;
@@ -69,7 +69,7 @@ Complex RootOfUpperHalf(Complex z) {
     return {z.im / (2 * im), im};
 }
 
-ExtendedComplex ExtendedRoot(ExtendedComplex z) { // one step of Newton's
+ExtendedComplex ExtendedRoot(ExtendedComplex z) { // one step of Newton's method
     const Complex root = RootOfUpperHalf({z.re.high, z.im.high});
     const Extended square = ExactProduct(root.re, root.re) - ExactProduct(root.im, root.im);
     const Complex rest = {(z.re - square).high,

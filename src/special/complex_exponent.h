@@ -12,20 +12,20 @@ struct ExtendedComplex {
     Extended re, im;
 };
 
-// factor exp(exponent). Kept apart, because the exponent may be beyond the range of exp and because
-// it needs more digits than the factor: an error in it is a relative error of the product.
+// factor exp(exponent). The exponent is separate because it may be beyond the range of exp and
+// because it needs more digits than the factor: an error in it is a relative error of the product.
 struct Exponential {
     Complex factor;
     ExtendedComplex exponent;
 };
 
-// Its value times exp(scale); infinite parts where it overflows, 0 where it underflows.
+// The value times exp(scale); infinite parts on overflow, 0 on underflow.
 Complex Value(const Exponential &term, const ExtendedComplex &scale);
 inline ExtendedComplex Plain(Complex z) { return {{z.re, 0}, {z.im, 0}}; }
 
-// sqrt(z) for a z with Im z >= 0, in the first quadrant.
+// sqrt(z) in the first quadrant, for Im z >= 0.
 Complex RootOfUpperHalf(Complex z);
-// sqrt(z) of such a z with all digits of twice the precision but a few.
+// The same in twice the precision, to all but a few digits.
 ExtendedComplex ExtendedRoot(ExtendedComplex z);
 
 // The exponent of Debye's expansions, s - order ln((order + s) / z) with s = sqrt(order^2 + z^2),
@@ -36,7 +36,7 @@ struct DebyeExponent {
 };
 DebyeExponent ExponentOfDebye(Extended order, Complex z);
 
-// The argument of re + i im, from -pi to pi; absolute error about 2^-70.
+// The argument of re + i im, in [-pi, pi]; absolute error about 2^-70.
 Extended ExtendedArgument(Extended re, Extended im);
 
 } // namespace qx

@@ -16,7 +16,7 @@ namespace qx {
 namespace {
 
 constexpr double kAllDigits = 8 * kEpsilon;
-constexpr double kPairEps = 1e-30; // of sums in two doubles
+constexpr double kPairEps = 1e-30; // eps of sums in two doubles
 constexpr double kUnusable = 1e38;
 constexpr double kNoDigits = 0.01;
 
@@ -34,7 +34,7 @@ constexpr double kHankelFrom = 12.9;
 constexpr double kAcceptedError = 0.0001220703125;
 constexpr double kAcceptedTruncation = 0.00048828125;
 
-constexpr double kAsymptoticFrom = 25; // of |x|; below it the form cannot have full precision
+constexpr double kAsymptoticFrom = 25; // in |x|; below it the form cannot have full precision
 constexpr int kMostAsymptoticTerms = 1000;
 constexpr double kTricomiAsymptoticFrom = 6;
 constexpr double kNearInteger = 0.0001;
@@ -72,8 +72,8 @@ double Limit(double c, double w) {
     return BesselJ(c - 1, 2 * root) / PowerOverGamma(root, c - 1);
 }
 
-// A block of 0F1(; c + i; -w), i < count: the last two, and from there the recurrence downwards,
-// which is stable.
+// A block of 0F1(; c + i; -w), i < count: the last two directly, the others from these by downward
+// recurrence, which is stable.
 void FillBlock(double c, double w, int count, double *block) {
     block[count - 1] = Limit(c + (count - 1), w);
     block[count - 2] = Limit(c + (count - 2), w);
@@ -83,15 +83,15 @@ void FillBlock(double c, double w, int count, double *block) {
     }
 }
 
-// The relative error of the Bessel functions: X eps from their argument; that of Hankel's form for
-// orders that are not integers.
+// The relative error of the Bessel functions: X eps from their argument, and for orders that are
+// not integers also the error of Hankel's form.
 double BesselError(double b, double w) {
     const double x = 2 * std::sqrt(w);
     const double hankel = x > kHankelFrom && !IsInteger(b) ? std::exp(-2 * x) : 0.0;
     return (4 + x) * kEpsilon + hankel;
 }
 
-// Where no digit is left, the estimate itself means nothing.
+// With no correct digits left the estimate itself is meaningless.
 KummerEstimate Judge(const SeriesSum &sum, double eps) {
     const double size = std::fabs(sum.sum);
     const double truncation = sum.last / size;
@@ -106,8 +106,8 @@ struct AsymptoticSum {
     double error;
 };
 
-// The sum of (p)_n (q)_n / n! y^n, divergent: cut at its smallest term once n is past -p and -q,
-// where the terms begin their final rise.
+// The sum of (p)_n (q)_n / n! y^n, divergent: truncated at its smallest term once n is above -p and
+// -q, where the terms begin their final growth.
 AsymptoticSum SumAsymptotic(double p, double q, double y) {
     double term = 1;
     double sum = 1;
@@ -135,7 +135,7 @@ double Prefactor(double b, double a, double y, double power, double scale) {
     const double quotient = GammaQuotient({b}, {a});
     if (quotient == 0)
         return 0;
-    const double half = std::exp(0.5 * scale); // the whole may overflow before the power joins it
+    const double half = std::exp(0.5 * scale); // exp(scale) may overflow though the result does not
     return direct * half * quotient * half;
 }
 
@@ -154,7 +154,7 @@ KummerEstimate KummerBessel(double a, double b, double x) {
     int blockEnd = 0;
     int length =
         static_cast<int>(std::clamp(w - b + 2, double{kBesselBlock}, double{kLongestBlock}));
-    // A_n half^n / (b)_n for n and the two before
+    // A_n half^n / (b)_n for n and the two preceding indices
     double factor = 1;
     double before = 0;
     double beforeThat = 0;
@@ -205,7 +205,7 @@ KummerEstimate KummerSeries(double a, double b, double x) {
 
 KummerEstimate KummerAsymptotic(double a, double b, double x) {
     const double y = std::fabs(x);
-    // for x < 0 as exp(x) M(b - a, b, -x), which exchanges the two parts
+    // for x < 0 by exp(x) M(b - a, b, -x), which exchanges the two parts
     const double p = x < 0 ? b - a : a;
     const double q = x < 0 ? a : b - a;
     const double firstPower = x < 0 ? -a : a - b;
@@ -234,13 +234,13 @@ double Kummer(double x, double a, double b) {
     if (std::isinf(a) && std::isinf(x))
         return kNaN;
     if (x == kInfinity && std::isfinite(a) && std::isfinite(b) && a != 0)
-        return kInfinity; // kept: of this sign for every a and b
+        return kInfinity; // kept: positive for every a and b
     if (a == 0 || x == 0)
         return 1;
     if (a == b)
         return std::exp(x);
 
-    // Where the asymptotic form is as good as any, the others would but take more time.
+    // Where the asymptotic form is as accurate as any, the other methods would only take more time.
     KummerEstimate asymptotic = Unusable();
     if (std::fabs(x) >= kAsymptoticFrom) {
         asymptotic = KummerAsymptotic(a, b, x);
@@ -259,7 +259,7 @@ double Kummer(double x, double a, double b) {
         return asymptotic.value;
     if (series.error <= asymptotic.error && series.error < kUnusable)
         return series.value;
-    // kept: also where the asymptotic form has the smaller error
+    // kept: also if the asymptotic form has the smaller error
     if (series.error < kAcceptedError && series.truncation < kAcceptedTruncation)
         return series.value;
     if (asymptotic.error < series.error && asymptotic.error < kAcceptedError)
@@ -269,9 +269,10 @@ double Kummer(double x, double a, double b) {
 
 namespace {
 
-// x >= 6. The terms alternate from the place on where n is past -a and -b', and there they end once
-// they rise; what is left of the sum is then the last term times C(n) = 1 - r(n) C(n + 1), r being
-// the size of the ratio. Its slope r' is small, and C = 1 / (1 + r) + r r' / (1 + r)^3 - ...
+// x >= 6. The terms alternate in sign once n is above -a and -b', and from there on the sum ends
+// when they grow. The remainder of the sum is then the last term times C(n) = 1 - r(n) C(n + 1),
+// where r is the magnitude of the ratio. Its slope r' is small, so that
+// C = 1 / (1 + r) + r r' / (1 + r)^3 - ...
 double TricomiAsymptotic(double x, double a, double b) {
     const double p = a + 1 - b;
     double term = 1;
@@ -307,7 +308,7 @@ double Tricomi(double x, double a, double b) {
     if (!std::isfinite(x) || !std::isfinite(a) || !std::isfinite(b) || x < 0)
         return kNaN;
     if (x == 0)
-        return kInfinity; // kept: also where U has a finite limit
+        return kInfinity; // kept: also if U has a finite limit
     if (x >= kTricomiAsymptoticFrom)
         return OneNaN(TricomiAsymptotic(x, a, b));
     // kept: a mean, not the limit form with digamma functions

@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// The few complex operations that the Kelvin functions need, in a fixed order of arithmetic;
-// arguments stay far from overflow.
+// The few complex operations that the Kelvin functions need, with a fixed order of arithmetic.
+// Arguments must be far from overflow.
 typedef CDB Complex;
 
 inline Complex RootOfRightHalf(Complex a) {

@@ -10,9 +10,9 @@ namespace qx {
 namespace {
 
 constexpr double kSeriesFrom = 10;
-constexpr double kLogarithmFrom = 1e9; // here the series no longer counts
+constexpr double kLogarithmFrom = 1e9; // above it the series is negligible
 
-// Bernoulli numbers B_14 ... B_2, each over its index.
+// Bernoulli numbers B_14 ... B_2, each divided by its index.
 constexpr double kSeries[] = {1.0 / 12,  -691.0 / 32760, 1.0 / 132, -1.0 / 240,
                               1.0 / 252, -1.0 / 120,     1.0 / 12};
 

@@ -9,8 +9,8 @@ namespace qx {
 
 namespace {
 
-constexpr double kHalfPiLow = 6.123233995736766e-17; // pi / 2 less its double
-constexpr int kMostRounds = 40;                      // of Landen's transformation; about 8 are made
+constexpr double kHalfPiLow = 6.123233995736766e-17; // pi / 2 minus its double
+constexpr int kMostRounds = 40; // of Landen's transformation; about 8 are needed
 
 bool IsParameter(double m) { return m >= 0 && m <= 1; }
 
@@ -20,8 +20,8 @@ struct LandenSums {
     double extra; // E = F E(m) / K(m) + extra
 };
 
-// floor((phi + pi / 2) / pi), but next to an odd multiple of pi / 2, where rounding decides that and
-// the sign of t = tan(phi), the number of half turns that belongs to t.
+// floor((phi + pi / 2) / pi). Near an odd multiple of pi / 2, where rounding decides this number
+// and the sign of t = tan(phi) independently, the number of half turns that is consistent with t.
 double HalfTurns(double phi, double t) {
     constexpr double steep = 1e6;
     const double turns = std::floor((phi + kHalfPi) / kPi);
@@ -45,14 +45,14 @@ LandenSums Landen(double phi, double m) {
         const double mean = std::sqrt(a * b);
         a = 0.5 * (a + b);
         b = mean;
-        c = 0.25 * c * c / a; // half the difference of a and b before, without its cancellation
+        c = 0.25 * c * c / a; // half the previous difference of a and b, without its cancellation
         d += d;
         extra += c * std::sin(phi);
     }
     return {(std::atan(t) + turns * kPi) / (d * a), extra};
 }
 
-// An amplitude as a multiple of pi and a rest within a quarter turn.
+// An amplitude as a multiple of pi and a remainder within a quarter turn.
 struct Amplitude {
     double halfTurns;
     double rest;
@@ -91,8 +91,8 @@ double EllipticE(double m) {
 
 namespace {
 
-// An incomplete integral by its complete form and by its values for 0 < phi < pi / 2 at m = 1 and
-// elsewhere.
+// An incomplete integral from its complete form and from functions for 0 < phi < pi / 2, one for m
+// = 1 and one for other m.
 template <class AtOne, class General>
 double Incomplete(double phi, double m, double (*complete)(double), AtOne atOne, General general) {
     if (!IsParameter(m) || std::isnan(phi))
@@ -175,7 +175,7 @@ JacobiValues ByMeans(double u, double m) {
     double b = std::sqrt(1 - m);
     double scale = 1;
     int i = 0;
-    // eps a is exact, and so c / a, rounded, exceeds eps where c exceeds eps a
+    // eps a is exact, so the rounded c / a exceeds eps if c exceeds eps a
     while (i < rounds && std::fabs(c[i]) > kEpsilon * a[i]) {
         a[i + 1] = 0.5 * (a[i] + b);
         c[i + 1] = 0.5 * (a[i] - b);
@@ -190,7 +190,7 @@ JacobiValues ByMeans(double u, double m) {
     }
     for (; i > 0; --i) {
         const double sine = c[i] * std::sin(phi) / a[i];
-        // a small arc sine is its argument to the last bit
+        // a small arc sine equals its argument to the last bit
         phi = 0.5 * ((std::fabs(sine) < 1e-8 ? sine : std::asin(sine)) + phi);
     }
     const double sn = std::sin(phi);
@@ -203,8 +203,8 @@ JacobiValues ByMeans(double u, double m) {
 JacobiValues EllipticJacobi(double u, double m) {
     if (!IsParameter(m) || !std::isfinite(u))
         return {kNaN, kNaN, kNaN, kNaN};
-    // The first-order forms hold where the dropped second order, (m u)^2 or (m1 exp(2 u))^2 in
-    // size, is below eps; elsewhere the means serve.
+    // The first-order forms are accurate where the neglected second order, of size (m u)^2 or
+    // (m1 exp(2 u))^2, is below eps; elsewhere the means are used.
     if (m < 1e-9 && std::fabs(m * u) < 1e-8)
         return NearCircular(u, m);
     const double m1 = 1 - m;

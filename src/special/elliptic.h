@@ -3,9 +3,9 @@
 
 namespace qx {
 
-// Elliptic integrals of the first and second kind by their parameter m = k^2, NaN outside [0, 1].
-// Complete: pi/2 and m times a rational form up to m = 1/2, beyond it P(1 - m) - ln(1 - m) Q(1 -
-// m), which carries the logarithmic end exactly.
+// Elliptic integrals of the first and second kind as functions of the parameter m = k^2; NaN for m
+// outside [0, 1]. Complete: pi/2 and m times a rational form up to m = 1/2; above it P(1 - m) -
+// ln(1 - m) Q(1 - m), which represents the logarithmic singularity exactly.
 double EllipticK(double m);
 double EllipticE(double m);
 
@@ -15,13 +15,13 @@ double EllipticE(double m);
 double EllipticF(double phi, double m);
 double EllipticE(double phi, double m);
 
-// F(phi, 1), the inverse of the Gudermannian function, to the last digits of small angles and next to a
-// quarter turn; what EllipticF gives from a quarter turn on.
+// F(phi, 1), the inverse of the Gudermannian function, accurate to the last digits for small angles
+// and near a quarter turn. From a quarter turn on the same as EllipticF.
 double EllipticFOfOne(double phi);
 
 // Jacobi's sn, cn, dn and the amplitude. m < 1e-9 and m > 0.999999999: first-order forms about the
-// circular and the hyperbolic functions, the latter only while the second order stays below eps;
-// otherwise at most 8 arithmetic-geometric means and back through the amplitudes.
+// circular and the hyperbolic functions, the latter only while the second order is below eps.
+// Otherwise at most 8 steps of the arithmetic-geometric mean and back through the amplitudes.
 struct JacobiValues {
     double sn, cn, dn, phi;
 };

@@ -3,9 +3,9 @@
 
 namespace qx {
 
-// erf(x), 2 / sqrt(pi) times the integral of exp(-t^2) from 0 to x, and erfc(x) = 1 - erf(x): each
-// in its own form where it is the smaller, up to |x| = 1 and beyond, with the rational
-// approximations of special/tables/error_function.h.
+// erf(x), 2 / sqrt(pi) times the integral of exp(-t^2) from 0 to x, and erfc(x) = 1 - erf(x). Each
+// has its own form where it is the smaller one, erf up to |x| = 1 and erfc beyond, with the
+// rational approximations of special/tables/error_function.h.
 double Erf(double x);
 double ErfC(double x);
 

@@ -15,7 +15,7 @@ namespace {
 constexpr double kBig = 1.4411518807585587e+17;       // 2^57
 constexpr double kInverseBig = 6.938893903907228e-18; // 2^-57
 constexpr int32_t kLargeOrder = 5001;
-constexpr int32_t kWithoutLogarithm = 170; // (n - 1)! has left the range
+constexpr int32_t kWithoutLogarithm = 170; // (n - 1)! overflows
 
 double Expansion(double x, double n) {
     const double k = n + x;
@@ -62,7 +62,7 @@ double ContinuedFraction(double x, double n) {
     return c.value * std::exp(-x);
 }
 
-// 1 + 1 / 2 + ... + 1 / k, by k.
+// 1 + 1 / 2 + ... + 1 / k, indexed by k.
 constexpr auto kHarmonic = [] {
     std::array<double, kWithoutLogarithm> sums = {};
     for (std::size_t k = 1; k < sums.size(); ++k)
@@ -91,7 +91,7 @@ double PowerSeries(double x, int32_t n) {
             sum += term / p;
     } while (sum == 0 || std::fabs(term) > kEpsilon * std::fabs(sum));
     if (n >= kWithoutLogarithm)
-        return -sum; // kept: the first term no longer counts
+        return -sum; // kept: the first term is negligible
     return LogarithmicTerm(x, n) - sum;
 }
 
@@ -105,7 +105,7 @@ double First(double x) {
                                       : table::e1Far(1 / x);
     if (x < farTo)
         return std::exp(-x) * (scaled / x);
-    const double root = std::exp(-0.5 * x); // the whole one would lose digits as it underflows
+    const double root = std::exp(-0.5 * x); // exp(-x) itself would lose digits as it underflows
     return root * (scaled / x) * root;
 }
 

@@ -9,7 +9,7 @@
 
 namespace qx {
 
-// sin(pi x) and cos(pi x), exact zeros and ones included.
+// sin(pi x) and cos(pi x), with exact zeros and ones.
 inline double SinPi(double x) {
     const double r = std::fmod(std::fabs(x), 2.0);
     const double s = r >= 1 ? -1.0 : 1.0;
@@ -35,7 +35,7 @@ inline double CosPi(double x) {
     return -std::cos(kPi * (1 - r));
 }
 
-// exp(i pi turns), exact zeros and ones included; |turns| to 2^52.
+// exp(i pi turns), with exact zeros and ones; |turns| up to 2^52.
 inline CDB TurnByPi(double turns) {
     const double x = turns - 2 * std::floor(0.5 * turns + 0.5); // -1 to 1
     const double quarters = std::floor(2 * x + 0.5);
@@ -49,7 +49,8 @@ inline CDB TurnByPi(double turns) {
     return quarters == -1 ? CDB{sine, -cosine} : CDB{-cosine, -sine};
 }
 
-// For series that are summed in doubles or in pairs of them: the leading double, and a pair as Number.
+// For series that are summed in doubles or in pairs of doubles: the leading double, and a pair
+// converted to Number.
 inline double Leading(double x) { return x; }
 inline double Leading(Extended x) { return x.high; }
 
@@ -65,7 +66,7 @@ inline Extended Of<Extended>(Extended x) {
 }
 
 inline bool IsInteger(double x) { return std::floor(x) == x && !std::isinf(x); }
-inline bool IsOdd(double x) { return std::fmod(x, 2.0) != 0; } // of an integer
+inline bool IsOdd(double x) { return std::fmod(x, 2.0) != 0; } // x is an integer
 
 } // namespace qx
 

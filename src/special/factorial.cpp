@@ -52,12 +52,12 @@ constexpr double kTable[] = {1.,
                              8683317618811886495518194401280000000.};
 static_assert(sizeof kTable / sizeof kTable[0] == kLastInTable + 1);
 
-// What the double of 33! leaves off; the sum of both is exact.
+// 33! minus its double; the sum of both is exact.
 constexpr double kRestOfLast = 5.568025205059617e+20;
 
-// A look-up is a fifth of the time of gamma.
+// A look-up takes a fifth of the time of the gamma function.
 std::array<double, kLastFinite + 1> AllFinite() {
-    const DefaultArithmetic arithmetic; // whatever modes the process has then
+    const DefaultArithmetic arithmetic; // whatever modes the process has at that time
     std::array<double, kLastFinite + 1> values;
     Extended product = {kTable[kLastInTable], kRestOfLast};
     for (int32_t n = 0; n <= kLastFinite; ++n) {
@@ -70,7 +70,7 @@ std::array<double, kLastFinite + 1> AllFinite() {
     return values;
 }
 
-// Formed when the module is loaded: a local static would take the compiler's guard in each call.
+// Computed when the module is loaded: a local static would cost the compiler's guard in each call.
 const std::array<double, kLastFinite + 1> kValues = AllFinite();
 
 } // namespace

@@ -5,8 +5,8 @@
 
 namespace qx {
 
-// n!: a table up to 33, the running product in extended precision up to 50, GammaFunction beyond.
-// NaN for n < 0; +infinity from 171 on.
+// n!: from a table up to 33, by a running product in extended precision up to 50, by GammaFunction
+// above. NaN for n < 0; +infinity from 171 on.
 double Factorial(int32_t n);
 
 // ln n! by LnGammaFunction. NaN for n < 0.

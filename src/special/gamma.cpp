@@ -10,7 +10,7 @@ namespace {
 
 constexpr double big = 1.4411518807585587e+17;       // 2^57
 constexpr double inverseBig = 6.938893903907228e-18; // 2^-57
-constexpr double endOfIntegers = 9007199254740992.0; // 2^53, from where x + 1 is rounded to x
+constexpr double endOfIntegers = 9007199254740992.0; // 2^53; above it x + 1 rounds to x
 
 // Gamma(x) for x < -33 by reflection.
 double ReflectedGamma(double x) {
@@ -30,7 +30,7 @@ double ReflectedGamma(double x) {
     return kPi / (std::fabs(w) * StirlingGamma(q)) * sign;
 }
 
-// The convergents of a continued fraction, numerators p and denominators q, kept in range by
+// The convergents of a continued fraction, with numerators p and denominators q, kept in range by
 // powers of two.
 struct Convergents {
     double pBefore, qBefore, p, q;
@@ -49,8 +49,8 @@ struct Convergents {
     }
 };
 
-// Both continued fractions of the incomplete beta function: they differ in the variable and in
-// two of the eight factors. Cut after 100 rounds without a sign of it.
+// Evaluates either continued fraction of the incomplete beta function; they differ in the variable
+// and in two of the eight factors. Truncated after 100 rounds without an indication.
 double BetaConvergents(double z, double a, double k2, double step2, double k6, double step6) {
     constexpr int rounds = 100;
     double k1 = a, k3 = a, k4 = a + 1.0, k5 = 1.0, k7 = a + 1.0, k8 = a + 2.0;
@@ -95,10 +95,10 @@ double BetaFractionRatio(double a, double b, double x) {
     return BetaConvergents(x / (1.0 - x), a, b - 1.0, -1.0, a + b, 1.0);
 }
 
-// x^a exp(-x) / Gamma(a) before the exponential.
+// The logarithm of x^a exp(-x) / Gamma(a).
 double LogOfFront(double a, double x) { return a * std::log(x) - x - LnGammaFunction(a); }
 
-// Faults and limits that P and Q share; `atInfinity` is the value at x = +infinity.
+// Domain errors and limits that P and Q share; `atInfinity` is the value at x = +infinity.
 bool IsSpecial(double a, double x, double atInfinity, double atZero, double *value) {
     if (x == kInfinity)
         *value = atInfinity;
@@ -146,7 +146,7 @@ double StirlingGamma(double x) {
     const double y = std::exp(x);
     if (x <= 143.01608)
         return kRootTwoPi * w * std::pow(x, x - 0.5) / y;
-    const double root = std::pow(x, 0.5 * x - 0.25); // the whole power would overflow
+    const double root = std::pow(x, 0.5 * x - 0.25); // the full power would overflow
     return kRootTwoPi * w * (root / y) * root;
 }
 
@@ -219,7 +219,8 @@ double LnGammaFunction(double x) {
     static constexpr double numerator[] = {-1378.2515256912086, -38801.631513463784,
                                            -331612.9927388712,  -1162370.974927623,
                                            -1721737.0082083966, -853555.6642457654};
-    // The last value follows from the others and ln Gamma: peak relative error 2e-16 on [2, 3].
+    // The last coefficient follows from the others and ln Gamma: peak relative error 2e-16 on
+    // [2, 3].
     static constexpr double denominator[] = {1.0,
                                              -351.81570143652345,
                                              -17064.210665188115,
@@ -242,8 +243,8 @@ double IncompleteGammaP(double a, double x) {
         return kInfinity; // kept: not NaN
     const double front = std::exp(log);
     if (front == 0.0)
-        return 0.0;         // whatever the sum, which is finite
-    if (a >= endOfIntegers) // the terms no longer fall but as powers of x / a
+        return 0.0;         // whatever the sum is; it is finite
+    if (a >= endOfIntegers) // here the terms fall only as powers of x / a
         return front / std::max(1.0 - x / a, kEpsilon) / a;
     double r = a;
     double term = 1.0;
@@ -260,11 +261,11 @@ double IncompleteGammaQ(double a, double x) {
     double special;
     if (IsSpecial(a, x, 0.0, 1.0, &special))
         return special;
-    if (x < 1.0 || x < a) // not the mirror of P's test at x = 1 and x = a
+    if (x < 1.0 || x < a) // does not mirror P's test at x = 1 and x = a
         return 1.0 - IncompleteGammaP(a, x);
     const double front = std::exp(LogOfFront(a, x));
     if (front == 0.0)
-        return 0.0; // the fraction is finite, though for huge x its convergents would overflow
+        return 0.0; // the fraction is finite, although its convergents would overflow for huge x
     double y = 1.0 - a;
     double z = x + y + 1.0;
     double count = 0.0;
@@ -290,16 +291,16 @@ double IncompleteGammaQ(double a, double x) {
 }
 
 double IncompleteBeta(double a, double b, double x) {
-    constexpr double tiniest = 0x1p-1000; // below, 1 / a may pass the range
+    constexpr double tiniest = 0x1p-1000; // below it 1 / a may overflow
     if (!std::isfinite(a) || !std::isfinite(b) || !(a >= 0.0 && b >= 0.0 && x >= 0.0 && x <= 1.0))
         return kNaN;
     if (x == 0.0 || x == 1.0)
         return x;
     if (a < tiniest && b < tiniest)
-        return b / (a + b); // NaN where both are 0
+        return b / (a + b); // NaN if both are 0
     if (a < tiniest)
         return 1.0;
-    if (b < tiniest) // in proportion to b
+    if (b < tiniest) // proportional to b
         return IncompleteBeta(a, tiniest, x) * (b / tiniest);
     if (a == 1.0) {
         if (b == 1.0)

@@ -3,9 +3,9 @@
 
 namespace qx {
 
-// The gamma family. A fault of the domain gives NaN; there is no status.
+// The gamma family. Arguments outside the domain give NaN; there is no status.
 //
-// The coefficients are given; their author is not known. They approximate
+// The coefficients were given; their author is not known. They approximate
 //   Gamma(2 + t), t from 0 to 1              relative error 1.3e-17
 //   ln Gamma(2 + t), t from 0 to 1           relative error 2.8e-17
 //   Stirling's series from x = 33 on         error 1.2e-17 (the factor), 1e-18 (its logarithm)
@@ -16,10 +16,10 @@ namespace qx {
 
 // Horner's rule: coef[0] x^degree + ... + coef[degree].
 double PolyEval(double x, const double *coef, int degree);
-// The same with coef[0] taken as 1 and not read.
+// The same, with coef[0] assumed to be 1 and not read.
 double PolyEvalMonic(double x, const double *coef, int degree);
 
-// Gamma(x). Beyond |x| = 33 by Stirling's formula and reflection, else by a rational function on
+// Gamma(x). For |x| > 33 by Stirling's formula and reflection, otherwise by a rational function on
 // [2, 3] and the recurrence. NaN at 0 and at negative integers beyond -33.
 double GammaFunction(double x);
 
@@ -28,19 +28,19 @@ double GammaFunction(double x);
 double LnGammaFunction(double x);
 
 // Gamma(x) by Stirling's formula, meant for x above 33; +infinity from 709.78 on, where the
-// formula's exponential would overflow.
+// exponential in the formula would overflow.
 double StirlingGamma(double x);
 
-// The regularised lower and upper incomplete gamma functions P(a, x) and Q(a, x): the series up
-// to max(1, a), the continued fraction beyond. Both loops run until they have converged; near
-// x = a that takes a number of terms in proportion to sqrt(a): below a millisecond up to a = 1e9,
-// 0.1 s at 1e14, 1 s towards 2^53, from where the series, then geometric, has a closed form. The
-// factor before them has by then lost its digits to the rounding of its logarithm.
+// The regularised lower and upper incomplete gamma functions P(a, x) and Q(a, x): the series up to
+// max(1, a), the continued fraction beyond. Both loops run until they converge. Near x = a that
+// takes a number of terms proportional to sqrt(a): below a millisecond up to a = 1e9, 0.1 s at
+// 1e14, 1 s near 2^53. From there on the series is geometric and has a closed form. The prefactor
+// has by then lost its digits to the rounding of its logarithm.
 double IncompleteGammaP(double a, double x);
 double IncompleteGammaQ(double a, double x);
 
 // The regularised incomplete beta function I_x(a, b), by the two continued fractions, which are
-// cut after 100 terms: with a and b in the thousands and x near a / (a + b) digits are lost.
+// truncated after 100 terms: digits are lost for a and b in the thousands and x near a / (a + b).
 double IncompleteBeta(double a, double b, double x);
 
 } // namespace qx

@@ -11,7 +11,7 @@ namespace qx {
 
 namespace {
 
-constexpr double kDirectTo = 50; // the product of six stays in range
+constexpr double kDirectTo = 50; // the product of six gammas stays in range
 
 bool IsPole(double x) { return x <= 0 && IsInteger(x); }
 

@@ -12,7 +12,7 @@ namespace qx {
 namespace {
 
 constexpr double kConnectionFrom = 0.9;
-constexpr double kFarthest = -1e280; // beyond, 1 / (1 - x) has not the digits of two doubles
+constexpr double kFarthest = -1e280; // below it 1 / (1 - x) does not have the digits of two doubles
 constexpr double kGoodConnection = 1e-13;
 constexpr double kGoodParts = 1e-27;
 constexpr double kAside = 0x1p-32;
@@ -26,7 +26,7 @@ struct GaussArguments {
     Extended a, b, c;
 };
 
-// A point of (0, 1) and its distance from 1.
+// A point in (0, 1) and its distance from 1.
 struct Point {
     Extended x, rest;
 };
@@ -47,14 +47,14 @@ Estimated Connection(const GaussArguments &p, Extended s, const Point &point) {
                        second.error + secondFactor.error + power.error});
 }
 
-// The same where c - a - b may be next to an integer.
+// The same if c - a - b may be near an integer.
 Estimated NearOne(const GaussArguments &p, const Point &point) {
     const Extended s = p.c - p.a - p.b;
     const double whole = std::rint(s.high);
     const Extended off = s - Whole(whole);
     if (std::fabs(off.high) >= kAside)
         return Connection(p, s, point);
-    // b moves, since F has no poles in b
+    // b is moved, because F has no poles in b
     const auto beside = [&](double aside) {
         const Extended moved = Whole(whole) + Whole(aside);
         return Connection({p.a, p.c - p.a - moved, p.c}, moved, point);
@@ -62,7 +62,7 @@ Estimated NearOne(const GaussArguments &p, const Point &point) {
     return Between(beside(-kAside), beside(kAside), off.high / kAside);
 }
 
-// The two series of which one ends, c - a or c - b being 0, -1, -2, ...
+// Euler's form, whose series ends because c - a or c - b is 0, -1, -2, ...
 Estimated Euler(const GaussArguments &p, const Point &point) {
     const Extended d = p.c - p.a, e = p.c - p.b;
     const HyperForm form = {{d, e, p.c, point.x, true}, point.rest, d - p.b};

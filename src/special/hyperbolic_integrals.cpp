@@ -13,10 +13,10 @@ namespace {
 constexpr double kSeriesTo = 8;
 constexpr double kMidTo = 18;
 constexpr double kLargest = 880;
-constexpr double kSplitFrom = 700; // beyond, exp(x) may overflow before its quotient by x does
+constexpr double kSplitFrom = 700; // above it exp(x) may overflow before exp(x) / x does
 
-// The sum of x^(k+step) / ((k + step) (k + step)!), step 2, from an exponent on; `term` is the term
-// before that, without the first divisor.
+// The sum of x^(k+step) / ((k + step) (k + step)!), step 2, from the given exponent on; `term` is
+// the preceding term without its first divisor.
 double SeriesOnward(double square, double term, double exponent) {
     double sum = 0;
     double added;
@@ -29,7 +29,7 @@ double SeriesOnward(double square, double term, double exponent) {
     return sum;
 }
 
-// Clenshaw's recurrence: the sum of c[k] T_k(t / 2), the first halved.
+// Clenshaw's recurrence: the sum of c[k] T_k(t / 2), with the first term halved.
 template <std::size_t N>
 double ChebyshevSum(const double (&c)[N], double t) {
     double b0 = c[N - 1];

@@ -34,7 +34,7 @@ struct GaussTerms {
 
 bool IsNearInteger(double x, double tolerance) { return std::fabs(x - std::rint(x)) < tolerance; }
 
-// 0, -1, -2, ..., where a series ends.
+// 0, -1, -2, ..., at which a series ends.
 bool EndsSeries(double a) { return a <= 0 && IsNearInteger(a, kHyperTolerance); }
 
 double Snapped(double a) { return EndsSeries(a) ? std::rint(a) : a; }
@@ -44,7 +44,7 @@ bool IsOutsideDomain(double x, double a, double b, double c) {
            std::fabs(x) > 1 || (x == 1 && c <= a + b);
 }
 
-// (1 - x)^p; 1 - x is rounded, and the power would multiply its error by p.
+// (1 - x)^p; 1 - x is rounded, and the power would multiply the rounding error by p.
 double PowerOfOneMinus(double x, double p) {
     if (std::fabs(p) > 1000)
         return std::exp(p * std::log1p(-x));
@@ -78,7 +78,7 @@ double DigammaSum(double a, double b, double m, double y) {
         const double term = factor * bracket;
         sum += term;
         const double ratio = (a + k) * (b + k) / ((k + 1) * (k + 1 + m)) * y;
-        // kept: summed to this tolerance only; the bracket alone may pass through 0
+        // kept: summed only to this tolerance; the bracket alone may pass through 0
         const double size = std::fmax(std::fabs(term), std::fabs(factor));
         if (size <= kHyperTolerance * (1 + std::fabs(sum)) && std::fabs(ratio) < 1)
             return sum;
@@ -99,7 +99,7 @@ double LimitForm(double x, double a, double b, double c, double m) {
     return finite + sign * factor * DigammaSum(a + m, b + m, m, y);
 }
 
-// The two parts of the connection with 1 - x.
+// The sum of the two parts of the connection with 1 - x.
 double Connection(double x, double a, double b, double c, double s) {
     const double first = GammaQuotient({c, s}, {c - a, c - b}) * HyperSeries(a, b, 1 - s, 1 - x);
     const double second = PowerOfOneMinus(x, s) * GammaQuotient({c, -s}, {a, b}) *
@@ -114,7 +114,7 @@ double Pfaff(double x, double a, double b, double c) {
     return PowerOfOneMinus(x, -b) * HyperSeries(c - a, b, c, z);
 }
 
-// No parameter ends a series, and |x| < 1 or x = -1.
+// For parameters with which no series ends, and |x| < 1 or x = -1.
 double Infinite(double x, double a, double b, double c, double pfaffBelow) {
     if (x < pfaffBelow)
         return Pfaff(x, a, b, c);

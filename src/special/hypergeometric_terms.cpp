@@ -20,10 +20,10 @@ constexpr int kBigExponent = 300;
 constexpr double kVanishing = 1e-250;
 constexpr int kSpareBits = 24;
 
-// What a scan of a series has found, in units of 2^exponent.
+// The result of a scan of a series, in units of 2^exponent.
 struct Scan {
     Extended sum;
-    double roundings; // what the terms weigh in the error of the sum, in units of the precision
+    double roundings; // contribution of the terms to the sum's error, in units of the precision
     int exponent;
     double peak; // the largest term
     bool isComplete;
@@ -48,7 +48,7 @@ Extended Down(Extended x) { return {x.high * (1 / kBig), x.low * (1 / kBig)}; }
 double Up(double x) { return x * kBig; }
 Extended Up(Extended x) { return {x.high * kBig, x.low * kBig}; }
 
-// No parameter is left below 0, where the ratio of the terms may rise again.
+// Whether no parameter plus k is negative, where the ratio of the terms may rise again.
 bool IsPast(const HyperTerms &t, double k) {
     return t.a.high + k > 0 && (!t.hasB || t.b.high + k > 0) && t.c.high + k > 0;
 }
@@ -57,12 +57,12 @@ template <class Number>
 Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
     const Number a = Of<Number>(terms.a), b = Of<Number>(terms.b), c = Of<Number>(terms.c);
     const Number x = Of<Number>(terms.x);
-    const double end = terms.hasB ? std::fabs(terms.x.high) : 0; // of the ratios
+    const double end = terms.hasB ? std::fabs(terms.x.high) : 0; // limit of the ratios
     Number term = Of<Number>({1, 0});
     Number sum = term;
     double roundings = 1, peak = 1;
     int exponent = 0;
-    int below = 0; // what the exponent of the term is lower
+    int below = 0; // how much lower the exponent of the term is
     for (int i = 0; i < most; ++i) {
         const double k = i;
         Number top = At(a, k) * x;
@@ -71,10 +71,10 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
         const Number quotient = top / (At(c, k) * Of<Number>({k + 1, 0}));
         term = term * quotient;
         const double size = std::fabs(Leading(term));
-        const double ratio = std::max(std::fabs(Leading(quotient)), end); // of the terms behind
+        const double ratio = std::max(std::fabs(Leading(quotient)), end); // bound for later terms
         if (size == 0)
             return {ToPair(sum), roundings, exponent, peak, Leading(top) == 0};
-        if (size < kVanishing) { // may rise again behind the poles
+        if (size < kVanishing) { // may rise again beyond the poles
             if (IsPast(terms, k) && ratio < 1)
                 return {ToPair(sum), roundings, exponent, peak, true};
             term = Up(term);
@@ -88,7 +88,7 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
             continue;
         }
         sum = sum + term;
-        roundings += size * (2 + 0.2 * k); // more than the root of 4 k
+        roundings += size * (2 + 0.2 * k); // an estimate for a product of about 4 k rounded factors
         peak = std::max(peak, size);
         if (!(size < kBig)) {
             if (!(size < kInfinity))
@@ -99,8 +99,8 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
             peak /= kBig;
             exponent += kBigExponent;
         }
-        if (ratio < 1 && size * ratio <= tolerance * std::fabs(Leading(sum)) * (1 - ratio) &&
-            IsPast(terms, k))
+        // Never for a ratio of 1 and above, where the bound is not above 0.
+        if (size * ratio <= tolerance * std::fabs(Leading(sum)) * (1 - ratio) && IsPast(terms, k))
             return {ToPair(sum), roundings, exponent, peak, true};
     }
     return {ToPair(sum), roundings, exponent, peak, false};
@@ -112,7 +112,8 @@ Estimated Result(const Scan &scan, double error) {
     return {WideOf(scan.sum, scan.exponent), error};
 }
 
-// The sum in double precision is that of the parameters: no small a + k loses what is behind the double.
+// Whether the double precision of the parameters suffices: no small a + k loses digits of the low
+// part.
 bool IsDouble(const HyperTerms &t) {
     const auto isDouble = [](Extended a) { return a.low == 0 || a.high > 0; };
     return isDouble(t.a) && (!t.hasB || isDouble(t.b)) && isDouble(t.c);
@@ -124,8 +125,8 @@ Estimated FactorOf(const HyperForm &form) {
     return form.base.high == 0 ? Estimated{WideExp(form.power), 0} : PowerOf(form.base, form.power);
 }
 
-// The same in double precision, which corrects for what is behind the doubles; an infinite error beyond
-// a moderate range.
+// The same in double precision, corrected for the low parts; an infinite error outside a moderate
+// range.
 Estimated QuickFactorOf(const HyperForm &form) {
     const double p = form.power.high;
     const bool isExp = form.base.high == 0;
@@ -142,7 +143,8 @@ Estimated Times(const Estimated &a, const Estimated &b) {
     return {a.value * b.value, a.error + b.error};
 }
 
-// The sum in two doubles, else in integers; `largest` from a scan of the series.
+// The sum in two doubles or, if these do not suffice, in integers; `largest` is from a scan of the
+// series.
 Estimated Careful(const HyperTerms &terms, double largest, double tolerance) {
     const Scan pair = SumOf<Extended>(terms, kMostCarefulTerms, 0x1p-106);
     const double error = pair.error(kPairEpsilon);

@@ -12,12 +12,12 @@ namespace qx {
 namespace {
 
 constexpr double kStirlingFrom = 10.0;
-constexpr double kLeast = 1e-290;  // beyond it an inverse is 0
+constexpr double kLeast = 1e-290;  // an inverse below it is returned as 0
 constexpr double kDirectTo = 33.0; // the powers and the beta function stay in range
 
 Extended Whole(double x) { return {x, 0.0}; }
 
-// x^power of a number whose low part counts.
+// x^power, including the low part of x.
 double Power(Extended x, double power) {
     return std::pow(x.high, power) * (1.0 + power * (x.low / x.high));
 }
@@ -28,7 +28,7 @@ Extended FromMean(double a, double b, const UnitPoint &point) {
 }
 
 // a, b >= 10: sqrt(a b / (2 pi (a + b))) exp(-D), where D is the deviance of the point from the
-// mean and what Stirling's formula leaves.
+// mean plus the corrections to Stirling's formula.
 double PowerByDeviance(double a, double b, const UnitPoint &point, Extended exponent = {0.0, 0.0}) {
     const Extended sum = ExactSum(a, b);
     const Extended t = FromMean(a, b, point);
@@ -40,8 +40,8 @@ double PowerByDeviance(double a, double b, const UnitPoint &point, Extended expo
            ExpOf(Whole(rest) - deviance + exponent);
 }
 
-// The smaller parameter is moved up to Stirling's range: with it one more, the power is y (a + b) /
-// b times as large.
+// The smaller parameter is raised to Stirling's range: raising it by one multiplies the power by
+// y (a + b) / b.
 double PowerByShift(double a, double b, const UnitPoint &point) {
     Extended factor = {1.0, 0.0};
     Extended sum = ExactSum(a, b);
@@ -49,7 +49,7 @@ double PowerByShift(double a, double b, const UnitPoint &point) {
     int steps = 0;
     for (; moved.high < kStirlingFrom; moved = moved + Whole(1.0), sum = sum + Whole(1.0), ++steps)
         factor = factor * (moved / sum);
-    // The deviance takes the parameter as one double: what its sum has rounded is far below it.
+    // The deviance takes the parameter as one double; its low part is negligible.
     const Extended exponent = -(Whole(steps) * LogOf(point.y));
     return PowerByDeviance(a, moved.high, point, exponent) * factor.high;
 }
@@ -69,8 +69,9 @@ double BySeries(double a, double b, const UnitPoint &point) {
     return BetaPower(a, b, point) / (Power(point.y, b) * a) * (1.0 + a * sum);
 }
 
-// The value of 1 / (beta_1 + alpha_2 / (beta_2 + alpha_3 / ...)): the number of terms from the
-// convergents, the value from the last term on, where rounding errors do not gather.
+// The value of 1 / (beta_1 + alpha_2 / (beta_2 + alpha_3 / ...)). The convergents determine the
+// number of terms; the value is then computed backward from the last term, so that rounding errors
+// do not accumulate.
 template <class Terms>
 double ContinuedFraction(Terms terms) {
     constexpr int limit = 1000000;
@@ -99,7 +100,7 @@ double ContinuedFraction(Terms terms) {
     return rest;
 }
 
-// x at most the mean: where b exceeds 1 all terms are positive up to n = b.
+// For x at most at the mean. Where b exceeds 1, all terms are positive up to n = b.
 double ByFraction(double a, double b, const UnitPoint &point) {
     const double x = point.x.high;
     const double y = point.y.high;
@@ -115,7 +116,7 @@ double ByFraction(double a, double b, const UnitPoint &point) {
     return BetaPower(a, b, point) * ContinuedFraction(terms);
 }
 
-// The part below x, which is not above the mean by much.
+// The lower part, for x not far above the mean.
 double LowerPart(double a, double b, const UnitPoint &point) {
     const double x = point.x.high;
     const bool isShort = x <= 0.7 && (b <= 1.0 || b * x <= (a <= 1.0 ? 1.4 : 0.7));
@@ -124,8 +125,9 @@ double LowerPart(double a, double b, const UnitPoint &point) {
 
 UnitPoint Opposite(const UnitPoint &point) { return {point.y, point.x}; }
 
-// Whether the lower part is the one to compute, from which the other follows: where one parameter
-// is below 1 its own side is taken only while little more than half of the whole.
+// Whether to compute the lower part directly and the upper part from it. Where one parameter is
+// below 1, the part on its side is computed directly only while it is little more than half of the
+// whole.
 bool LowerIsDirect(double a, double b, const UnitPoint &point) {
     const double x = point.x.high;
     const double y = point.y.high;
@@ -140,8 +142,8 @@ bool LowerIsDirect(double a, double b, const UnitPoint &point) {
     return !(y <= 0.7 && a * y <= reach * std::max(least, b));
 }
 
-// The point with x / y times exp(step), formed on the smaller of x and y, so that both keep their
-// digits.
+// The point with x / y multiplied by exp(step), computed from the smaller of x and y so that both
+// keep their digits.
 UnitPoint Moved(const UnitPoint &point, double step) {
     const bool isLeft = point.x.high <= point.y.high;
     const Extended w = isLeft ? point.x : point.y;
@@ -186,7 +188,7 @@ BothTails IncompleteBeta(double a, double b, UnitPoint point) {
 UnitPoint InverseIncompleteBeta(double a, double b, double tail, bool isUpper) {
     constexpr int limit = 200;
     UnitPoint point = UnitPoint::Share(Whole(a), Whole(b));
-    double low = -kInfinity, high = kInfinity; // of u
+    double low = -kInfinity, high = kInfinity; // bounds of u
     const auto logit = [](const UnitPoint &p) { return std::log(p.x.high) - std::log(p.y.high); };
     for (int turn = 0; turn < limit; ++turn) {
         const BothTails both = IncompleteBeta(a, b, point);
@@ -195,15 +197,15 @@ UnitPoint InverseIncompleteBeta(double a, double b, double tail, bool isUpper) {
         const double u = logit(point);
         const bool isTooHigh = isUpper ? got < tail : got > tail;
         (isTooHigh ? high : low) = u;
-        // What underflows tells the direction alone.
+        // An underflow shows only the direction.
         double step = got < kLeast ? kNaN : std::log(tail / got) * (got / power);
         if (isUpper)
             step = -step;
         double next = u + step;
-        // Small steps are below the digits of u.
+        // Steps this small are below the rounding of u.
         constexpr double small = 1e-9;
         if (!(std::fabs(step) < small) && !(next > low && next < high && std::fabs(step) < 500)) {
-            // One side may be open yet.
+            // One bound may still be infinite.
             if (std::isinf(low))
                 next = u - std::max(1.0, std::fabs(u));
             else if (std::isinf(high))

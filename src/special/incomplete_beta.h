@@ -10,15 +10,16 @@ struct UnitPoint {
     Extended x;
     Extended y; // 1 - x
 
-    // p / (p + q) of numbers above 0 (or one of them 0) whose sum does not overflow.
+    // p / (p + q) of positive numbers (one may be 0) whose sum does not overflow.
     static UnitPoint Share(Extended p, Extended q) {
         const Extended sum = p + q;
         return {p / sum, q / sum};
     }
 };
 
-// The two parts of a whole of 1, each to full relative precision where it is the smaller one: within
-// 21 eps on 500 points with parameters 1/2 to 20000 (median 0.7), more where a parameter is below 1/2.
+// The two parts, whose sum is 1, each to full relative precision where it is the smaller one:
+// within 21 eps on 500 points with parameters 1/2 to 20000 (median 0.7), more where a parameter is
+// below 1/2.
 struct BothTails {
     double lower;
     double upper;
@@ -34,8 +35,8 @@ BothTails IncompleteBeta(double a, double b, UnitPoint point);
 // The power x^a y^b / beta(a, b): x y times the density of the beta distribution.
 double BetaPower(double a, double b, UnitPoint point);
 
-// The point whose lower part is `tail`, or whose upper part is where `isUpper`; 0 < tail < 1. A
-// coordinate below 1e-290 comes out as 0.
+// The point whose lower part is `tail`, or whose upper part is `tail` if `isUpper`; 0 < tail < 1. A
+// coordinate below 1e-290 is returned as 0.
 UnitPoint InverseIncompleteBeta(double a, double b, double tail, bool isUpper);
 
 } // namespace qx

@@ -11,25 +11,25 @@ namespace qx {
 namespace {
 
 constexpr int kWordBits = 32;
-constexpr int kMostWords = 64;       // of a term
-constexpr int kFactorWords = 8;      // of a parameter, with the number of the term added
-constexpr double kMostWork = 200000; // words of all terms, a few milliseconds
+constexpr int kMostWords = 64;       // in a term
+constexpr int kFactorWords = 8;      // in a parameter plus the number of the term
+constexpr double kMostWork = 200000; // words in all terms, a few milliseconds
 constexpr double kMostLargest = 1e7; // log2 of the largest term
-constexpr int kMostBelow = 5;        // of them behind the point
+constexpr int kMostBelow = 5;        // words of a parameter below the binary point
 constexpr double kParameterLimit = 0x1p40;
 
-// The magnitude of a whole number, lowest word first, times 2^(32 exponent).
+// The magnitude of an integer, lowest word first, times 2^(32 exponent).
 template <int Words>
 struct Magnitude {
     uint32_t word[Words];
-    int length; // without zeros at the upper end
+    int length; // without leading zero words
     int exponent;
 
     void trim() {
         while (length > 0 && word[length - 1] == 0)
             --length;
     }
-    // The upper `most` words.
+    // Keeps the upper `most` words.
     void cut(int most) {
         if (length <= most)
             return;
@@ -44,11 +44,11 @@ struct Magnitude {
 typedef Magnitude<kMostWords + 2 * kFactorWords> Term;
 typedef Magnitude<2 * kFactorWords> Factor;
 
-// A parameter as a whole number in two's complement times 2^(32 exponent), to which 1 is added for
-// each term.
+// A parameter as a two's complement integer times 2^(32 exponent), to which 1 is added for each
+// term.
 class Parameter {
 public:
-    // False where it has too many digits.
+    // Returns false if it has too many digits.
     bool set(Extended x) {
         exponent_ = 0;
         if (!std::isfinite(x.high) || !std::isfinite(x.low))
@@ -80,7 +80,7 @@ public:
     }
 
 private:
-    // The exponent of the word in which the lowest digit of a double lies.
+    // The exponent of the word that contains the lowest bit of a double.
     static int lowestWord(double x) {
         int e = 0;
         double rest = std::fabs(std::frexp(x, &e));
@@ -174,8 +174,7 @@ void Divide(Term &term, Factor by, int words) {
         by.word[0] <<= shift;
     }
     const int steps = std::max(words + 1, term.length - m + 1);
-    uint32_t
-        rest[kMostWords + 5 * kFactorWords]; // the term with zeros below, normalised as `by` is
+    uint32_t rest[kMostWords + 5 * kFactorWords]; // the term, padded with zeros and shifted as `by`
     const int length = steps + m - 1;
     const int zeros = length - term.length;
     for (int i = 0; i < zeros; ++i)
@@ -212,7 +211,7 @@ void Divide(Term &term, Factor by, int words) {
         }
         const uint64_t difference = static_cast<uint64_t>(at[m]) - carry - borrow;
         at[m] = static_cast<uint32_t>(difference);
-        if (difference >> 63 != 0) { // one too many
+        if (difference >> 63 != 0) { // the digit is one too large
             --digit;
             uint64_t sum = 0;
             for (int i = 0; i < m; ++i) {
@@ -229,14 +228,14 @@ void Divide(Term &term, Factor by, int words) {
     term.trim();
 }
 
-// The terms behind the one of number k + 1 fall.
+// Whether the terms after number k + 1 decrease.
 bool Falls(const HyperTerms &t, double k) {
     const bool isPast = t.a.high + k > 0 && (!t.hasB || t.b.high + k > 0) && t.c.high + k > 0;
     const double second = t.hasB ? t.b.high + k : 1;
     return isPast && (t.a.high + k) * second * std::fabs(t.x.high) < (t.c.high + k) * (k + 1);
 }
 
-// Sums of terms of either sign, from a fixed place on.
+// The sums of the positive and of the negative terms, from a fixed lowest word on.
 class Accumulator {
 public:
     Accumulator(int words, int exponent) : words_(words), exponent_(exponent) {
@@ -244,7 +243,7 @@ public:
             for (int i = 0; i < words; ++i)
                 part[i] = 0;
     }
-    // False where the term reaches beyond the upper end.
+    // Returns false if the term reaches beyond the upper end.
     bool add(const Term &term, bool isNegative) {
         uint32_t *sum = word_[isNegative ? 1 : 0];
         const int offset = term.exponent - exponent_;
@@ -263,7 +262,7 @@ public:
     }
     bool isBelow(const Term &term) const { return term.exponent + term.length <= exponent_; }
 
-    // The difference of the two sums; an error of `units` in the last place.
+    // The difference of the two sums, with an error of `units` in the last place.
     Estimated value(double units) const {
         int top = words_ - 1;
         while (top >= 0 && word_[0][top] == word_[1][top])

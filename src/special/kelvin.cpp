@@ -14,7 +14,7 @@ namespace {
 
 constexpr double kTwoGamma = 1.1544313298030657; // twice Euler's constant
 
-// i^n times the number.
+// a times i^n.
 Complex Turn(Complex a, double n) {
     switch (static_cast<int>(std::fmod(n, 4.0))) {
     case 1:
@@ -28,7 +28,8 @@ Complex Turn(Complex a, double n) {
     }
 }
 
-// The sums over even and odd k that a factor exp(i k pi / 2) separates.
+// The real and the imaginary part of a sum with factors exp(i k pi / 2): the sums over even and odd
+// k.
 struct Halves {
     double even = 0;
     double odd = 0;
@@ -49,7 +50,7 @@ Complex SeriesI(double n, double x) {
     return {factor * (c * sum.even - s * sum.odd), factor * (s * sum.even + c * sum.odd)};
 }
 
-// exp(+-z) of z = x exp(i pi / 4), whose parts are formed in two doubles.
+// exp(+-z) of z = x exp(i pi / 4), with its parts in two doubles.
 Complex ExpOnDiagonal(double x, double sign) {
     constexpr Extended diagonal = {kRootHalf, -4.833646656726457e-17};
     const Extended part = diagonal * Extended{sign * x, 0};
@@ -111,7 +112,7 @@ Neighbours UpwardK(int n, Complex z, double x) {
     return {value, next};
 }
 
-// ker and kei for x < 2: logarithm, the finite sum of n terms, and the infinite sum.
+// ker and kei for x < 2: the logarithm, the finite sum of n terms, and the infinite sum.
 Complex SeriesK(int n, double x) {
     const double q = 0.25 * x * x;
     const double c = CosPi(0.75 * (n % 8));
@@ -136,7 +137,7 @@ Complex SeriesK(int n, double x) {
     }
     const Complex ber = SeriesI(n, x);
     const double l = std::log(0.5 * x);
-    // exact zeros of the phase keep an infinite sum out of the other part
+    // a factor of exactly 0 drops a sum that may be infinite
     const auto part = [](double phase, double sum) { return phase == 0 ? 0.0 : phase * sum; };
     const Complex first = {part(c, finite.even) - part(s, finite.odd),
                            -(part(s, finite.even) + part(c, finite.odd))};
@@ -161,7 +162,8 @@ Complex AsymptoticI(double n, Complex z, double x) {
     return ExpOnDiagonal(x, 1) * (sum / RootOfRightHalf(z * (2 * kPi)));
 }
 
-// The ratio I_(n+1) / I_n by downward recurrence from far above, then the Wronskian.
+// I_n from the ratio I_(n+1) / I_n, by downward recurrence from a much higher order, and the
+// Wronskian.
 Complex WronskianI(int n, Complex z, double x) {
     const int start = n + 30 + static_cast<int>(x + 4 * std::sqrt(x));
     Complex ratio = {0, 0};

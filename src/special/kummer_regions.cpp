@@ -14,7 +14,7 @@ namespace {
 constexpr double kAsymptoticFrom = 30;
 constexpr double kGood = 40 * kEpsilon;
 constexpr int kMostTerms = 1000;
-constexpr double kHopeless = 1e30; // of the terms of an asymptotic sum
+constexpr double kHopeless = 1e30; // bound of the terms of an asymptotic sum
 
 Extended Whole(double x) { return {x, 0}; }
 
@@ -23,7 +23,7 @@ Estimated GammaRatio(Extended b, Extended a) {
     return GammaQuotientOf({b, Whole(1)}, {a, Whole(1)});
 }
 
-// The part gamma(b) / gamma(a) exp(scale) |x|^power times a sum.
+// One part of the asymptotic form: gamma(b) / gamma(a) exp(scale) |x|^power times a sum.
 Estimated Part(Extended b, Extended a, double scale, double x, Extended power,
                const AsymptoticResult &sum) {
     const Estimated quotient = GammaRatio(b, a);
@@ -38,7 +38,7 @@ Estimated Asymptotic(double a, double b, double x) {
     const double y = std::fabs(x);
     const Extended d = ExactSum(b, -a);
     const double e = 1 - d.high; // 1 + a - b
-    // for x < 0 as exp(x) M(b - a, b, -x), which exchanges the two parts
+    // for x < 0 by exp(x) M(b - a, b, -x), which exchanges the two parts
     const bool isTurned = x < 0;
     const AsymptoticResult rising =
         isTurned ? AsymptoticSum(a, e, 1 / y) : AsymptoticSum(d.high, 1 - a, 1 / y);

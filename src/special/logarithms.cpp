@@ -9,8 +9,8 @@ namespace qx {
 
 namespace {
 
-// (atanh(z) / z - 1) / z^2 = 1/3 + z^2/5 + z^4/7 + ..., |z| <= 0.18: the leading terms in twice the
-// precision, since a double leaves 2^-53 of the first of the others.
+// (atanh(z) / z - 1) / z^2 = 1/3 + z^2/5 + z^4/7 + ..., |z| <= 0.18. The leading terms are in twice
+// the precision; the others, in double precision, have an error of 2^-53 of the first of them.
 Extended AtanhSeries(Extended z) {
     static constexpr Extended inverses[] = {
         {0x1.5555555555555p-2, 0x1.5555555555555p-56},  // 1/3

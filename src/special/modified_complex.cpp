@@ -17,13 +17,13 @@ namespace qx {
 
 namespace {
 
-constexpr double kFar = 22;           // from where asymptotic sums have all digits
-constexpr double kDebyeFrom = 10;     // order, for smaller |z|
+constexpr double kFar = 22;           // from here on asymptotic sums have all digits
+constexpr double kDebyeFrom = 10;     // order from which Debye's expansion is used for smaller |z|
 constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
-constexpr double kLongWayUp = 25;     // orders that take as long as Debye's expansion
-constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
-constexpr double kAxisFrom = 3;       // |z| from which it is
-constexpr double kSeriesUpTo = 2;     // |z| + Re z, of Temme's series
+constexpr double kLongWayUp = 25;     // up to here recurrence from near 0 is no slower than Debye's
+constexpr double kAxisWidth = 1;      // |Re z| up to which I is computed from K on both sides
+constexpr double kAxisFrom = 3;       // |z| from which this is done
+constexpr double kSeriesUpTo = 2;     // |z| + Re z up to which Temme's series is used
 constexpr double kNegligible = 0x1p-56;
 constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
 constexpr Complex kOne = {1, 0};
@@ -38,8 +38,8 @@ struct Inverses { // 1 / n
 };
 constexpr Inverses inverses;
 
-// The argument of a z in the first quadrant; the first has the rounding of an arc tangent up to
-// pi/4 alone.
+// The argument of a z in the first quadrant. LongAngle has only the rounding error of an arc
+// tangent of at most pi/4.
 Extended LongAngle(Complex z) {
     if (z.im <= z.re)
         return {std::atan(z.im / z.re), 0};
@@ -66,7 +66,7 @@ Exponential Conjugate(const Exponential &term) {
     return {Conjugate(term.factor), {term.exponent.re, -im}};
 }
 
-// Below, z lies in the first quadrant; for K as AxisI asks for it a little beyond.
+// From here on z is in the first quadrant; for K it may lie slightly outside, as AxisI requires.
 
 double TurningWidth(double order, double modulus) {
     return kTurningWidth * std::cbrt(std::max(modulus, order));
@@ -77,14 +77,14 @@ bool DebyeHolds(double order, double modulus, Complex z) {
            std::hypot(order - z.im, z.re) >= TurningWidth(order, modulus);
 }
 
-// The sum of an asymptotic series and that with alternating signs.
+// The sum of an asymptotic series, and the sum with alternating signs.
 struct Sums {
     Complex plain, alternating;
 };
 
 // sum u_k / order^k, where u_k / order^k = P_k(order^2 / s^2) / s^k with real polynomials P_k, each
-// by the recurrence for real coefficients (D. E. Knuth, The art of computer programming, 4.6.4);
-// and for N = 2 the sum of the v_k likewise.
+// evaluated by the recurrence for real coefficients (D. E. Knuth, The art of computer programming,
+// 4.6.4); for N = 2 also the sum of the v_k.
 template <int N>
 struct DebyeSums {
     Sums of[N];
@@ -155,7 +155,7 @@ ExponentialPair TwoExponentials(double order, Complex scale, const ExtendedCompl
     return pair;
 }
 
-// Debye's expansion for one place.
+// Debye's expansion at one order and argument.
 struct Debye {
     double order;
     Complex z;
@@ -176,14 +176,15 @@ struct Debye {
     }
 };
 
-// Two orders, order and one next to it, over exp(exponent).
+// The values for an order and a neighbouring one, divided by exp(exponent).
 struct TwoOrders {
     Complex first, second;
     ExtendedComplex exponent;
 };
 
-// Debye's expansions of a function f and its derivative, which is +-s / z f but for the sums; with
-// it I_(order - 1) = I' + order / z I and K_(order + 1) = -K' + order / z K, where nothing cancels.
+// Debye's expansions of a function f and its derivative, which is +-s / z f except for the sums.
+// From these I_(order - 1) = I' + order / z I and K_(order + 1) = -K' + order / z K, where nothing
+// cancels.
 TwoOrders DebyeTwo(Extended order, Complex z, bool isK) {
     const DebyeExponent place = ExponentOfDebye(order, z);
     const DebyeSums<2> sums(order.high, place.s);
@@ -195,7 +196,7 @@ TwoOrders DebyeTwo(Extended order, Complex z, bool isK) {
             isK ? Negative(place.exponent) : place.exponent};
 }
 
-// Hankel's.
+// Hankel's expansion.
 struct Hankel {
     double order;
     Complex z;
@@ -214,8 +215,9 @@ double ReciprocalGammaNextToOne(double mu) { // 1 / gamma(1 + mu), |mu| <= 1/2
     return Horner(table::reciprocalGamma, mu);
 }
 
-// What the logarithm of (|z|/2)^order / gamma(order + 1) lacks through the rounding of the modulus,
-// which the power multiplies by the order, and of order + 1, of which gamma is taken below 20.
+// The correction to the logarithm of (|z|/2)^order / gamma(order + 1) for the rounding of the
+// modulus, which the power multiplies by the order, and for the rounding of order + 1, whose gamma
+// function is used below order 20.
 double RoundingInPower(double order, Complex z, double modulus) {
     const Extended square = ExactProduct(z.re, z.re) + ExactProduct(z.im, z.im);
     const Extended rounded = ExactProduct(modulus, modulus);
@@ -266,14 +268,14 @@ struct SplitOrder {
         : mu(order - std::floor(order + 0.5)), m(static_cast<int>(std::floor(order + 0.5))) {}
 };
 
-// z inverse - 1 in more digits than those of the product.
+// z found - 1, with more digits than the rounded product has.
 Complex ExcessOfInverse(Complex z, Complex found) {
     const Extended re = ExactProduct(z.re, found.re) - ExactProduct(z.im, found.im);
     const Extended im = ExactProduct(z.re, found.im) + ExactProduct(z.im, found.re);
     return {(re - Extended{1, 0}).high, im.high};
 }
 
-// I_(mu + k) downwards from any start, normalised by
+// I_(mu + k) by downward recurrence from arbitrary start values, normalised by
 // (z/2)^mu exp(z) = gamma(1 + mu) (I_mu + sum 2 (mu + k) (2 mu + 1)_(k-1) / k! I_(mu + k)).
 Exponential MillerI(double order, Complex z, double modulus) {
     const SplitOrder split(order);
@@ -283,9 +285,9 @@ Exponential MillerI(double order, Complex z, double modulus) {
     const double mu = split.mu;
     Complex above = {0, 0};
     Complex p = kOne;
-    Complex sum = p; // of the terms from k on, over the weight of k
+    Complex sum = p; // of the terms from k on, divided by the weight of k
     Complex wanted = p;
-    Complex next = {0, 0}; // of the order above
+    Complex next = {0, 0}; // of the order above the wanted one
     for (int k = start; k >= 1; --k) {
         const double rounded = mu + k;
         const double rest = mu - (rounded - k);
@@ -295,7 +297,7 @@ Exponential MillerI(double order, Complex z, double modulus) {
         p = below;
         const double weight = k == 1 ? 2 * (mu + 1)
                                      : (mu + k) * (2 * mu + (k - 1)) /
-                                           ((mu + (k - 1)) * k); // of k over that of k - 1
+                                           ((mu + (k - 1)) * k); // of k, divided by that of k - 1
         sum = p + sum * weight;
         if (k - 1 == split.m) {
             wanted = p;
@@ -303,21 +305,21 @@ Exponential MillerI(double order, Complex z, double modulus) {
         }
     }
     const Complex power = Exp(Complex{std::log(0.5 * modulus), Angle(z)} * mu);
-    // All that is of z (1 - excess), but for its power and exponential.
+    // So far everything except the power and the exponential is for the argument z (1 - excess).
     const Complex excess = ExcessOfInverse(z, step * 0.5);
     const Complex slope = z * (next - wanted) + wanted * split.m;
     return {(wanted + excess * slope) * power / sum * ReciprocalGammaNextToOne(mu), Plain(z)};
 }
 
 // K_mu = sqrt(pi / (2 z)) exp(-z) U_0 / sum C_n U_n, where U_n is the confluent function
-// U(mu + 1/2 + n, 2 mu + 1, 2 z), C_n = (1/2 + mu)_n (1/2 - mu)_n / n!, and the U_n come downwards
-// from any start. Below, n! U_n.
+// U(mu + 1/2 + n, 2 mu + 1, 2 z), C_n = (1/2 + mu)_n (1/2 - mu)_n / n!, and the U_n come from
+// downward recurrence with arbitrary start values. The code computes n! U_n.
 TwoOrders MillerK(double mu, Complex z, double modulus) {
     const int start = std::min(static_cast<int>(400 / (modulus + z.re)) + 9, kSteps - 1);
     const auto coefficient = [mu](int n) { return (n - 0.5) * (n - 0.5) - mu * mu; };
     Complex above = {0, 0};
     Complex u = kOne;
-    Complex sum = u; // of C_m U_m from m = n on, over C_n / n!
+    Complex sum = u; // of C_m U_m from m = n on, divided by C_n / n!
     for (int n = start; n >= 1; --n) {
         const double twice = 2 * inverses.of[n];
         const Complex below = Complex{2 + twice * z.re, twice * z.im} * u -
@@ -337,14 +339,14 @@ TwoOrders HalfOrderK(Complex z) {
     return {value, value, Plain(-z)};
 }
 
-// (z/2)^-mu and its inverse, sinh(s) / s of the exponent s, and the logarithm of 2 / z.
+// (z/2)^-mu, its inverse, sinh(s) / s for the exponent s of the power, and the logarithm of 2 / z.
 struct PowersOfHalf {
     Complex grow, decay, sinc, logarithm;
 
     PowersOfHalf(double mu, Complex z, double modulus) {
         int exponent;
         const double mantissa = std::frexp(modulus, &exponent);
-        // For a small |z| the rounding of the logarithm would be one of the power.
+        // For small |z| the rounding of the logarithm would become an error of the power.
         const double part = std::log(mantissa);
         const Extended turns = {static_cast<double>(1 - exponent), 0};
         const Extended logOfSize = turns * table::extendedLnTwo + Extended{-part, 0};
@@ -372,7 +374,8 @@ struct PowersOfHalf {
 
 // The two series of Temme about z = 0, sum q^k / k! f_k and sum q^k / k! (p_k - k f_k) with
 // f_k = (k f_(k-1) + p_(k-1) + q_(k-1)) / (k^2 - mu^2), p_k = p_(k-1) / (k - mu) and
-// q_k = q_(k-1) / (k + mu): what the terms have of f_0, p_0 and q_0, over k!, is real.
+// q_k = q_(k-1) / (k + mu). The coefficients of f_0, p_0 and q_0 in the terms, divided by k!, are
+// real.
 struct TemmeTerms {
     static constexpr int most = 20;
     double first[3][most] = {{1}, {0}, {0}};
@@ -433,7 +436,7 @@ TwoOrders SeriesK(double mu, Complex z, double modulus, bool hasSecond) {
 Exponential Upwards(double order, int steps, Complex z, const TwoOrders &start) {
     if (steps <= 1)
         return {steps == 0 ? start.first : start.second, start.exponent};
-    // Scaled, since a step takes no numbers next to the end of the range.
+    // Scaled down, because the steps need values away from the overflow limit.
     constexpr double down = 0x1p-60;
     OrderRecurrence k(z, ExactSum(order, 1), 1, start.first * down, start.second * down);
     for (int n = 1; n < steps; ++n)
@@ -441,9 +444,9 @@ Exponential Upwards(double order, int steps, Complex z, const TwoOrders &start) 
     return {k.value() * (1 / down), start.exponent};
 }
 
-// Next to the turning point: down from an order above it.
+// Near the turning point: downwards from an order above it.
 Exponential TurningI(double order, Complex z, double modulus) {
-    // of an order above that from which we start
+    // at an order above the starting order
     const double width = TurningWidth(0, modulus + 10 * std::cbrt(modulus) + 7);
     const double wide = std::sqrt(std::max(0.0, width * width - z.re * z.re));
     const int steps = std::max(1, static_cast<int>(std::ceil(z.im + wide - order)));
@@ -454,7 +457,7 @@ Exponential TurningI(double order, Complex z, double modulus) {
     return {i.value(), start.exponent};
 }
 
-// Next to the turning point: up from an order below it, or from next to 0.
+// Near the turning point: upwards from an order below it, or from an order near 0.
 Exponential TurningK(double order, Complex z, double modulus) {
     const double width = TurningWidth(0, modulus);
     const double wide = std::sqrt(std::max(0.0, width * width - z.re * z.re));
@@ -466,7 +469,7 @@ Exponential TurningK(double order, Complex z, double modulus) {
     return Upwards(split.mu, split.m, z, MillerK(split.mu, z, modulus));
 }
 
-// Where the asymptotic expansions hold.
+// The asymptotic expansion that holds.
 enum class Region { Hankel, Debye, Other };
 Region RegionOf(double order, Complex z, double modulus) {
     if (modulus >= kFar && order * order <= 2 * modulus)
@@ -504,8 +507,8 @@ bool IsNextToAxis(double order, Complex z, double modulus) {
     return z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom && modulus < kFar;
 }
 
-// Next to the imaginary axis, where I oscillates: by K on both sides of the axis,
-// i pi I(z) = K(z exp(-i pi)) - exp(i pi order) K(z), with no recurrence through the turning point.
+// Near the imaginary axis, where I oscillates: from K on both sides of the axis,
+// i pi I(z) = K(z exp(-i pi)) - exp(i pi order) K(z), without a recurrence through the turning point.
 ExponentialPair AxisI(double order, Complex z, const Exponential &k) {
     const Exponential mirrored = Conjugate(UpperK(order, {-z.re, z.im}));
     const Complex turn = TimesI(TurnByPi(order));

@@ -5,9 +5,9 @@
 
 namespace qx {
 
-// I and K of order v >= 0 and z in the right half-plane, Re z >= 0, z other than 0, |z| and v to
-// 2^31; what all complex Bessel and Airy functions are made of. The methods are symmetrical about
-// the real axis; below, y = |Im z|.
+// I and K of order v >= 0 for z in the right half-plane, Re z >= 0, z other than 0, |z| and v up to
+// 2^31. All complex Bessel and Airy functions are computed from these. The methods are symmetrical
+// about the real axis; below, y = |Im z|.
 //
 //   I  |z|^2 <= 4 (v + 1)          the power series, whose terms fall from the start
 //      |z| from 3 to 22, Re z <= 1, y > v, no expansion below: K at z and -z
@@ -18,28 +18,28 @@ namespace qx {
 //   both, where |z| >= 22 and v^2 <= 2 |z|: Hankel's expansion
 //   both, where |v + i z| >= 8.2 max(|z|, v)^(1/3), and |z| >= 22 or v >= 10: Debye's expansion,
 //      which beyond the Stokes line of the turning point z = i v takes a second exponential for I
-//   both next to the turning point: recurrence from where Debye's holds, which is 8.2 |z|^(1/3)
-//      orders off, downwards for I and upwards for K, below order 25 from next to 0. Each is the
-//      solution that this does not harm.
+//   both near the turning point: recurrence from where Debye's expansion holds, 8.2 |z|^(1/3)
+//      orders away, downwards for I and upwards for K; below order 25 from near 0. Each is stable
+//      in its direction.
 //
-// What would cost digits is done in more than double precision: exponents and phases
-// (complex_exponent.h) at orders that are not rounded, the recurrences in the order
-// (order_recurrence.h), and what Miller's loses to the rounding of 2 / z and of the orders.
+// The steps that would lose digits use more than double precision: exponents and phases
+// (complex_exponent.h) at unrounded orders, the recurrences in the order (order_recurrence.h), and
+// the corrections to Miller's recurrence for the rounding of 2 / z and of the orders.
 //
-// Where |v + i z| = 8.2 max(|z|, v)^(1/3) the difference of the two exponentials' exponents is at
-// least 44, the size at which Debye's first 20 terms leave 2^-55; so they do in Hankel's case.
+// Where |v + i z| = 8.2 max(|z|, v)^(1/3), the exponents of the two exponentials differ by at least
+// 44, at which Debye's first 20 terms leave an error of 2^-55; the same holds in Hankel's case.
 // Sources: F. W. J. Olver, Asymptotics and Special Functions, 1974, chapters 7 and 10; D. E. Amos,
 // Algorithm 644, 1986; N. M. Temme, On the numerical evaluation of the modified Bessel function of
 // the third kind, 1975.
 
-// The second term is 0 where there is none.
+// The second term is 0 if there is only one.
 struct ExponentialPair {
     Exponential first, second;
 };
 ExponentialPair ModifiedI(double order, Complex z);
 Exponential ModifiedK(double order, Complex z);
 
-// Both, in less time than one after the other.
+// Both functions, in less time than separately.
 struct ModifiedBoth {
     ExponentialPair i;
     Exponential k;

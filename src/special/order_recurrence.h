@@ -6,14 +6,14 @@
 
 namespace qx {
 
-// The recurrence f(next) = f(before) + (2 order / z) f of the modified Bessel functions, for K with
-// its signs as they are and upwards, for I downwards. What rounding takes from z's inverse, from
-// the orders and from each step is carried along to first order: over n steps the plain recurrence
-// loses about |z|^(2/3) eps next to the turning point, most of it to the rounding of 2 / z.
+// The recurrence f(next) = f(before) + (2 order / z) f of the modified Bessel functions: upwards
+// for K, with its signs unchanged, and downwards for I. The rounding errors of the inverse of z, of
+// the orders and of each step are carried along to first order: over n steps the plain recurrence
+// loses about |z|^(2/3) eps near the turning point, most of it to the rounding of 2 / z.
 class OrderRecurrence {
 public:
-    // The first step is from `order` by `direction`, +1 or -1. For |z| below 1e-100, or values
-    // above 2^996, the correction may be lost, and value() is the plain one.
+    // The first step goes from `order` in `direction`, +1 or -1. For |z| below 1e-100 or values
+    // above 2^996 the correction may overflow; value() is then the uncorrected value.
     OrderRecurrence(Complex z, Extended order, double direction, Complex before, Complex present)
         : before_(Pack(before)), beforeLow_(0.0), present_(Pack(present)), presentLow_(0.0) {
         const ExtendedComplex step = TwoOver(z);
@@ -61,7 +61,7 @@ private:
         return Lanes<2>::gather(parts, 1);
     }
     static Lanes<2> sign() { return Pack({-1, 1}); }
-    // ExactSum and ExactProduct (frame/extended.h) of two parts each.
+    // ExactSum and ExactProduct (frame/extended.h) for two parts each.
     static Sum2 Sum(Lanes<2> a, Lanes<2> b) {
         const Lanes<2> s = a + b;
         const Lanes<2> t = s - a;
@@ -88,7 +88,7 @@ private:
     }
 
     Lanes<2> step_, stepLow_;
-    Lanes<2> factor_, factorLow_; // of the next step
+    Lanes<2> factor_, factorLow_; // for the next step
     Lanes<2> before_, beforeLow_, present_, presentLow_;
 };
 

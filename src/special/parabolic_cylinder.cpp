@@ -10,7 +10,8 @@ namespace qx {
 
 namespace {
 
-// Below 40 the other methods serve, so the asymptotic series has to be as good as they are.
+// Below 40 other methods are available, so there the asymptotic series has to be as accurate as
+// they are.
 constexpr double kAsymptoticLimit = 1e-12;
 constexpr double kAsymptoticLimitBelow40 = 1e-15;
 constexpr double kMostSteps = 1000; // D overflows near order 340 unless x is large
@@ -24,7 +25,7 @@ double Gaussian(double x, double sign) {
     return e + e * (0.25 * sign * square.low);
 }
 
-// sum of sign^k (a)_2k / (k! (2 x^2)^k); false where it does not reach the limit.
+// sum of sign^k (a)_2k / (k! (2 x^2)^k); false if it does not reach the limit.
 bool AsymptoticSum(double a, double x, double sign, double *sum) {
     const double inverse = 0.5 / x / x;
     double term = 1;
@@ -38,7 +39,7 @@ bool AsymptoticSum(double a, double x, double sign, double *sum) {
         if (std::fabs(term) <= 0.1 * kEpsilon * std::fabs(*sum))
             break;
     }
-    // a sum far below its terms has cancelled
+    // a sum far below its terms has lost digits to cancellation
     const double limit = x < 40 ? kAsymptoticLimitBelow40 : kAsymptoticLimit;
     return std::fabs(term) <= limit * std::fabs(*sum) && std::fabs(*sum) > 1e-2;
 }
@@ -63,7 +64,7 @@ bool ParabolicAsymptotic(double x, double v, double *value) {
     return true;
 }
 
-// M(a, b, z) in two doubles: for orders above 0 its terms have both signs.
+// M(a, b, z) in two doubles, because for orders above 0 its terms have both signs.
 double KummerSum(double a, double b, Extended z) {
     Extended term = {1, 0};
     Extended sum = term;
@@ -90,18 +91,18 @@ double TwoSeries(double x, double v) {
 
 struct Pair {
     double value;
-    double above; // of the order one higher
+    double above; // for the order one higher
 };
 
 // v < 0, x >= 1: Miller's algorithm.
 Pair NegativeOrder(double x, double v) {
     const double zero = std::exp2(0.5 * v) * kRootPi * ReciprocalGamma(0.5 * (1 - v)); // D_v(0)
-    if (zero == 0) // D falls from there
+    if (zero == 0) // D decreases from there
         return {0, 0};
     const double start = 60 + 400 / (x * x) + 3 * x * x + 4 * x * std::sqrt(-v);
     double above = 0; // w_(k+1), where w_k is proportional to D_(v-k)
     double value = 1e-300;
-    double total = value; // the normalising sum from k on, relative to its first coefficient
+    double total = value; // the normalising sum from k on, divided by its first coefficient
     for (double k = std::floor(start); k > 0; k -= 1) {
         const double below = x * value + (k - v) * above;
         above = value;
@@ -117,7 +118,7 @@ Pair NegativeOrder(double x, double v) {
     return {scale * value, scale * (x * value - v * above)};
 }
 
-// Upwards to the order v from two neighbours: D_(m+1) = x D_m - m D_(m-1).
+// Upward recurrence to the order v from two neighbouring orders: D_(m+1) = x D_m - m D_(m-1).
 double Upward(double x, double v, double from, Pair pair) {
     if (v - from > kMostSteps)
         return kNaN;
@@ -146,7 +147,7 @@ double ParabolicCylinder(double x, double v) {
         const double d0 = Gaussian(x, -1);
         return Upward(x, v, 0, {d0, x * d0});
     }
-    if (x < 1 || x > 40) // beyond 40 only orders remain that overflow or underflow
+    if (x < 1 || x > 40) // for x > 40 only orders remain that overflow or underflow
         return TwoSeries(x, v);
     if (v < 0)
         return NegativeOrder(x, v).value;

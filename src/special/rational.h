@@ -14,8 +14,8 @@ inline double Horner(const double (&c)[N], double x) {
     return y;
 }
 
-// A rational function about a centre; P and Q count the coefficients, degree plus one. The
-// tables in special/tables are made of these.
+// A rational function about a centre; P and Q are the numbers of coefficients, degree plus one. The
+// tables in special/tables consist of these.
 template <std::size_t P, std::size_t Q>
 struct Rational {
     double centre;

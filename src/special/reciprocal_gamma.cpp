@@ -21,8 +21,8 @@ double StirlingCorrection(double v) {
     return Horner(c, z) / v;
 }
 
-// (e y / v)^v / sqrt(2 pi v): the quotient is raised in two parts, because the power multiplies
-// its rounding error by v.
+// (e y / v)^v / sqrt(2 pi v). The quotient is raised to the power in two parts, because the power
+// multiplies its rounding error by v.
 double StirlingPower(double y, double v) {
     const Extended base = Extended{kE, kELow} * Extended{y, 0} / Extended{v, 0};
     if (!(base.high > 0) || std::isinf(base.high))

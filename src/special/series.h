@@ -8,13 +8,13 @@
 
 namespace qx {
 
-// What the sum of a hypergeometric series has come to. The largest term against the sum tells the
+// The result of summing a hypergeometric series. The largest term relative to the sum shows the
 // digits lost to cancellation.
 struct SeriesSum {
     double sum;
     double last;
     double largest;
-    bool isComplete; // ended by itself or by its stop test
+    bool isComplete; // the series ended, or met its stop test
 };
 
 // a + k, exact in two doubles.
@@ -36,16 +36,16 @@ inline double Rounded(Extended x) { return x.high; }
 
 constexpr double kVanished = 1e-200;
 
-// A NaN of any sign as the one that the functions give.
+// Replaces a NaN of either sign by the NaN that the functions return.
 inline double OneNaN(double x) {
     return std::isnan(x) ? std::numeric_limits<double>::quiet_NaN() : x;
 }
 
-// Sums a series of first term 1, `terms.ratio<Number>(k)` being the quotient of the terms k + 1 and
-// k. It ends where a ratio is 0, where the sum leaves the range, and where a term has fallen to
-// `tolerance` times (offset + |sum|), provided that the terms cannot rise again: the next ratio is
-// below 1, and `terms.isPastPoles(k)`, since a negative lower parameter makes the terms first small
-// and then large. A term 1e-200 times the sum ends it in any case.
+// Sums a series with first term 1, where `terms.ratio<Number>(k)` is the quotient of the terms
+// k + 1 and k. The sum ends when a ratio is 0, when it overflows, and when a term has fallen to
+// `tolerance` times (offset + |sum|) and the terms cannot rise again: the next ratio must be below
+// 1 and `terms.isPastPoles(k)` true, because a negative lower parameter makes the terms first small
+// and then large. A term of 1e-200 times the sum always ends it.
 template <class Number, class Terms>
 SeriesSum SumSeries(const Terms &terms, double tolerance, double offset, int mostTerms) {
     Number term = Shifted<Number>(1, 0);

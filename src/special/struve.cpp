@@ -15,14 +15,14 @@ constexpr double kStop = 1.8046660579423136e-14;
 constexpr double kMostTerms = 200;
 constexpr double kLargestTerm = 1e35;
 constexpr double kUnusable = 1e38;
-constexpr double kPairEps = 1e-31; // of sums in two doubles
+constexpr double kPairEps = 1e-31; // eps of sums in two doubles
 
 struct Estimate {
     double sum;
     double error;
 };
 
-// What a sum has come to: its last term and its largest give the estimate of the error.
+// Estimates the error of a sum from its last and its largest term.
 Estimate Judge(double sum, double last, double largest, double eps) {
     const double size = std::fabs(sum);
     return {sum, std::fmax(std::fabs(last) / size, largest * eps / size)};
@@ -41,7 +41,8 @@ Estimate Struve1F2(double x, double v) {
         sum = sum + term;
         last = std::fabs(term.high);
         largest = std::fmax(largest, last);
-        // the stated relative size would leave the last digits out, so the terms go on below it
+        // kStop itself would leave out the last digits, so terms are added down to a hundredth of
+        // it
         if (last <= 0.01 * kStop * std::fabs(sum.high) &&
             std::fabs(q.high) < std::fabs(divisor.high))
             return {sum.high, Judge(sum.high, 0.0, largest, kPairEps).error};
@@ -85,7 +86,7 @@ double Ascending(double sum, double x, double v) {
     const double value = sum * (0.5 * x / kHalfRootPi) * Factor(x, v, 1);
     if (!std::isinf(value) || v >= 1)
         return value;
-    const double root = std::pow(0.5 * x, 0.5 * (v + 1)); // the power alone may pass the range
+    const double root = std::pow(0.5 * x, 0.5 * (v + 1)); // the power alone may overflow
     return (sum / kHalfRootPi * root) * (root * ReciprocalGamma(v + 1.5));
 }
 

@@ -13,8 +13,8 @@ namespace qx {
 namespace {
 
 constexpr double kStirlingFrom = 10.0;
-constexpr double kDirectFrom = 8.0; // own parameter, from which the integral is short
-constexpr double kHuge = 1e290;     // beyond it products in twice the precision overflow
+constexpr double kDirectFrom = 8.0; // parameter from which the integral over its tail is short
+constexpr double kHuge = 1e290;     // products in twice the precision overflow above it
 constexpr double kAboveHalf = 0.55;
 
 Extended Whole(double x) { return {x, 0.0}; }
@@ -51,7 +51,7 @@ double LogRest(double w) {
     return 2.0 * z * (z * z) * Horner(c, z * z) - w * z;
 }
 
-// The logarithm of the integrand at t = x exp(u) over that at x.
+// The logarithm of the integrand at t = x exp(u) minus that at x.
 struct GammaExponent {
     double lead, x; // a - x
     double slope() const { return lead; }
@@ -59,7 +59,7 @@ struct GammaExponent {
     double operator()(double u) const { return lead * u - x * ExpRest(u); }
 };
 
-// The same where t / (1 - t) is exp(u) times x / y; written for the smaller of x and y.
+// The same where t / (1 - t) is exp(u) times x / y, computed from the smaller of x and y.
 struct BetaExponent {
     double lead, sum, x, y; // a y - b x, a + b
     double slope() const { return lead; }
@@ -77,14 +77,14 @@ struct BetaExponent {
     }
 };
 
-// Where the integrand has fallen by 17 digits and more.
+// The distance at which the integrand has fallen by 17 digits or more.
 template <class Exponent>
 double EndOfIntegral(const Exponent &exponent, double direction) {
     constexpr double least = -40.0, most = -70.0;
     const double s = std::fabs(exponent.slope());
     double v = -2 * least / (s + std::sqrt(s * s - 2 * least * exponent.curvature()));
     double low = 0.0, high = kInfinity;
-    for (int turn = 0; turn < 2200; ++turn) { // enough to halve through the range of the doubles
+    for (int turn = 0; turn < 2200; ++turn) { // enough to bisect the range of the doubles
         const double at = exponent(direction * v);
         if (at <= least && at >= most)
             break;
@@ -98,7 +98,7 @@ double EndOfIntegral(const Exponent &exponent, double direction) {
 template <class Exponent>
 double IntegralOf(const Exponent &exponent, double direction) {
     constexpr double longest = 5.5;
-    constexpr double farthest = 1e5; // no integral reaches so far but by a fault
+    constexpr double farthest = 1e5; // no correct integral extends this far
     const double end = EndOfIntegral(exponent, direction);
     if (!(end < farthest))
         return kNaN;
@@ -115,8 +115,8 @@ double IntegralOf(const Exponent &exponent, double direction) {
     return (sum.high + sum.low) * width;
 }
 
-// factor times sqrt(square / (2 pi)) exp(exponent); what the factor's rounding takes goes into the
-// exponent.
+// factor times sqrt(square / (2 pi)) exp(exponent); the rounding error of the factor is moved into
+// the exponent.
 Scaled Front(Extended factor, Extended square, Extended exponent) {
     constexpr Extended inverseRoot = {kInverseRootTwoPi, -0x1.cbc0d30ebfd15p-56};
     const Extended whole = factor * SquareRoot(square) * inverseRoot;
@@ -169,8 +169,8 @@ int StepsToDirect(double a) {
     return a < kDirectFrom ? static_cast<int>(std::ceil(kDirectFrom - a)) : 0;
 }
 
-// The lower part over its slope: 1 / a (1 + x / (a + 1) (1 + x / (a + 2) (...))), and the integral
-// behind the last term.
+// The lower part divided by its slope: 1 / a (1 + x / (a + 1) (1 + x / (a + 2) (...))), with the
+// integral as the remainder after the last term.
 double LowerGamma(double a, double x) {
     const int steps = StepsToDirect(a);
     const double raised = a + steps;
@@ -200,7 +200,7 @@ double LowerBeta(double a, double b, const UnitPoint &point) {
     return value / a;
 }
 
-// The part that is tried first, unless it is above a half.
+// The part that is tried first, or the other one if the first exceeds kAboveHalf.
 template <class Lower, class Upper>
 Tails SmallerOf(const Scaled &slope, bool lowerFirst, Lower lower, Upper upper) {
     const Scaled first = slope * (lowerFirst ? lower() : upper());

@@ -5,18 +5,20 @@
 
 namespace qx {
 
-// factor * exp(exponent), so that neither overflows nor underflows before its time.
+// factor * exp(exponent), separate so that the product overflows or underflows only when its value
+// does.
 struct Scaled {
     double factor;
     Extended exponent;
 
-    double value() const; // rounded once, subnormal numbers included
+    double value() const; // rounded once, even if the result is subnormal
     double logarithm() const;
     Scaled operator*(double by) const { return {factor * by, exponent}; }
 };
 
-// The two parts of a whole of 1: the smaller one, or one that is hardly above a half, from which the
-// other follows. `slope` is the derivative of the lower part in ln x (gamma) or ln(x / y) (beta).
+// Two parts whose sum is 1, represented by the smaller one, or by one that is hardly above a half;
+// the other follows from it. `slope` is the derivative of the lower part in ln x (gamma) or
+// ln(x / y) (beta).
 struct Tails {
     Scaled smaller;
     bool isLower;
@@ -27,13 +29,13 @@ struct Tails {
 };
 
 // The regularised incomplete gamma functions P(a, x) and Q(a, x), and the beta function I_x(a, b)
-// with its complement: each part within 4 eps where it is the smaller one, for a and b up to 1e25.
+// with its complement, each part within 4 eps where it is the smaller one, for a and b up to 1e25.
 //
-// In the variable u = ln t, or ln(t / (1 - t)), the integrand is the exponential of a concave function
-// without singularities nearby, at every size of the parameters. So one rule of Gauss and Legendre
-// on intervals of length 3 serves all: its terms are positive and its front, the integrand at x, is
-// formed in twice the precision (C. Loader's deviance). A parameter below 8 is first raised by
-// the recurrence, whose terms are positive too.
+// In the variable u = ln t, or ln(t / (1 - t)), the integrand is the exponential of a concave
+// function without singularities nearby, for parameters of any size. Therefore one Gauss-Legendre
+// rule on intervals of length at most 5.5 serves all of them: its terms are positive, and its
+// prefactor, the integrand at x, is computed in twice the precision (C. Loader's deviance). A
+// parameter below 8 is first raised by the recurrence, whose terms are also positive.
 Tails GammaTails(double a, double x);
 Tails BetaTails(double a, double b, const UnitPoint &point);
 

@@ -21,7 +21,7 @@ constexpr double kGoodParts = 1e-27;
 constexpr double kConnectionBelow = 1;
 constexpr double kConnectionFirst = 0.2;
 constexpr double kPlainBelow = 3, kPlainDistance = 0.05;
-constexpr double kPlain = 20; // parameters up to which the functions of doubles serve
+constexpr double kPlain = 20; // parameters up to which gamma functions of doubles suffice
 constexpr double kAside = 0x1p-32;
 constexpr int kMostTerms = 40000;
 constexpr int kMostSteps = 3000;
@@ -41,13 +41,14 @@ constexpr double kPrecision = kEpsilon;
 template <>
 constexpr double kPrecision<Extended> = 0x1p-100;
 
-// Where to begin the recurrence downwards: where the term of the normalising sum has fallen, by F. W. J.
-// Olver's relation of the falling solution to the growing one (Numerical solution of second-order
-// linear difference equations, 1967). 0 where it would be beyond kMostTerms.
+// The index at which the downward recurrence starts: where the terms of the normalising sum have
+// fallen below the tolerance, by F. W. J. Olver's relation between the decaying and the growing
+// solution (Numerical solution of second-order linear difference equations, 1967). 0 if it would be
+// above kMostTerms.
 int FirstTerm(double a, double b, double x, bool isWeighted, double tolerance) {
-    constexpr int stride = 8;    // from one term that is looked at to the next
+    constexpr int stride = 8;    // from one tested term to the next
     double p = 1, step = 1;      // the growing solution
-    double product = 1, sum = 0; // weight times quotient of the coefficients; of the terms
+    double product = 1, sum = 0; // weight times quotient of the coefficients; sum of the terms
     for (int n = 1; n < kMostTerms; ++n) {
         const double at = a + n;
         const double below = at - b + 1;
@@ -75,7 +76,7 @@ int FirstTerm(double a, double b, double x, bool isWeighted, double tolerance) {
     return 0;
 }
 
-// U(a, b, x) and U(a + 1, b, x) in units of 2^exponent, and the steps that led there.
+// U(a, b, x) and U(a + 1, b, x) in units of 2^exponent, and the number of steps.
 template <class Number>
 struct Neighbours {
     Number at, above;
@@ -84,8 +85,9 @@ struct Neighbours {
     bool isKnown;
 };
 
-// a >= 1, a - b >= 0. With f_n = (first)_n U(first + n, b, x), where first is a less a whole number,
-// and d_n = f_n - f_(n+1), all above 0: d_(n-1) = ((first + n - b + 1) d_n + x f_n) / (first + n - 1).
+// a >= 1, a - b >= 0. With f_n = (first)_n U(first + n, b, x), where first is a minus an integer,
+// and d_n = f_n - f_(n+1), all positive:
+// d_(n-1) = ((first + n - b + 1) d_n + x f_n) / (first + n - 1).
 template <class Number>
 Neighbours<Number> FromAbove(Extended a, Extended b, double x) {
     const double kept = std::floor(std::min(a.high - 1, a.high - b.high));
@@ -104,7 +106,7 @@ Neighbours<Number> FromAbove(Extended a, Extended b, double x) {
     Number f = Of<Number>(Whole(1)), d = f, sum = f, above = Of<Number>(Whole(0)), at = above,
            next = above;
     Number product = f; // (first)_kept
-    int downs = 0;      // of at and next more than of the sum
+    int downs = 0;      // scalings of the sum and the product since `at` and `next` were set
     for (int n = last; n > 0; --n) {
         const Number whole = Of<Number>(Whole(n));
         sum = sum * ((excess + whole) / whole);
@@ -147,7 +149,7 @@ void KeepInRange(Number &u, Number &v, Wide &unit) {
     unit.exponent += kBigExponent;
 }
 
-// The same for any a, b <= x + 1.
+// The same for any a and b <= x + 1.
 template <class Number>
 Neighbours<Number> DownInA(Extended a, Extended b, double x) {
     const double up =
@@ -168,7 +170,8 @@ Neighbours<Number> DownInA(Extended a, Extended b, double x) {
     return u;
 }
 
-// From b <= x + 1 upwards: e = U(b) - U(b - 1) = -U'(b - 1), x e(b + 1) = (b - 1 - a) e + a U(b).
+// Upwards in b from b <= x + 1: e = U(b) - U(b - 1) = -U'(b - 1),
+// x e(b + 1) = (b - 1 - a) e + a U(b).
 template <class Number>
 Estimated ByRecurrences(Extended a, Extended b, double x) {
     const double up = std::max(0.0, std::ceil(b.high - 1 - x));
@@ -180,7 +183,7 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
     if (!u.isKnown)
         return none;
     const Number first = Of<Number>(a), point = Of<Number>(Whole(x));
-    // Below 0 U oscillates in a with this change of phase from one step to the next.
+    // For a < 0, U oscillates in a with this change of phase per step.
     const double phase = a.high < 0 ? std::sqrt(x / (std::fabs(a.high) + x)) : 1;
     double scale = std::sqrt(std::fabs(a.high * (a.high - second.high + 1))) / phase;
     if (up > 0) {
@@ -191,7 +194,7 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
     }
     for (double n = 1; n < up; ++n) {
         const Extended now = second + Whole(n - 1);
-        const Extended fall = now - a; // of b - 1 - a
+        const Extended fall = now - a; // the factor b - 1 - a
         if (fall.high > 0) {
             u.above = (Of<Number>(fall) * u.above + first * u.at) / point;
             u.at = u.at + u.above;
@@ -206,7 +209,7 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
     const double size = std::fabs(Leading(u.at));
     const double amplitude = size + scale * std::fabs(Leading(u.above));
     double weight = (8 + std::sqrt(static_cast<double>(u.steps)) + up) / phase;
-    if (up > 0 && a.high < 0) // the part that grows has a factor 1 / gamma(a)
+    if (up > 0 && a.high < 0) // the growing part has a factor 1 / gamma(a)
         weight += 0.1 * weight / std::fabs((a - Whole(std::rint(a.high))).high);
     return {u.unit * WideOf(Pair(u.at)), 4 * weight * kPrecision<Number> * amplitude / size};
 }
@@ -220,7 +223,7 @@ Estimated Polynomial(Extended a, Extended b, double x) {
     return {value.value * factor.value * sign, value.error + factor.error};
 }
 
-// Where b is not an integer: gamma(1 - b) / gamma(a - b + 1) M(a, b, x) +
+// For b that is not an integer: gamma(1 - b) / gamma(a - b + 1) M(a, b, x) +
 // gamma(b - 1) / gamma(a) x^(1-b) M(a - b + 1, 2 - b, x).
 Estimated Connection(Extended a, Extended b, double x) {
     const Extended one = Whole(1);

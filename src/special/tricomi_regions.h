@@ -3,7 +3,7 @@
 
 namespace qx {
 
-// U(a, b, x), x >= 0. In this order:
+// U(a, b, x), x >= 0. The methods are tried in this order:
 //
 //   the asymptotic sum (13.7.3 of the DLMF) where its smallest term is below 9e-15, and where it ends
 //   x < 0.2, and x < 1 where a < 0: the two M of 13.2.42, with gammas and sums in two doubles; at b
@@ -16,8 +16,8 @@ namespace qx {
 //          downwards in a from where U is as good as 0, in a form without a difference, normalised by
 //          the sum of (a - b + 1)_n (a)_n U(a + n, b, x) / n! = x^(-a); to larger b upwards
 //
-// At x = 0 the limit. NaN for x < 0, for arguments that are not finite, and where the error is estimated
-// above 1e-12.
+// At x = 0 the limit. NaN for x < 0, for arguments that are not finite, and where the estimated
+// error is above 1e-12.
 // Source: N. M. Temme, The numerical computation of the confluent hypergeometric function U(a, b, z),
 // 1983, for the recurrence in a and its sum.
 double TricomiByRegion(double x, double a, double b);

@@ -36,7 +36,7 @@ constexpr Extended kInverseFactorials[] = {{0x1.0000000000000p+0, 0},
                                            {0x1.93974a8c07c9dp-37, 0x1.05d6f8a2efd1fp-92},
                                            {0x1.ae7f3e733b81fp-41, 0x1.1d8656b0ee8cbp-97}};
 
-// B_2k / (2k (2k - 1)), as many as x = 30 needs.
+// B_2k / (2k (2k - 1)), as many terms as x = 30 needs.
 constexpr Extended kStirling[] = {{0x1.5555555555555p-4, 0x1.5555555555555p-58},
                                   {-0x1.6c16c16c16c17p-9, 0x1.f49f49f49f49fp-64},
                                   {0x1.a01a01a01a01ap-11, 0x1.a01a01a01a01ap-71},
@@ -53,7 +53,8 @@ constexpr Extended kStirling[] = {{0x1.5555555555555p-4, 0x1.5555555555555p-58},
                                   {-0x1.1a198ae1c4ab8p+15, 0x1.4c012227b696ep-41},
                                   {0x1.51a2089a6e11ap+19, 0x1.c219ee4fdc447p-36}};
 
-// c[0] + c[1] x + ..., the terms that count below the last bit of c[0] in double precision.
+// c[0] + c[1] x + ..., where the terms from `pairs` on, which matter only below the last bit of
+// c[0], are summed in double precision.
 template <std::size_t N>
 Extended Sum(const Extended (&c)[N], Extended x, std::size_t pairs) {
     double tail = 0;

@@ -5,15 +5,16 @@
 
 namespace qx {
 
-// value 2^exponent: the digits of two doubles beyond the range of one, for factors of a product that
-// is itself a double. An exponent beyond 2^30 either way is not kept apart from infinity and 0.
+// value 2^exponent: the digits of two doubles with a range beyond that of a double, for factors of
+// a product that is itself a double. An exponent beyond 2^30 in either direction is not
+// distinguished from infinity or 0.
 struct Wide {
     Extended value; // 0, or of modulus 1/2 to 1
     int exponent;
 
     bool isZero() const { return value.high == 0; }
     double rounded() const;   // rounded once; infinite or 0 beyond the range
-    double logarithm() const; // log2 |value 2^exponent|, to some digits; -infinity for 0
+    double logarithm() const; // log2 |value 2^exponent|, to a few digits; -infinity for 0
 };
 
 Wide WideOf(Extended value, int exponent = 0);
@@ -21,7 +22,7 @@ Wide operator*(const Wide &a, const Wide &b);
 Wide operator/(const Wide &a, const Wide &b);
 Wide operator+(const Wide &a, const Wide &b);
 
-// A value and the estimate of its relative error, infinite where there is none.
+// A value and the estimate of its relative error, infinite if there is no value.
 struct Estimated {
     Wide value;
     double error;
@@ -31,16 +32,16 @@ struct Estimated {
 Wide WideExp(Extended x);
 Estimated PowerOf(Extended base, Extended power);
 
-// gamma(x) for x from -2000 to 1e15: by Stirling's series from 30 on and the recurrence below, so
-// the error is about 2^-90 |ln gamma(max(x, 30))|; it is infinite where x is out of reach.
+// gamma(x) for x from -2000 to 1e15: by Stirling's series from 30 on and by the recurrence below
+// 30. The error is about 2^-90 |ln gamma(max(x, 30))|; it is infinite if x is out of range.
 struct WideGamma {
     Estimated gamma;
     bool isPole; // 0, -1, -2, ...
 };
 WideGamma GammaOf(Extended x);
 
-// The product of gamma over the numerators divided by that over the denominators; 0 at a pole of a
-// denominator, an infinite error at one of a numerator.
+// The product of gamma over the numerators divided by the product over the denominators; 0 at a
+// pole of a denominator, an infinite error at a pole of a numerator.
 Estimated GammaQuotientOf(const Extended (&numerators)[2], const Extended (&denominators)[2]);
 
 } // namespace qx

@@ -19,7 +19,7 @@ double Zeta(double x) {
         const double s = 1 - x;
         if (s == 1)
             return -0.5;
-        const double pole = (s - 1) / -x; // what s has rounded away counts next to the pole only
+        const double pole = (s - 1) / -x; // the rounding of s matters only near the pole
         return Zeta(s) * pole * std::pow(2 * kPi, x) * SinPi(0.5 * x) / (ReciprocalGamma(s) * kPi);
     }
     if (x >= 127)

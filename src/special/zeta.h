@@ -3,7 +3,7 @@
 
 namespace qx {
 
-// Riemann's zeta function for real x. +infinity at 1 and, kept so, at +infinity; NaN for NaN,
+// Riemann's zeta function for real x. +infinity at 1 and (kept) at +infinity; NaN for NaN,
 // -infinity and x < -30.8148.
 //
 //   x < 0           reflection from 1 - x

@@ -31,8 +31,8 @@ void CopyFirst(VectorView<E> from, VectorView<E> to) {
                 sizeof(typename VectorView<E>::T) * static_cast<std::size_t>(to.size()));
 }
 
-// out[t] = sum of a[i] b[t - i]. The shorter sequence are the taps; the steps let their order be
-// that of ascending or of descending i.
+// out[t] = sum of a[i] b[t - i]. The shorter sequence serves as the taps; the steps make the order
+// of the sum ascending or descending in i.
 enum class Order { AscendingInA, DescendingInA };
 
 template <ElementType Code>
@@ -47,7 +47,7 @@ void ConvolveSliding(ConstantSteps<Code> a, int32_t na, ConstantSteps<Code> b, i
     const bool tapsAreA = na < nb;
     const int32_t taps = tapsAreA ? na : nb;
     const int32_t length = tapsAreA ? nb : na;
-    // Windows either rise through the longer sequence with the taps from their end, or the other
+    // Windows either move forward through the longer sequence with the taps reversed, or the other
     // way round.
     const bool rising = tapsAreA == (order == Order::DescendingInA);
     const ConstantSteps<Code> tap = tapsAreA ? a : b;
@@ -56,8 +56,8 @@ void ConvolveSliding(ConstantSteps<Code> a, int32_t na, ConstantSteps<Code> b, i
                  length, 1 - int64_t{taps}, rising ? forward : backward, count});
 }
 
-// From two padded sequences in `first` and `second` to the transform of their convolution, which is
-// left in `first`; all three have the same length.
+// Transforms two padded sequences in `first` and `second`, and stores their circular convolution in
+// `first`; all three arrays have the same length.
 ErrorCode ConvolveCircularly(const FFTPlan *plan, RealVector first, RealVector second,
                              RealVector work) {
     const auto L = static_cast<int32_t>(first.size());
@@ -69,7 +69,7 @@ ErrorCode ConvolveCircularly(const FFTPlan *plan, RealVector first, RealVector s
     return FFTRealInverse(plan, second.data(), first.data(), 1, 1, L);
 }
 
-// The convolution of x, reversed if so asked, and y.
+// The convolution of x, reversed if requested, and y.
 ErrorCode TransformReal(ConstRealVector x, bool reversed, ConstRealVector y, RealVector out) {
     const int32_t L = NextTransformLength(static_cast<int32_t>(out.size()));
     RealVector a, b, work;
@@ -116,7 +116,8 @@ ErrorCode TransformComplex(ConstComplexVector x, ConstComplexVector y, ComplexVe
     return memory.release();
 }
 
-// By the squared magnitude of one spectrum; the circular result is laid out around lag zero.
+// Uses the squared magnitude of a single spectrum; the circular result is rearranged around lag
+// zero.
 ErrorCode AutoCorrelateByTransform(ConstRealVector x, RealVector out) {
     const int32_t L = NextTransformLength(static_cast<int32_t>(out.size()));
     RealVector a, b;

@@ -14,14 +14,14 @@
 namespace qx {
 namespace {
 
-// The plans of the rows and the columns of matrices of one size.
+// The plans for the rows and the columns of matrices of one size.
 struct Plans {
     PlanReference ofRows, ofColumns;
     Plans(int32_t rows, int32_t cols) : ofRows(cols), ofColumns(rows) {}
     explicit operator bool() const { return ofRows && ofColumns; }
 };
 
-// What real and complex matrices do differently.
+// The steps in which real and complex matrices differ.
 ErrorCode Forward(const Plans &plans, const DBL *x, const MatrixRegion &region, CDB *spectrum) {
     return FFT2DRealForward(plans.ofRows.get(), plans.ofColumns.get(), x, region, 0, spectrum);
 }
@@ -39,7 +39,7 @@ ErrorCode Inverse(const Plans &plans, const CDB *spectrum, const ComplexMatrix &
 double Conjugate(double value) { return value; }
 CDB Conjugate(const CDB &value) { return {value.re, -value.im}; }
 
-// Row by row of the result: a sliding sum over the rows of the kernel that reach it.
+// Row by row of the result: a sliding sum over the rows of the kernel that contribute to it.
 template <ElementType E>
 void ConvolveDirectly2D(const ConstMatrixView<E> &big, const ConstMatrixView<E> &kernel,
                         const MatrixView<E> &out) {

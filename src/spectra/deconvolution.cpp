@@ -18,7 +18,7 @@ void CopyPadded(ConstRealVector from, RealVector to) {
     Fill(to.data() + from.size(), to.size() - from.size(), 0.0);
 }
 
-// Whether a value of the half-complex spectrum h is too small to divide by. NaN is not.
+// Whether a value of the half-complex spectrum h is too small to divide by; false for NaN.
 // kept: element k is paired with element L/2 + k, which is not its own imaginary part.
 bool IsSingular(const DBL *h, std::ptrdiff_t L) {
     const double tolerance = std::min(static_cast<double>(L) * 2.220446049250313e-16, 1e-9);
@@ -48,8 +48,8 @@ void DivideHalfComplex(DBL *g, const DBL *h, std::ptrdiff_t L) {
         g[L / 2] = g[L / 2] / h[L / 2];
 }
 
-// What the taps x give for a unit impulse, the first values: x itself and zeros after it,
-// but each sum also meets all the other taps times zero.
+// The first values of the response of the taps x to a unit impulse: x itself followed by zeros,
+// except that each sum also includes all the other taps times zero.
 void ImpulseResponse(ConstRealVector x, RealVector response) {
     std::ptrdiff_t broken = 0;
     for (const double value : x)
@@ -61,9 +61,9 @@ void ImpulseResponse(ConstRealVector x, RealVector response) {
     }
 }
 
-// By the series: with i leading zeros in y, the quotient begins at place i of the response of the
-// filter with the numerator x and the denominator y from i on. An all-zero y leaves the numerator
-// alone, and the quotient begins at place ny.
+// Division by the series: with i leading zeros in y, the quotient begins at index i of the response
+// of the filter with the numerator x and the denominator y from index i on. If y is all zeros, only
+// the numerator remains, and the quotient begins at index ny.
 ErrorCode DivideSeries(ConstRealVector x, ConstRealVector y, RealVector quotient) {
     std::ptrdiff_t zeros = 0;
     while (zeros < y.size() && y[zeros] == 0.0)

@@ -6,10 +6,10 @@
 
 namespace qx {
 
-// Finds q with x = q convolved with y, where y is not empty and not longer than x; q has nx - ny +
-// 1 values and may begin where x does. The spectra are divided, or, where that of y counts as
-// singular, the series: then leading zeros of y are skipped, and the quotient is the response of
-// the filter x / y. ErrOutOfMemory.
+// Finds q such that x is the convolution of q with y, where y is neither empty nor longer than x. q
+// has nx - ny + 1 values and may begin at the same address as x. The spectra are divided or, if
+// that of y is considered singular, the series: leading zeros of y are then skipped, and the
+// quotient is the response of the filter x / y. ErrOutOfMemory.
 ErrorCode DeconvolveReal(ConstRealVector x, ConstRealVector y, RealVector quotient);
 
 } // namespace qx

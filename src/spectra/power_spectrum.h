@@ -14,10 +14,10 @@ namespace qx {
 
 // In place; exactly symmetric.
 ErrorCode PowerSpectrumReal(DBL *x, int32_t n);
-// z holds n interleaved complex values.
+// z consists of n interleaved complex values.
 ErrorCode PowerSpectrumComplex(const DBL *z, DBL *out, int32_t n);
 
-// The output serves as the only work memory: outRe and outIm must not overlap the inputs.
+// The output serves as the only work memory, so outRe and outIm must not overlap the inputs.
 ErrorCode CrossSpectrumReal(const DBL *x, const DBL *y, int32_t inStride, int32_t n, DBL *outRe,
                             DBL *outIm, int32_t outStride);
 // Inputs and output are n interleaved complex values.

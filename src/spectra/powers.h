@@ -8,7 +8,7 @@
 
 namespace qx {
 
-// The passes of the power and cross spectra over n frequencies, behind the transforms.
+// The passes of the power and cross spectra over n frequencies, after the transforms.
 
 // power[k] = |X[k]|^2 scale, exactly symmetric, from the half-complex spectrum h. n is at least 2.
 QX_BY_WIDTH(void, PowerOfHalfComplex, (const DBL *h, int32_t n, double scale, DBL *power))

@@ -7,7 +7,7 @@
 namespace qx::QX_WIDTH {
 namespace {
 
-// The power at frequencies k onward, one for each lane, and at the opposite frequencies.
+// The power at the frequencies from k on, one per lane, and at the opposite frequencies.
 template <class L>
 void PowerPairs(const DBL *h, std::ptrdiff_t k, std::ptrdiff_t n, double scale, DBL *power) {
     const std::ptrdiff_t opposite = n - k - (L::count - 1);

@@ -24,8 +24,8 @@ CDB Quotient(const CDB &value, const CDB &a) {
 CDB Flush(const CDB &value) { return {qx::Flush(value.re), qx::Flush(value.im)}; }
 double Flush(double value) { return qx::Flush(value); }
 
-// A division by 1 gives the value itself: most filters have such an a[0], and can do without the
-// slowest of all operations in the loop that nothing else can hide.
+// Division by 1 returns the value itself. Most filters have such an a[0]; skipping the division
+// avoids the slowest operation in a loop where nothing else can hide its latency.
 bool IsOne(double a) { return a == 1.0; }
 bool IsOne(const CDB &) { return false; }
 

@@ -8,8 +8,8 @@
 
 namespace qx {
 
-// A part of a value that runs through a recursion: what is not above the smallest normal number in
-// magnitude becomes 0.0, so that a decaying response does not linger on denormals. NaN passes.
+// Flushes a part of a value in a recursion: a magnitude not above the smallest normal number
+// becomes 0.0, so that a decaying response does not linger in subnormal numbers. NaN is unchanged.
 inline double Flush(double value) {
     return std::fabs(value) <= 2.2250738585072014e-308 ? 0.0 : value;
 }
@@ -19,8 +19,8 @@ inline double Flush(double value) {
 //
 //     y[t] = flush((y[t] - a[na-1] y[t-na+1] - ... - a[1] y[t-1]) / a[0])
 //
-// in this order of subtraction. `history` holds the na - 1 values before y[0], the newest last, and
-// is brought up to date. A complex division multiplies by the conjugate of a[0] and divides by its
+// with the subtractions in this order. `history` contains the na - 1 values before y[0], newest
+// last, and is updated. A complex division multiplies by the conjugate of a[0] and divides by its
 // squared magnitude.
 template <ElementType Coefficient, ElementType Signal>
 void RunRecursion(ConstVectorView<Coefficient> a, VectorView<Signal> history, VectorView<Signal> y);

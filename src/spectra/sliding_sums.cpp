@@ -12,7 +12,7 @@ constexpr auto Complex = ElementType::CDB;
 bool IsFinite(double x) { return std::fabs(x) <= 1.7976931348623157e308; }
 bool IsFinite(const CDB &x) { return IsFinite(x.re) && IsFinite(x.im); }
 
-// Sums of this many values and more are worth lanes.
+// From this many sums on lanes pay.
 constexpr int32_t worthLanes = 4;
 
 double Term(double sum, double a, double b) { return sum + a * b; }
@@ -29,7 +29,7 @@ bool AllTapsFinite(const SlidingJob<Code> &job) {
     return finite;
 }
 
-// One sum after the other, in the ends of the signal no further than it goes.
+// One sum after another; at the ends of the signal only as far as the signal goes.
 template <ElementType Code>
 void OneByOne(const SlidingJob<Code> &job) {
     for (std::ptrdiff_t t = job.count - 1; t >= 0; --t) {
@@ -47,7 +47,7 @@ void OneByOne(const SlidingJob<Code> &job) {
     }
 }
 
-// Outputs from `from` up to `to` of a job.
+// The outputs `from` to `to` - 1 of a job.
 template <ElementType Code>
 SlidingJob<Code> Part(SlidingJob<Code> job, int64_t from, int64_t to) {
     job.first += from;
@@ -65,7 +65,7 @@ void Slide(const SlidingJob<Code> &job) {
         return OneByOne(job);
     if (AllTapsFinite(job))
         return InLanes(job);
-    // From the last output to the first, as an output on the signal demands.
+    // From the last output to the first, as required if the output overlaps the signal.
     const int64_t from = std::clamp<int64_t>(-job.first, 0, job.count);
     const int64_t to =
         std::clamp<int64_t>(job.length - job.tapCount + 1 - job.first, from, job.count);

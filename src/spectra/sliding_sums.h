@@ -9,15 +9,16 @@
 
 namespace qx {
 
-// Sums of products over a window that slides along a signal: the inside of every direct
-// convolution, correlation and FIR filter,
+// Sums of products over a window that slides along a signal: the core of every direct convolution,
+// correlation and FIR filter,
 //
 //     out[t] = 0.0 + taps[0] signal[first + t] + taps[1] signal[first + t + 1] + ...
 //
 // with the terms added in this order. Taps, signal and output each have a step, which may be
-// negative; an order of summation that walks the other way is a matter of steps. Terms beyond the
-// ends of the signal are left out. A job of several segments adds the sums over rows of taps and of
-// signals, one row after the other. The output may lie on the signal if none of the windows that
+// negative; to sum in the opposite order, the caller negates steps. Terms beyond the ends of the
+// signal are omitted. A job of several segments adds the sums over rows of taps and of signals, one
+// row after the other. The output may overlap the signal if no window that begins at t or before
+// contains the place of out[t], except as its own last value.
 // begin at t or before holds the place of out[t], its own last value excepted.
 //
 // A complex term a b adds (a.re b.re - a.im b.im) to the real sum and (a.im b.re + a.re b.im) to
@@ -50,8 +51,8 @@ struct SlidingJob {
 void SlidingSums(const SlidingJob<ElementType::DBL> &job);
 void SlidingSums(const SlidingJob<ElementType::CDB> &job);
 
-// The same in lanes. Zeros stand for what lies beyond the signal, so that the taps must be finite
-// if a window reaches there: 0 times such a tap adds nothing to a sum that began with 0.0.
+// The same in lanes. Zeros are used beyond the ends of the signal, so the taps must be finite if a
+// window extends there: 0 times a finite tap adds nothing to a sum that starts with 0.0.
 QX_BY_WIDTH(void, SlidingSumsInLanes, (const SlidingJob<ElementType::DBL> &job))
 QX_BY_WIDTH(void, ComplexSlidingSumsInLanes, (const SlidingJob<ElementType::CDB> &job))
 

@@ -1,19 +1,19 @@
 #include "frame/lanes.h"
 #include "spectra/sliding_sums.h"
 
-// Each lane runs along a stretch of outputs of its own, `stretch` outputs away from its neighbour.
-// The signal is laid out accordingly beforehand, once per tile: vector i holds, for each lane, the
-// value i places after the start of the lane's first window. Then output p of all lanes takes tap k
-// from vector p + k: whole vectors at aligned addresses, several sums at once in registers, and
-// each vector that is read serves two taps.
+// Each lane computes its own stretch of outputs, `stretch` outputs away from that of its neighbour.
+// The signal is rearranged accordingly beforehand, once per tile: vector i contains, for each lane,
+// the value i places after the start of the lane's first window. Output p of all lanes then takes
+// tap k from vector p + k: whole vectors at aligned addresses, several sums together in registers,
+// and each vector that is loaded serves two taps.
 namespace qx::QX_WIDTH {
 namespace {
 
 typedef Lanes<nativeLanes> L;
 constexpr int lanes = nativeLanes;
 
-// What one tile holds: outputs of one lane, and taps. Both in all, the signal of a tile takes 16
-// KiB with four lanes.
+// The outputs of one lane and the taps in one tile. In total, the signal of a tile takes 16 KiB
+// with four lanes.
 constexpr int tileOutputs = 240;
 constexpr int tileTaps = 256;
 
@@ -24,7 +24,7 @@ struct RealSums {
 };
 struct ComplexSums {
     static constexpr auto code = ElementType::CDB;
-    static constexpr int parts = 2; // real parts in even places, imaginary parts in odd ones
+    static constexpr int parts = 2; // real parts at even places, imaginary parts at odd ones
     static constexpr int together = 4;
 };
 
@@ -49,7 +49,7 @@ inline void Take(const double *place, CDB *value) {
     value->im = place[lanes];
 }
 
-// Rows and columns of a square of values exchanged.
+// Transposes a square of values.
 inline void Transpose(L (&v)[lanes]) {
 #ifdef __AVX__
     const auto low01 = __builtin_shufflevector(v[0].v, v[1].v, 0, 4, 2, 6);
@@ -67,7 +67,7 @@ inline void Transpose(L (&v)[lanes]) {
 #endif
 }
 
-// The values i .. i + lanes - 1 of a sequence of step 1 or -1.
+// The values i .. i + lanes - 1 of a sequence with step 1 or -1.
 inline L LoadSome(const DBL *at, std::ptrdiff_t step, std::ptrdiff_t i) {
     return step == 1 ? L::load(at + i) : L::load(at - i - (lanes - 1)).reversed();
 }
@@ -78,7 +78,7 @@ inline void StoreSome(L values, DBL *at, std::ptrdiff_t step, std::ptrdiff_t i) 
         values.reversed().store(at - i - (lanes - 1));
 }
 
-// A stretch of signal to be laid out: lane l begins at index begin + l stretch.
+// A stretch of signal to be rearranged: lane l begins at index begin + l stretch.
 template <ElementType Code>
 struct Rows {
     const typename Element<Code>::type *signal;
@@ -87,7 +87,7 @@ struct Rows {
     int stretch;
 };
 
-// Where the vectors begin and end that squares can lay out: all lanes lie on the signal.
+// The range of vectors that can be rearranged in squares, where all lanes lie on the signal.
 struct Range {
     int from, to;
 };
@@ -133,7 +133,7 @@ void LayOutOneByOne(const Rows<Sums::code> &rows, Range range, double *vectors) 
     }
 }
 
-// Lays out `count` vectors.
+// Rearranges `count` vectors.
 template <class Sums>
 void LayOut(const Rows<Sums::code> &rows, int count, double *vectors) {
     const Range squares = SquaresOf(rows, count);
@@ -153,7 +153,7 @@ inline void SumTaps(RealSums, const double *vectors, const double *tap, int taps
         const L first(tap[k]);
         const L second(tap[k + 1]);
         const double *v = vectors + k * lanes;
-        // g++ would keep vectors for the next round, and run out of registers.
+        // g++ would keep vectors for the next iteration and run out of registers.
         asm("" : "+r"(v));
         sum[0] = sum[0] + first * L::load(v);
 #pragma GCC unroll 16
@@ -232,7 +232,7 @@ void StoreSums(const SlidingJob<Sums::code> &job, int64_t start, int stretch, in
     }
 }
 
-// The taps from `tap` on that one tile takes, all of one row.
+// Adds the taps from `tap` on that fit into one tile, all of one row.
 template <class Sums>
 void AddTaps(const SlidingJob<Sums::code> &job, std::ptrdiff_t row, int32_t tap, int taps,
              int64_t start, int stretch, Tile<Sums> &tile) {
@@ -248,7 +248,7 @@ void AddTaps(const SlidingJob<Sums::code> &job, std::ptrdiff_t row, int32_t tap,
                 tile.sums + p * Sums::parts * lanes);
 }
 
-// Outputs start .. start + count - 1, at most those of one tile.
+// Computes outputs start .. start + count - 1, at most those of one tile.
 template <class Sums>
 void RunTile(const SlidingJob<Sums::code> &job, int64_t start, int64_t count, Tile<Sums> &tile) {
     const int needed = static_cast<int>((count + lanes - 1) / lanes);
@@ -264,7 +264,7 @@ void RunTile(const SlidingJob<Sums::code> &job, int64_t start, int64_t count, Ti
     StoreSums<Sums>(job, start, stretch, count, tile.sums);
 }
 
-// From the last tile to the first, each read as a whole before it is written.
+// From the last tile to the first; each is read completely before it is written.
 template <class Sums>
 void RunTiles(const SlidingJob<Sums::code> &job) {
     Tile<Sums> tile;

@@ -4,7 +4,7 @@
 namespace qx::QX_WIDTH {
 namespace {
 
-// Frequencies k onward, one for each lane, and the places of their imaginary parts.
+// The frequencies from k on, one per lane, and the indices of their imaginary parts.
 template <class N>
 struct Pairs {
     std::ptrdiff_t k, opposite;

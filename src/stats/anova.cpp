@@ -15,7 +15,7 @@ namespace qx {
 
 namespace {
 
-// Upper tail of a distribution's status and value.
+// Status and upper tail of a distribution.
 template <class Distribution>
 ErrorCode UpperTail(Distribution distribution, double *p) {
     double below;
@@ -25,7 +25,7 @@ ErrorCode UpperTail(Distribution distribution, double *p) {
     return status;
 }
 
-// The sums of a table of counts, over its rows, its columns and all of it.
+// The sums of a table of counts, over its rows, over its columns and over all.
 struct TableSums {
     ErrorCode add(const ConstMatrixView<ElementType::I32> &table) {
         if (const ErrorCode status =
@@ -67,7 +67,7 @@ ErrorCode ContingencyTest(const ConstMatrixView<ElementType::I32> &table, DBL *c
             statistic += difference * difference / expected;
         }
     *chiSquare = statistic;
-    // A table of 2^31 degrees of freedom cannot be held.
+    // A table with 2^31 degrees of freedom would not fit into memory.
     const int32_t dof = static_cast<int32_t>(int64_t{rows - 1} * (cols - 1));
     double upper = 0.0;
     ErrorCode status =
@@ -137,7 +137,7 @@ ErrorCode ContingencyTail(const ConstMatrixView<ElementType::I32> &table, DBL *c
         }
     statistic = statistic / Extended{sums.total, 0.0};
     *chiSquare = statistic.high;
-    // An empty row or column makes the statistic NaN, which has no tail.
+    // An empty row or column makes the statistic NaN, and so there is no tail.
     const double dof = static_cast<double>(rows - 1) * (cols - 1);
     *p = std::isnan(*chiSquare) ? kNaN
                                 : ChiSquareValue(*chiSquare, dof, DistributionValue::Survival);
@@ -146,7 +146,7 @@ ErrorCode ContingencyTail(const ConstMatrixView<ElementType::I32> &table, DBL *c
 
 namespace {
 
-// y[i] - y[0] times a power of 2, with which no square overflows or vanishes.
+// y[i] - y[0] times a power of 2 with which no square overflows or underflows.
 class ScaledDifferences {
 public:
     explicit ScaledDifferences(ConstRealVector y) : y_(y) {
@@ -172,7 +172,7 @@ struct SumsOfSquares {
     Extended between, error;
 };
 
-// `sums` has a pair of elements for each level, the parts of its sum and then of its mean.
+// `sums` has a pair of elements for each level: the two parts of its sum, later of its mean.
 SumsOfSquares SquaresAboutMeans(const ScaledDifferences &differences,
                                 ConstVectorView<ElementType::I32> labels, Levels &levels,
                                 Scratch<ElementType::DBL> &sums) {

@@ -6,7 +6,7 @@
 
 namespace qx {
 
-// Pearson's test of independence on a table of counts. NaN where a row or a column is empty.
+// Pearson's test of independence on a table of counts. NaN if a row or a column is empty.
 // ErrTableTooSmall, ErrTableNegativeSize (a cell), ErrOutOfMemory.
 ErrorCode ContingencyTest(const ConstMatrixView<ElementType::I32> &table, DBL *chiSquare, DBL *p);
 
@@ -14,7 +14,8 @@ struct OneWayTable {
     double ssBetween, msBetween, f, p, ssError, msError, ssTotal, fCritical;
 };
 
-// One-way analysis of variance of observations with integer labels, one for each, on k levels.
+// One-way analysis of variance of observations with integer labels, one label per observation, on k
+// levels.
 // kept: the sums of squares are differences of large sums from a single pass. With a mean of m
 // standard deviations about 2 log10(m) of the sixteen digits are lost, and ssError can come out
 // slightly negative.
@@ -23,13 +24,13 @@ struct OneWayTable {
 ErrorCode OneWayAnova(ConstRealVector y, ConstVectorView<ElementType::I32> labels, int32_t k,
                       double alpha, OneWayTable *result);
 
-// The revisions. The statistic from exact O total - (row sum)(column sum), in twice the precision, and
-// its probability from the upper tail.
+// The revisions. The statistic is computed from exact O total - (row sum)(column sum), in twice the
+// precision, and its probability from the upper tail.
 ErrorCode ContingencyTail(const ConstMatrixView<ElementType::I32> &table, DBL *chiSquare, DBL *p);
 
 // Two passes over differences to one observation, of data scaled by a power of 2, in twice the
-// precision: the sums of squares are the exact ones rounded. One below 2^-90 of the sum of squares
-// of the differences is taken as 0, which it is in truth.
+// precision: the sums of squares are the exact ones, rounded. A sum of squares below 2^-90 of that
+// of the differences is set to 0, which is its true value.
 ErrorCode OneWayAnovaByDifferences(ConstRealVector y, ConstVectorView<ElementType::I32> labels,
                                    int32_t k, double alpha, OneWayTable *result);
 

@@ -7,7 +7,8 @@ namespace qx {
 
 namespace {
 
-// base^exponent by squaring, exponent at least 1. The order of the products is part of the
+// base^exponent by repeated squaring, exponent at least 1. The order of the products is part of the
+// result.
 // result.
 double Power(double base, int32_t exponent) {
     while (exponent % 2 == 0) {
@@ -66,7 +67,7 @@ ErrorCode ArrayMSE(ConstRealVector x, ConstRealVector y, DBL *mse) {
         return ErrEmptyInput;
     double sum = 0.0;
     for (std::ptrdiff_t i = 0; i < m; ++i) {
-        // kept: expanded, not a squared difference
+        // kept: expanded, not the square of a difference
         const double t = y[i] * (y[i] - 2.0 * x[i]);
         sum += x[i] * x[i] + t;
     }

@@ -6,9 +6,9 @@
 
 namespace qx {
 
-// One number from one array. Every sum runs from the first element to the last in one double
-// accumulator that starts at 0; NaN and infinity propagate. n is the number of elements;
-// ErrEmptyInput where there is none.
+// Each function computes one number from an array. Every sum runs from the first element to the
+// last in one double accumulator that starts at 0; NaN and infinity propagate. n is the number of
+// elements; ErrEmptyInput if it is 0.
 
 // sum(x) / n.
 ErrorCode ArrayMean(ConstRealVector x, DBL *mean);

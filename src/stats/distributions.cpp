@@ -9,10 +9,10 @@ namespace qx {
 
 namespace {
 
-// A NaN is not refused.
+// NaN is not refused.
 bool IsNoProbability(double p) { return p < 0.0 || p > 1.0; }
 
-// A probability of 0 or 1 has its quantile at once: the lower end of the range, or +infinity.
+// A probability of 0 or 1 has a known quantile: the lower end of the range, or +infinity.
 bool IsCertain(double p, double lowerEnd, DBL *quantile) {
     if (p != 0.0 && p != 1.0)
         return false;
@@ -20,9 +20,9 @@ bool IsCertain(double p, double lowerEnd, DBL *quantile) {
     return true;
 }
 
-// The point where the distribution reaches p, from below, within 1e-4. A NaN probability is
-// reached everywhere, so that the lower end of the bracket remains.
-// kept: the tolerance is absolute for every scale of the answer
+// The point at which the distribution reaches p, from below, within 1e-4. For a NaN probability
+// every point counts as reached, so the result is the lower end of the bracket.
+// kept: the tolerance is absolute, whatever the scale of the result
 template <class Distribution>
 double Bisect(double p, double lo, double hi, Distribution distribution) {
     do {
@@ -121,7 +121,7 @@ ErrorCode FisherQuantile(double p, int32_t n, int32_t d, DBL *f) {
 }
 
 ErrorCode ChiSquareQuantile(double p, int32_t dof, DBL *x) {
-    // kept: in this one the probability is tested before the degrees of freedom
+    // kept: here the probability is tested before the degrees of freedom
     if (IsNoProbability(p))
         return ErrProbabilityOutOfRange;
     if (dof < 1)

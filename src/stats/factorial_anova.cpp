@@ -19,7 +19,7 @@ Extended Whole(double x) { return {x, 0.0}; }
 Extended Square(Extended x) { return x * x; }
 
 // A subset of the factors is a set of bits. Its cells are the combinations of its factors' levels,
-// the last factor fastest; the tables of all subsets lie one behind the other.
+// with the last factor varying fastest; the tables of all subsets are stored one after the other.
 class Layout {
 public:
     explicit Layout(const FactorialDesign &design) : factors_(design.factors) {
@@ -46,7 +46,7 @@ public:
     int64_t degrees(int subset) const { return degrees_[subset]; }
     int64_t size() const { return start_[all()] + cells_[all()]; } // of all tables together
 
-    // Where the table of `subset` has the cell with these levels.
+    // The index of the cell with these levels in the table of `subset`.
     std::ptrdiff_t place(int subset, const int32_t *level) const {
         int64_t cell = 0;
         for (int i = 0; i < factors_; ++i)
@@ -78,7 +78,7 @@ private:
     int64_t cells_[maxSubsets] = {}, degrees_[maxSubsets] = {}, start_[maxSubsets] = {};
 };
 
-// Scratch memory starts at any byte, so the numbers are kept as pairs of elements.
+// Scratch memory starts at any byte, so the numbers are stored as pairs of elements.
 class ExtendedTable {
 public:
     ErrorCode allocate(int64_t count) {
@@ -98,7 +98,7 @@ private:
     Scratch<ElementType::DBL> elements_;
 };
 
-// The cell of each observation. ErrAnovaFactorEmpty, ErrAnovaCellCount, ErrOutOfMemory.
+// Finds the cell of each observation. ErrAnovaFactorEmpty, ErrAnovaCellCount, ErrOutOfMemory.
 ErrorCode AssignCells(const FactorialDesign &design, const Layout &layout,
                       Scratch<ElementType::I32> &cellOf) {
     if (const ErrorCode failed = cellOf.allocate(design.n()))
@@ -134,14 +134,14 @@ ErrorCode AssignCells(const FactorialDesign &design, const Layout &layout,
     return 0;
 }
 
-// The data times a power of 2, so that squares of their differences neither overflow nor vanish.
+// The data times a power of 2 with which squares of differences neither overflow nor underflow.
 class ScaledData {
 public:
     explicit ScaledData(const FactorialDesign &design) : y_(design.y) {
         double least = y_[0];
         double largest = y_[0];
         for (int32_t k = 1; k < design.n(); ++k) {
-            const double value = y_[k]; // whose address is aligned, unlike an element's
+            const double value = y_[k]; // its address is aligned, unlike that of an element
             least = std::min(least, value);
             largest = std::max(largest, value);
         }
@@ -153,9 +153,9 @@ public:
         spread_ = largest * scale_ - least * scale_;
     }
     double at(std::ptrdiff_t k) const { return y_[k] * scale_; }
-    // From the first observation, exact.
+    // The difference from the first observation, exact.
     Extended shifted(double scaled) const { return ExactSum(scaled, -at(0)); }
-    double spread() const { return spread_; } // from the least to the largest
+    double spread() const { return spread_; } // largest minus smallest
     double unscaledSquare(double x) const { return x / scale_ / scale_; }
 
 private:
@@ -165,13 +165,13 @@ private:
 };
 
 struct SumsOfSquares {
-    Extended effect[maxSubsets]; // by subset of the factors
+    Extended effect[maxSubsets]; // indexed by the subset of the factors
     Extended error;
     Extended total;
 };
 
-// The mean of each cell: that of the differences to an observation of the cell, which is exactly 0
-// where all are equal. ErrOutOfMemory.
+// The mean of each cell: that of the differences from an observation of the cell, which is exactly
+// 0 if all are equal. ErrOutOfMemory.
 ErrorCode CellMeans(const FactorialDesign &design, const Layout &layout, const ScaledData &data,
                     const Scratch<ElementType::I32> &cellOf, ExtendedTable &means) {
     Scratch<ElementType::DBL> first;
@@ -189,7 +189,7 @@ ErrorCode CellMeans(const FactorialDesign &design, const Layout &layout, const S
     return 0;
 }
 
-// The means over all other subsets from those of the cells.
+// The means for all other subsets, from those of the cells.
 void MarginalMeans(const Layout &layout, ExtendedTable &means) {
     const int all = layout.all();
     layout.forEachCell(all, [&](const int32_t *level) {
@@ -205,8 +205,8 @@ void MarginalMeans(const Layout &layout, ExtendedTable &means) {
     }
 }
 
-// The sum of squares of the effects of a subset of factors: a mean less all effects of lower order
-// is an alternating sum of means.
+// The sum of squares of the effects of a subset of factors. An effect, which is a mean minus all
+// effects of lower order, is an alternating sum of means.
 Extended EffectSquares(const Layout &layout, const ExtendedTable &means, int subset) {
     Extended sum = Whole(0.0);
     layout.forEachCell(subset, [&](const int32_t *level) {
@@ -225,7 +225,7 @@ Extended EffectSquares(const Layout &layout, const ExtendedTable &means, int sub
     return sum;
 }
 
-// 0 where deviations of this root mean square are rounding errors of twice the precision.
+// 0 if deviations with this root mean square are rounding errors of twice the precision.
 Extended WithoutRounding(Extended sum, int32_t n, double spread) {
     const double deviation = n * 0x1p-100 * spread;
     return sum.high <= n * (deviation * deviation) ? Whole(0.0) : sum;
@@ -271,8 +271,8 @@ MeanSquare MeanOf(Extended sum, int64_t degrees) {
     return {sum / Whole(count), count};
 }
 
-// a + b - c with the degrees of freedom of F. E. Satterthwaite; 0 where nothing but rounding errors
-// is left or less.
+// a + b - c with the degrees of freedom of F. E. Satterthwaite; 0 if only rounding errors are left,
+// or if it is negative.
 MeanSquare Combined(const MeanSquare &a, const MeanSquare &b, const MeanSquare &c) {
     const Extended value = a.value + b.value - c.value;
     if (!(value.high > 0x1p-60 * (a.value.high + b.value.high + c.value.high)))
@@ -285,17 +285,18 @@ MeanSquare Combined(const MeanSquare &a, const MeanSquare &b, const MeanSquare &
     return {value, 1.0 / reciprocal};
 }
 
-// The mean squares of a table and what tests them.
+// The mean squares of a table, and the denominators of their tests.
 struct MeanSquares {
     MeanSquare effect[maxSubsets];
     MeanSquare error;
     int factors;
     int random; // the random factors as a subset
 
-    // What has the expectation that the effect's mean square has without the effect. In the
-    // unrestricted model this is the error and a component for each larger subset with a random
-    // factor. Of these the subsets with one factor more decide: none (all factors are fixed), one,
-    // or two, which both contain the components of the whole.
+    // The mean square whose expectation is that of the effect's mean square in the absence of the
+    // effect. In the unrestricted model it consists of the error and a component for each larger
+    // subset with a random factor. It is determined by the number of such subsets with one factor
+    // more: none (all factors are fixed), one, or two. With two, both contain the component of the
+    // whole set.
     MeanSquare denominator(int subset) const {
         int larger[2] = {};
         int count = 0;
@@ -362,7 +363,7 @@ ErrorCode FactorialAnova(const FactorialDesign &design, const double *significan
     if (const ErrorCode failed = SquareDeviations(design, layout, data, cellOf, &sums))
         return failed;
 
-    // With one observation per cell the highest interaction is the error.
+    // With one observation per cell the highest interaction serves as the error.
     const bool isReplicated = design.observations > 1;
     const int tested = isReplicated ? layout.subsets() : layout.all();
     MeanSquares squares = {};
@@ -382,7 +383,7 @@ ErrorCode FactorialAnova(const FactorialDesign &design, const double *significan
         source.degrees = degrees;
         return source;
     };
-    // The main effects first, then the interactions of two factors.
+    // Main effects first, then the interactions of two factors.
     static constexpr int orderOfTwo[] = {1, 2, 3};
     static constexpr int orderOfThree[] = {1, 2, 4, 3, 5, 6, 7};
     const int *order = design.factors == 2 ? orderOfTwo : orderOfThree;

@@ -14,34 +14,34 @@ struct Factor {
     bool isRandom;
 };
 
-// Observations in crossed factors: their number is the product of the levels and the observations
+// Observations in crossed factors. Their number is the product of the levels times the observations
 // per cell.
 struct FactorialDesign {
     ConstRealVector y;
-    int32_t observations; // per cell; 1 only where all factors are fixed
+    int32_t observations; // per cell; 1 only if all factors are fixed
     int factors;          // 2 or 3
     Factor factor[maxFactors];
 
     int32_t n() const { return static_cast<int32_t>(y.size()); }
 };
 
-// NaN where the source has no such number.
+// NaN if the source has no such number.
 struct AnovaSource {
     double sumOfSquares, degrees, meanSquare, f, p, denominatorDegrees, critical;
 };
 
-// A, B, AB, error, total; or A, B, C, AB, AC, BC, ABC, error, total.
+// The sources A, B, AB, error, total; or A, B, C, AB, AC, BC, ABC, error, total.
 struct FactorialTable {
     int sources;
     AnovaSource source[9];
 };
 
 // Analysis of variance of a balanced design with two or three factors (unrestricted model). Every
-// deviation is formed in twice the precision from the exact differences to one observation, so the
-// results have the digits of the data whatever their mean. Critical values where `significance` is
-// not null.
-// ErrAnovaFactorEmpty (other labels in number than levels), ErrAnovaCellCount, ErrNaNInData,
-// ErrBadSignificance, ErrAnovaDesign (a denominator is not above 0), ErrOutOfMemory.
+// deviation is computed in twice the precision from the exact differences to one observation, so
+// that the results are as accurate as the data, whatever their mean. Critical values are computed
+// if `significance` is not null.
+// ErrAnovaFactorEmpty (the number of labels is not that of the levels), ErrAnovaCellCount,
+// ErrNaNInData, ErrBadSignificance, ErrAnovaDesign (a denominator is not above 0), ErrOutOfMemory.
 ErrorCode FactorialAnova(const FactorialDesign &design, const double *significance,
                          FactorialTable *table);
 

@@ -6,7 +6,7 @@ namespace qx {
 
 namespace {
 
-// 1, or a power of two, which rounds nothing, for ranges at the ends of the exponents.
+// 1, or a power of two, which causes no rounding, for ranges at the ends of the range of exponents.
 double UnitOfRange(double min, double max, int32_t bins) {
     if (std::isinf(max - min))
         return std::isinf(max) || std::isinf(min) ? 1.0 : 0x1p-2;
@@ -20,7 +20,7 @@ void Clear(VectorView<ElementType::I32> counts) {
 
 } // namespace
 
-// Everything in units in which the range and its reciprocal stay finite.
+// All members are in units in which the range and its reciprocal are finite.
 EqualBins::EqualBins(double min, double max, int32_t bins)
     : max_(max), unit_(UnitOfRange(min, max, bins)), low_(min * unit_), bins_(bins) {
     const double range = max * unit_ - low_;
@@ -86,7 +86,7 @@ ErrorCode GeneralHistogram(ConstRealVector x, const PackedInterval *interval,
                 ++counts[j];
                 isPlaced = true;
             } else if (j == 0 && position < 0) {
-                // Only the first interval decides that a sample lies below all.
+                // Only the first interval decides whether a sample lies below all of them.
                 ++summary->outside;
                 ++summary->below;
                 break;

@@ -14,8 +14,8 @@ struct Level {
     I32 count;
 };
 
-// The levels of a factor in the order of their first appearance, with a hash table of their places:
-// open addressing, at most half of it taken.
+// The levels of a factor in the order of their first appearance, with a hash table of their
+// indices: open addressing, at most half full.
 class Levels {
 public:
     ErrorCode reserve(int32_t limit) {
@@ -32,15 +32,15 @@ public:
         return 0;
     }
 
-    // The level of a label, opened if it is new; null beyond the limit.
+    // The level of a label, created if it is new; null beyond the limit.
     Level *find(int32_t label) {
         const int32_t place = placeOf(label);
         return place < 0 ? nullptr : &at(place);
     }
-    // The same as its place; -1 beyond the limit.
+    // The same, as an index; -1 beyond the limit.
     int32_t placeOf(int32_t label) {
         for (uint32_t slot = Hash(label) & mask_;; slot = (slot + 1) & mask_) {
-            I32 &place = places_[static_cast<std::ptrdiff_t>(slot)]; // counts from 1, 0 is free
+            I32 &place = places_[static_cast<std::ptrdiff_t>(slot)]; // counts from 1; 0 means free
             if (place == 0) {
                 if (count_ == limit_)
                     return -1;
@@ -58,7 +58,8 @@ public:
     ErrorCode release() { return Merge(levels_.release(), places_.release()); }
 
 private:
-    // The finaliser of MurmurHash3 (A. Appleby): every bit of the label moves every bit.
+    // The finaliser of MurmurHash3 (A. Appleby): every bit of the label affects every bit of the
+    // hash.
     static uint32_t Hash(int32_t label) {
         uint32_t h = static_cast<uint32_t>(label);
         h = (h ^ (h >> 16)) * 0x85ebca6bu;

@@ -10,13 +10,13 @@ namespace qx {
 
 namespace {
 
-// The elements of rank n / 2 - 1 and n / 2; the lower one counts for even n only.
+// The elements of rank n / 2 - 1 and n / 2; the lower one is used only for even n.
 struct Middle {
     double lower, upper;
 };
 
 bool HasNaN(ConstRealVector x) {
-    constexpr std::ptrdiff_t block = 256; // whole blocks take no branch per element
+    constexpr std::ptrdiff_t block = 256; // whole blocks need no branch per element
     const std::ptrdiff_t n = x.size();
     std::ptrdiff_t i = 0;
     for (; n - i >= block; i += block) {
@@ -32,7 +32,7 @@ bool HasNaN(ConstRealVector x) {
     return false;
 }
 
-// Ranks k - 1 and k, k at least 1 unless there is one element.
+// The elements of ranks k - 1 and k; k is at least 1 unless there is only one element.
 Middle SelectPair(RealVector a, int32_t k) {
     SelectKth(a, k);
     double lower = a[0];
@@ -43,7 +43,7 @@ Middle SelectPair(RealVector a, int32_t k) {
 
 // Fills the sample with elements of x from random places.
 void TakeSample(ConstRealVector x, RealVector sample) {
-    uint32_t random = 1; // linear congruences (D. Knuth, The Art of Computer Programming 2, 1981)
+    uint32_t random = 1; // linear congruential (D. Knuth, The Art of Computer Programming 2, 1981)
     const auto n = static_cast<uint64_t>(x.size());
     for (std::ptrdiff_t i = 0; i < sample.size(); ++i) {
         random = random * 1664525U + 1013904223U;
@@ -51,9 +51,9 @@ void TakeSample(ConstRealVector x, RealVector sample) {
     }
 }
 
-// Brackets the middle between two elements of a sample, so that one pass over x leaves a few
-// elements to select from (R. Floyd, R. Rivest: Expected time bounds for selection, 1975). False
-// where the middle lies outside the bracket, or is a zero whose sign the order decides.
+// Brackets the middle between two elements of a sample, so that one pass over x leaves only a few
+// elements to select from (R. Floyd, R. Rivest: Expected time bounds for selection, 1975). Returns
+// false if the middle is outside the bracket, or is a zero whose sign depends on the order.
 bool FindByBracket(ConstRealVector x, RealVector work, Middle *middle) {
     const auto n = static_cast<int32_t>(x.size());
     const int32_t k = n / 2;
@@ -61,7 +61,7 @@ bool FindByBracket(ConstRealVector x, RealVector work, Middle *middle) {
     while (std::sqrt(double{1} * sampleSize) * sampleSize < n) // n to the power of 2/3
         sampleSize *= 2;
     TakeSample(x, work.part(0, sampleSize));
-    // The middle is this near to that of the sample in 99 of 100 random arrays.
+    // In 99 of 100 random arrays the middle is within this distance of the middle of the sample.
     const auto gap = static_cast<int32_t>(1.3 * std::sqrt(double{1} * sampleSize)) + 1;
     SelectKth(work.part(0, sampleSize), sampleSize / 2 + gap);
     const double high = work[sampleSize / 2 + gap];
@@ -73,8 +73,8 @@ bool FindByBracket(ConstRealVector x, RealVector work, Middle *middle) {
     int32_t negativeZeros = 0;
     for (int32_t i = 0; i < n; ++i) {
         const double value = x[i];
-        // Always stored and only sometimes kept: no branch. All n are inside at most, so the last
-        // place is written by the last element at the latest.
+        // Always stored and only sometimes kept, to avoid a branch. At most all n are inside, so
+        // the last place is written by the last element at the latest.
         work[inside] = value;
         below += value < low;
         inside += (value >= low) & (value <= high);
@@ -88,8 +88,8 @@ bool FindByBracket(ConstRealVector x, RealVector work, Middle *middle) {
     return middle->upper != 0.0 || negativeZeros == 0;
 }
 
-// Of elements that fall from place `fall` on and rise before: binary search for how many of the k
-// smallest are at the left end; the others are at the right end.
+// For elements that rise up to index `fall` and fall from there on: binary search for how many of
+// the k smallest are at the left end; the others are at the right end.
 Middle MiddleOfRiseAndFall(ConstRealVector x, std::ptrdiff_t fall) {
     const std::ptrdiff_t n = x.size(), k = n / 2;
     std::ptrdiff_t left = std::max<std::ptrdiff_t>(0, k - (n - fall));
@@ -100,7 +100,7 @@ Middle MiddleOfRiseAndFall(ConstRealVector x, std::ptrdiff_t fall) {
         else
             end = i;
     }
-    const std::ptrdiff_t right = n - (k - left); // the first of those at the right end
+    const std::ptrdiff_t right = n - (k - left); // index of the first one at the right end
     Middle middle = {-kInfinity, kInfinity};
     if (left > 0)
         middle.lower = x[left - 1];
@@ -113,8 +113,8 @@ Middle MiddleOfRiseAndFall(ConstRealVector x, std::ptrdiff_t fall) {
     return middle;
 }
 
-// Monotone data, and those that rise and then fall, need no selection; false for others, and for a
-// zero as above.
+// Monotone data, and data that rise and then fall, need no selection. Returns false for other data,
+// and for a zero as above.
 bool ReadOff(ConstRealVector x, Middle *middle) {
     const std::ptrdiff_t n = x.size(), k = n / 2;
     if (n < 2)

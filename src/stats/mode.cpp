@@ -11,11 +11,11 @@ namespace qx {
 
 namespace {
 
-// A growing list of modes at the front of a block that is still being read further back.
+// A growing list of modes at the front of a block whose later part is still being read.
 struct ModeList {
     DBL *values;
-    int32_t best;  // how often they occur
-    int32_t count; // of modes
+    int32_t best;  // how often each of them occurs
+    int32_t count; // number of modes
 
     void offer(double value, int32_t occurrences) {
         if (occurrences < best)
@@ -30,7 +30,7 @@ struct ModeList {
 
 typedef Scratch<ElementType::DBL> Values;
 
-// Keeps the modes at the front of their block, or nothing where none occurs more than once.
+// Keeps the modes at the front of their block, or none if none occurs more than once.
 ErrorCode KeepModes(const ModeList &list, Values &modes, int32_t *count) {
     if (list.best <= 1)
         return modes.release();
@@ -46,8 +46,8 @@ ErrorCode SingleMode(double value, Values &modes, int32_t *count) {
     return 0;
 }
 
-// Of bins that outnumber the samples by far only those that hold any are kept: their numbers take
-// the place of the samples, and the centres of the fullest that of their numbers.
+// If the bins far outnumber the samples, only nonempty bins are stored: their numbers replace the
+// samples, and the centres of the fullest bins replace their numbers.
 ErrorCode SparselyBinnedMode(ConstRealVector x, const EqualBins &bins, Values &modes,
                              int32_t *count) {
     const auto n = static_cast<int32_t>(x.size());
@@ -62,7 +62,7 @@ ErrorCode SparselyBinnedMode(ConstRealVector x, const EqualBins &bins, Values &m
         const double bin = a[i];
         for (run = 1; i + run < n && a[i + run] == bin; ++run) {
         }
-        if (run > 1 && bin >= 0.0) // -1 is no bin
+        if (run > 1 && bin >= 0.0) // -1 is not a bin
             list.offer(bin, run);
     }
     EqualBins::Centre centre(bins);
@@ -75,7 +75,7 @@ ErrorCode SparselyBinnedMode(ConstRealVector x, const EqualBins &bins, Values &m
     return KeepModes(list, modes, count);
 }
 
-// kept: as many as have centres in a block of memory, although none is taken for them
+// kept: the number of centres that fit into a block of memory, although no such block is allocated
 constexpr int32_t mostIntervals = std::numeric_limits<int32_t>::max() / int32_t{sizeof(DBL)};
 
 ErrorCode BinnedMode(ConstRealVector x, int32_t intervals, Values &modes, int32_t *count) {
@@ -109,11 +109,11 @@ ErrorCode ExactMode(ConstRealVector x, Values &modes, int32_t *count) {
     const auto n = static_cast<int32_t>(x.size());
     if (const ErrorCode failed = modes.allocate(n))
         return failed;
-    DBL *const a = modes.data(); // auto would drop the alignment
+    DBL *const a = modes.data(); // auto would drop the alignment attribute
     SortNaNsFirst(x, SortOrder::Ascending, {a, n});
     if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * kEpsilon)
         return KeepModes({a, n, 1}, modes, count);
-    // NaNs stand at the front; each ends its run at once, since it compares false.
+    // NaNs are at the front; each is a run of its own, because it compares false.
     ModeList list = {a, 1, 0};
     for (int32_t i = 0; i < n;) {
         const double value = a[i];

@@ -9,17 +9,17 @@
 
 namespace qx {
 
-// Median-of-three partition selection. The two scans need no bound: the pivot itself stops the
-// one that goes down, and the element at r, which is no smaller than the pivot, or a NaN, the one
-// that goes up.
+// Median-of-three partition selection. The two scans need no bounds check: the downward scan is
+// stopped by the pivot itself, the upward scan by the element at r, which is not smaller than the
+// pivot, or is NaN.
 void SelectKth(RealVector elements, int32_t k) {
     DBL *const a = elements.data();
     const auto n = static_cast<int32_t>(elements.size());
     int32_t l = 0;
     int32_t r = n - 1;
-    // Pivots that hardly shorten the range would make the work quadratic, and data that bring
-    // them about can be constructed. Beyond a few times n the rest is sorted instead; the element
-    // of rank k is the same.
+    // Pivots that hardly shorten the range would make the work quadratic, and data that cause this
+    // can be constructed. After a few times n steps the rest is sorted instead; the element of rank
+    // k is the same.
     int64_t workLeft = int64_t{16} * n + 64;
     while (r > l + 1) {
         workLeft -= r - l;
@@ -79,10 +79,10 @@ ErrorCode ArrayMaxMin(ConstRealVector x, Extremes *found) {
 }
 
 namespace {
-// Zeros of different signs are equal, and their order is that of the sort.
+// Zeros of different signs are equal, and the sort determines their order.
 bool HasNegativeZero(ConstRealVector ascending) {
     std::ptrdiff_t i = 0, end = ascending.size();
-    while (i < end) { // to the first element that is not below 0
+    while (i < end) { // up to the first element that is not below 0
         const std::ptrdiff_t middle = i + (end - i) / 2;
         if (ascending[middle] < 0.0)
             i = middle + 1;
@@ -104,7 +104,7 @@ void SortNaNsFirst(ConstRealVector x, SortOrder order, RealVector out) {
     const bool isAscending = IsAscending(x);
     const bool isDescending = !isAscending && IsDescending(x);
     DBL *const a = out.data();
-    constexpr std::ptrdiff_t worthALook = 24; // shorter ones are sorted as fast
+    constexpr std::ptrdiff_t worthALook = 24; // shorter arrays are sorted as fast
     const bool looks = n >= worthALook && a != x.data() && !isAscending && !isDescending;
     if (const std::ptrdiff_t fall = looks ? StartOfFall(x) : 0) {
         MergeRiseAndFall(x, fall, out);
@@ -116,7 +116,7 @@ void SortNaNsFirst(ConstRealVector x, SortOrder order, RealVector out) {
     }
     if (a != x.data())
         std::memcpy(a, x.data(), static_cast<std::size_t>(n) * sizeof(DBL));
-    std::ptrdiff_t first = 0; // of those that are no NaN
+    std::ptrdiff_t first = 0; // index of the first element that is not NaN
     if (!isAscending && !isDescending) {
         for (std::ptrdiff_t i = 0; i < n; ++i)
             if (std::isnan(a[i]))

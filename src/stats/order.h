@@ -10,8 +10,8 @@ namespace qx {
 // ErrEmptyInput; ErrNaNInData; ErrOutOfMemory.
 ErrorCode ArrayMedian(ConstRealVector x, DBL *median);
 
-// Puts the element of rank k (from 0) in place k, everything before it smaller or equal, everything
-// behind it greater or equal.
+// Puts the element of rank k (from 0) at index k, with no larger element before it and no smaller
+// element after it.
 void SelectKth(RealVector a, int32_t k);
 
 struct Extremes {
@@ -19,8 +19,8 @@ struct Extremes {
     int32_t maxIndex, minIndex;
 };
 
-// The extremes among the elements that are no NaN, each with its first index; NaN and -1 if
-// there is none. ErrEmptyInput.
+// The extremes of the elements that are not NaN, each with its first index; NaN and -1 if there are
+// none. ErrEmptyInput.
 ErrorCode ArrayMaxMin(ConstRealVector x, Extremes *found);
 
 enum class SortOrder { Ascending, Descending };

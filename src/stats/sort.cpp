@@ -36,8 +36,8 @@ void SiftDown(DBL *a, std::ptrdiff_t root, std::ptrdiff_t n) {
     a[root] = value;
 }
 
-// Moves the pivot to a[0]: the median of three, for a long range of three medians of three that
-// lie evenly over the range, so that neither rising and falling data nor long runs mislead it.
+// Moves the pivot to a[0]: the median of three or, for a long range, of three medians of three,
+// evenly spaced over the range, so that neither rising and falling data nor long runs mislead it.
 void ChoosePivot(DBL *a, std::ptrdiff_t n) {
     const auto median = [a](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t k) {
         OrderPair(&a[i], &a[j]);
@@ -56,17 +56,17 @@ void ChoosePivot(DBL *a, std::ptrdiff_t n) {
     }
 }
 
-// Splits a[1..n-1] by the pivot in a[0] and puts that between the parts; returns its place.
-// Elements on the wrong side are noted block by block, which takes no branch that depends on the
-// data, and exchanged in bulk.
+// Partitions a[1..n-1] by the pivot in a[0] and puts the pivot between the parts; returns its
+// index. Elements on the wrong side are recorded block by block, without a branch that depends on
+// the data, and exchanged in bulk.
 std::ptrdiff_t Partition(DBL *a, std::ptrdiff_t n) {
     constexpr std::ptrdiff_t block = 64;
     const double pivot = a[0];
     unsigned char leftPlaces[block];
     unsigned char rightPlaces[block];
     std::ptrdiff_t leftCount = 0, rightCount = 0, leftUsed = 0, rightUsed = 0;
-    DBL *left = a + 1;  // everything before it is smaller than the pivot
-    DBL *right = a + n; // everything from it on is not
+    DBL *left = a + 1;  // all elements before it are smaller than the pivot
+    DBL *right = a + n; // no element from it on is smaller
 
     while (right - left > 2 * block) {
         if (leftCount == 0) {
@@ -96,7 +96,7 @@ std::ptrdiff_t Partition(DBL *a, std::ptrdiff_t n) {
             right -= block;
     }
 
-    // What is left is two blocks at most, one of which may be half done: the plain scheme.
+    // At most two blocks are left, one of which may be half done: use the plain scheme.
     while (true) {
         while (left < right && *left < pivot)
             ++left;
@@ -107,7 +107,7 @@ std::ptrdiff_t Partition(DBL *a, std::ptrdiff_t n) {
         Swap(left++, --right);
     }
     if (left < right && !(pivot < *left))
-        ++left; // equal to the pivot, which may stand on either side
+        ++left; // equal to the pivot, which may be on either side
     Swap(a, left - 1);
     return left - 1 - a;
 }
@@ -123,7 +123,7 @@ void Sort(DBL *a, std::ptrdiff_t n, int badPivotsAllowed) {
         const std::ptrdiff_t behind = n - place - 1;
         if (std::min(place, behind) < n / 8)
             --badPivotsAllowed;
-        // The shorter part by recursion, so that the stack stays small.
+        // Recursion for the shorter part, so that the stack stays small.
         if (place < behind) {
             Sort(a, place, badPivotsAllowed);
             a += place + 1;
@@ -168,7 +168,7 @@ bool IsDescending(ConstRealVector a) {
 }
 
 std::ptrdiff_t StartOfFall(ConstRealVector a) {
-    constexpr std::ptrdiff_t shortest = 4; // a rise that random data hardly have
+    constexpr std::ptrdiff_t shortest = 4; // a rise that random data hardly ever have
     std::ptrdiff_t start = 1;
     while (start < a.size() && a[start - 1] <= a[start])
         ++start;
@@ -180,12 +180,13 @@ std::ptrdiff_t StartOfFall(ConstRealVector a) {
     return i == a.size() ? start : 0;
 }
 
-// From the ends inward and from the peak outward at once, since each choice waits for the one before.
+// From the ends inward and from the peak outward in the same loop, because each choice waits for
+// the previous one.
 void MergeRiseAndFall(ConstRealVector a, std::ptrdiff_t fall, RealVector out) {
     QX_EXPECTS(out.size() == a.size());
     const std::ptrdiff_t n = a.size();
-    std::ptrdiff_t first = 0, last = n - 1; // of those that are not among the smallest yet
-    // The largest that are left on either side of the peak; -1 or n where there is none.
+    std::ptrdiff_t first = 0, last = n - 1; // bounds of the elements not taken yet
+    // The largest remaining elements on either side of the peak; -1 or n if there is none.
     std::ptrdiff_t rising = fall - 1, falling = fall;
     for (std::ptrdiff_t i = 0; i < n / 2; ++i) {
         const double small = a[first], other = a[last];

@@ -14,10 +14,10 @@ namespace {
 constexpr double kMostDegrees = 1e6;
 constexpr double kNearest = 1e-100, kFarthest = 1e5;
 constexpr double kCentralTo = 0.9;
-constexpr double kLargestLogarithm = 640.0; // of 1 over the tail
+constexpr double kLargestLogarithm = 640.0; // of 1 / tail
 
 double DensityAtZero(double n) {
-    constexpr double low = -0x1.cbc0d30ebfd15p-56; // of 1 / sqrt(2 pi) behind its double
+    constexpr double low = -0x1.cbc0d30ebfd15p-56; // of 1 / sqrt(2 pi), the part below its double
     const double lacking = n < 3.0    ? table::studentFirst(n)
                            : n < 10.0 ? table::studentSecond(n)
                            : n < 40.0 ? table::studentThird(n)
@@ -25,12 +25,12 @@ double DensityAtZero(double n) {
     return kInverseRootTwoPi + (low - kInverseRootTwoPi * lacking);
 }
 
-// (1 + t^2 / n)^(-power), the base in twice the precision.
+// (1 + t^2 / n)^(-power), with the base in twice the precision.
 double PowerOfBase(const Extended &base, double power) {
     return std::pow(base.high, -power) * (1.0 - power * (base.low / base.high));
 }
 
-// 1 + (n + 1) / 3 y (1 + (n + 3) / 5 y (...)), from the term that is below half a unit on.
+// 1 + (n + 1) / 3 y (1 + (n + 3) / 5 y (...)), up to the term that is below half a unit.
 double CentralSeries(double n, double y) {
     double term = 1.0, rest = 0.0;
     for (double k = 1; term > 0.1 * kEpsilon; ++k) {
@@ -84,7 +84,7 @@ StudentTail StudentTailAt(double t, double n) {
 
 namespace {
 
-// Hill's start, for the two tails of p together.
+// Hill's start value, for the probability of both tails.
 double HillsPoint(double both, double n, double normalPoint) {
     const double a = 1.0 / (n - 0.5);
     const double b = 48.0 / (a * a);
@@ -114,17 +114,17 @@ double HillsPoint(double both, double n, double normalPoint) {
 
 double StudentUpperPoint(double p, double n, double normalPoint) {
     double t = n < 1.5 ? 1.0 / std::tan(kPi * p) : HillsPoint(2.0 * p, n, normalPoint);
-    const double central = 0.5 - p; // exact from a quarter on
+    const double central = 0.5 - p; // exact for p from 1/4 on
     for (int turn = 0; turn < 12; ++turn) {
         const StudentTail tail = StudentTailAt(t, n);
         if (!tail.isKnown)
             return kNaN;
         const double curvature = (n + 1.0) * t / (n + t * t); // -density' / density
-        double step; // Newton's step, made one of third order by the curvature
+        double step; // Newton's step, made third-order by the curvature
         if (tail.isCentral) {
             const double newton = (central - tail.part) / tail.density;
             step = newton / (1.0 - 0.5 * curvature * newton);
-        } else { // of the logarithm of the tail
+        } else { // for the logarithm of the tail
             const double hazard = tail.density / tail.part;
             const double newton = std::log(tail.part / p) / hazard;
             step = newton / (1.0 + 0.5 * (hazard - curvature) * newton);

@@ -17,16 +17,16 @@ namespace {
 
 constexpr double kMostDegrees = 1e25;
 constexpr double kLeastTail = 1e-250;
-constexpr double kFarStudent = 1e140;   // from there on the tail is a power of t to the last digit
-constexpr double kNearStudent = 1e-150; // up to there the tail is a half to the last digit
+constexpr double kFarStudent = 1e140;   // from here on the tail is a power of t to the last digit
+constexpr double kNearStudent = 1e-150; // up to here the tail is a half to the last digit
 
 Extended Whole(double x) { return {x, 0.0}; }
 
 constexpr double kLeastDegrees = 1e-300;
-constexpr double kLeastHalf = 5e-321; // of chi-square: a quotient by it is not 0
+constexpr double kLeastHalf = 5e-321; // for chi-square: a quotient by it is not 0
 constexpr double kLeastStudentDegrees = 1e-25;
-constexpr double kFewDegrees = 1e-25;  // of Fisher's: below it a part is proportional to them
-constexpr double kFlatDegrees = 1e-20; // of Fisher's, where the others are few
+constexpr double kFewDegrees = 1e-25;  // for Fisher's: below it a part is proportional to them
+constexpr double kFlatDegrees = 1e-20; // for Fisher's, if the other degrees are few
 
 double Limited(double degrees) { return std::clamp(degrees, kLeastDegrees, kMostDegrees); }
 
@@ -43,7 +43,7 @@ double ValueOf(const Tails &tails, DistributionValue what) {
     return IsLogarithm(what) ? tails.logarithm(isLower) : tails.part(isLower);
 }
 
-// Where all is below the argument or above it.
+// The value if all of the distribution is below the argument, or above it.
 double ValueAtEnd(bool isBelow, DistributionValue what) {
     if (what == DistributionValue::Density)
         return 0.0;
@@ -53,14 +53,14 @@ double ValueAtEnd(bool isBelow, DistributionValue what) {
     return isCertain ? 1.0 : 0.0;
 }
 
-// The density at 0 of a distribution that begins there as x^(degrees / 2 - 1).
+// The density at 0 of a distribution that starts there as x^(degrees / 2 - 1).
 double DensityAtZero(double degrees, double ofTwo) {
     return degrees < 2.0 ? kInfinity : degrees > 2.0 ? 0.0 : ofTwo;
 }
 
-// exp(-x^2 / 2), the square in twice the precision.
+// The exponent of exp(-x^2 / 2), with the square in twice the precision.
 Extended ExponentOfNormal(double x) {
-    const double half = 0.5 * x; // x / 2 and x are exact, their product is kept whole
+    const double half = 0.5 * x; // x / 2 and x are exact; their product is stored in full
     return std::fabs(x) < 1e150 ? -ExactProduct(half, x) : Whole(-half * x);
 }
 
@@ -72,7 +72,8 @@ Scaled UpperNormal(double x) {
     return {factor, ExponentOfNormal(x)};
 }
 
-// x of P(0 < X < x) = p, p <= 0.25 or so: Newton's method on a series that keeps small values.
+// x with P(0 < X < x) = p, p <= 0.25 or so: Newton's method on a series that keeps small values
+// accurate.
 double CentralNormalPoint(double p) {
     double x = p * kRootTwoPi;
     for (int turn = 0; turn < 6; ++turn) {
@@ -86,7 +87,7 @@ double CentralNormalPoint(double p) {
     return x;
 }
 
-// x of P(X > x) = p, p at most a half. The start is formula 26.2.23 of M. Abramowitz and I. A.
+// x with P(X > x) = p, p at most 1/2. The start value is formula 26.2.23 of M. Abramowitz and I. A.
 // Stegun, Handbook of mathematical functions, 1964.
 double UpperNormalPoint(double p) {
     if (p > 0.25)
@@ -112,14 +113,14 @@ Tails ChiSquareTails(double x, double dof) {
     return GammaTails(0.5 * dof, std::max(0.5 * x, kLeastHalf));
 }
 
-// n f and d as parts of a whole: both are scaled where f is far from 1.
+// n f and d as fractions of their sum; both are scaled if f is far from 1.
 UnitPoint FisherShare(double f, double n, double d) {
     const double scale = f > 1e150 ? 0x1p-300 : f < 1e-150 ? 0x1p300 : 1.0;
     return UnitPoint::Share(ExactProduct(f * scale, n), Whole(d * scale));
 }
 
-// Where n is few degrees beside d, the part above f is n times an integral over t^-1 that does not
-// depend on n but for its end; where d is, the part below f is that with 1 / f.
+// If n is tiny compared with d, the part above f is n times an integral over t^-1 that does not
+// depend on n except for its end. If d is tiny, the part below f is the same with 1 / f.
 Tails FewFisherTails(double f, double n, double d) {
     const bool isFirst = n < d;
     const double few = isFirst ? n : d, many = isFirst ? d : n;
@@ -136,7 +137,7 @@ Tails FewFisherTails(double f, double n, double d) {
     return tails;
 }
 
-// With few degrees of both the parts do not depend on f.
+// If both degrees are tiny, the parts do not depend on f.
 Tails FlatFisherTails(double n, double d) {
     const double below = d / (n + d), above = n / (n + d);
     return {{std::min(below, above), Whole(0.0)}, below <= above, {0.5 * n * below, Whole(0.0)}};
@@ -150,14 +151,14 @@ Tails FisherTails(double f, double n, double d) {
     return BetaTails(0.5 * n, 0.5 * d, FisherShare(f, n, d));
 }
 
-// Of t^2, which has Fisher's distribution with 1 and dof degrees.
+// The tails of t^2, which has Fisher's distribution with 1 and dof degrees.
 Tails SquareTails(double t, double dof) {
     const UnitPoint point = UnitPoint::Share(ExactProduct(t, t), Whole(dof));
     return BetaTails(0.5, 0.5 * dof, point);
 }
 
-// P(T > t), t > 0, at most a half. With fewer degrees than the least it is a half for
-// all t, to the last bit.
+// P(T > t), t > 0, at most 1/2. For degrees below kLeastStudentDegrees it is 1/2 for all t, to the
+// last bit.
 Scaled UpperStudent(double t, double dof) {
     dof = std::max(dof, kLeastStudentDegrees);
     if (t < kNearStudent)
@@ -176,7 +177,7 @@ Scaled UpperStudent(double t, double dof) {
 }
 
 double StudentDensity(double t, double dof) {
-    // Flat to the last bit below this.
+    // The density is constant to the last bit below this.
     const double least = 1e-20 * std::sqrt(dof);
     const double u = std::max(std::fabs(t), least);
     if (u > kFarStudent)
@@ -184,8 +185,8 @@ double StudentDensity(double t, double dof) {
     return (SquareTails(u, dof).slope * (1.0 / u)).value();
 }
 
-// ln(p / part): of the numbers themselves, since rounding of a large logarithm counts more, where
-// they are no less than this, or can be raised.
+// ln(p / part), from the numbers themselves where they are above `least` or can be scaled up,
+// because the rounding of a large logarithm would matter more.
 double LogOfShare(double p, const Tails &tails, bool lower) {
     constexpr double least = 1e-290;
     constexpr double raise = 0x1p200;
@@ -198,7 +199,7 @@ double LogOfShare(double p, const Tails &tails, bool lower) {
     return std::log(p) - tails.logarithm(lower);
 }
 
-// Newton's method for the logarithm of a part as a function of u = ln x, which is concave.
+// Newton's method for the logarithm of a part as a function of u = ln x; the function is concave.
 template <class TailsAt>
 double Solve(double start, double p, bool isUpper, TailsAt tailsAt) {
     const double direction = isUpper ? -1.0 : 1.0;
@@ -236,7 +237,7 @@ double Solve(double start, double p, bool isUpper, TailsAt tailsAt) {
     return x;
 }
 
-// The part to solve for is the one that is at most a half; 1 - p is then exact.
+// Solves for the part that is at most 1/2; 1 - p is then exact.
 void TakeSmaller(double &p, bool &isUpper) {
     if (p <= 0.5)
         return;
@@ -244,7 +245,7 @@ void TakeSmaller(double &p, bool &isUpper) {
     isUpper = !isUpper;
 }
 
-// 0 and 1 have their points at the ends.
+// For p = 0 and p = 1 the points are the ends of the range.
 bool IsAtEnd(double p, bool isUpper, double lowerEnd, double *point) {
     if (p != 0.0 && p != 1.0)
         return false;
@@ -323,12 +324,12 @@ double StudentPoint(double p, bool isUpper, double dof) {
         const bool isBeyond = log.high > 1000.0 * dof;
         t = isBeyond ? kInfinity : kFarStudent * ExpOf(log / Whole(dof));
     } else {
-        // Of t^2: the upper part is 2 p, the lower one 1 less that, exact from a quarter on.
+        // For t^2: the upper part is 2 p, the lower part is 1 - 2 p, which is exact from 1/4 on.
         const bool takesLower = p > 0.25;
         const double z = UpperNormalPoint(p);
         t = Solve(z, takesLower ? 1.0 - 2.0 * p : 2.0 * p, !takesLower, [=](double at) {
             Tails tails = SquareTails(at, dof);
-            tails.slope = tails.slope * 2.0; // in ln t
+            tails.slope = tails.slope * 2.0; // with respect to ln t
             return tails;
         });
     }

@@ -6,9 +6,9 @@
 
 namespace qx {
 
-// Distributions and their inverses to the last digits in either tail. The argument is no NaN, degrees
-// of freedom are above 0; those above 1e25, infinity included, count as 1e25, with which the
-// distributions have reached their limits.
+// Distributions and their inverses, accurate to the last digits in either tail. The argument must
+// not be NaN, and degrees of freedom must be positive; degrees above 1e25, including infinity,
+// count as 1e25, with which the distributions have reached their limits.
 
 enum class DistributionValue {
     Probability,
@@ -23,7 +23,7 @@ double StudentValue(double t, double dof, DistributionValue what);
 double FisherValue(double f, double n, double d, DistributionValue what);
 double ChiSquareValue(double x, double dof, DistributionValue what);
 
-// The point below which, or above which where isUpper, the probability is p, 0 <= p <= 1.
+// The point below which (above which if isUpper) the probability is p, 0 <= p <= 1.
 double NormalPoint(double p, bool isUpper);
 double StudentPoint(double p, bool isUpper, double dof);
 double FisherPoint(double p, bool isUpper, double n, double d);

@@ -34,7 +34,7 @@ public:
         const double sine = std::sin(angle / 2);
         return {-std::expm1(logarithm) + 2 * magnitude * sine * sine, -magnitude * std::sin(angle)};
     }
-    // How far z^exponent has come from 1 on its way: its rounding error is a fraction of that.
+    // The length of the way from 1 to z^exponent; the rounding error of the power is proportional to it.
     double way(double exponent) const {
         return std::fabs(exponent) * std::hypot(std::log(square_) / 2, angle_);
     }
@@ -55,7 +55,7 @@ ErrorCode CheckSpiral(const CDB &a, const CDB &w) {
     return 0;
 }
 
-// terms[k] = x[k] a^(-k), from one power and a product for each further value.
+// terms[k] = x[k] a^(-k), by one power and a product for each further value.
 template <ElementType E>
 void TakeStart(ConstVectorView<E> x, const CDB &a, ComplexVector terms) {
     CDB factor = Powers(a).of(static_cast<double>(1 - x.size()));
@@ -79,7 +79,7 @@ void SumDirectly(ConstComplexVector terms, const CDB &w, ComplexVector out) {
     }
 }
 
-// By k m = (k^2 + m^2 - (m - k)^2) / 2 the sum is a convolution with a chirp.
+// Since k m = (k^2 + m^2 - (m - k)^2) / 2, the sum is a convolution with a chirp.
 ErrorCode SumByConvolution(ComplexVector terms, const CDB &w, ComplexVector out) {
     const std::ptrdiff_t n = terms.size();
     const int64_t length = int64_t{out.size()} + 2 * n - 1;
@@ -104,8 +104,8 @@ ErrorCode SumByConvolution(ComplexVector terms, const CDB &w, ComplexVector out)
     return memory.release();
 }
 
-// A number whose exponent may leave the range of double: on the full circle products of n
-// differences do so from n around 4000, though what is formed of them is near 1.
+// A number whose exponent may leave the range of double: on the full circle, products of n differences
+// do so from n around 4000, although the results formed from them are near 1.
 struct Scaled {
     CDB value = {1.0, 0.0};
     int32_t exponent = 0;
@@ -121,7 +121,7 @@ struct Scaled {
     }
 };
 
-// u[k], the product of 1 / (1 - w^(-j)) over j from 1 to k. The exponents are kept apart.
+// u[k] is the product of 1 / (1 - w^(-j)) over j from 1 to k. The exponents are kept separately.
 class Reciprocals {
 public:
     ErrorCode build(const Powers &w, std::ptrdiff_t n) {
@@ -163,7 +163,8 @@ CDB AlternatingChirp(const Powers &w, std::ptrdiff_t k, int step) {
     return k % 2 == 0 ? power : CDB{-power.re, -power.im};
 }
 
-// Where `count` of the n points w^k / a lie best, and 1/a as seen from there.
+// Returns the first of the `count` consecutive points, out of the n points w^k / a, around the one nearest
+// to the unit circle. *start is 1/a and becomes that point.
 std::ptrdiff_t BestStretch(std::ptrdiff_t n, std::ptrdiff_t count, const CDB &w, CDB *start) {
     const double growth = std::sqrt(Square(w));
     double magnitude = std::sqrt(Square(*start));
@@ -184,8 +185,8 @@ std::ptrdiff_t BestStretch(std::ptrdiff_t n, std::ptrdiff_t count, const CDB &w,
     return first;
 }
 
-// The polynomial of n coefficients, y[0] first, that has the given values at the powers of w.
-// y has 2 n - 1 values.
+// The n coefficients, y[0] first, of the polynomial that has the given values at the powers of w. y has
+// 2 n - 1 values.
 ErrorCode Interpolate(ConstComplexVector values, const CDB &w, ComplexVector y) {
     const std::ptrdiff_t n = values.size();
     const Powers powers(w);

@@ -21,9 +21,9 @@ enum ChirpMethod : uint32_t {
 template <ElementType E>
 ErrorCode ChirpZ(ConstVectorView<E> x, CDB a, CDB w, ChirpMethod method, ComplexVector out);
 
-// The inverse: the sequence of `count` values whose transform is the input, which has as many
-// values or more. Of more input values a stretch of `count` is taken, around the point of the
-// spiral that is nearest to the unit circle.
+// The inverse: the sequence of `count` values whose transform is the input, which has at least as many
+// values. If it has more, the `count` values around the point of the spiral that is nearest to the
+// unit circle are used.
 //
 // With y[k] = x[k] a^(-k) this is the interpolation of a polynomial at the powers of w, solved by
 // Lagrange's formula: the products of the differences of such points are products of 1 - w^(-j),
@@ -31,7 +31,7 @@ ErrorCode ChirpZ(ConstVectorView<E> x, CDB a, CDB w, ChirpMethod method, Complex
 // product over all points are Gaussian binomials. The error grows with the condition of the points
 // (docs/accuracy/chirp_z.md).
 //
-// Beside the above: ErrDegenerateValue where two points agree to rounding.
+// In addition to the codes above: ErrDegenerateValue if two points agree to rounding.
 ErrorCode InverseChirpZ(ConstComplexVector in, CDB a, CDB w, ComplexVector out);
 
 } // namespace qx

@@ -14,10 +14,10 @@ namespace {
 
 typedef Lanes<2> Pair;
 
-// Below, (c, s) stands for cos and sin of pi k / (2n); those of n - k are (s, c), so bins k and
-// n - k share one pair.
+// Below, (c, s) denotes cos and sin of pi k / (2n); for n - k they are (s, c), so bins k and n - k share
+// one pair.
 
-// `Length` is the type of n: an integer, or one of fixed value that is transformed whole, for which
+// `Length` is the type of n: an integer, or a constant for a length that is transformed whole, for which
 // the compiler unrolls the loops and computes the scale.
 template <class Length>
 ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, DBL *out, Length n, DBL *work) {
@@ -46,8 +46,8 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, DBL *out, Length n, DBL
         TurnHalfComplex(h, wave, scale, n, out);
     else
         for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
-            // Each value of h is read by itself: one load of two values that a short transform has
-            // stored apart would wait for both stores.
+            // The values of h are read one by one: a single load of two values that a short transform
+            // has stored separately would wait for both stores.
             const Pair w = Pair::load(wave + 2 * k);
             const double im = h[n - k];
             const Pair turned = Pair(h[k]) * w + Pair(Pair::Vector{im, -im}) * w.reversed();
@@ -87,7 +87,7 @@ ErrorCode InverseEven(const FFTPlan *plan, const DBL *spectrum, DBL *out, int32_
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
         return ErrOutOfMemory;
-    // Interleaved, which the engine transforms fastest.
+    // Interleaved, because the engine is fastest for that layout.
     CDB *const z = reinterpret_cast<CDB *>(work);
     CDB *const u = z + n;
     const double scale = std::sqrt(2.0 * n);
@@ -96,6 +96,32 @@ ErrorCode InverseEven(const FFTPlan *plan, const DBL *spectrum, DBL *out, int32_
     if (const ErrorCode failed = FFTComplexInverse(plan, &z->re, &z->im, &u->re, &u->im, 2, 2, n))
         return failed;
     SpreadEvenOdd(&u->re, n, out);
+    return 0;
+}
+
+// The same for 8 values, in one piece. The inverse Fourier transform is the forward transform with the
+// results k and n - k exchanged; only its real parts are needed.
+ErrorCode InverseEight(const FFTPlan *plan, const DBL *spectrum, DBL *out, DBL *work) {
+    constexpr std::ptrdiff_t n = 8;
+    const DBL *const wave = QuarterWave(plan);
+    if (!wave)
+        return ErrOutOfMemory;
+    DBL *const z = work;
+    DBL *const u = work + 2 * n;
+    const Pair scale(std::sqrt(2.0 * n));
+    // Both parts of a value are stored together: the transform loads them together, and would wait for
+    // two separate stores.
+    Pair(Pair::Vector{spectrum[0] * std::sqrt(static_cast<double>(n)), 0.0}).store(z);
+    for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
+        const Pair w = Pair::load(wave + 2 * k) * scale;
+        (Pair(spectrum[k]) * w).store(z + 2 * k);
+        (Pair(spectrum[n - k]) * w.reversed()).store(z + 2 * (n - k));
+    }
+    plan->whole.complex(z, u);
+    for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
+        out[2 * j] = u[2 * ((n - j) % n)] * (1.0 / n);
+        out[2 * j + 1] = u[2 * (j + 1)] * (1.0 / n);
+    }
     return 0;
 }
 
@@ -134,7 +160,7 @@ ErrorCode DCTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DB
     PaddedInput x;
     if (const ErrorCode failed = x.take(in, n))
         return failed;
-    if (n == 8) // the block of image coding; so short that the code around the transform costs most
+    if (n == 8) // the block of image coding, so short that the overhead dominates
         return ForwardEven(plan, x.data, out.data(), std::integral_constant<int32_t, 8>(), work);
     const auto forward = n % 2 == 0 ? ForwardEven<int32_t> : ForwardOdd;
     return forward(plan, x.data, out.data(), n, work);
@@ -143,6 +169,8 @@ ErrorCode DCTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DB
 ErrorCode DCTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work) {
     const auto n = static_cast<int32_t>(out.size());
     QX_EXPECTS(n >= 1 && in.size() >= n && plan->length == DCTPlanLength(n));
+    if (n == 8)
+        return InverseEight(plan, in.data(), out.data(), work);
     const auto inverse = n % 2 == 0 ? InverseEven : InverseOdd;
     return inverse(plan, in.data(), out.data(), n, work);
 }

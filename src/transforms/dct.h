@@ -24,7 +24,7 @@ inline int64_t DCTForwardWork(int32_t n) { return n % 2 == 0 ? 2 * int64_t{n} : 
 inline int64_t DCTInverseWork(int32_t n) { return 4 * int64_t{n}; }
 
 // The output has n values, and the plan is one for n. The forward transform takes the first n values
-// of the input, with zeros behind its end where it is shorter; the inverse takes n values. Input and
+// of the input, with zeros after its end if it is shorter; the inverse takes n values. Input and
 // output may be the same memory. ErrOutOfMemory.
 ErrorCode DCTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);
 ErrorCode DCTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);

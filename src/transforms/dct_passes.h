@@ -8,12 +8,12 @@
 
 namespace qx {
 
-// The passes of the cosine transforms of an even number n of values side by side, before and behind
-// the Fourier transform. `wave` holds, interleaved, cos and sin of pi k / (2n).
+// The passes of the cosine transforms of an even number n of contiguous values, before and after the
+// Fourier transform. `wave` holds, interleaved, cos and sin of pi k / (2n).
 
-// The values of even index, and behind them those of odd index backward.
+// The values of even index, followed by those of odd index in reverse order.
 QX_BY_WIDTH(void, GatherEvenOdd, (const DBL *x, int32_t n, DBL *reordered))
-// Its opposite, for the real parts of complex values.
+// The inverse permutation, for the real parts of complex values.
 QX_BY_WIDTH(void, SpreadEvenOdd, (const DBL *complex, int32_t n, DBL *x))
 
 // For k from 1 to n/2 - 1, with c and s of k and h in half-complex form, out[k] = (h[k] c + h[n-k]

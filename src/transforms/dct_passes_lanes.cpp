@@ -84,7 +84,7 @@ void TurnReal(const DBL *x, const DBL *wave, double scale, int32_t n, DBL *compl
         DBL *const down = complex + 2 * opposite;
         for (int part = 0; part < 2; ++part) {
             (lows[part] * w[part]).store(up + part * nativeLanes);
-            // (c, s) backward is (s, c) of the opposite value.
+            // (c, s) reversed is the (s, c) of the opposite value.
             (highs[part] * w[part]).reversed().store(down + (1 - part) * nativeLanes);
         }
     }

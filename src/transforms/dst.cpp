@@ -8,7 +8,7 @@ namespace qx {
 namespace {
 
 // The half-complex spectrum, in the second half of the work buffer, of the odd extension of x.
-// The imaginary part of bin k stands at length - k and is -2 times the sine sum of k.
+// The imaginary part of bin k is at length - k and equals -2 times the sine sum of k.
 ErrorCode OddExtensionSpectrum(const FFTPlan *plan, const DBL *x, int32_t n, DBL *work) {
     const int64_t length = DSTPlanLength(n);
     QX_EXPECTS(n >= 1 && plan->length == length);

@@ -21,7 +21,7 @@ inline int64_t DSTPlanLength(int32_t n) { return 2 * int64_t{n} + 2; }
 inline int64_t DSTWork(int32_t n) { return 4 * (int64_t{n} + 1); }
 
 // The output has n values, and the plan is one for n. The forward transform takes the first n values
-// of the input, with zeros behind its end where it is shorter; the inverse takes n values. Input and
+// of the input, with zeros after its end if it is shorter; the inverse takes n values. Input and
 // output may be the same memory. ErrOutOfMemory.
 ErrorCode DSTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);
 ErrorCode DSTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);

@@ -30,8 +30,8 @@ void FoldInput(VectorView<Code> x, int32_t L, int32_t subLength) {
         Add(x[t], *next++);
 }
 
-// The work of one sub-sequence: gathered values and their spectrum, `subLength` bins. With work
-// memory at hand, a transform by a plan of its length has no failure.
+// The work of one sub-sequence: gathered values and their spectrum, `subLength` bins. Given work memory, a
+// transform by a plan of its own length cannot fail.
 template <ElementType Code>
 struct SubSpectrum;
 
@@ -74,7 +74,7 @@ struct SubSpectrum<ElementType::CDB> {
     CDB bin(int32_t k) const { return {re[k], im[k]}; }
 };
 
-// Every sections-th value from j on, with zeros behind the input's end.
+// Every sections-th value from j on, with zeros after the input's end.
 template <ElementType Code>
 void Gather(ConstVectorView<Code> x, int32_t sections, int32_t j, const SubSpectrum<Code> &sub) {
     int64_t u = j;
@@ -117,7 +117,7 @@ ErrorCode BandTransform(const FFTPlan *plan, VectorView<E> x, int32_t sections, 
         return ErrFFTSizeNotPositive;
     if (!plan || plan->length != subLength)
         return ErrInternal;
-    // A length beyond int32 cannot be folded into; it ends in ErrLengthTooLarge below.
+    // No input is longer than an L beyond int32, which is reported as ErrLengthTooLarge below.
     const int64_t L = int64_t{sections} * subLength;
     if (x.size() > L)
         FoldInput<E>(x, static_cast<int32_t>(L), subLength);

@@ -15,7 +15,7 @@ namespace qx {
 // input shorter than L counts as zero-padded, a longer one is folded, in place.
 //
 // ErrEmptyInput, ErrFFTSizeNotPositive, ErrInternal for a plan of another length than subLength,
-// ErrOutOfMemory, ErrLengthTooLarge where an index would pass int32.
+// ErrOutOfMemory, ErrLengthTooLarge where an index would exceed int32.
 template <ElementType E>
 ErrorCode BandTransform(const FFTPlan *plan, VectorView<E> x, int32_t sections, int32_t subLength,
                         int32_t start, ComplexVector out);

@@ -9,7 +9,7 @@ namespace {
 
 typedef HeapBlock<ElementType::DBL> HalfSpectrum;
 
-// The half-complex spectrum of x in a block from the heap.
+// The half-complex spectrum of x, in a heap block.
 ErrorCode Transform(const FFTPlan *plan, ConstRealVector x, HalfSpectrum &h) {
     QX_EXPECTS(plan->length == x.size());
     if (const ErrorCode failed = h.allocate(plan->length))

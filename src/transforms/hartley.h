@@ -7,7 +7,7 @@
 
 namespace qx {
 
-// In place, n values by a plan of that length. ErrOutOfMemory.
+// All four work in place on n values, with a plan of that length. ErrOutOfMemory.
 
 // H[k] = sum over j of x[j] (cos(2 pi j k / n) + sin(2 pi j k / n)); the inverse is the same
 // transform scaled by 1/n.

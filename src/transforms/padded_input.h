@@ -9,8 +9,8 @@
 
 namespace qx {
 
-// The first n values of an input: the input itself where it is long enough, else a heap copy with
-// zeros behind its end.
+// The first n values of an input: the input itself if it is long enough, else a heap copy with zeros
+// after its end.
 struct PaddedInput {
     const DBL *data;
     HeapBlock<ElementType::DBL> copy;

@@ -8,10 +8,10 @@
 namespace qx {
 namespace {
 
-// One block for both directions: the work of the larger need, then the gathered columns.
+// One block for both directions: the larger of the two work areas, then the gathered columns.
 //
-// The longer direction is not always the one that needs more work, since an odd length takes
-// twice the work of an even one.
+// The longer direction does not always need more work memory, because an odd length needs twice as much as
+// an even one.
 struct WorkBlock {
     HeapBlock<ElementType::DBL> block;
     DBL *columns;
@@ -49,7 +49,7 @@ ErrorCode TransformColumns(const ConstRealMatrix &in, const RealMatrix &out, DBL
     return 0;
 }
 
-// `transform` makes one transform of n values: plan, from, to, n.
+// transform(plan, from, to, n) computes one transform of n values.
 template <class Transform>
 ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
                            const ConstRealMatrix &in, const RealMatrix &out, bool columnsFirst,

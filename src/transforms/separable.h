@@ -32,8 +32,8 @@ struct SineTransform {
     static constexpr bool inverseRunsColumnsFirst = false;
 };
 
-// The upper left rows by cols values of a matrix, with zeros to the right and below where it is
-// smaller: the matrix itself where the shapes agree, else a heap copy. 0 or ErrOutOfMemory.
+// The upper left rows by cols values of a matrix, with zeros to the right and below if it is smaller:
+// the matrix itself if the shapes agree, else a heap copy. Returns 0 or ErrOutOfMemory.
 struct MatrixWindow {
     ConstRealMatrix view;
     HeapBlock<ElementType::DBL> copy;
@@ -41,8 +41,8 @@ struct MatrixWindow {
     ErrorCode take(const ConstRealMatrix &in, int32_t rows, int32_t cols);
 };
 
-// Matrices of one size; columnPlan serves the transforms of the columns, rowPlan those of the rows.
-// The codes of the 1-D routines.
+// Both matrices have the same size; columnPlan is for the transforms of the columns, rowPlan for those of
+// the rows. The codes are those of the 1-D routines.
 template <class Transform>
 ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
                            const ConstRealMatrix &in, const RealMatrix &out);

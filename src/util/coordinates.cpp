@@ -13,8 +13,8 @@ namespace qx {
 
 namespace {
 
-// Beyond it a sum of three products by elements of a rotation may overflow where its result does
-// not.
+// Beyond this, the sum of three products with elements of a rotation may overflow although its
+// result does not.
 constexpr double largestPlain = 0x1p1021;
 
 double LargestOf(const DBL *const *arrays, int count, int32_t n) {
@@ -24,8 +24,8 @@ double LargestOf(const DBL *const *arrays, int count, int32_t n) {
     return largest;
 }
 
-// The product of three turns is formed in twice the precision: what is left are the errors of the
-// sines and cosines.
+// The product of three rotations is formed in twice the precision, so that only the errors of the
+// sines and cosines remain.
 struct ExtendedRotation {
     Extended m[3][3];
 };
@@ -110,8 +110,8 @@ Rotation RotationOf(EulerAngles angles, EulerAxes axes) {
 //     m[k][k] = cos a1 cos a2, m[k][j] = -e sin a1 cos a2, m[k][i] = e sin a2,
 // two give
 //     m[i][k] = -e cos a1 sin a2, m[i][j] = sin a1 sin a2, m[i][i] = cos a2.
-// The third angle is read from what is left when the first has been turned back, so that it makes
-// up for the error that the first has near the lock.
+// The third angle is computed after the first rotation has been undone, so that it compensates for
+// the error of the first angle near gimbal lock.
 EulerAngles AnglesOf(const Rotation &rotation, EulerAxes axes) {
     const auto &m = rotation.m;
     const int i = axes.first;
@@ -129,7 +129,7 @@ EulerAngles AnglesOf(const Rotation &rotation, EulerAxes axes) {
         return angles;
     }
     angles.first = std::atan2(sine, cosine);
-    // Column j of the rotation without the first turn.
+    // Column j of the matrix without the first rotation.
     const double c = std::cos(angles.first);
     const double s = e * std::sin(angles.first);
     const auto left = [&](int row) { return m[row][j] * c + m[row][k] * s; };
@@ -142,7 +142,7 @@ ErrorCode NearestRotation(const DBL *matrix, Rotation &rotation) {
     for (int i = 0; i < 3; ++i)
         for (int j = 0; j < 3; ++j)
             rotation.m[i][j] = matrix[3 * i + j];
-    // Elements beyond 2 are no rotation's; their products might overflow.
+    // No rotation has elements beyond 2, and their products might overflow.
     for (int element = 0; element < 9; ++element)
         if (!(std::fabs(matrix[element]) <= 2.0))
             return ErrBadCoefficients;
@@ -153,7 +153,7 @@ ErrorCode NearestRotation(const DBL *matrix, Rotation &rotation) {
                 return ErrBadCoefficients;
     if (Determinant(rotation) < 0.0)
         return ErrBadCoefficients;
-    // The departure is squared by each step: 1e-6, 1e-12, 1e-24.
+    // Each step squares the departure: 1e-6, 1e-12, 1e-24.
     StepToOrthogonal(rotation, departure);
     StepToOrthogonal(rotation, Departure(rotation));
     return 0;
@@ -188,7 +188,7 @@ void Rotate3D(const DBL *const from[3], int32_t n, const Rotation &rotation, DBL
 
 namespace {
 
-// Points are converted a block at a time, so that what lies between stays in the cache.
+// Points are converted a block at a time, so that intermediate results stay in the cache.
 constexpr int32_t block = 128;
 typedef DBL Column[block];
 
@@ -217,8 +217,7 @@ void Inclinations(const DBL *fromAxis, const DBL *height, int32_t n, DBL *inclin
     ArcTangents(fromAxis, above, n, inclinations);
 }
 
-// What azimuths become where the distance from the axis is negative or the azimuth itself is
-// beyond its range; 0 on the axis.
+// Brings azimuths into their range, also if the distance from the axis is negative; 0 on the axis.
 void AzimuthsInRange(const DBL *given, const DBL *fromAxis, int32_t n, DBL *azimuths) {
     bool areInRange = true;
     for (int32_t i = 0; i < n; ++i) {
@@ -250,12 +249,12 @@ void Products(const DBL *x, const DBL *y, int32_t n, DBL *products) {
         products[i] = x[i] * y[i];
 }
 
-// At any address, which std::copy does not promise.
+// Copies from and to any address, which std::copy does not guarantee.
 void CopyColumn(const DBL *x, int32_t n, DBL *y) {
     std::memcpy(y, x, sizeof(DBL) * static_cast<std::size_t>(n));
 }
 
-// Of a block of n points; the results lie apart from them.
+// The coordinates of a block of n points, in and out; the results do not overlap the inputs.
 typedef const DBL *const *From;
 typedef DBL *const *To;
 
@@ -286,7 +285,7 @@ void SphericalToCylindrical(From p, int32_t n, To q) {
     AzimuthsInRange(p[1], sines, n, q[1]);
     Products(p[0], cosines, n, q[2]);
 }
-// The distance from the axis may overflow where no result does.
+// The distance from the axis may overflow although no result does, so the points are scaled.
 void CartesianToSpherical(From p, int32_t n, To q) {
     constexpr double down = 0x1p-2;
     constexpr double up = 0x1p+2;

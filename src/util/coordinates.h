@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// Rotations of the coordinate system and changes of coordinates; include/qx/coordinates.h has the
-// conventions.
+// Rotations of the coordinate system and changes of coordinates; include/qx/coordinates.h documents
+// the conventions.
 
 struct Rotation {
     double m[3][3];
@@ -18,9 +18,9 @@ struct EulerAngles {
     double first, second, third;
 };
 
-// The axes that a sequence of Euler angles turns about, 0 to 2 for X to Z. `other` is the axis that
-// is neither the first nor the second, and `sign` is +1 where first, second, other follow each
-// other as X, Y, Z do, else -1.
+// The axes of rotation of a sequence of Euler angles, 0 to 2 for X to Z. `other` is the axis that
+// is neither the first nor the second, and `sign` is +1 if first, second, other are in the cyclic
+// order of X, Y, Z, otherwise -1.
 struct EulerAxes {
     int first, second, third, other;
     double sign;
@@ -29,14 +29,14 @@ struct EulerAxes {
 constexpr int32_t eulerSequences = 12;
 EulerAxes AxesOf(int32_t sequence); // 0 <= sequence < eulerSequences
 
-// The angles are finite.
+// The angles must be finite.
 Rotation RotationOf(EulerAngles angles, EulerAxes axes);
 EulerAngles AnglesOf(const Rotation &rotation, EulerAxes axes);
 
 // The rotation nearest to a 3 by 3 matrix of finite elements. ErrBadCoefficients.
 ErrorCode NearestRotation(const DBL *matrix, Rotation &rotation);
 
-// Finite coordinates of n points, which the results do not overlap.
+// The coordinates of n points must be finite; the results must not overlap them.
 void Rotate2D(const DBL *x, const DBL *y, int32_t n, double angle, DBL *newX, DBL *newY);
 void Rotate3D(const DBL *const from[3], int32_t n, const Rotation &rotation, DBL *const to[3]);
 

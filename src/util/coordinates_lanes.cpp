@@ -27,7 +27,7 @@ QX_INLINE void TurnSpace(const DBL *const *from, int32_t i, const Rotation &r, D
 
 } // namespace
 
-// Zero times a finite number is zero, and times any other it is NaN, which no later sum removes.
+// Zero times a finite number is zero; zero times any other is NaN, which the sum keeps.
 bool AllFinite(const DBL *x, int32_t n) {
     const L zero(0.0);
     L sums[4] = {zero, zero, zero, zero};

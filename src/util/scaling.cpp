@@ -12,7 +12,7 @@ int32_t Count(RealVector x) { return static_cast<int32_t>(x.size()); }
 
 void ScaleToUnitRange(RealVector x, double &scale, double &offset) {
     const Range range = RangeOf(x.data(), Count(x));
-    if (range.highest < range.lowest) { // nothing but NaN
+    if (range.highest < range.lowest) { // only NaN
         scale = offset = kNaN;
         return;
     }

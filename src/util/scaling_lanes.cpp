@@ -22,7 +22,7 @@ QX_INLINE void Each(DBL *x, int32_t n, Operation operation) {
         operation(One::load(x + i)).store(x + i);
 }
 
-// Sixteen values that each take in every sixteenth element.
+// Updates sixteen values, each with every sixteenth element.
 template <class Take>
 QX_INLINE void Gather(const DBL *x, int32_t n, DBL *values, Take take) {
     L held[vectors];
@@ -56,7 +56,7 @@ QX_INLINE double Reduced(const DBL *x, int32_t n, double start, Take take) {
     return Combined(values, take);
 }
 
-// The comparisons are false for NaN, which is never taken.
+// The comparisons are false for NaN, which is therefore never selected.
 struct Highest {
     template <class V>
     QX_INLINE V operator()(V held, V x) const {
@@ -88,7 +88,7 @@ Range RangeOf(const DBL *x, int32_t n) {
         low[k] = infinity;
         high[k] = -infinity;
     }
-    // Block by block, so that the second look finds the elements in the cache.
+    // Block by block, so that the second pass finds the elements in the cache.
     constexpr int32_t block = 2048;
     for (int32_t i = 0; i < n; i += n - i < block ? n - i : block) {
         const int32_t count = n - i < block ? n - i : block;
@@ -125,9 +125,9 @@ void MultiplyAndDivide(DBL *x, int32_t n, double factor, double divisor) {
     Each(x, n, [=]<class V>(V value) { return value * V(factor) / V(divisor); });
 }
 
-// The number of turns hardly ever changes from one element to the next. As long as it stays, the
-// unwrapped values follow from the given ones alone, and nothing waits for the value before: lanes
-// of them are computed with the turns so far, and kept if those are what the rule gives for each.
+// The number of turns rarely changes from one element to the next. While it does not, the unwrapped
+// values depend only on the given ones and not on the value before: a vector of them is computed
+// with the current number of turns, and kept if the rule gives this number for each element.
 void Unwrap(DBL *x, int32_t n, double period) {
     const L ones(1.0);
     double turns = 0.0;

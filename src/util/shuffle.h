@@ -19,14 +19,14 @@ void Shuffle(int32_t n, bool isUnbiased, RandomState &state, const Exchange &exc
         for (int32_t i = n - 1; i > 0; --i)
             exchange(i, static_cast<int32_t>(stream.next() * (i + 1.0)));
     } else {
-        // kept: every element changes places with any, which is biased.
+        // kept: each element is exchanged with any element, which is biased.
         for (int32_t i = 0; i < n; ++i)
             exchange(i, static_cast<int32_t>(stream.next() * n));
     }
 }
 
-// The same without bias, by numbers of a counter: element i, from the last down to 1, changes
-// places with one of the elements 0 to i, which the block i values on decides.
+// The same without bias, with a counter-based generator: element i, from the last down to 1, is
+// exchanged with one of the elements 0 to i, which the block at position + i selects.
 template <class Exchange>
 void CounterShuffle(int32_t n, const NoisePlace &place, const Exchange &exchange) {
     constexpr int32_t atOnce = 256;
@@ -35,7 +35,7 @@ void CounterShuffle(int32_t n, const NoisePlace &place, const Exchange &exchange
         const int32_t first = std::max(1, last - atOnce + 1);
         NoisePlace piece = place;
         piece.position += static_cast<uint64_t>(first);
-        PhiloxBlocks(piece, last - first + 1, a, b);
+        PhiloxBlocks(piece, 0, last - first + 1, a, b);
         for (int32_t i = last; i >= first; --i) {
             const auto count = static_cast<uint32_t>(i) + 1;
             const uint32_t j = CounterIndex(a[i - first], count, place, static_cast<uint64_t>(i));

@@ -10,7 +10,7 @@ ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants)
         int32_t selector;
         double cg, enbw;
     };
-    // Stored on their own, not derived from the coefficients of the windows.
+    // Stored values, not derived from the coefficients of the windows.
     static constexpr Row table[] = {
         {0, 1.0, 1.0},
         {1, 0.5, 1.5},
@@ -23,7 +23,7 @@ ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants)
         {8, 0.27105140069342415, 2.631905},
         {9, 0.323215218, 2.215350782519},
         {11, 0.3635819, 1.9761117},
-        // Not read by an export: these windows are measured, so that the value depends on n.
+        // No export reads these: the windows are measured, so that the value depends on n.
         {31, 0.5, 1.45584787},
         {32, 0.40528473457, 1.78574087544},
         {33, 0.375, 1.91746031746},

@@ -29,7 +29,7 @@ struct Terms {
     }
 };
 
-// The same with the state in registers.
+// The same, with the state in registers.
 template <int Count>
 struct FixedTerms {
     explicit FixedTerms(const Terms &terms) : constant(terms.constant) {

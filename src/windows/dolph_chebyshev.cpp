@@ -34,8 +34,8 @@ void ChebyshevSpectrum(RealVector W, int32_t length, double ratio) {
     }
 }
 
-// The right half of the window of that length, from the middle outward, in the first `half` values
-// of w.
+// The right half of the window of the given length, from the middle outwards, in the first `half`
+// values of w.
 ErrorCode RightHalf(DBL *w, int32_t half, int32_t length, double ratio) {
     const bool isEven = length % 2 == 0;
     RealVector spectrum, work;
@@ -55,14 +55,14 @@ ErrorCode RightHalf(DBL *w, int32_t half, int32_t length, double ratio) {
     return DCTInverse(plan.get(), spectrum.part(0, half), {w, half}, work.data());
 }
 
-// Fills w, of two values or more, with the window, not normalised: the inverse transform of
-// T[length-1](x0 cos(pi k / length)), whose side lobes all lie `ratio` below the main lobe. *peak
-// is its largest value.
+// Fills w, which has two or more values, with the window, without normalising it: the inverse
+// transform of T[length-1](x0 cos(pi k / length)), whose side lobes all lie `ratio` below the main
+// lobe. *peak is its largest value.
 ErrorCode GenerateDolChebyWindow(RealVector w, double ratio, double *peak) {
     const int32_t length = Count(w), half = length / 2 + length % 2;
     if (const ErrorCode status = RightHalf(w.data(), half, length, ratio))
         return status;
-    const int32_t middle = length % 2; // of an odd window, on both sides the same value
+    const int32_t middle = length % 2; // 1 if both halves share the middle value
     std::memcpy(&w[half], &w[middle], static_cast<std::size_t>(half - middle) * sizeof(DBL));
     Reverse(w.data(), half);
     *peak = -std::numeric_limits<double>::infinity();

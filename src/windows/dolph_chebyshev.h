@@ -8,9 +8,9 @@ namespace qx {
 
 // The Dolph-Chebyshev window, whose side lobes all lie `ratio` below the main lobe (C. L. Dolph: A
 // current distribution for broadside arrays which optimizes the relationship between beam width
-// and side-lobe level, 1946), with its peak brought to 1: of n values where `symmetric`, else the
-// first n of n + 1, which is the periodic form. The ratio is linear and not checked: below 1 it
-// gives NaN. A single sample is left as it is. ErrEmptyInput, ErrOutOfMemory.
+// and side-lobe level, 1946), with its peak scaled to 1: of n values if `symmetric`, otherwise the
+// first n of n + 1 values, which is the periodic form. The ratio is linear and not checked: below 1
+// the result is NaN. A single sample is left as it is. ErrEmptyInput, ErrOutOfMemory.
 template <ElementType E>
 ErrorCode ApplyDolChebyWindow(VectorView<E> x, double ratio, bool symmetric);
 

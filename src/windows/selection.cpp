@@ -31,7 +31,7 @@ bool IsCosineSum(int32_t selector) {
     return selector != Rectangle && CosineWindowCoefs(selector).count > 0;
 }
 
-// Selectors 30 to 34 and 60 to 62: the windows whose periodic form other routines build on.
+// Selectors 30 to 34 and 60 to 62: the windows on whose periodic form other routines are built.
 template <ElementType E>
 ErrorCode ApplyPeriodicShape(VectorView<E> x, int32_t selector, double param) {
     switch (selector) {
@@ -56,7 +56,7 @@ ErrorCode ApplyPeriodicShape(VectorView<E> x, int32_t selector, double param) {
     }
 }
 
-// The symmetric window over ones.
+// The symmetric window applied to ones.
 ErrorCode GenerateSymmetric(RealVector w, int32_t selector, double param) {
     if (selector == Rectangle)
         return 0;
@@ -64,7 +64,7 @@ ErrorCode GenerateSymmetric(RealVector w, int32_t selector, double param) {
         return ApplyDolChebyWindow(w, param, true);
     if (selector == Gaussian)
         return ApplyGaussWindow(w, param, true);
-    // The periodic window of one sample less, closed by its first sample.
+    // The periodic window with one sample less, followed by its first sample.
     const RealVector periodic = w.part(0, w.size() - 1);
     const ErrorCode status = IsCosineSum(selector)
                                  ? ApplyCosineWindowBySelector(periodic, selector, false)

@@ -6,14 +6,14 @@
 
 namespace qx {
 
-// A window by its selector, see qx/windows.h for the table.
+// Windows by selector; qx/windows.h has the table.
 
-// The parameter, or the window's own default where it is NaN (for selectors 61 and 62 also where
-// it is negative); 0 for windows without a parameter.
+// The parameter, or the window's default if it is NaN (for selectors 61 and 62 also if it is
+// negative); 0 for windows without a parameter.
 double WindowDefaultParam(int32_t selector, double param);
 
-// The parameter as the window's routine takes it: the default filled in, and decibels turned
-// into a ratio for Dolph-Chebyshev.
+// The parameter as the window's routine takes it: the default filled in, and decibels converted to
+// a ratio for Dolph-Chebyshev.
 double PreparedWindowParam(int32_t selector, double param);
 
 // The symmetric form: the mirror of sample i is n - 1 - i. ErrEmptyInput, ErrInvalidSelector.
@@ -32,7 +32,7 @@ template <ElementType E>
 ErrorCode ApplyWindowBySelector(VectorView<E> x, int32_t selector, double param, bool scaled,
                                 bool symmetric);
 
-// The periodic, unscaled window of selectors 30 to 34 and 60 to 62 itself, for measuring it.
+// The values of the periodic, unscaled window of selectors 30 to 34 and 60 to 62, for measuring it.
 // ErrInvalidSelector.
 ErrorCode GenerateForMeasurement(RealVector w, int32_t selector, double param);
 

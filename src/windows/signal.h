@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// What a window does to a sample: the real and the complex form of every window are one text over
-// these. A complex sample has both parts multiplied by the same real value.
+// The effect of a window on a sample: the real and the complex form of every window are one
+// template over these functions. A complex sample has both parts multiplied by the same real value.
 inline void Scale(DBL &sample, double w) { sample *= w; }
 inline void Scale(CDB &sample, double w) {
     sample.re *= w;

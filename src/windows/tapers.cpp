@@ -9,7 +9,7 @@ namespace qx {
 
 namespace {
 
-// A point that moves round the unit circle in equal steps.
+// A point that moves around the unit circle in equal steps.
 struct Rotation {
     explicit Rotation(double theta) : cosTheta(std::cos(theta)), sinTheta(std::sin(theta)) {}
     void advance() {
@@ -21,8 +21,8 @@ struct Rotation {
     double cosine = 1.0, sine = 0.0;
 };
 
-// A window that is 0 at sample 0 and mirrored about n/2, from its value at 1, 2, ...; `value` is
-// asked for these in order, and for the middle sample of an even n.
+// A window that is 0 at sample 0 and mirrored about n/2, from its values at 1, 2, ...; `value` is
+// called for these in order, and for the middle sample of an even n.
 template <ElementType E, class Value>
 void ScaleMirrored(VectorView<E> x, Value value) {
     const int32_t n = Count(x);
@@ -37,8 +37,9 @@ void ScaleMirrored(VectorView<E> x, Value value) {
         Scale(x[half], value(half));
 }
 
-// The modified Bessel function of order 0, as far as a window needs it.
-// kept: the test is absolute and the sum ends after 25 terms, so a large argument is cut short
+// The modified Bessel function of order 0, as far as the window needs it.
+// kept: the test is absolute and the sum ends after 25 terms, so that it is truncated for large
+// arguments
 double KaiserBesselI0(double z) {
     constexpr int rounds = 25;
     constexpr double smallest = 1e-08;
@@ -56,7 +57,7 @@ double KaiserBesselI0(double z) {
     return sum;
 }
 
-// The integer part of a count of samples, kept within 0 and n; a NaN counts as 0.
+// The integer part of a number of samples, clamped to 0 to n; NaN counts as 0.
 int32_t SampleCount(double samples, int32_t n) {
     if (!(samples > 0.0))
         return 0;
@@ -70,7 +71,7 @@ ErrorCode ApplyTriangleWindow(VectorView<E> x) {
     const int32_t n = Count(x);
     if (n < 1)
         return ErrEmptyInput;
-    Clear(x[0]); // kept: also for a single sample, unlike every other window
+    Clear(x[0]); // kept: even for a single sample, unlike all other windows
     const double delta = 2.0 / n;
     // The middle sample of an even n is its own mirror and is scaled by 1 twice.
     for (int32_t i = 1; i <= n / 2; ++i) {
@@ -246,7 +247,7 @@ ErrorCode ApplyCosTaperedWindow(VectorView<E> x, double taperRatio) {
     const double delta = kPi / (2.0 * taper);
     double phase = delta;
     for (int32_t i = 1; i < taper; ++i) {
-        // kept: the complex form takes the phase afresh, the real form accumulates it
+        // kept: the complex form computes the phase anew, the real form accumulates it
         if constexpr (E == ElementType::CDB)
             phase = i * kPi / (2.0 * taper);
         const double sine = std::sin(phase);

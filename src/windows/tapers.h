@@ -6,9 +6,9 @@
 
 namespace qx {
 
-// The windows that are no cosine sum. Each multiplies the n samples of x in place and is
-// periodic (the mirror of sample i is n - i) unless its line says otherwise. ErrEmptyInput for
-// n < 1; a single sample is left as it is, unless stated.
+// The windows that are not cosine sums. Each multiplies the n samples of x in place and is periodic
+// (the mirror of sample i is n - i) unless its line says otherwise. ErrEmptyInput for n < 1; a
+// single sample is left as it is, unless stated.
 
 // 2 i / n up to the middle. A single sample becomes 0.
 template <ElementType E>
@@ -25,7 +25,7 @@ ErrorCode ApplyParzenWindow(VectorView<E> x);
 // sin(theta) / pi - (2 i / n) cos(theta) with theta = 2 pi i / n.
 template <ElementType E>
 ErrorCode ApplyBohmanWindow(VectorView<E> x);
-// I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2 i / n and a series of I0 of its own.
+// I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2 i / n and its own series of I0.
 template <ElementType E>
 ErrorCode ApplyKaiserWindow(VectorView<E> x, double beta);
 // exp(-t^2 / (2 sigma^2)), t in units of n + 1 samples from the middle at n/2, or, if
@@ -35,7 +35,7 @@ ErrorCode ApplyGaussWindow(VectorView<E> x, double sigma, bool symmetric);
 // Keeps the first `percent` per cent of the samples. ErrFewerThanTwo for n < 2.
 template <ElementType E>
 ErrorCode ApplyForceWindow(VectorView<E> x, double percent);
-// Falls from 1 to `finalValue` exponentially. ErrFewerThanTwo for n < 2, then
+// Decays exponentially from 1 to `finalValue`. ErrFewerThanTwo for n < 2, then
 // ErrFinalValueNotPositive.
 template <ElementType E>
 ErrorCode ApplyExpWindow(VectorView<E> x, double finalValue);

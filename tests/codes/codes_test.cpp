@@ -5,10 +5,10 @@
 #include <algorithm>
 #include <set>
 
-// Every code that an export documents is raised by it, and of two faults at once the code that
-// comes first in the documentation. How each is raised is data: witnesses.txt, which
-// tools/find_codes writes, and by_hand.txt. A code that only a test of the family raises, or none,
-// has a line in without_witness.txt.
+// Every export raises each code that it documents; if a call has two faults, it reports the code
+// that comes first in the documentation. The calls are listed in witnesses.txt, which
+// tools/find_codes writes, and in by_hand.txt. A code that only a test of the family raises, or
+// that no test raises, has a line in without_witness.txt.
 
 namespace qx::test {
 
@@ -31,7 +31,7 @@ std::vector<WithoutWitness> ReadExceptions() {
     return found;
 }
 
-// What is found by running the witnesses, once for all tests.
+// The results of running the witnesses, which happens once for all tests.
 class Codes : public testing::Test {
 protected:
     static void SetUpTestSuite() {
@@ -53,7 +53,7 @@ protected:
             if (witness.later == 0)
                 witnessed[name].insert(witness.code);
             else if (!ExportOf(name)->hasInOrder(witness.code, witness.later))
-                wrong += "\n" + line + ": the documentation has them in another order";
+                wrong += "\n" + line + ": the documentation lists them in another order";
         }
     }
 
@@ -65,8 +65,8 @@ std::map<std::string, std::set<ErrorCode>> Codes::witnessed, Codes::raised;
 
 TEST_F(Codes, AreRaisedAsTheWitnessesSayAndInTheOrderOfTheDocumentation) { EXPECT_EQ(wrong, ""); }
 
-// Lack of memory and refused resizes belong to the conformance tests, exports without a recipe to
-// tests of their own.
+// Out-of-memory codes and refused resizes are covered by the conformance tests; exports without a
+// recipe have their own tests.
 TEST_F(Codes, AreEachWitnessedOrListedWithAReason) {
     std::map<std::string, std::set<ErrorCode>> exceptions;
     for (const WithoutWitness &one : ReadExceptions())
@@ -88,8 +88,8 @@ TEST_F(Codes, AreEachWitnessedOrListedWithAReason) {
     }
 }
 
-// A reason "raised in FILE, TEST" names a test that is there.
-TEST_F(Codes, WithoutWitnessNameTestsThatAreThere) {
+// A reason "raised in FILE, TEST" names a test that exists.
+TEST_F(Codes, WithoutWitnessNameExistingTests) {
     const std::string head = "raised in ";
     for (const WithoutWitness &one : ReadExceptions()) {
         if (!one.reason.starts_with(head))
@@ -121,8 +121,9 @@ TEST_F(Codes, WithoutWitnessAreDocumentedAndNotRaised) {
 
 // ---- NaN ----
 
-// What the recipes of an export show of a NaN first, in the middle and last in each input, and in
-// each number: by places, in the order of the header's words.
+// What the calls of an export's recipes do with a NaN as the first, middle or last element of each
+// input array, or in place of a number: the outcomes of each place, in the order in which a header
+// lists them.
 class NaNs {
 public:
     explicit NaNs(const Interceptable &target) : target_(target) {}
@@ -151,7 +152,8 @@ public:
         }
     }
 
-    // An array in a record that goes both ways, and of which nothing is seen, counts as an output.
+    // An array in a record that is read and written counts as an output if a NaN in it has no
+    // effect.
     std::map<std::string, std::string> words() const {
         std::map<std::string, std::string> found;
         for (const auto &[place, outcomes] : seen_)
@@ -206,7 +208,7 @@ private:
     std::set<std::string> mayBeOutputs_;
 };
 
-// The sentence as a header has it: places of the same words together.
+// The sentence as it appears in a header, with places of the same outcome joined.
 std::string SentenceOf(const Interceptable &target, std::map<std::string, std::string> words) {
     std::string sentence;
     for (const InterceptedArgument &argument : target.arguments)
@@ -242,7 +244,7 @@ TEST(NaN, DoesInEachInputWhatItsHeaderSays) {
         for (const Recipe *recipe : recipes[target.name])
             nans.look(*recipe);
         if (nans.words() != target.nan) {
-            ADD_FAILURE() << target.name << ": its recipes show \""
+            ADD_FAILURE() << target.name << ": according to its recipes, \""
                           << SentenceOf(target, nans.words()) << "\"";
         }
     }

@@ -14,13 +14,13 @@
 #include <unistd.h>
 
 // Looks for arguments that make each export raise each code that it documents, one fault at a time
-// and then two, and writes them as lines of tests/codes/witnesses.txt. What has not been found, and
-// pairs of which always the later code wins, go to the standard error.
+// and then two, and writes them as lines of tests/codes/witnesses.txt. Codes that were not raised,
+// and pairs of which the later code always wins, are reported on standard error.
 //
 //     find_codes MODULE [--only EXPORT] [--tries N] [--code CODE]
 //
-// With --code it looks for that one alone, with numbers of all sizes: the quick way to what does
-// not converge.
+// With --code it looks for that code alone, with numbers of all magnitudes: a quick way to find
+// inputs that do not converge.
 
 namespace qx::test {
 
@@ -121,8 +121,8 @@ std::vector<std::string> ActionsOn(const SpoilPlace &place) {
     return actions;
 }
 
-// A negative size and one array for two arguments only where a code is for them: such calls may end
-// the process.
+// Tries negative sizes, and one array for two arguments, only if the export has a code for them:
+// such calls may end the process.
 std::vector<Spoil> AllSpoils(const Base &base, const std::vector<ErrorCode> &wanted) {
     const auto wants = [&wanted](ErrorCode code) {
         return std::find(wanted.begin(), wanted.end(), code) != wanted.end();
@@ -154,12 +154,12 @@ std::vector<Spoil> AllSpoils(const Base &base, const std::vector<ErrorCode> &wan
     return all;
 }
 
-// All dimensions of one size become another one, so that arrays still fit each other.
+// Changes all dimensions of one size to another size together, so that the arrays still match.
 std::vector<Spoils> JointSizes(const Base &base) {
     std::set<int32_t> sizes;
     for (const SpoilPlace &place : base.places)
         sizes.insert(place.sizes.begin(), place.sizes.end());
-    std::vector<Spoils> all(1); // no elements anywhere, for a start
+    std::vector<Spoils> all(1); // the first: no elements anywhere
     for (const SpoilPlace &place : base.places)
         if (place.dimensions > 0)
             all[0].push_back({place.name, SizeAction(std::vector<int32_t>(place.sizes.size(), 0))});
@@ -229,15 +229,15 @@ public:
             look(b, some);
         }
     }
-    // Numbers of all sizes in all arrays, and as a last resort in symmetric matrices: iterations
-    // that do not converge.
+    // Numbers of all magnitudes in all arrays, also in symmetric matrices: a last resort for
+    // iterations that do not converge.
     void wild() {
         for (int32_t seed = 1; seed <= tries / 6; ++seed)
             for (std::size_t b = 0; b < bases_.size() && !missing().empty(); ++b)
                 for (const bool mirrors : {false, true})
                     look(b, WildSpoils(bases_[b], seed, mirrors));
     }
-    // Two faults at once, for each pair of codes.
+    // Two faults in one call, for each pair of codes.
     void pairs() {
         for (std::size_t i = 0; i < wanted_.size(); ++i)
             for (std::size_t j = 0; j < wanted_.size(); ++j)
@@ -288,7 +288,7 @@ private:
                 all.push_back({b, {base.recipe, base.n, code, 0, spoils}});
             }
     }
-    // Leaves out spoils that the code does not need.
+    // Removes spoils that are not needed to raise the code.
     static void reduce(const Base &base, ErrorCode code, Spoils &spoils) {
         for (std::size_t i = 0; i < spoils.size() && spoils.size() > 1;) {
             Spoils fewer = spoils;
@@ -350,7 +350,7 @@ std::vector<Base> BasesOf(const Interceptable &target) {
     for (const Recipe &recipe : AllRecipes())
         if (recipe.exportName() == target.name)
             recipes.push_back(&recipe);
-    // The sizes in the outer loop, so that each recipe is among the first; 8 makes the best start.
+    // The outer loop is over sizes, so that each recipe is tried early; size 8 comes first.
     std::set<int32_t> sizes;
     for (const Recipe *recipe : recipes)
         for (const int32_t n : recipe->sizes)
@@ -404,8 +404,8 @@ int Main(int count, char **words) {
                         [&](const Recipe &recipe) { return recipe.exportName() == target.name; });
         if (!hasRecipe || target.codes.empty() || (!only.empty() && only != target.name))
             continue;
-        // In a process of its own: what crashes or does not come back ends the search in one
-        // export.
+        // In a separate process: a call that crashes or does not return ends the search for one
+        // export only.
         const pid_t child = fork();
         if (child == 0)
             SearchIn(target);

@@ -20,7 +20,7 @@ struct Interception {
 };
 thread_local Interception *active = nullptr;
 
-// Where a place is in the memory of one call.
+// The location of a place in the memory of one call.
 struct Located {
     std::string name;
     int dimensions;
@@ -98,7 +98,7 @@ int64_t CountOf(const std::vector<int32_t> &sizes) {
     return count;
 }
 
-// Only the sizes, for a block that the host cannot resize: not more than it holds.
+// Changes only the sizes, for a block that the host cannot resize: to no more than it holds.
 bool Shrink(const Located &place, const std::vector<int32_t> &before,
             const std::vector<int32_t> &sizes) {
     if (CountOf(sizes) > CountOf(before))
@@ -143,7 +143,7 @@ bool Resize(const Located &place, const std::vector<int32_t> &sizes) {
     return true;
 }
 
-// Puts a number made of the index and of what was there into each part of each element.
+// Sets each part of each element to a function of its index and its old value.
 bool Fill(const Located &place, const std::function<double(int64_t, double)> &value) {
     if (*place.handle == nullptr || place.dimensions == 3 || IsRecord(place.element))
         return false;
@@ -157,7 +157,8 @@ bool Fill(const Located &place, const std::function<double(int64_t, double)> &va
     return count > 0;
 }
 
-// The number i of those that `seed` stands for: their range and how many are 0 change with it.
+// Number i of the sequence that `seed` selects; the range and the share of zeros depend on the
+// seed.
 double Wild(uint64_t seed, int64_t i) {
     constexpr int range[] = {1000, 500, 100, 330, 1000, 0};
     constexpr double zeros[] = {0, 0, 0.3, 0.6};
@@ -248,7 +249,7 @@ bool Apply(const std::string &action, const Located &place, const std::vector<Lo
     return false;
 }
 
-// The places of a call. What is const for the export is changed in a copy.
+// The places of a call. Arguments that are const for the export are changed in a copy.
 class Places {
 public:
     Places(const Interceptable &target, Value *values) {
@@ -321,8 +322,8 @@ private:
     std::vector<std::vector<unsigned char>> copies_;
 };
 
-// Pointers of a call that are made null, and words of the caller's that hold something else than a
-// cell, until the call is over.
+// Sets pointers of a call to null, and words of the caller to something other than a cell, until
+// the call returns.
 class SpoiltPointers {
 public:
     SpoiltPointers(const Interceptable &target, const Spoils &spoils, Value *values) {
@@ -345,7 +346,7 @@ public:
 private:
     void replace(void **word) {
         words_.push_back({word, *word});
-        *word = &noCell_[1]; // 0 before it is the mark of no kind
+        *word = &noCell_[1]; // the 0 before it marks no kind of cell
     }
     uint64_t noCell_[2] = {};
     std::vector<std::pair<void **, void *>> words_;

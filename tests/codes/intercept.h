@@ -13,16 +13,16 @@
 
 namespace qx::test {
 
-// Calls on their way from a recipe to the module. A recipe makes valid arguments; spoils change
-// some of them, named as in the declaration, before the module sees them.
+// Intercepts calls between a recipe and the module. A recipe makes valid arguments; spoils change
+// some of them, named as in the declaration, before the module receives them.
 
 enum class ArgumentKind { Array1D, Array2D, Array3D, Number, Record, Word, Error, Other };
 
 struct InterceptedArgument {
     const char *name;
     ArgumentKind kind;
-    bool isByValue, isInput, isOutput; // neither of the two last: both ways
-    std::string element;               // of the host, or a record's name
+    bool isByValue, isInput, isOutput; // neither isInput nor isOutput: both read and written
+    std::string element;               // a host type, or a record's name
 };
 
 struct Interceptable {
@@ -30,11 +30,10 @@ struct Interceptable {
     int32_t (*real)(const Value *);
     bool returnsCode;
     std::vector<ErrorCode> codes;
-    std::vector<ErrorCode> checks; // as the documentation has them: some codes more than once
+    std::vector<ErrorCode> checks; // in documentation order: some codes more than once
     bool hasInOrder(ErrorCode first, ErrorCode later) const;
     std::vector<InterceptedArgument> arguments;
-    std::map<std::string, std::string>
-        nan; // by arguments and "record.field"s, what a NaN there does
+    std::map<std::string, std::string> nan; // the effect of a NaN, by argument or "record.field"
 };
 
 struct LayoutField {
@@ -48,7 +47,7 @@ struct RecordLayout {
     std::vector<LayoutField> fields;
 };
 
-// What the build writes from the catalogue.
+// Generated from the catalogue by the build.
 const std::vector<Interceptable> &AllInterceptable();
 const std::map<std::string, RecordLayout> &AllLayouts();
 const std::map<std::string, ErrorCode> &AllCodes();
@@ -72,13 +71,13 @@ T Typed(void *plain) {
 // A change of one argument, or of a field "record.field":
 //     x size 0          a size 3x2           new elements repeat the old ones
 //     x fill nan        x at 2 -1            numbers; of a complex element both parts
-//     x scale 1e300     x first              0 but for the first element
+//     x scale 1e300     x first              0 except for the first element
 //     x up    x down    ascending or descending whole numbers
-//     x wave            a growing sine, of which no value comes twice
-//     a wild 5          powers of 2 of all sizes times noise, and zeros, by that seed
+//     x wave            a growing sine in which no value occurs twice
+//     a wild 5          powers of 2 of all sizes times noise, and zeros, from that seed
 //     a mirror          the lower triangle over the upper one: a symmetric or Hermitian matrix
-//     order = -1        y is x               another value; the same array
-//     slot foreign      ref null             a word that holds no cell of ours; a null pointer
+//     order = -1        y is x               a new value; the same array
+//     slot foreign      ref null             a word that holds no cell of the module; a null pointer
 struct Spoil {
     std::string place, action;
     bool operator==(const Spoil &) const = default;
@@ -87,7 +86,7 @@ typedef std::vector<Spoil> Spoils;
 std::string Written(const Spoils &spoils);
 Spoils ReadSpoils(const std::string &text);
 
-// What can be spoilt in a call, as it was before.
+// A place that can be spoilt in a call, with its original content.
 struct SpoilPlace {
     std::string name;
     int dimensions; // of an array; 0 for a number
@@ -100,8 +99,8 @@ struct SpoilPlace {
 struct SpoiltRun {
     std::vector<ErrorCode> codes;   // of its calls
     std::vector<SpoilPlace> places; // of the first call
-    std::vector<double> numbers;    // those of all outputs that may be NaN
-    bool applied = true;            // whether each spoil had its place
+    std::vector<double> numbers;    // of all outputs that may be NaN
+    bool applied = true;            // whether a place was found for each spoil
     bool hasRaised(ErrorCode code) const;
 };
 SpoiltRun RunSpoilt(const Recipe &recipe, int32_t n, const Spoils &spoils);

@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""make_interceptors.py CATALOGUE OUTPUT: writes, for each export of the catalogue, a function of its
-name that shows the arguments to whoever changes them on their way, and calls the module."""
+"""make_interceptors.py CATALOGUE OUTPUT: writes, for each export of the catalogue, a function of the same
+name that lets the interceptor change the arguments and then calls the module."""
 
 import json
 import sys

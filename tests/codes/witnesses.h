@@ -12,9 +12,9 @@ namespace qx::test {
 //
 //     recipe | n | codes | spoils
 //
-// The recipe with arguments for n, spoilt so, raises the first of the codes. With a second code the
-// spoils are those of two witnesses at once, and the first code is the one that comes first in the
-// documentation.
+// With arguments for size n, spoilt in this way, the recipe raises the first of the codes. If there
+// is a second code, the spoils are those of two witnesses combined, and the first code is the one
+// that comes first in the documentation.
 struct Witness {
     const Recipe *recipe = nullptr;
     int32_t n = 0;

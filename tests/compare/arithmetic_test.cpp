@@ -1,6 +1,7 @@
-// arithmetic_test MODULE: calls every export by its recipes in each of the modes of arithmetic that a host may
-// have set, and compares the bits with those of the usual modes. The modes are set between the recipe, which
-// computes its arguments, and the export. After a call the caller has its modes again.
+// arithmetic_test MODULE: calls every export by its recipes in each of the arithmetic modes that a
+// host may have set, and compares the bits with those of the usual modes. The modes are set between
+// the recipe, which computes its arguments, and the export. Each call must restore the caller's
+// modes.
 
 #include "tests/compare/trampolines.h"
 #include "tests/support/host_arithmetic.h"
@@ -15,18 +16,10 @@ extern "C" {
 __attribute__((visibility("hidden"))) uint32_t qxModesOfCalls = 0;
 }
 
+namespace qx::test {
 namespace {
 
-using qx::test::Call;
-using qx::test::CurrentArithmetic;
-using qx::test::HashEveryExport;
-using qx::test::InArithmetic;
-using qx::test::modesOfHosts;
-using qx::test::NamedModes;
-using qx::test::Recipe;
-using qx::test::usualArithmetic;
-
-// The exports that give other bits, or leave other modes; each is printed.
+// Prints and counts the exports that give other bits or leave other modes.
 int Different(const NamedModes &host, const std::map<std::string, uint64_t> &expected) {
     int different = 0;
     qxModesOfCalls = host.modes;
@@ -45,15 +38,16 @@ int Different(const NamedModes &host, const std::map<std::string, uint64_t> &exp
 }
 
 } // namespace
+} // namespace qx::test
 
 int main(int count, char **arguments) {
     if (count != 2 || qx::test::BindExports(arguments[1]) == nullptr)
         return 2;
-    const auto expected = HashEveryExport();
+    const auto expected = qx::test::HashEveryExport();
     int different = 0;
-    for (const NamedModes &host : modesOfHosts)
-        different += Different(host, expected);
+    for (const qx::test::NamedModes &host : qx::test::modesOfHosts)
+        different += qx::test::Different(host, expected);
     std::printf("%zu exports in %zu modes, %d differences\n", expected.size(),
-                std::size(modesOfHosts), different);
+                std::size(qx::test::modesOfHosts), different);
     return different == 0 && expected.size() > 600 ? 0 : 1;
 }

@@ -1,4 +1,4 @@
-"""The comparison of modules finds what is planted in one of them, and nothing in a copy."""
+"""The comparison of modules finds every planted difference, and none in a copy."""
 
 import json
 import os
@@ -12,7 +12,7 @@ from pathlib import Path
 
 ROOT, DRIVER, MODULE, PLANTED = (Path(argument).resolve() for argument in sys.argv[1:5])
 del sys.argv[1:5]
-# What tests/compare/planted.cpp says, and the kind of each.
+# The differences planted in tests/compare/planted.cpp, with their kinds.
 DIFFERENCES = {"RMS_head": "elements", "Mean_head": "code", "Convolution": "resizes",
                "DCT_1DH": "sizes", "CxRMS_head": "end", "MSE_head": "end"}
 
@@ -47,7 +47,7 @@ class CompareModules(unittest.TestCase):
         self.assertEqual(status, 1)
         for name, how in (("CxRMS_head", "ended by SIGSEGV"), ("MSE_head", "ended by too much time")):
             self.assertRegex(text, rf"DIFFERS: {name}: end in .*{how}")
-        # What is said of the way to repeat a call is a way to repeat it.
+        # The printed options repeat the call.
         words = re.search(r"--only (RMS_head) --seed (\d+) --round (\d+)", text).groups()
         status, _, shown = compare(MODULE, self.planted, "--only", words[0], "--seed", words[1],
                                    "--round", words[2])
@@ -55,7 +55,7 @@ class CompareModules(unittest.TestCase):
         self.assertRegex(shown, r"(?m)^-  (rms|scalar 0)\[0\] = ")
         self.assertRegex(shown, r"(?m)^\+  (rms|scalar 0)\[0\] = ")
 
-    def test_what_is_allowed_is_no_difference(self):
+    def test_allowed_differences_are_not_reported(self):
         few = ("--only", "RMS_head", "--only", "CxRMS_head", "--calls", "300", "--seconds", "1")
         status, found, text = compare(MODULE, self.planted, *few, "--allow", "CxRMS_head:end")
         self.assertEqual((status, found), (1, {"RMS_head": "elements"}), text)
@@ -63,14 +63,14 @@ class CompareModules(unittest.TestCase):
                                       "--allow", "RMS_head:elements")
         self.assertEqual((status, found), (0, {}), text)
 
-    def test_a_copy_is_equal_and_a_new_export_no_difference(self):
+    def test_a_copy_is_equal_and_a_new_export_is_not_reported(self):
         status, found, text = compare(MODULE, MODULE, "--calls", "4000")
         self.assertEqual((status, found), (0, {}), text)
         status, found, text = compare(self.planted, MODULE, "--only", "TDist_head")
         self.assertEqual((status, found), (0, {}), text)
         self.assertIn("TDist_head: new", text)
 
-    def test_what_cannot_be_compared_has_a_status_of_its_own(self):
+    def test_what_cannot_be_compared_has_its_own_status(self):
         for arguments in ((MODULE, self.planted / "no"), (MODULE, DRIVER.parent / "catalogue.json"),
                           (MODULE, MODULE, "--only", "No_such"), (MODULE, MODULE, "--allow", "A:b")):
             self.assertEqual(compare(*arguments)[0], 2, arguments)

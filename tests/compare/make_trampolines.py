@@ -1,8 +1,8 @@
 #!/usr/bin/python3
 """make_trampolines.py CATALOGUE OUTPUT [--show] [--modes] [--but NAME...]: writes, for each export of the
-catalogue, a function of its name that jumps to wherever a module has it, so that one program calls
-the exports of any module that it loads. --show: others see the functions, too. --modes: each sets the modes of
-arithmetic in qxModesOfCalls first, unless that is 0 (x86). --but: not these."""
+catalogue, a function of the same name that jumps to its address in a loaded module, so that one program can
+call the exports of any module. --show: the functions are visible to other modules. --modes: each function first
+sets the arithmetic modes in qxModesOfCalls, unless that is 0 (x86). --but: omits these exports."""
 
 import argparse
 import json

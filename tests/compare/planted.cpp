@@ -11,10 +11,10 @@
 #include <dlfcn.h>
 #include <limits>
 
-// A module that hands every call on to another one, which the environment names, but for a few
+// A module that forwards every call to another module, named by the environment, except for a few
 // exports in which a small difference is planted.
 
-// The host's, in the program that loads the module.
+// Defined by the host, in the program that loads the module.
 extern "C" int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress,
                                     int32_t count);
 
@@ -35,7 +35,7 @@ Function *Original(Function *, const char *name) {
 
 } // namespace
 
-// The last bit of one result in some.
+// The last bit of some results.
 int32_t RMS_head(DBL1D x, DBL *rms, ErrorCode *err) {
     const int32_t result = Original(RMS_head, "RMS_head")(x, rms, err);
     if ((*x)->dimSize == 8)
@@ -51,14 +51,14 @@ int32_t Mean_head(DBL1D x, DBL *mean, ErrorCode *err) {
     return result;
 }
 
-// A resize too many.
+// One resize too many.
 int32_t Convolution(DBL1D x, DBL1D y, DBL1D out, const int32_t *algorithm, ErrorCode *err) {
     if ((*x)->dimSize == 2)
         HostBlockReshape(QXTypeDBL, 1, &out, 1);
     return Original(Convolution, "Convolution")(x, y, out, algorithm, err);
 }
 
-// A size too small.
+// A size that is too small.
 ErrorCode DCT_1DH(DBL1D in, DBL1D out, int32_t size, PlanSlot *slot) {
     const ErrorCode code = Original(DCT_1DH, "DCT_1DH")(in, out, size, slot);
     if ((*out)->dimSize > 0)
@@ -73,7 +73,7 @@ ErrorCode CxRMS_head(CDB1D z, DBL *rms) {
     return Original(CxRMS_head, "CxRMS_head")(z, rms);
 }
 
-// A call that does not come back.
+// A call that does not return.
 int32_t MSE_head(DBL1D x, DBL1D y, DBL *mse, ErrorCode *err) {
     for (volatile bool forever = (*x)->dimSize == 3; forever;) {
     }

@@ -16,37 +16,37 @@
 #include <unistd.h>
 #include <vector>
 
-// Makes the fuzzer's calls and those of the recipes on one module and writes a record of each, so
-// that tools/compare_modules can hold two modules against each other.
+// Makes the calls of the fuzzer and of the recipes on one module and writes a record of each, so
+// that tools/compare_modules can compare two modules.
 //
 //     record_calls MODULE [--exports FILE] [--seed N] [--from CASE] [--to CASE]
 //                  [--seconds N] [--show]
 //     record_calls --list
 //
-// FILE has the names of the exports to call, one in a line. With E of them, case c is that of the
-// export c % E in round c / E: in round 0 its recipes as they are, at each of their sizes, after
-// that the case of the fuzzer. A failing heap and a small workspace are left out: how much memory a
-// function takes is no part of its results. The records of a case are written at its end and at
-// once, so that whoever reads them knows the case in which the process has died; it dies of a case
-// that takes longer than --seconds of the processor as well. --show prints the calls in words.
+// FILE lists the names of the exports to call, one per line. With E exports, case c belongs to
+// export c % E in round c / E: round 0 runs its recipes unchanged, at each of their sizes; later
+// rounds run the case of the fuzzer. A failing heap and a small workspace are not simulated: the
+// memory that a function takes is not part of its results. The records of a case are written
+// together when it ends, so that the reader knows in which case the process died; a case that takes
+// longer than --seconds of processor time also ends the process. --show prints the calls in words.
 //
-// No result depends on an address, the time or a call before: blocks of the host and of the heap
-// hold one byte throughout when they are new, slots and instance words belong to one case, and no
-// export reads a clock.
+// No result depends on an address, the time or an earlier call: new blocks of the host and of the
+// heap are filled with one byte value, slots and instance words belong to one case, and no export
+// reads a clock.
 
 namespace qx::test {
 
 namespace {
 
 // The flags of a record.
-constexpr uint32_t lacksMemory = 1;  // the heap refused a request beyond the limit
-constexpr uint32_t hostFault = 2;    // the host complains, of a byte outside a block for one
-constexpr uint32_t inputChanged = 4; // which is no output
+constexpr uint32_t lacksMemory = 1;  // the heap refused a request above the limit
+constexpr uint32_t hostFault = 2;    // the host reports a fault, such as a write outside a block
+constexpr uint32_t inputChanged = 4; // of an argument that is not an output
 constexpr uint32_t sizesExceedBlock = 8;
 
 struct Record {
     int64_t caseNumber;
-    int32_t step; // of the calls of a case
+    int32_t step; // index of the call in its case
     int32_t code;
     int32_t result;
     uint32_t flags;
@@ -54,9 +54,9 @@ struct Record {
 };
 static_assert(sizeof(Record) == 48);
 
-constexpr int faultStatus = 3; // of the process, whose memory is no longer sound
+constexpr int faultStatus = 3; // exit status: the memory of the process is corrupted
 constexpr unsigned char freshByte = 0x17;
-constexpr int32_t clockPerProcessor = 15; // in which a case that waits is given up
+constexpr int32_t clockPerProcessor = 15; // elapsed time after which a waiting case is ended
 constexpr rlim_t mostMemory = rlim_t{4} << 30;
 
 struct Orders {
@@ -64,7 +64,7 @@ struct Orders {
     const char *exports = nullptr;
     uint64_t seed = 1;
     int64_t from = 0, to = 0;
-    int32_t seconds = 20; // of the processor for one case
+    int32_t seconds = 20; // of processor time for one case
     bool show = false;
 };
 Orders orders;
@@ -117,7 +117,7 @@ private:
     std::vector<Record> records_;
 };
 
-// How many bytes an element has, and how it is written.
+// The size of an element in bytes, and how it is printed.
 void PrintElements(const OutputValue &value) {
     const auto record = AllRecords().find(value.element);
     const RecordType plain = {ElementSize(value.element), {{0, 1, value.element}}};
@@ -189,7 +189,7 @@ void PrintScenario(const Scenario &scenario) {
                             : std::vector<int32_t>{argument.rows, argument.cols},
                         argument.bytes.data(), parameter.isIn ? argument.bytes.size() : 0});
             if (argument.saysNegativeSize())
-                std::printf("    but says %d rows, %d columns, of which 0 is the truth\n",
+                std::printf("    but claims %d rows, %d columns, where 0 means the true size\n",
                             argument.claims[0], argument.claims[1]);
         } else if (parameter.kind == Kind::Value) {
             std::printf("  %s = %" PRId64 ", or %.17g (%a) if it is real\n", parameter.name,
@@ -205,14 +205,14 @@ void PrintScenario(const Scenario &scenario) {
     PrintDisturbance(scenario.disturbance);
 }
 
-// What of the surroundings is no matter of results.
+// Keeps only the host's part of a disturbance: memory must not affect the records.
 Disturbance OfHostOnly(Disturbance disturbance) {
     disturbance.allocationFails = 0;
     disturbance.workspace = 0;
     return disturbance;
 }
 
-// Whether the host has anything to complain of after the call, too.
+// Records a fault that the host finds after the call.
 void CheckAfter(Observed &seen) {
     try {
         CheckBlocks();
@@ -244,14 +244,14 @@ void CallByCatalogue(Case &one, const Thunk &thunk, Random &random) {
 
 void PrintSpecial(const RecipeSpoiling &spoiling) {
     if (spoiling.claimed < 0 && spoiling.claimsBoth)
-        std::printf("  each dimension of input %d says %d\n", spoiling.input, spoiling.claimed);
+        std::printf("  each dimension of input %d claims %d\n", spoiling.input, spoiling.claimed);
     else if (spoiling.claimed < 0)
-        std::printf("  dimension %d of input %d says %d\n", spoiling.dimension, spoiling.input,
+        std::printf("  dimension %d of input %d claims %d\n", spoiling.dimension, spoiling.input,
                     spoiling.claimed);
     if (!spoiling.shared)
         return;
     const auto &[first, second] = spoiling.shared->first;
-    std::printf("  %s %d and %s %d are one array\n", first.isOutput ? "output" : "input",
+    std::printf("  %s %d and %s %d are the same array\n", first.isOutput ? "output" : "input",
                 first.number, second.isOutput ? "output" : "input", second.number);
 }
 
@@ -298,7 +298,7 @@ void MakeCase(int64_t number, const Subject &subject, int64_t round) {
     one.write();
 }
 
-// What is over the limit ends the process: SIGPROF, or SIGALRM where it only waits.
+// A case that exceeds the limit ends the process: by SIGPROF, or by SIGALRM if it only waits.
 void LimitTime() {
     const itimerval limit = {{0, 0}, {orders.seconds, 0}};
     setitimer(ITIMER_PROF, &limit, nullptr);

@@ -19,7 +19,7 @@
 #include <string>
 #include <thread>
 
-// Every export of the catalogue through what a host can do to it.
+// Every export of the catalogue under everything that a host can do to it.
 
 namespace qx::test {
 
@@ -41,7 +41,7 @@ protected:
         const ErrorCode status = statusOf(call);
         return {status, call.outputHash(status), static_cast<int32_t>(Host().reshapes.size())};
     }
-    // Calls, and holds the function result to the export's convention.
+    // Makes the call and checks the function result against the export's convention.
     static ErrorCode statusOf(Call &call, int32_t refusal = 0) {
         const int32_t result = GetParam().run(call);
         const HeapProbe::Pause pause;
@@ -51,9 +51,9 @@ protected:
             EXPECT_EQ(result, isRefusal         ? refusal
                               : has(CodeInBoth) ? status
                                                 : 0)
-                << "the function result beside *err";
+                << "the function result alongside *err";
         }
-        // What every export says to two outputs that are one array.
+        // Every export may return this code if two outputs are the same array.
         if (!call.sharesArray() || status != ErrInternal)
             expectDocumented(status, refusal);
         return status;
@@ -62,7 +62,7 @@ protected:
         static const auto all = ReadCodeList(QX_CODE_LIST);
         const auto found = all.find(GetParam().exportName());
         if (found == all.end())
-            EXPECT_EQ(status, 0) << "of an export that has none by its declaration";
+            EXPECT_EQ(status, 0) << "the status of an export declared without one";
         else if (refusal != 0 && status == refusal)
             EXPECT_TRUE(found->second.hostStatus) << "the host's status is not under Codes:";
         else
@@ -81,7 +81,7 @@ protected:
     void TearDown() override { ResetHost(); }
 };
 
-// The workspace while it is enabled.
+// Keeps the workspace enabled during its lifetime.
 class ServingWorkspace {
 public:
     ServingWorkspace() {
@@ -92,7 +92,7 @@ public:
     ~ServingWorkspace() {
         DisableAnalysisWorkspaceH(&status_);
         UninitializeAnalysisWorkspaceH(&status_);
-        // Anything else than 0 would tell of a block that was never given back.
+        // Anything other than 0 means that a block was never released.
         EXPECT_EQ(status_.code, 0);
     }
 
@@ -112,8 +112,8 @@ TEST_P(Conformance, ValidArgumentsGiveOneResultEveryTime) {
     }
 }
 
-// A host that works in place: the result is that of two arrays, or the call is refused.
-TEST_P(Conformance, OneArrayMayStandInTwoPlaces) {
+// A host may work in place: the result is that of two separate arrays, or the call is refused.
+TEST_P(Conformance, OneArrayMayBeTwoArguments) {
     typedef Call::Meeting Meeting;
     for (int32_t n : GetParam().sizes) {
         Call probe(n);
@@ -140,7 +140,7 @@ TEST_P(Conformance, OneArrayMayStandInTwoPlaces) {
             two.keepApart(pair);
             const Result separate = run(two);
             EXPECT_EQ(inPlace.status, separate.status);
-            // Two inputs that are one may be taken another way.
+            // The result may differ if two inputs are the same array, which may take another path.
             if (meeting != Meeting::ReadTwice) {
                 EXPECT_EQ(inPlace.hash, separate.hash);
             }
@@ -184,8 +184,8 @@ TEST_P(Conformance, AnEmptyInputIsAFailure) {
     }
 }
 
-// It is an empty one, but for the few exports that have a code for it.
-TEST_P(Conformance, AnInputThatSaysANegativeSizeIsEmpty) {
+// Such an array counts as empty, except in the few exports that have a code for it.
+TEST_P(Conformance, AnInputWithANegativeSizeIsEmpty) {
     const int32_t n = GetParam().sizes.back();
     Call probe(n);
     run(probe);
@@ -211,8 +211,8 @@ TEST_P(Conformance, AnInputThatSaysANegativeSizeIsEmpty) {
         }
 }
 
-// Arrays that do not fit each other or the numbers beside them: refused or not, by the contract,
-// and no byte outside a block is touched.
+// Arrays whose sizes do not match each other or the numeric arguments: the call is refused or not,
+// within the contract, and touches no byte outside a block.
 TEST_P(Conformance, AnInputOfAnotherSizeKeepsTheContract) {
     const int32_t n = GetParam().sizes.back();
     Call probe(n);
@@ -234,7 +234,7 @@ TEST_P(Conformance, AnInputOfAnotherSizeKeepsTheContract) {
         }
 }
 
-TEST_P(Conformance, AFailedAllocationIsACodeAndLeaksNothing) {
+TEST_P(Conformance, AFailedAllocationReturnsACodeAndLeaksNothing) {
     if (!HeapProbe::works())
         return;
     const int32_t n = GetParam().sizes.back();
@@ -291,7 +291,7 @@ TEST_P(Conformance, TheWorkspaceChangesNoBitAndSparesTheHeap) {
     }
 }
 
-// A cell of each kind that a node can keep.
+// One cell of each kind that a node can keep.
 class Cells {
 public:
     Cells() {
@@ -339,7 +339,7 @@ TEST_P(Conformance, AWordThatHoldsSomethingElseIsRefused) {
     }
 }
 
-// What a call works with does not change with the words of its node.
+// A call gives the same result if the host exchanges the words of its node during a resize.
 TEST_P(Conformance, TheHostMayExchangeWordsWithinAResize) {
     const int32_t n = GetParam().sizes.back();
     NodeWords node, other;
@@ -388,8 +388,8 @@ std::string TestName(const testing::TestParamInfo<Recipe> &info) {
 }
 INSTANTIATE_TEST_SUITE_P(Exports, Conformance, testing::ValuesIn(AllRecipes()), TestName);
 
-// Any bit that changes shows as a changed line in the review of tests/conformance/hashes.txt.
-TEST(Hashes, AreThoseThatWereAccepted) {
+// Any changed bit shows as a changed line of tests/conformance/hashes.txt in the review.
+TEST(Hashes, AreTheAcceptedOnes) {
     auto accepted = AcceptedHashes(QX_HASHES);
     std::string changed;
     const auto hashes = HashEveryExport();
@@ -402,7 +402,7 @@ TEST(Hashes, AreThoseThatWereAccepted) {
     for (const auto &gone : accepted)
         changed += "\n" + gone.first + " is gone";
     EXPECT_EQ(changed, "")
-        << "If that is meant: tools/compare_hashes --accept, and commit " QX_HASHES;
+        << "If this is intended: tools/compare_hashes --accept, and commit " QX_HASHES;
     // ./test looks for this line at each width of each preset.
     std::printf("hashes of %d exports compared at %d lanes\n", static_cast<int>(hashes.size()),
                 static_cast<int>(lanesInUse));
@@ -411,12 +411,12 @@ TEST(Hashes, AreThoseThatWereAccepted) {
 TEST(Catalogue, EveryExportHasARecipe) {
     std::set<std::string> recipes, known;
     for (const Recipe &recipe : AllRecipes()) {
-        EXPECT_TRUE(recipes.insert(recipe.name).second) << recipe.name << " stands twice";
+        EXPECT_TRUE(recipes.insert(recipe.name).second) << recipe.name << " occurs twice";
         known.insert(recipe.exportName());
     }
     for (const Exempt &exempt : ExemptExports())
         EXPECT_TRUE(known.insert(exempt.name).second)
-            << exempt.name << " is exempt and has a recipe";
+            << exempt.name << " is exempt but has a recipe";
     std::ifstream file(QX_EXPORT_LIST);
     std::set<std::string> exports;
     std::string name;
@@ -427,7 +427,7 @@ TEST(Catalogue, EveryExportHasARecipe) {
         EXPECT_EQ(known.count(export_), 1U)
             << export_ << " needs a line in the recipes of its family";
     for (const std::string &recipe : known)
-        EXPECT_EQ(exports.count(recipe), 1U) << recipe << " is no export";
+        EXPECT_EQ(exports.count(recipe), 1U) << recipe << " is not an export";
 }
 
 } // namespace

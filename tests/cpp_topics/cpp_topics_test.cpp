@@ -40,7 +40,7 @@ bool SameBits(std::span<const T> x, std::span<const T> y) {
            (x.empty() || std::memcmp(x.data(), y.data(), x.size_bytes()) == 0);
 }
 
-// What exports need of scratch memory comes from a region of its own while this is there.
+// Exports take their scratch memory from a separate region during the lifetime of this object.
 class Workspace {
 public:
     Workspace() {
@@ -57,7 +57,8 @@ private:
     WorkspaceStatus status_{};
 };
 
-// All blocks together give the bits of one block, again after a reset, and no later block takes memory.
+// All blocks together give the bits of one block, and again after a reset; then no block takes
+// memory.
 template <class In, class Out, class Stream>
 void HasTheBitsOfTheWhole(const char *name, Stream stream, std::size_t mostPerInput = 1) {
     SCOPED_TRACE(name);
@@ -120,7 +121,7 @@ TEST(Streams, HaveTheBitsOfTheWholeAndTakeNoMemory) {
     HasTheBitsOfTheWhole<double, double>("CIC", qx::multirate::CICInterpolateStream(3, 4), 4);
 }
 
-TEST(Streams, OfSingleSamplesOfTheLongestBlockTakeNoMemoryFromTheFirstOneOn) {
+TEST(Streams, WithADeclaredLongestBlockTakeNoMemoryAfterTheFirst) {
     const auto [a, b, zeros, poles, gain] = qx::filters::butterworth(0.1, 4);
     qx::filters::CascadeStream stream(a, b, qx::filters::Form::second_order, 512);
     Samples x = Signal<double>(512);
@@ -130,7 +131,7 @@ TEST(Streams, OfSingleSamplesOfTheLongestBlockTakeNoMemoryFromTheFirstOneOn) {
     EXPECT_EQ(heap.allocations(), 0);
 }
 
-TEST(Streams, SayWhatIsWrongAndBeginAnew) {
+TEST(Streams, ReportFailuresAndRestart) {
     const auto [a, b, zeros, poles, gain] = qx::filters::butterworth(0.1, 4);
     qx::filters::CascadeStream stream(a, Samples{1});
     const Samples x = Signal<double>(10);
@@ -165,9 +166,9 @@ TEST(Failures, NameFunctionArgumentAndCode) {
     EXPECT_EQ(either.code(), ErrEmptyInput);
     EXPECT_STREQ(either.status().argument, "") << "x or y is empty";
     EXPECT_EQ(qx::stats::mse(qx::returned, x, Samples{1}).code(), WarnLengthsDiffer);
-    EXPECT_NO_THROW(qx::stats::mse(x, Samples{1})) << "a warning";
+    EXPECT_NO_THROW(qx::stats::mse(x, Samples{1})) << "warnings do not throw";
     EXPECT_TRUE(qx::stats::mse(qx::returned, x, Samples{1}));
-    // What is no matrix is an empty one.
+    // Elements that do not make up a matrix give an empty one.
     EXPECT_EQ(qx::linalg::det(qx::returned, qx::Matrix<double>(2, 2, {1})).code(), ErrEmptyInput);
 }
 
@@ -261,7 +262,7 @@ TEST(Defaults, AreThoseOfMost) {
             all[i] = 0.01 * static_cast<double>(i);
         return all;
     }();
-    // A lowpass of unit gain at 0, a unit matrix solved, a line without weights, the two-norm.
+    // A lowpass of unit gain at 0, a line without weights, the two-norm.
     const auto [a, b, zeros, poles, gain] = qx::filters::chebyshev1(0.1, 0.5, 3);
     EXPECT_NEAR(qx::filters::filter_cascade(Samples(500, 1.0), a, b).back(), 1, 1e-9);
     const auto line = qx::fit::line(t, t);
@@ -310,7 +311,7 @@ TEST(Threads, HavePlansOfTheirOwn) {
     EXPECT_TRUE(right[0] && right[1]);
 }
 
-// The blocks of a stream that starts anew after each failure and reset.
+// The block sizes of a stream that restarts after each failure and reset.
 const std::size_t kBlocks[] = {0, 700, 1, 2, 13, 699, 60, 1525};
 
 TEST(RunningStream, HasTheBitsOfTheWholeAndTheDefinitions) {
@@ -338,7 +339,7 @@ TEST(RunningStream, HasTheBitsOfTheWholeAndTheDefinitions) {
     EXPECT_EQ(found.greatest, *std::max_element(x.begin(), x.end()));
 }
 
-TEST(TriggerStream, HasTheTriggersOfTheWholeAndNamesWhatIsWrong) {
+TEST(TriggerStream, HasTheTriggersOfTheWholeAndReportsFailures) {
     const Samples x = Signal<double>(3000);
     typedef qx::measure::TriggerStream Stream;
     for (const auto slope :

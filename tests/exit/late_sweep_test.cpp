@@ -8,16 +8,17 @@
 #include <unistd.h>
 #endif
 
-// A host that cleans up in its last exit handler: it was registered before the module's static
-// objects were made, so it runs after they are gone. The sweep has to find the plan cache in order,
-// and a plan can still be had. The process ends with 0 only from inside the handler.
+// A host that cleans up in its last exit handler, which was registered before the module's static
+// objects were constructed and therefore runs after their destruction. The sweep must find the plan
+// cache intact, and plans must still be available. The process ends with 0 only from inside the
+// handler.
 
 namespace {
 
 PlanSlot kept[3];
 
-// Takes what has been freed by now and fills it with bytes that make a mutex look taken: who locks
-// one of those waits, and is ended.
+// Reallocates the freed memory and fills it with bytes that make a mutex look locked: whoever locks
+// such a mutex hangs, and the process is ended.
 void MakeFreedMemoryUseless() {
     for (std::size_t size = 8; size <= 256; size += 8)
         for (int i = 0; i < 20; ++i)
@@ -53,5 +54,5 @@ int main() {
             std::_Exit(3);
         }
     }
-    return 1; // unless the handler says otherwise
+    return 1; // unless the handler ends the process with 0
 }

@@ -27,7 +27,7 @@ Current currents[mostThreads];
 thread_local Current *current = currents;
 std::atomic<int> findings = 0;
 std::atomic<int64_t> callsMade = 0;
-// Small, so that time is bounded by the data and only a loop over a parameter can take long.
+// Small, so that only a loop over a parameter, and not the data, can take long.
 std::size_t largestBlock = 4U << 20;
 
 namespace {
@@ -37,7 +37,7 @@ constexpr double slowness = 30;
 #else
 constexpr double slowness = 1;
 #endif
-constexpr double secondsPerCall = 5 * slowness; // of the processor
+constexpr double secondsPerCall = 5 * slowness; // of processor time
 
 double ProcessorSeconds() {
     timespec now;
@@ -61,7 +61,7 @@ std::string HowToRepeat(const Current &at) {
 
 void Tell(const char *format, ...) {
     static std::mutex lock;
-    static std::set<std::string> told; // one of each kind from each export
+    static std::set<std::string> told; // one finding of each kind for each export
     char text[300];
     va_list arguments;
     va_start(arguments, format);
@@ -87,7 +87,8 @@ void TellWhereItEnded() {
 
 double ProcessSeconds() { return static_cast<double>(std::clock()) / CLOCKS_PER_SEC; }
 
-// By the processor, for a machine may have others to serve; what waits for ever uses none.
+// Limits the processor time, since the machine may be busy, and the elapsed time, since a
+// deadlocked call uses no processor.
 void Watch(const std::atomic<bool> &done) {
     constexpr double most = 60 * slowness;
     while (!done) {
@@ -159,10 +160,10 @@ void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturba
     const auto documented = DocumentedCodes().find(name);
     if (documented == DocumentedCodes().end() || documented->second.codes.count(status) != 0)
         return;
-    // The frame copies an input that is also an output, whatever the export.
+    // The frame copies an input that is also an output, in every export.
     if (shares && status == ErrOutOfMemory)
         return;
-    // A limit of the host's own is a refusal like any other.
+    // A limit of the host itself is a refusal like any other.
     const bool isRefusal =
         (disturbance.refuseAt != 0 && status == disturbance.refusal) || status == statusNoMemory;
     if (!isRefusal || !documented->second.hostStatus)
@@ -180,14 +181,14 @@ void CheckHost() {
 
 void CheckRefusal(ErrorCode status, bool hasStatus) {
     if (hasStatus && status != ErrInternal)
-        Tell("one array for two outputs is not refused (%d)", status);
+        Tell("one array as two outputs is not refused (%d)", status);
 }
 
 void CheckRepetition(const char *name, const Outcome &first, const Outcome &second,
                      const char *apart) {
     if (IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::DependsOnState))
         return;
-    // The others may have filled the region, or switched it off, in between.
+    // Other threads may have filled or disabled the region in between.
     const bool lacksMemory = first.status == ErrOutOfMemory || second.status == ErrOutOfMemory;
     if (options.threads > 1 && lacksMemory)
         return;
@@ -201,10 +202,12 @@ void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcom
     if (refused.status < 0 || refused.status == statusNoMemory || isHosts ||
         IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::RefusalPasses))
         return;
-    if (options.threads > 1 && granted.status == ErrOutOfMemory) // of a region that others fill
+    if (options.threads > 1 &&
+        granted.status == ErrOutOfMemory) // in a region that other threads fill
         return;
     if (refused.status != granted.status || refused.hash != granted.hash)
-        Tell("a refusal is a success with another result (%d, %d)", refused.status, granted.status);
+        Tell("a call succeeds despite a refusal, with another result (%d, %d)", refused.status,
+             granted.status);
 }
 
 void ForSomeRefusals(Random &random, const Observed &calm,
@@ -234,7 +237,7 @@ void GiveBack(const std::function<void()> &release) {
     heapLeft += probe.liveAllocations();
 }
 
-// What threads share may be given back by another one.
+// With several threads, shared blocks may be freed by another thread.
 void EndHeapBalance() {
     const int64_t left = std::exchange(heapLeft, 0);
     if (left != 0 && options.threads == 1)

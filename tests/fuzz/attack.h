@@ -13,7 +13,7 @@
 
 namespace qx::test {
 
-// What happens around a call, whoever makes its arguments, and how a finding is told.
+// The environment of a call, whatever the source of its arguments, and the reporting of findings.
 
 struct Options {
     uint64_t seed = 1;
@@ -22,17 +22,17 @@ struct Options {
     int threads = 1;
     int64_t onlyRound = -1;
     std::string onlyExport;
-    std::string onlyKind; // of cases
+    std::string onlyKind; // of the cases to run
 };
 extern Options options;
 
-// What each thread is at, for whoever ends the process.
+// The current case of each thread, reported when the process ends.
 struct Current {
     std::atomic<int64_t> round = -1;
     std::atomic<const char *> name = nullptr;
-    std::atomic<const char *> called = nullptr; // in its case, where that is another export
+    std::atomic<const char *> called = nullptr; // the called export, if another one
     std::atomic<double> since = 0;              // seconds of the process's processor time
-    std::atomic<int64_t> start = 0;             // of the clock
+    std::atomic<int64_t> start = 0;             // time of day
 };
 double ProcessSeconds();
 constexpr int mostThreads = 64;
@@ -42,7 +42,7 @@ extern thread_local Current *current;
 extern std::atomic<int> findings;
 __attribute__((format(printf, 1, 2))) void Tell(const char *format, ...);
 void TellWhereItEnded();
-// Ends a process in which a case does not come back.
+// Ends the process if a case does not return.
 void Watch(const std::atomic<bool> &done);
 
 struct Outcome {
@@ -51,7 +51,7 @@ struct Outcome {
 };
 
 struct Disturbance {
-    int32_t refuseAt = 0, refusal = 0; // the n-th resize, the host's status
+    int32_t refuseAt = 0, refusal = 0; // the n-th resize and the host's status
     int32_t allocationFails = 0;       // the n-th
     uint32_t workspace = 0;            // bytes; 0 for none
     std::function<void()> atReshape = nullptr;
@@ -61,54 +61,54 @@ struct Disturbance {
 };
 Disturbance SomeDisturbance(Random &random);
 
-// What there is to see of one call besides its outputs.
+// The observable effects of one call besides its outputs.
 struct Observed {
     int32_t result = 0; // of the function
     std::vector<Reshape> reshapes;
     bool lacksMemory = false; // the heap has refused a request
     int32_t allocations = 0;  // of the heap, refused ones included
     int64_t peakBytes = 0;    // of the heap
-    std::string fault;        // what the host complains of
+    std::string fault;        // the fault that the host reports
     double seconds = 0;       // of the processor
 };
-// Calls of exports in this process.
+// The number of calls made in this process.
 extern std::atomic<int64_t> callsMade;
-// Neither the host nor the heap gives more in one piece.
+// The largest block that the host and the heap grant.
 extern std::size_t largestBlock;
-// Makes the call in a host that refuses as told and whose new blocks, as those of the heap, hold
-// `rubbish`.
+// Makes the call in a host that refuses as `disturbance` specifies. New blocks of the host and of
+// the heap are filled with `rubbish`.
 Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
                  const std::function<int32_t()> &call);
-// The same, and tells of a fault and of a long time.
+// The same, but also reports faults and slow calls.
 Observed Attacked(const Disturbance &disturbance, unsigned char rubbish,
                   const std::function<int32_t()> &call);
-// Tells of a code that the export does not document.
+// Reports a code that the export does not document.
 void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturbance, bool shares);
-// Tells of a touched byte outside the blocks, and ends the process: what comes after it would tell
-// nothing.
+// Reports a write outside the blocks and ends the process, since later findings would be
+// meaningless.
 void CheckHost();
-// Tells where an array that the call writes in two places is not refused.
+// Reports a call that accepts one array as two outputs.
 void CheckRefusal(ErrorCode status, bool hasStatus);
-// A call and the one that `apart` names have to have the same outcome.
+// A call must have the same outcome as the one that `apart` names.
 void CheckRepetition(const char *name, const Outcome &first, const Outcome &second,
                      const char *apart);
 
-// A call that is successful while the host or the heap refuses has to have the outcome that it has
-// when they grant everything.
+// A call that succeeds although the host or the heap refuses must have the outcome that it has when
+// they grant everything.
 void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcome &refused,
                   const Outcome &granted);
 
-// For each resize and for some allocations of a call its refusal, and a workspace or two that are
-// too small for it.
+// Makes a call with each of its resizes and some of its allocations refused, and with workspaces
+// that are too small for it.
 void ForSomeRefusals(Random &random, const Observed &calm,
                      const std::function<void(const Disturbance &)> &make);
 
-// What the calls of a case take of the heap, and what they and the release of their words give back.
-// At the end of a case nothing may be left.
+// Counts the heap blocks that the calls of a case take, and that they and the release of their
+// words free. No block may be left at the end of a case.
 void GiveBack(const std::function<void()> &release);
 void EndHeapBalance();
 
-// The workspace for one call in one thread.
+// The workspace for one call, if there is only one thread.
 class TinyWorkspace {
 public:
     explicit TinyWorkspace(uint32_t size);
@@ -121,9 +121,10 @@ private:
     WorkspaceStatus status_ = {0, 0};
 };
 
-// Many threads share one region, which each of them reserves, gives back and switches as it likes.
+// Many threads share one region, which each of them reserves, releases, enables and disables at
+// random.
 void ChangeWorkspace(Random &random);
-// At the end no block may be left in it.
+// Reports blocks that are left in the region at the end.
 void EndWorkspace();
 
 } // namespace qx::test

@@ -9,7 +9,8 @@
 
 namespace qx::test {
 
-// What the fuzzer puts into arguments: numbers of every class, sizes that fit and that do not.
+// The content that the fuzzer puts into arguments: numbers of every class, and sizes that match or
+// do not.
 
 class Random : public Noise {
 public:
@@ -30,7 +31,7 @@ enum class Content {
     Descending,
     Symmetric,
     Dominant, // a diagonal that outweighs its row
-    Constant, // so far what a caller could mean
+    Constant, // up to here, content that a caller could intend
     Zeros,
     Huge,
     Tiny,
@@ -42,7 +43,7 @@ enum class Content {
 constexpr int32_t usualContents = static_cast<int32_t>(Content::Constant) + 1;
 constexpr int32_t allContents = static_cast<int32_t>(Content::RandomBits) + 1;
 
-// The sizes of one call, from which its arrays and numbers take theirs.
+// The sizes of one call, from which those of its arrays and its numbers are chosen.
 struct Sizes {
     int32_t n, m;
 };
@@ -53,9 +54,9 @@ int32_t SomeWhole(Random &random, const Sizes &sizes);
 double SomeReal(Random &random, const Sizes &sizes, bool isUsual);
 
 std::size_t ElementSize(const std::string &element);
-// The host's, 0 for a record.
+// The type code of the host; 0 for a record.
 int32_t TypeCode(const std::string &element);
-// rows by cols elements (a row of a 1-D array has them all), each field of a record by itself.
+// rows by cols elements (a 1-D array is one row); each field of a record is generated separately.
 std::vector<unsigned char> SomeElements(Random &random, const std::string &element, int32_t rows,
                                         int32_t cols, Content content);
 

@@ -18,18 +18,18 @@ namespace qx::test {
 
 namespace {
 
-// A block of the host or of the heap is granted up to this; a call may have several.
+// The largest block that the host or the heap grants; a call may have several.
 constexpr std::size_t grantedBlock = 32U << 20;
 constexpr rlim_t addressSpace = rlim_t{2} << 30;
 constexpr int64_t mostHeap = int64_t{512} << 20;
-// Of the processor: by itself, and for each byte that a call has asked for.
+// Limits on processor time: a constant, and an amount for each byte that a call has requested.
 constexpr double secondsByItself = 1, secondsPerByte = 1e-7;
 constexpr rlim_t secondsToLive = 20;
 
 struct Cost {
     double seconds = 0;
     int64_t heap = 0;
-    int64_t hosts = 0; // bytes that were asked of the host, but for refused ones
+    int64_t hosts = 0; // bytes requested from the host, except refused ones
     ErrorCode status = 0;
 };
 std::map<std::string, Cost> highest;
@@ -108,7 +108,7 @@ Outcome RunCost(Random &random, const Subject &subject) {
     const pid_t child = fork();
     if (child == 0) {
         Limit(RLIMIT_CPU, secondsToLive);
-#ifndef __SANITIZE_ADDRESS__ // which has reserved more
+#ifndef __SANITIZE_ADDRESS__ // the sanitizer itself reserves more
         Limit(RLIMIT_AS, addressSpace);
 #endif
         Limit(RLIMIT_CORE, 0);
@@ -126,9 +126,9 @@ Outcome RunCost(Random &random, const Subject &subject) {
     waitpid(child, &how, 0);
     ++callsMade;
     if (WIFSIGNALED(how))
-        Tell("ended by signal %d in a process of its own", WTERMSIG(how));
+        Tell("ended by signal %d in a separate process", WTERMSIG(how));
     else if (WEXITSTATUS(how) != 0)
-        ++findings; // the process has said which
+        ++findings; // the process has reported it
     if (isRead) {
         Cost &most = highest[subject.name];
         most.seconds = std::max(most.seconds, cost.seconds);

@@ -6,10 +6,10 @@
 
 namespace qx::test {
 
-// A call with few data whose numbers are of any size, in a process of its own: what it takes of the
-// processor and of memory is bounded by what it reads and writes.
+// Makes a call with little data and numbers of any magnitude, in a separate process: its processor
+// time and memory must be bounded by the amount of data that it reads and writes.
 Outcome RunCost(Random &random, const Subject &subject);
-// The highest costs there were.
+// Prints the highest costs.
 void PrintCosts();
 
 } // namespace qx::test

@@ -17,33 +17,33 @@
 #include <iterator>
 #include <thread>
 
-// Calls every export of the catalogue with arguments of every kind (each third time with those of
-// its recipe, spoilt here and there), in a host that refuses, and looks at what holds whatever the
-// arguments are: no byte is touched outside a block or in an input, the sizes of a block never
-// exceed it, codes are those that are documented, the same call gives the same bits, one handle as
-// input and output gives what two give, the workspace and the heap get back what they gave, and time
-// stays bounded. The kinds of cases:
+// Calls every export of the catalogue with arguments of every kind (a third of the time with those
+// of its recipe, partly spoilt), in a host that refuses requests, and checks what must hold for any
+// arguments: no byte is written outside a block or in an input, the sizes of a block never exceed
+// it, codes are documented, the same call gives the same bits, one handle as input and output gives
+// the result of two handles, the workspace and the heap get back all blocks, and time is bounded.
+// The kinds of cases:
 //
 //     plain     a few calls of an export
 //     meetings  a call with each pair of its arrays as one array
-//     honesty   a call while the host or the heap refuse: what is successful gives the same numbers
+//     honesty   a call while the host or the heap refuses: a success must give the same numbers
 //     session   several exports on the same slots, instance words and arrays
-//     cost      a call with few data and numbers of any size, in a process of its own with a limit of
-//               time and memory; only where it is asked for
+//     cost      a call with little data and numbers of any size, in a separate process with limits on
+//               time and memory; only on request
 //
 //     fuzz [--seed N] [--rounds N] [--calls N] [--seconds N] [--threads N] [--export NAME]
 //          [--round N] [--kind NAME] [--list]
 //
-// It ends at the first of the limits, of which the usual one is 100 rounds, or when it is asked to.
-// Each round makes a case for each export. The case of an export in round k of a seed is the same
-// whatever other exports there are: what is found is repeated by --seed, --export and --round.
+// The program ends at the first limit reached (by default 100 rounds), or on a signal. Each round
+// makes a case for each export. The case of an export in round k of a seed does not depend on the
+// other exports, so that a finding can be repeated with --seed, --export and --round.
 
 namespace qx::test {
 
 namespace {
 
-// An export that has so many cases, two thirds of them far from valid arguments, and no success is a
-// fault of its recipes or its own.
+// An export without a success in this many cases is a finding: it or its recipes are at fault, even
+// though two thirds of the cases are far from valid arguments.
 constexpr int64_t enoughCases = 1000;
 
 std::atomic<bool> isStopped = false;
@@ -52,7 +52,7 @@ struct Tally {
     int64_t cases = 0, successes = 0;
 };
 
-// The kinds of cases, and how many of ten they are.
+// The kinds of cases, and the number out of ten of each.
 struct CaseKind {
     const char *name;
     int32_t share;
@@ -121,7 +121,7 @@ void Work(int thread, std::atomic<int64_t> &next, std::vector<Tally> &tallies) {
     }
 }
 
-// The calls so far are told of; a second signal ends the process at once.
+// Ends the run, which then reports its calls; a second signal ends the process immediately.
 void Stop(int signal) {
     isStopped = true;
     std::signal(signal, SIG_DFL);
@@ -215,9 +215,9 @@ int Main() {
         if (one.cases > 0 && one.successes == 0 && !mustFail)
             neverRight += std::string(" ") + name;
         if (one.successes > 0 && mustFail)
-            Tell("%s was successful, which it never is", name);
+            Tell("%s succeeded, although it is listed as always failing", name);
         if (one.successes == 0 && one.cases >= enoughCases && !mustFail)
-            Tell("%s was never successful", name);
+            Tell("%s never succeeded", name);
     }
     std::printf("seed %" PRIu64 ": %" PRId64 " calls in %" PRId64
                 " cases of %zu exports in %d threads, %" PRId64 " cases successful, %d findings\n",
@@ -227,7 +227,7 @@ int Main() {
         std::printf("never successful:%s\n", neverRight.c_str());
     PrintCosts();
     if (findings > 0)
-        std::printf("What an export does on purpose is told in tests/fuzz/oddities.h.\n");
+        std::printf("Intended deviations of exports are listed in tests/fuzz/oddities.h.\n");
     return findings > 0 ? 1 : 0;
 }
 

@@ -1,5 +1,5 @@
-"""make_thunks.py CATALOGUE OUTPUT: writes, from the catalogue, how each export is called with
-untyped arguments, so that the fuzzer attacks an export the day it is declared."""
+"""make_thunks.py CATALOGUE OUTPUT: generates, from the catalogue, calls of each export with
+untyped arguments, so that the fuzzer attacks an export as soon as it is declared."""
 
 import json
 import sys
@@ -10,8 +10,8 @@ KINDS = {"array1d": "Array1D", "array2d": "Array2D", "value": "Value", "referenc
 
 
 def is_driven(export, records):
-    """Not those that take pointers to something whose content no catalogue tells, nor those that
-    change the process: the fuzzer calls the exports of the workspace by itself."""
+    """False for exports that take pointers whose target the catalogue does not describe, and for those that change
+    the process: the fuzzer itself calls the exports of the workspace."""
     return "*" not in export["returns"] and all(
         a["kind"] in KINDS and "byAddress" not in a and a.get("element") != "WorkspaceStatus"
         and all("*" not in f["type"] and "element" in f
@@ -24,8 +24,7 @@ def is_release(export):
 
 
 def release_of(export, exports):
-    """The export that gives back what an instance word holds: that of the header, else that of the
-    transforms."""
+    """The export that releases what an instance word holds: that of the same header, else that of the transforms."""
     if not any(a["kind"] == "instance" for a in export["arguments"]):
         return "nullptr"
     releases = [e for e in exports if is_release(e)]

@@ -7,14 +7,14 @@
 
 namespace qx::test {
 
-// What exports are known to do against the rules that the fuzzer holds all others to.
+// Known deviations of exports from the rules that the fuzzer checks for all others.
 enum class Oddity {
-    OldContentStays,   // a success that leaves in an output what it held
+    OldContentStays,   // a success that leaves the old content in an output
     SizeBeyondBlock,   // an array whose size is set although the host refused the resize
-    DependsOnState,    // a result that depends on calls before, for a state of the process
-    WorksInInput,      // an input that is work memory as well, and may be an output as an input may
-    RefusalPasses,     // a success with another result where the host or the heap refuses
-    AlwaysFails,       // no call is successful
+    DependsOnState,    // a result that depends on earlier calls through a state of the process
+    WorksInInput,      // an input that is also work memory, and may be an output as any input may
+    RefusalPasses,     // a success with another result if the host or the heap refuses
+    AlwaysFails,       // no call succeeds
     TimeFollowsNumber, // time that grows with a number by value, which therefore stays small here
 };
 
@@ -53,8 +53,8 @@ constexpr KeptOddity keptOddities[] = {
     {"PolyRootsNtBst_head", Oddity::TimeFollowsNumber, "iterations that do not settle"},
 };
 
-// Of the few exports that have a code for an array that says a negative size; to the others it is
-// an empty one.
+// Whether `status` is the code of one of the few exports that have one for an array that claims a
+// negative size; the others treat such an array as empty.
 inline bool IsCodeOfNegativeSize(const char *name, ErrorCode status) {
     return status == ErrNegativeDimension || status == ErrTableNegativeSize ||
            (status == ErrSizesDisagree && std::strcmp(name, "GenHistH") == 0);

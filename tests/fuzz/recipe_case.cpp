@@ -10,7 +10,7 @@ namespace qx::test {
 
 namespace {
 
-// Two arrays of one type, as a call without a fault has them.
+// Two arrays of one type of an undisturbed call.
 std::optional<std::pair<Call::Pair, Call::Meeting>> SomePair(Random &random, const Recipe &recipe,
                                                              int32_t n) {
     Call probe(n);
@@ -35,7 +35,7 @@ RecipeSpoiling SomeSpoiling(Random &random, const Recipe &recipe) {
         some.n = least + random.below(most - least + 1);
     some.seed = random.bits();
     some.spoilsContent = random.oneIn(2);
-    some.input = random.below(8); // none, where the call has fewer
+    some.input = random.below(8); // no input, if the call has fewer
     some.dimension = random.oneIn(3) ? 1 : 0;
     const int32_t others[] = {0, 1, 2, 3, some.n - 1, some.n + 1, some.n / 2, 2 * some.n};
     some.size = random.oneIn(2) ? random.oneOf(others) : -1;
@@ -71,7 +71,7 @@ const char *PartOf(ElementType element) {
     return "";
 }
 
-// Some elements, or all, get others of one class.
+// Replaces some or all elements by numbers of one class.
 void SpoilElements(Random &random, unsigned char *elements, ElementType element, int32_t rows,
                    int32_t cols) {
     if (random.oneIn(2))
@@ -114,8 +114,8 @@ bool IsRefused(const RecipeSpoiling &spoiling) {
     return spoiling.shared && spoiling.shared->second == Call::Meeting::WrittenTwice;
 }
 
-// Two inputs that are one may be taken another way, and of an array that is written by the way
-// nothing is promised.
+// Two inputs that are one array may take another path, and the content of an array that is written
+// as a side effect is unspecified.
 bool IsRepeatable(const RecipeSpoiling &spoiling) {
     return spoiling.disturbance.isNone() &&
            (!spoiling.shared || spoiling.shared->second == Call::Meeting::ReadAndWritten);

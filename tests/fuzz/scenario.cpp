@@ -12,11 +12,11 @@ namespace qx::test {
 
 namespace {
 
-// What shares a handle in a call.
+// The arguments that share a handle in a call.
 enum class Sharing { Nothing, InputAndOutput, TwoOutputs };
 
-// An array argument before `at` whose handle it may share. Arrays that share the handle of a third
-// do not come into question.
+// An array argument before `at` whose handle it may share, or -1. Arguments that already share a
+// handle are excluded.
 int SomeAlias(Random &random, const Scenario &scenario, std::size_t at, Sharing sharing) {
     const std::vector<Parameter> &parameters = scenario.thunk->parameters;
     const auto fit = [sharing](const Parameter &one, const Parameter &other) {
@@ -45,7 +45,7 @@ Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &s
     if (parameter.isArray()) {
         argument.rows = parameter.dimensions() == 1 ? 1 : SomeDimension(random, sizes, isUsual);
         argument.cols = SomeDimension(random, sizes, isUsual);
-        if (parameter.dimensions() == 2) { // what is cubic in the size stays small
+        if (parameter.dimensions() == 2) { // limits the cost that is cubic in the size
             argument.rows %= 33;
             argument.cols %= 33;
         }
@@ -68,7 +68,7 @@ Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &s
     return argument;
 }
 
-// Lets one array say a negative size, one of two or both, so that their product is positive.
+// Makes one array claim a negative size: one of two, or both, so that their product is positive.
 void ClaimNegativeSize(Random &random, Scenario &scenario) {
     const std::vector<Parameter> &parameters = scenario.thunk->parameters;
     const auto at = static_cast<std::size_t>(random.below(static_cast<int32_t>(parameters.size())));
@@ -102,7 +102,8 @@ bool Scenario::shares() const {
 
 bool Scenario::writesOneTwice() const {
     const auto isOutput = [this](std::size_t i) { return thunk->parameters[i].isOut; };
-    std::vector<int> writers(arguments.size(), 0); // of the array that each argument is
+    std::vector<int> writers(arguments.size(),
+                             0); // of each array, counted at the argument that owns it
     for (std::size_t i = 0; i < arguments.size(); ++i) {
         const int other = arguments[i].aliasOf;
         if (thunk->parameters[i].isArray() && isOutput(i) &&
@@ -336,7 +337,7 @@ void ValueHash::add(const OutputValue &value) {
         MixField(elements_, value.element, value.elements, value.bytes);
         return;
     }
-    // By its fields: what is between them is nobody's.
+    // Field by field, since the padding between them is undefined.
     const RecordType &type = record->second;
     for (std::size_t at = 0; at < value.bytes; at += type.size)
         for (const RecordField &field : type.fields)

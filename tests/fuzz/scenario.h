@@ -13,40 +13,41 @@
 
 namespace qx::test {
 
-// A call with arguments that come from the catalogue and a random stream alone.
+// A call whose arguments come from the catalogue and a random stream alone.
 
-// One argument as it is before a call; blocks are made from it for each run.
+// One argument before a call; blocks are made from it for each run.
 struct Argument {
     int32_t rows = 0, cols = 0;       // of an array; a 1-D array has cols only
-    std::vector<unsigned char> bytes; // elements of an array, or what a pointer shows
+    std::vector<unsigned char> bytes; // elements of an array, or the target of a pointer
     int64_t whole = 0;
     double real = 0;
-    int aliasOf = -1; // the array argument whose handle this one shares
-    // Negative sizes that the block says in place of `rows` and `cols`; 0 for none.
+    int aliasOf = -1; // the array argument whose handle it shares
+    // Negative sizes that the block claims in place of `rows` and `cols`; 0 for none.
     int32_t claims[2] = {0, 0};
     bool saysNegativeSize() const { return claims[0] < 0 || claims[1] < 0; }
 };
 
-// One call with all that happens around it.
+// One call and its environment.
 struct Scenario {
     const Thunk *thunk;
     std::vector<Argument> arguments;
     Disturbance disturbance;
     bool shares() const;
-    // Two arrays that the call writes are one, which every export refuses.
+    // Whether two outputs are the same array, which every export refuses.
     bool writesOneTwice() const;
-    // An array is read in one place and written in another.
+    // Whether an array is read in one place and written in another.
     bool writesInput() const;
     bool saysNegativeSize() const;
 };
 Scenario SomeScenario(Random &random, const Thunk &thunk);
 
-// An array as it is before a call, in a block of the host; with `rubbish` in place of the elements.
+// An array before a call, in a block of the host, optionally with `rubbish` in place of the
+// elements.
 void *NewArray(const Parameter &parameter, const Argument &argument,
                const unsigned char *rubbish = nullptr);
 std::vector<int32_t> SizesOf(void *handle, const Parameter &parameter);
 const unsigned char *ElementsOf(void *handle, const Parameter &parameter);
-// Of the elements, by the sizes; none where the block has not so many.
+// The size of the elements in bytes, according to the dimensions; nothing if the block is smaller.
 std::optional<std::size_t> ElementBytes(void *handle, const Parameter &parameter);
 
 // The words that a node keeps between its calls.
@@ -57,9 +58,9 @@ struct Node {
     ~Node();
 };
 
-// How a call is made. The second time what no result may depend on is another: what memory and
-// outputs hold before, whether arrays share a handle, and whether an array says a negative size or
-// that it is empty.
+// The way in which a call is made. A second call changes what no result may depend on: the initial
+// content of memory and outputs, whether arrays share a handle, and whether an array claims a
+// negative size or 0.
 struct Manner {
     bool apart = false;
     unsigned char rubbish = 0x17;
@@ -83,7 +84,7 @@ public:
         return ElementBytes(handles_[i], parameter(i));
     }
     bool isShared(std::size_t i) const;
-    // Whether its sizes are those from before the call.
+    // Whether its sizes are unchanged since before the call.
     bool saysAsBefore(std::size_t i) const;
 
 private:
@@ -96,7 +97,7 @@ private:
     std::vector<std::vector<int32_t>> before_; // the sizes
 };
 
-// A scenario with its blocks: makes the call and shows what it left.
+// A scenario with its blocks: makes the call and returns its results.
 class PreparedCall {
 public:
     PreparedCall(const Scenario &scenario, Node &node, const Manner &manner);
@@ -123,7 +124,8 @@ private:
     bool hasError_ = false;
 };
 
-// A NaN counts as a NaN: its sign and payload are the processor's; a negative size as 0.
+// All NaNs are equal, since their sign and payload depend on the processor; a negative size counts
+// as 0.
 class ValueHash {
 public:
     void add(const OutputValue &value);
@@ -134,14 +136,14 @@ private:
     uint64_t sizes_ = 0x632BE59BD9B4E019U, elements_ = 0x632BE59BD9B4E019U;
 };
 
-// An export with the ways to call it.
+// An export and the ways to call it.
 struct Subject {
     std::string name;
     const Thunk *thunk = nullptr;
     std::vector<const Recipe *> recipes;
 };
 const std::vector<Subject> &AllSubjects();
-// Of the case of an export in a round: the same whatever other exports there are.
+// The seed of the case of an export in a round, which does not depend on the other exports.
 uint64_t SeedOf(uint64_t seed, const std::string &name, int64_t round);
 
 } // namespace qx::test

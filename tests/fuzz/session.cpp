@@ -12,7 +12,8 @@ namespace qx::test {
 namespace {
 
 constexpr std::size_t mostArrays = 10;
-constexpr std::size_t mostElements = 2000, mostOfMatrix = 33 * 33; // that stay for later calls
+constexpr std::size_t mostElements = 2000,
+                      mostOfMatrix = 33 * 33; // limits for arrays that are kept for later calls
 
 bool HasWord(const Thunk &thunk) {
     return std::any_of(thunk.parameters.begin(), thunk.parameters.end(), [](const Parameter &p) {
@@ -20,7 +21,7 @@ bool HasWord(const Thunk &thunk) {
     });
 }
 
-// Half of them keep something.
+// Half of the time, an export that keeps a state in a word.
 const Thunk &SomeThunk(Random &random) {
     static const auto withWord = [] {
         std::vector<const Thunk *> found;
@@ -77,7 +78,7 @@ std::size_t Session::someArray(Random &random, const Parameter &parameter,
     return arrays_.size() - 1;
 }
 
-// Those that have grown and, of many, some.
+// Drops arrays that have become too large, and some at random if there are many.
 void Session::dropArrays(Random &random) {
     std::erase_if(arrays_, [&](const Array &array) {
         const std::size_t most = array.parameter.dimensions() == 2 ? mostOfMatrix : mostElements;
@@ -130,7 +131,7 @@ Outcome Session::call(const Scenario &scenario, const Places &places, Words &wor
     const Observed seen =
         Attacked(scenario.disturbance, 0x17, [&] { return thunk.call(values.data()); });
     const ErrorCode status = hasError ? error : thunk.returnsCode ? seen.result : 0;
-    if (status != ErrInternal) // what two outputs that are one get
+    if (status != ErrInternal) // the code for two outputs that are the same array
         CheckStatus(thunk.name, status, scenario.disturbance, true);
     CheckHost();
 
@@ -172,7 +173,7 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
                       words_.slots[static_cast<std::size_t>(b)]);
         };
 
-    // Their kinds are read now: a call that gets no memory frees the cell of its word.
+    // The kinds are read now, because a call that gets no memory frees the cell of its word.
     const std::vector<void *> before = words_.all();
     std::vector<uint64_t> kinds;
     for (void *const word : before)
@@ -190,7 +191,7 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
         for (const Array &copy : copies)
             detail::FreeBlock(copy.handle);
         outcome = call(scenario, places, words_, arrays_);
-        // A word that holds a cell of another kind is refused and left as it is.
+        // A word that holds a cell of another kind is refused and not changed.
         bool isOfAnotherKind = false;
         const std::vector<void *> wanted = fresh.all(), after = words_.all();
         for (std::size_t i = 0; i < places.size(); ++i) {
@@ -202,10 +203,10 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
                 continue;
             isOfAnotherKind = true;
             if (outcome.status == ErrInternal && after[word] != before[word])
-                Tell("a word that is refused has changed");
+                Tell("a refused word has changed");
         }
         if (outcome.status != ErrInternal || !isOfAnotherKind)
-            CheckRepetition(thunk.name, outcome, alone, "a word that has been used");
+            CheckRepetition(thunk.name, outcome, alone, "a word from earlier calls");
     }
     dropArrays(random);
     return outcome;

@@ -11,9 +11,9 @@
 namespace qx::test {
 
 // Calls of several exports on the same slots, instance words and arrays. Words are exchanged
-// between the calls and, in the host's part of a resize, during them. Arrays come back as other
-// arguments, in several places of a call at once. Each undisturbed call has to have the outcome
-// that it has with words that are null and with arrays of its own.
+// between calls and, while the host resizes an array, during them. Arrays are reused as other
+// arguments, also in several places of one call. Each undisturbed call must have the outcome that
+// it has with null words and separate arrays.
 class Session {
 public:
     Session() = default;
@@ -36,7 +36,7 @@ private:
         std::vector<void *> all() const;
     };
     struct Array {
-        Parameter parameter; // that it was made for
+        Parameter parameter; // for which it was made
         void *handle;
     };
     // Which array or slot each parameter gets.

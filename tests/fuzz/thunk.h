@@ -9,7 +9,8 @@
 
 namespace qx::test {
 
-// What the build writes from the catalogue: each export with its arguments, callable untyped.
+// Generated from the catalogue by the build: each export with its arguments, callable without
+// types.
 
 enum class Kind {
     Array1D,
@@ -28,7 +29,7 @@ struct Parameter {
     const char *name;
     Kind kind;
     bool isOut, isIn;
-    std::string element; // of the host, or a record's name
+    std::string element; // a host type, or a record's name
     bool isArray() const { return kind == Kind::Array1D || kind == Kind::Array2D; }
     int dimensions() const { return kind == Kind::Array2D ? 2 : 1; }
 };
@@ -59,7 +60,7 @@ struct RecordType {
 
 const std::vector<Thunk> &AllThunks();
 const std::map<std::string, RecordType> &AllRecords();
-// Exports that take what the catalogue cannot describe.
+// Exports whose arguments the catalogue cannot describe.
 const std::vector<std::string> &NotDriven();
 
 } // namespace qx::test

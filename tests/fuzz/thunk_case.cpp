@@ -8,7 +8,7 @@ namespace qx::test {
 
 namespace {
 
-// Everything that one call is held to by itself.
+// Makes one call and checks everything that must hold for a single call.
 Outcome CallAndCheck(const Scenario &scenario, Node &node, const Manner &manner,
                      Observed *observed = nullptr) {
     const Thunk &thunk = *scenario.thunk;
@@ -32,7 +32,7 @@ Outcome CallAndCheck(const Scenario &scenario, Node &node, const Manner &manner,
         if (!call.inputIsUnchanged(i))
             Tell("the input %s has changed", parameter.name);
     }
-    if (status < 0 || status == statusNoMemory) // an output may keep what it held
+    if (status < 0 || status == statusNoMemory) // an output may keep its old content
         return {status, 0};
     ValueHash hash;
     for (const OutputValue &value : call.outputs())
@@ -80,7 +80,7 @@ Outcome RunThunkCase(Random &random, const Thunk &thunk) {
 
 namespace {
 
-// Whether two array arguments may be one by their types.
+// Whether the types of two array arguments allow them to be one array.
 bool AreOfOneType(const Parameter &one, const Parameter &other) {
     return one.isArray() && one.kind == other.kind && one.element == other.element;
 }
@@ -90,7 +90,8 @@ void LetShare(Scenario &scenario, std::size_t first, std::size_t second) {
     scenario.arguments[second].aliasOf = static_cast<int>(first);
 }
 
-// Calls a scenario in which arrays are one, and compares with arrays of the same content.
+// Calls a scenario in which arguments share an array, and compares with separate arrays of the same
+// content.
 Outcome RunShared(const Scenario &scenario) {
     const Outcome outcome = CallAlone(scenario, {});
     const bool isComparable = !scenario.writesOneTwice() && scenario.writesInput();

@@ -6,14 +6,15 @@
 
 namespace qx::test {
 
-// Cases whose arguments come from the catalogue. Each gives the outcome of one of its calls.
+// Cases whose arguments come from the catalogue. Each returns the outcome of one of its calls.
 
-// A few calls of one node.
+// A few calls on one node.
 Outcome RunThunkCase(Random &random, const Thunk &thunk);
-// One call, and with each pair of arrays of one type as one array, and with all that one array may
-// be in its place.
+// One call, then calls with each pair of arrays of one type as one array, and, for each array, a
+// call with it and all later ones of its type as one array.
 Outcome RunThunkMeetings(Random &random, const Thunk &thunk);
-// One call, and while each of its resizes, some of its allocations or a small workspace refuse.
+// One call, then calls in which each of its resizes, some of its allocations or a small workspace
+// refuses.
 Outcome RunThunkHonesty(Random &random, const Thunk &thunk);
 
 } // namespace qx::test

@@ -23,11 +23,11 @@
 #include <thread>
 #include <vector>
 
-// Calls all exports by their recipes, for as long as one likes, in one process with many threads,
-// on nodes that keep their words from call to call, while the workspace is reserved, enabled,
-// disabled and given back. What has to hold: each call gives the bits that it gives alone, which
-// are the accepted ones; no request is refused as long as all blocks together take less than a
-// quarter of the region; between the phases nothing is left, and memory does not grow.
+// Calls all exports by their recipes, for a given time, in one process with many threads, on nodes
+// that keep their words from call to call, while the workspace is reserved, enabled, disabled and
+// released. The program checks that each call gives the bits that it gives alone, which are the
+// accepted ones; that no request is refused while all blocks together take less than a quarter of
+// the region; that nothing is left between the phases; and that memory does not grow.
 //
 //     soak [--seconds N] [--threads N] [--seed N]
 
@@ -45,7 +45,7 @@ std::atomic<int> findings = 0;
 
 __attribute__((format(printf, 2, 3))) void Tell(const std::string &name, const char *format, ...) {
     static std::mutex lock;
-    static std::set<std::string> told; // one of each kind from each export
+    static std::set<std::string> told; // one finding of each kind for each export
     char text[200];
     va_list arguments;
     va_start(arguments, format);
@@ -58,12 +58,12 @@ __attribute__((format(printf, 2, 3))) void Tell(const std::string &name, const c
     std::fprintf(stderr, "FOUND: %s: %s\n", name.c_str(), text);
 }
 
-// One call of one recipe, and what it gives alone.
+// One call of one recipe, and its result when it runs alone.
 struct Step {
     const Recipe *recipe;
     int32_t n;
     uint64_t hash;
-    int64_t bytes; // of the heap, at most at one time
+    int64_t bytes; // peak use of the heap
 };
 
 std::vector<Step> AllSteps() {
@@ -93,8 +93,8 @@ void CompareWithAccepted() {
     }
 }
 
-// What the threads do with the workspace in a phase. In a scarce region requests are refused; in the
-// others none may be, since the calls at one time take a quarter of it at most.
+// The use of the workspace in a phase. In a scarce region requests are refused; in the others no
+// request may be refused, since simultaneous calls take at most a quarter of the region.
 enum class Workspace { None, Steady, Changing, Scarce };
 constexpr Workspace kinds[] = {Workspace::Steady, Workspace::Changing, Workspace::Scarce,
                                Workspace::None};
@@ -102,13 +102,13 @@ constexpr const char *kindNames[] = {"none", "steady", "changing", "scarce"};
 
 struct Phase {
     Workspace workspace;
-    uint32_t region; // the least
+    uint32_t region; // the smallest size
     std::atomic<int64_t> inUse = 0;
     std::atomic<int64_t> calls = 0, refused = 0;
     std::atomic<bool> over = false;
 
     bool mayRefuse() const { return workspace == Workspace::Scarce; }
-    // Takes the room of a call from the quarter that all of them share.
+    // Takes the memory of a call from the quarter that all calls share.
     bool enters(int64_t bytes) {
         if (workspace == Workspace::None || mayRefuse())
             return true;
@@ -154,7 +154,7 @@ void Run(const Step &step, NodeWords &node, Phase &phase) {
 
 void Work(const std::vector<Step> &steps, uint64_t seed, Phase &phase) {
     Noise noise(seed);
-    std::map<std::string, NodeWords> nodes; // of each export one, which all its recipes share
+    std::map<std::string, NodeWords> nodes; // one for each export, shared by its recipes
     while (!phase.over) {
         const Step &step = steps[noise.bits() % steps.size()];
         if (phase.enters(step.bytes)) {
@@ -171,7 +171,7 @@ void Work(const std::vector<Step> &steps, uint64_t seed, Phase &phase) {
     LeaveHost();
 }
 
-// What the process holds while nothing runs.
+// The memory of the process while no call runs.
 struct Memory {
     int64_t heap;     // bytes in use
     int64_t resident; // bytes
@@ -179,7 +179,7 @@ struct Memory {
 };
 
 Memory MemoryNow() {
-    std::thread(ForgetMovedBlocks).join(); // whose cache of the heap ends with it
+    std::thread(ForgetMovedBlocks).join(); // the thread's heap cache ends with it
     malloc_trim(0);
     const struct mallinfo2 heap = mallinfo2();
     int64_t pages = 0, resident = 0;
@@ -188,14 +188,14 @@ Memory MemoryNow() {
             RegisteredSweeps()};
 }
 
-// After the threads: no block is left in the workspace or the host.
+// Called after the threads have ended: no block may be left in the workspace or the host.
 void EndOfPhase() {
     WorkspaceStatus status = {0, 0};
     DisableAnalysisWorkspaceH(&status);
     status = {0, 0};
     UninitializeAnalysisWorkspaceH(&status);
     if (status.code != 0)
-        Tell("the workspace", "blocks were not given back (%d)", status.code);
+        Tell("the workspace", "blocks were not released (%d)", status.code);
     if (LiveBlocks() != 0)
         Tell("the host", "%d blocks are left", LiveBlocks());
 }
@@ -222,14 +222,14 @@ void RunPhase(const std::vector<Step> &steps, uint64_t number, double seconds, P
 constexpr int64_t heapNoise = 16 << 10, residentNoise = 16 << 20;
 
 int Main() {
-    // So that the C library keeps little of what has been given back.
+    // Makes the C library keep little freed memory.
     mallopt(M_MMAP_THRESHOLD, 1 << 20);
     mallopt(M_TRIM_THRESHOLD, 128 << 10);
     mallopt(M_ARENA_MAX, options.threads);
     CompareWithAccepted();
     const std::vector<Step> steps = AllSteps();
     constexpr uint32_t regions[] = {1U << 20, 4U << 20, 16U << 20, 64U << 20};
-    // The first minute fills what stays, or all but the last third of a short run.
+    // The first minute, or the first two thirds of a short run, fills what is kept permanently.
     const double each = std::clamp(options.seconds / 60, 0.25, 3.75);
     const auto phases = static_cast<uint64_t>(options.seconds / each);
     const uint64_t warm = std::min<uint64_t>(phases * 2 / 3, 16);

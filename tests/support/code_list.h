@@ -11,13 +11,13 @@
 
 namespace qx::test {
 
-// What the headers say of an export's codes; success is always among them.
+// The codes that the headers document for an export; success is always included.
 struct Documented {
     bool hostStatus = false;
     std::set<ErrorCode> codes = {0};
 };
 
-// By name, from the list that the build writes; exports without a status are not among them.
+// By export name, from the list that the build writes; exports without a status are not included.
 inline std::map<std::string, Documented> ReadCodeList(const char *path) {
     std::map<std::string, Documented> exports;
     std::ifstream file(path);

@@ -28,12 +28,12 @@ struct Watch {
     std::size_t largest;
     int32_t allocations;
     int32_t live;
-    void (*hook)(); // in place of a failure
+    void (*hook)(); // called instead of failing
     int32_t refusals;
-    int fresh; // what new blocks hold; negative for anything
+    int fresh; // the byte that fills new blocks; negative for none
     int64_t liveBytes, peakBytes;
 };
-// Of the initial-exec kind, so that reading it never allocates.
+// Uses the initial-exec model, so that reading it never allocates.
 __attribute__((tls_model("initial-exec"))) thread_local Watch watch;
 
 } // namespace
@@ -75,7 +75,7 @@ bool Refuses(std::size_t size) {
     return false;
 }
 
-// Counts bytes that are taken, or with a negative number given back.
+// Counts allocated bytes, or freed bytes if the number is negative.
 void CountBytes(int64_t bytes) {
     watch.liveBytes += bytes;
     watch.peakBytes = std::max(watch.peakBytes, watch.liveBytes);
@@ -93,7 +93,7 @@ void *Granted(void *block) {
     return block;
 }
 
-// From byte `from` to the end of what the heap has given.
+// Fills the block from byte `from` to the end of its usable size.
 void *Fresh(void *block, std::size_t from = 0) {
     if (watch.on && watch.fresh >= 0 && block != nullptr) {
         const std::size_t room = malloc_usable_size(block);

@@ -7,14 +7,15 @@
 
 namespace qx::test {
 
-// Watches the heap calls of the calling thread, those of the module included, and can make one
-// of them fail. Works where malloc can be replaced: on Linux without sanitizers.
+// Watches the heap calls of the calling thread, including those of the module, and can make one of
+// them fail. Works where malloc can be replaced: on Linux without sanitizers.
 class HeapProbe {
 public:
     static bool works();
 
-    // Watches from construction to destruction; the n-th allocation fails (0 for none), and so does
-    // each of more than `largest` bytes. New blocks hold the byte `fresh`, if that is not negative.
+    // Watches from construction to destruction. Allocation number `failAt` fails (0: none fails),
+    // and so does each allocation of more than `largest` bytes. New blocks are filled with the byte
+    // `fresh` unless it is negative.
     explicit HeapProbe(int32_t failAt = 0,
                        std::size_t largest = std::numeric_limits<std::size_t>::max(),
                        int fresh = -1);
@@ -22,15 +23,15 @@ public:
     HeapProbe(const HeapProbe &) = delete;
     HeapProbe &operator=(const HeapProbe &) = delete;
 
-    // Calls `hook` in place of a failure at the n-th allocation, which then goes on.
+    // Calls `hook` before allocation number `hookAt`, which then proceeds.
     HeapProbe(int32_t hookAt, void (*hook)());
 
     int32_t allocations() const;     // malloc, calloc and realloc, failed ones included
     int32_t liveAllocations() const; // allocations less frees
-    int32_t refusals() const;        // those that failed
-    int64_t peakBytes() const;       // the most that was held at one time
+    int32_t refusals() const;        // failed allocations
+    int64_t peakBytes() const;       // the peak of the bytes in use
 
-    // While one exists, heap calls are not watched: the host's own.
+    // While a Pause exists, heap calls are not watched; it is used for those of the host.
     class Pause {
     public:
         Pause();

@@ -5,8 +5,8 @@
 
 namespace qx::test {
 
-// Modes of the floating-point unit, as a register of the processor has them. On x86 those of the x87 unit go
-// with them: a precision of 24 bits and the same rounding.
+// Modes of the floating-point unit, as stored in a control register. On x86 they imply modes of the
+// x87 unit: a precision of 24 bits and the same rounding.
 typedef uint32_t ArithmeticModes;
 struct NamedModes {
     const char *name;
@@ -54,10 +54,10 @@ __attribute__((noinline)) inline void SetArithmetic(ArithmeticModes modes) {
 #endif
 }
 
-// From its construction to its end.
+// Sets the modes during its lifetime.
 class InArithmetic {
 public:
-    // Where the modes are these already nothing is written, and the x87 unit keeps its precision.
+    // If the modes are already set, nothing is written, and the x87 unit keeps its precision.
     explicit InArithmetic(ArithmeticModes modes)
         : before_(CurrentArithmetic()), isAnother_(before_ != modes) {
         if (isAnother_)

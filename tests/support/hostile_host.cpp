@@ -40,8 +40,8 @@ struct Block {
     unsigned char *end() const { return payload() + size; }
 };
 
-// What a guard reads as differs with what fresh blocks hold, so that a call which reads beyond a
-// block has another result then.
+// The guard byte depends on the fill byte of new blocks, so that a call that reads beyond a block
+// gives another result when that byte changes.
 unsigned char GuardByte() { return Host().freshByte ^ 0x58; }
 
 #ifdef QX_TEST_POISONS
@@ -58,10 +58,10 @@ void Allow(const unsigned char *, std::size_t) {}
 
 struct Registry {
     std::recursive_mutex lock;
-    std::deque<HostRecord> records; // of all threads there have been
-    std::vector<HostRecord *> left; // of those that need none any more
+    std::deque<HostRecord> records; // of all threads so far
+    std::vector<HostRecord *> left; // of threads that have ended, for reuse
     std::map<void *, Block> live;   // by handle
-    std::deque<Block> quarantine;   // poisoned
+    std::deque<Block> quarantine;   // blocks that have moved, poisoned
     std::map<std::pair<SweepProcedure, void *>, int32_t> sweeps;
 };
 
@@ -87,7 +87,7 @@ Block Allocate(std::size_t size, int32_t numDims, int32_t typeCode) {
 
 void Expect(const unsigned char *bytes, std::size_t count, unsigned char value, const char *what) {
     Allow(bytes, count);
-    // All are as the first one where each is as the next one.
+    // All bytes equal the first if each equals the next.
     if (count > 0 && (bytes[0] != value || std::memcmp(bytes, bytes + 1, count - 1) != 0))
         throw std::logic_error(what);
     Forbid(bytes, count);
@@ -128,7 +128,8 @@ std::size_t ElementSize(int32_t typeCode) {
     throw std::logic_error("a reshape with an unknown type code");
 }
 
-// An array of DBL may be emptied, but not sized, as one of CDB: some transforms were written so.
+// An array of DBL may be emptied, but not resized, with the type code of CDB, as some transforms
+// do.
 bool IsCodeOf(const Block &block, int32_t typeCode, int32_t count) {
     return typeCode == block.typeCode ||
            (count == 0 && block.typeCode == QXTypeDBL && typeCode == QXTypeCDB);
@@ -136,9 +137,9 @@ bool IsCodeOf(const Block &block, int32_t typeCode, int32_t count) {
 
 } // namespace
 
-// Nothing that is thread_local may have a destructor: on 32-bit Windows the run-time of the
-// compiler frees the memory of such objects before it destroys them, so a destructor would free
-// whatever stands there by then. The records therefore stay to the end of the process.
+// No thread_local object may have a destructor: on 32-bit Windows the compiler's run-time frees the
+// memory of such objects before it destroys them, so a destructor would act on reused memory. The
+// records are therefore kept until the process ends.
 namespace {
 thread_local HostRecord *threadsRecord = nullptr;
 }
@@ -180,7 +181,7 @@ void RunSweeps() {
 }
 
 void RunSweepOf(void *argument) {
-    if (argument == nullptr) // no object's: that is the workspace
+    if (argument == nullptr) // not an object's sweep, but that of the workspace
         return;
     SweepProcedure sweep = nullptr;
     {
@@ -264,7 +265,7 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
     void **handle = *static_cast<void ***>(handleAddress);
     const auto found = Blocks().live.find(handle);
     if (found == Blocks().live.end())
-        throw std::logic_error("a reshape of something that is no handle");
+        throw std::logic_error("a reshape of something that is not a handle");
     if (numDims != found->second.numDims)
         throw std::logic_error("a reshape with another number of dimensions");
     if (count < 0)
@@ -301,7 +302,7 @@ int32_t RegisterSweep(SweepProcedure procedure, void *argument, int32_t mode) {
 
 } // namespace qx::test
 
-// What the module looks for in the main program.
+// The names that the module looks up in the main program.
 #ifdef _WIN32
 #define QX_TEST_EXPORT __declspec(dllexport)
 #else

@@ -10,11 +10,11 @@
 #include <utility>
 #include <vector>
 
-// A host that a careless frame does not survive. It is part of the test program, which exports
-// the names that the module looks for. Every successful reshape moves the block, poisons the old
-// one and keeps it for a while to see whether anybody still writes there; both ends of every
-// block are guarded, for the address sanitizer against reading, too; elements of 1-D blocks stand
-// at 4 modulo 16; new bytes hold a pattern that no result looks like.
+// A host that exposes errors in the frame. It is part of the test program, which exports the names
+// that the module looks up. Every successful reshape moves the block, poisons the old one and keeps
+// it for a while to detect late writes; both ends of every block are guarded, under the address
+// sanitizer against reads as well; elements of 1-D blocks are at addresses that are 4 modulo 16;
+// new bytes hold a pattern that does not resemble any result.
 
 namespace qx::test {
 
@@ -29,39 +29,39 @@ struct Reshape {
 struct HostRecord {
     std::vector<Reshape> reshapes; // in order, refused ones included
     int32_t failAt = 0;            // the n-th reshape from the last reset fails; 0 for none
-    int32_t failStatus = 0;        // with this status
-    int32_t sweepStatus = 0;       // what a registration of a sweep gives; not 0 refuses it
-    // More is refused, with the status of a host that has no memory: by default more than any test
-    // needs, so that absurd requests are not granted lazily.
+    int32_t failStatus = 0;        // the status of that failure
+    int32_t sweepStatus = 0;       // the status of registering a sweep; nonzero refuses it
+    // Larger blocks are refused with the host's out-of-memory status. The default exceeds what any
+    // test needs and prevents absurd requests from being granted lazily.
     std::size_t largestBlock = std::size_t{1} << 30;
-    // What the bytes of a new block hold: as doubles about -1e-128, as int32 about -1.5e9. Its
-    // guards hold another byte, which follows from this one.
+    // The byte that fills a new block: about -1e-128 as double, about -1.5e9 as int32. Its guards
+    // hold another byte, derived from this one.
     unsigned char freshByte = 0xA5;
-    // What happens in the host before each reshape.
+    // Called before each reshape.
     std::function<void()> atReshape = nullptr;
 };
 HostRecord &Host();
-// The calling thread makes no more calls; its record is another's from here on.
+// Releases the record of the calling thread, which makes no more calls, to another thread.
 void LeaveHost();
 constexpr int32_t everyReshape = -1; // as `failAt`
 constexpr int32_t statusNoMemory = 2;
-// Forgets the calling thread's record and sets which reshape fails.
+// Clears the calling thread's record and sets which reshape fails.
 void ResetHost(int32_t failAt = 0, int32_t failStatus = 0);
 
 // Calls every registered sweep, as the host does after an aborted run. An object's sweep is
-// forgotten with the call.
+// unregistered by the call.
 void RunSweeps();
 // The same for the sweep that was registered with this argument, if there is one.
 void RunSweepOf(void *argument);
 int RegisteredSweeps();
 
-// Throws if a guard or a poisoned byte has changed since; called by every reshape and free too.
+// Throws if a guard or a poisoned byte has changed; also called by every reshape and free.
 void CheckBlocks();
-// Checks, and gives back what is kept of blocks that have moved.
+// Checks, and frees the quarantined blocks.
 void ForgetMovedBlocks();
 int LiveBlocks();
 
-// Elements with the alignment of their C++ type, for values on their own.
+// Elements with the alignment of their C++ type, for single values.
 template <ElementType Code>
 struct Plain {
     typedef typename Element<Code>::type type;
@@ -115,7 +115,7 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
 int32_t RegisterSweep(int32_t (*procedure)(void *), void *argument, int32_t mode);
 } // namespace detail
 
-// Test arrays: blocks of the hostile host under their C++ content.
+// Test arrays: blocks of the hostile host with access to their elements.
 template <ElementType Code>
 class Array1D {
 public:
@@ -137,7 +137,7 @@ public:
     Array1D &operator=(const Array1D &) = delete;
 
     Handle1D<Code> handle() const { return handle_; }
-    // As a host does it.
+    // Resizes the block as a host does.
     void resize(int32_t n) {
         detail::ReshapeBlock(static_cast<int32_t>(Code), 1, &handle_, n);
         (*handle_)->dimSize = n;

@@ -18,7 +18,7 @@ public:
         for (std::size_t i = 0; i < count; ++i)
             value_ = (value_ ^ static_cast<const unsigned char *>(bytes)[i]) * 0x100000001B3U;
     }
-    // A NaN counts as a NaN: its sign and payload are the processor's.
+    // All NaNs are equal: their sign and payload depend on the processor.
     void add(double value) {
         if (value != value)
             add("NaN", 3);
@@ -32,7 +32,7 @@ private:
 };
 
 void AddBytes(Hash &hash, const unsigned char *bytes, std::size_t count) {
-    // Every word that could be a double is taken as one, which only serves the NaN.
+    // Every word that could be a double is treated as one; this matters only for NaNs.
     std::size_t i = 0;
     for (; i + sizeof(double) <= count; i += sizeof(double)) {
         double word;
@@ -132,7 +132,7 @@ void *Call::makeRecords(int number, int32_t count, const void *records, std::siz
 double *Call::scalar(int number) {
     const HeapProbe::Pause pause;
     if (CurrentArithmetic() != usualArithmetic)
-        SetArithmetic(usualArithmetic); // for what a recipe computes between two calls
+        SetArithmetic(usualArithmetic); // for computations of the recipe between two calls
     return &(scalars_[number] = 12345.0);
 }
 
@@ -152,7 +152,7 @@ void **Call::slot(int number) {
 }
 
 void **Call::instance(int32_t (*release)(void **)) {
-    if (node_->instance == nullptr) { // else the word ends as whoever filled it has it
+    if (node_->instance == nullptr) { // otherwise its first user has set how it is released
         node_->instance = node_ == &own_ ? preset_ : nullptr;
         node_->releaseInstance = release;
     }
@@ -192,7 +192,7 @@ std::vector<Call::Size> Call::inputSizes() const {
     for (const auto &[number, array] : inputs_) {
         const bool mayBeZero =
             std::find(mayBeEmpty_.begin(), mayBeEmpty_.end(), number) != mayBeEmpty_.end();
-        // The sizes at the start; an export may have changed them since.
+        // The original sizes; an export may have changed them since.
         for (std::size_t i = 0; i < array->sizes().size(); ++i) {
             int32_t size;
             std::memcpy(&size, array->before.data() + 4 * i, sizeof size);

@@ -12,34 +12,35 @@
 #include <string>
 #include <vector>
 
-// One line per export that says how it is called with valid arguments. From these lines the
+// A recipe is one line per export that calls it with valid arguments. From the recipes, the
 // conformance tests drive every export through failing resizes and allocations, empty and
-// mismatched inputs, the workspace, moving blocks and several threads, and the bit hashes are made.
-// The hashes of all exports are committed (tests/conformance/hashes.txt): whoever adds an export or
-// a recipe, or changes a bit on purpose, runs tools/compare_hashes --accept and commits its lines.
+// mismatched inputs, the workspace, moving blocks and several threads, and the bit hashes are
+// computed. The hashes of all exports are committed (tests/conformance/hashes.txt): after adding an
+// export or a recipe, or changing a bit on purpose, run tools/compare_hashes --accept and commit
+// the changed lines.
 //
 //   {"ReOXFFTH80", [](Call &c) {
 //        return ReOXFFTH80(c.in<DBL>(0), c.out<CDB>(0), c.slot(0), 1, c.n, 0);
 //    }},
 //   {"Mean_head", [](Call &c) { return Mean_head(c.in<DBL>(0), c.scalar(0), c.err()); }},
 //
-// An export whose selectors, matrix types or methods matter has several: after the name of the
-// export and ": " comes what the recipe shows, and a loop may write them.
+// An export whose selectors, matrix types or methods matter has several recipes: the name of the
+// export, ": " and the variant. A loop may add them.
 //
 //   {"Norm_head: of infinity", [](Call &c) { ... }},
 //   for (int32_t type = 0; type < 4; ++type)
 //       recipes.push_back({"Det_head: type " + std::to_string(type), [type](Call &c) { ... }});
 //
-// Arguments carry a number each, because C++ leaves open in which order arguments are evaluated,
-// and the content follows the number. Inputs (also those that are outputs as well) are counted in
-// one row, outputs in another:
+// Each argument has a number, which determines its content, because C++ leaves the order of
+// evaluation of arguments unspecified. Inputs (including those that are also outputs) and outputs
+// are numbered separately:
 //
 //   {"SolveInPlace", [](Call &c) {
 //        return SolveInPlace(c.in2D<DBL>(0, c.n, c.n, Dominant), c.inOut<DBL>(1), c.integer(0));
 //    }},
 //
-// Content is noise in [-1, 1), for integers noise in [-9, 9], for masks 0 and 1; or what a function
-// of the index gives, or for a matrix one of row and column, as double or CDB.
+// The content is noise in [-1, 1), for integers noise in [-9, 9], for masks 0 and 1; or the values
+// of a function of the index, for a matrix of row and column, that returns double or CDB.
 
 namespace qx::test {
 
@@ -63,26 +64,26 @@ private:
     uint64_t state_;
 };
 
-// The content of an array that no function is given for.
+// The content of an array for which no function is given.
 struct FromNoise {};
 
-// What a call has left in one of its outputs.
+// The content of one output after a call.
 struct OutputValue {
     std::string name;
-    std::string element;        // of the host; empty where it is not known
-    std::vector<int32_t> sizes; // none for a number or a record
+    std::string element;        // a host type; empty if unknown
+    std::vector<int32_t> sizes; // empty for a number or a record
     const unsigned char *elements;
     std::size_t bytes;
 };
 
-// The words that a node keeps from call to call; what they hold ends with the node.
+// The words that a node keeps from call to call; their contents are released with the node.
 class NodeWords {
 public:
     NodeWords() = default;
     ~NodeWords() { release(nullptr); }
     NodeWords(const NodeWords &) = delete;
     NodeWords &operator=(const NodeWords &) = delete;
-    // Gives back all but what is another's.
+    // Releases all contents except `anothers`.
     void release(const void *anothers);
 
     std::map<int, void *> slots; // by their number in the recipe
@@ -112,7 +113,7 @@ public:
     Handle2D<Code> in2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
         return make<Code>(Role::Input, number, rows, cols, values);
     }
-    // A 1-D block of records, `bytes` in all; without records it still has the `least` bytes.
+    // A 1-D block of records of `bytes` bytes in all, but at least `least` bytes.
     // Named by the handle type: c.inRecords<HistInterval1D>(1, 3, intervals, sizeof intervals).
     template <class Handle>
     Handle inRecords(int number, int32_t count, const void *records, std::size_t bytes,
@@ -120,13 +121,13 @@ public:
         return static_cast<Handle>(makeRecords(number, count, records, bytes, least));
     }
 
-    // Output arrays. They hold rubbish of a few elements before the call.
+    // Output arrays. Before the call they hold a few elements of rubbish.
     template <ElementType Code>
     Handle1D<Code> out(int number);
     template <ElementType Code>
     Handle2D<Code> out2D(int number);
 
-    // Arrays that are input and output at once: a failure empties them, too.
+    // Arrays that are both input and output; a failure empties them as well.
     template <ElementType Code>
     Handle1D<Code> inOut(int number) {
         return inOut<Code>(number, n);
@@ -139,16 +140,12 @@ public:
     Handle2D<Code> inOut2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
         return make<Code>(Role::InOut, number, rows, cols, values);
     }
-    // The same, but a failure leaves them as they were: the state of a stream.
+    // The same, but a failure leaves them unchanged: the state of a stream.
     template <ElementType Code, class Values = FromNoise>
     Handle1D<Code> kept(int number, int32_t count, const Values &values = {}) {
         return make<Code>(Role::Kept, number, count, values);
     }
-    template <ElementType Code, class Values = FromNoise>
-    Handle2D<Code> kept2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
-        return make<Code>(Role::Kept, number, rows, cols, values);
-    }
-    // The same without a rule on failure: an input that the export is known to write into.
+    // The same without a rule on failure: an input that the export is known to overwrite.
     template <ElementType Code>
     Handle1D<Code> spoiled(int number) {
         return spoiled<Code>(number, n);
@@ -157,29 +154,25 @@ public:
     Handle1D<Code> spoiled(int number, int32_t count, const Values &values = {}) {
         return make<Code>(Role::Spoiled, number, count, values);
     }
-    template <ElementType Code, class Values = FromNoise>
-    Handle2D<Code> spoiled2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
-        return make<Code>(Role::Spoiled, number, rows, cols, values);
-    }
 
-    // An input that may be empty without a failure (quirk TakesEmptyInput: all of them).
+    // An input that may be empty without a failure (quirk TakesEmptyInput: all inputs).
     void mayBeEmpty(int number) {
         const HeapProbe::Pause pause;
         mayBeEmpty_.push_back(number);
     }
 
-    // An input that the recipe hands over in more than one call: it cannot be an output as well.
+    // An input that the recipe passes to more than one call, so it cannot also be an output.
     void isReadAgain(int number) {
         const HeapProbe::Pause pause;
         readAgain_.push_back(number);
     }
 
-    // Scalar outputs: a failure leaves the quiet NaN, in both parts of a complex one, or for
-    // integers 0.
+    // Scalar outputs: a failure sets them to a quiet NaN, in both parts of a complex number, or to
+    // 0 for integers.
     double *scalar(int number);
     CDB *complexScalar(int number);
     int32_t *integer(int number);
-    // A record or a pair that is an output but follows no rule on failure.
+    // A record or a pair that is an output without a rule on failure.
     template <class Record>
     Record *record(int number) {
         const HeapProbe::Pause pause;
@@ -187,8 +180,8 @@ public:
         bytes.assign(sizeof(Record), 0);
         return reinterpret_cast<Record *>(bytes.data());
     }
-    // A record with handles in it, whose layout is the platform's. It is no part of the result;
-    // what its numbers tell goes into a record of their own.
+    // A record that contains handles, whose layout depends on the platform. It is not part of the
+    // result; the recipe copies its numbers into a separate record.
     template <class Record>
     Record *recordWithHandles(int number) {
         const HeapProbe::Pause pause;
@@ -201,14 +194,14 @@ public:
     const int32_t *byReference(int32_t value);
     const double *byReference(double value);
 
-    // The trailing error out-parameter: then the status of the call is what stands there.
+    // The trailing error out-parameter; if it is used, it holds the status of the call.
     ErrorCode *err();
 
-    // Words that a node keeps: null at first. The call gives back what they hold.
+    // Words that a node keeps, initially null. The call releases their contents.
     void **slot(int number);
     void **instance(int32_t (*release)(void **));
 
-    // What the engine asks. `alter` changes one size of one input before the call is made.
+    // Used by the test engine. `alter` changes one size of one input before the call.
     ErrorCode status(int32_t functionResult) const;
     bool hasErr() const { return hasError_; }
     struct Size {
@@ -219,23 +212,24 @@ public:
     };
     std::vector<Size> inputSizes() const;
     void alter(int input, int dimension, int32_t size) { altered_ = {input, dimension, size}; }
-    // Lets the block of an input say a size that it does not have.
+    // Makes the block of an input claim a size that it does not have.
     static constexpr int all = -1;
     void claim(int input, int dimension, int32_t size) { claimed_ = {input, dimension, size}; }
-    // Lets every word hold something from the start, of which nobody but the caller disposes.
+    // Gives every word an initial content, which only the caller may free.
     void preset(void *word) { preset_ = word; }
-    // The words are those of a node, which keeps them after the call.
+    // Uses the words of a node, which keeps them after the call.
     void use(NodeWords &node) { node_ = &node; }
     // What the words hold after the call.
     std::vector<void *> words() const;
-    // Called with each array that the recipe has filled: what it changes is what the export gets.
+    // Called with each array that the recipe has filled, and may change it before the export
+    // receives it.
     typedef std::function<void(unsigned char *elements, ElementType, int32_t rows, int32_t cols)>
         Spoil;
     void spoil(Spoil spoil) { spoil_ = std::move(spoil); }
-    // One array in two places of the call. What is read of it is what the recipe gives; where both
-    // are read, what it gives last.
+    // One array in two places of the call. Its content is that of the place that is read, or, if
+    // both are read, of the one that the recipe fills last.
     struct Place {
-        bool isOutput; // a number in the row of outputs
+        bool isOutput; // the number counts outputs
         int number;
         bool operator==(const Place &) const = default;
     };
@@ -246,14 +240,14 @@ public:
         ReadTwice,      // two inputs
         ReadAndWritten, // an input and an output
         WrittenTwice,   // two outputs
-        Unknown         // one of them is written by the way
+        Unknown         // one of them is written as a side effect
     };
     std::vector<std::pair<Pair, Meeting>> pairsOfOneType() const;
     void share(const Pair &pair) { shared_ = pair, sharing_ = Sharing::OneArray; }
-    // Two arrays of that content in its stead, of which the second one counts.
+    // Two arrays of that content instead of the shared one; the second one counts in the result.
     void keepApart(const Pair &pair) { shared_ = pair, sharing_ = Sharing::TwoArrays; }
     bool sharesArray() const { return sharing_ == Sharing::OneArray; }
-    // But for a negative size that is claimed and still there.
+    // Ignores a claimed negative size that is still there.
     bool sizesFitBlocks() const;
     bool inputsAreUnchanged() const;
     // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
@@ -270,22 +264,22 @@ private:
     struct Array {
         virtual ~Array() = default;
         virtual const unsigned char *block() const = 0; // sizes and elements
-        virtual std::size_t room() const = 0;           // of the block
+        virtual std::size_t room() const = 0;           // the capacity of the block
         virtual std::size_t blockSize() const = 0;
         virtual std::vector<int32_t> sizes() const = 0;
         virtual ElementType element() const = 0;
-        void remember(); // the content at the start
+        void remember(); // stores the initial content
         bool isUnchanged() const;
         bool isEmpty() const; // all its sizes are 0
         std::size_t headerSize() const { return 4 * sizes().size(); }
 
-        // Of two arrays in one's stead that which is written more counts.
+        // Of two arrays instead of a shared one, the one with the higher rank counts.
         int rank() const { return role == Role::Output ? 3 : static_cast<int>(role); }
 
         Role role = Role::Output;
         bool isRecords = false;
         bool isCounted = true;             // in the result
-        std::vector<unsigned char> before; // content at the start, for inputs
+        std::vector<unsigned char> before; // initial content, for inputs
     };
     template <ElementType Code>
     struct Array1;
@@ -335,26 +329,27 @@ private:
     Spoil spoil_;
 };
 
-// What an export is known to do differently; everything else is checked.
+// Known deviations of an export; everything else is checked.
 enum Quirk : unsigned {
     None = 0,
-    // Codes other than failure for empty input arrays; for some of them only: Call::mayBeEmpty.
+    // Empty input arrays are not a failure; for single inputs see Call::mayBeEmpty.
     TakesEmptyInput = 1,
-    // A refused resize comes back as the host's own status, untranslated.
+    // A refused resize returns the host's own status, untranslated.
     HostStatusPassesThrough = 2,
-    // Heap calls beside the scratch front (plans, work blocks, instance data).
+    // Calls the heap directly (plans, work blocks, instance data), not only through the scratch
+    // functions.
     UsesHeap = 4,
     // A failed allocation is not, or not always, reported.
     MemoryFailureMayPass = 8,
-    // A failure may leave the array as it is.
+    // A failure may leave the array unchanged.
     MayKeepArrayOnFailure = 16,
     // The function has no status: NaN or infinity is its only sign.
     NoStatus = 32,
-    // The code stands in *err, and the function result is the host's own status where the host
-    // refused a resize (else 0, as for all others with an error out-parameter).
+    // The code is in *err, and the function result is the host's own status if the host refused a
+    // resize (otherwise 0, as for all other exports with an error out-parameter).
     HostStatusInResult = 128,
-    // The code stands in *err and is the function result as well; with HostStatusInResult the
-    // host's own status takes its place there.
+    // The code is both in *err and the function result; with HostStatusInResult the host's own
+    // status replaces it in the function result.
     CodeInBoth = 256,
     // A refused resize is a success.
     RefusalPasses = 512,
@@ -371,13 +366,13 @@ struct Recipe {
 
 inline void PrintTo(const Recipe &recipe, std::ostream *stream) { *stream << recipe.name; }
 
-// Exports that are tested by hand, with the reason.
+// Exports that have tests of their own instead of a recipe, with the reason.
 struct Exempt {
     const char *name;
     const char *reason;
 };
 
-// A file hands over what it holds by one object at its end:
+// A file registers its recipes by one object at its end:
 //
 //     const RecipeFile file(SpectraRecipes);
 class RecipeFile {
@@ -387,11 +382,11 @@ public:
     RecipeFile(std::initializer_list<Exempt> exempt);
 };
 
-// All that the families have handed over, by name.
+// All registered recipes, sorted by name.
 const std::vector<Recipe> &AllRecipes();
 const std::vector<Exempt> &ExemptExports();
 
-// The accepted hashes, by export (tests/conformance/hashes.txt), and how a hash stands there.
+// The accepted hashes, by export (tests/conformance/hashes.txt), and the text form of a hash.
 std::map<std::string, std::string> AcceptedHashes(const char *file);
 std::string HashText(uint64_t hash);
 // One hash per export over all its outputs at all the sizes of its recipes.

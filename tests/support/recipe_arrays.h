@@ -19,7 +19,7 @@ inline void Set(I32 *element, double value) { *element = static_cast<int32_t>(va
 inline void Set(U32 *element, double value) { *element = static_cast<uint32_t>(value); }
 inline void Set(U8 *element, double value) { *element = static_cast<uint8_t>(value); }
 
-// What noise is to each element: whole numbers need a wider range to say anything.
+// The noise of each element type; whole numbers need a wider range to be useful.
 inline double NoiseFor(const SGL *, Noise &noise) { return noise.symmetric(); }
 inline double NoiseFor(const DBL *, Noise &noise) { return noise.symmetric(); }
 inline double NoiseFor(const I32 *, Noise &noise) { return noise.symmetric() * 10; }
@@ -63,7 +63,7 @@ void Fill(T *elements, int32_t count, int32_t cols, int seed, const Values &valu
 
 } // namespace detail
 
-// While one exists, resizes are the test's: the host neither refuses nor records them.
+// While one exists, resizes belong to the test: the host neither refuses nor records them.
 class TestsOwnResizes {
 public:
     TestsOwnResizes() : record_(Host()) { ResetHost(); }
@@ -118,7 +118,7 @@ struct Call::Array2 : Call::Array {
     }
 };
 
-// Adds an array, or lets it be one with its partner that stands already, which gets its content.
+// Adds an array, or merges it with its existing partner, which receives its content.
 template <class Made>
 Made &Call::addOrShare(Role role, const Place &place, std::unique_ptr<Made> made) {
     std::unique_ptr<Array> *const held = partnerOf(place);
@@ -137,7 +137,7 @@ Made &Call::addOrShare(Role role, const Place &place, std::unique_ptr<Made> made
     }
     if (!isMore)
         return partner;
-    // The shared array stands where it is written more.
+    // The shared array is kept in the place with the higher rank.
     std::unique_ptr<Array> moved = std::move(*held);
     const Place &from = place == shared_.first ? shared_.second : shared_.first;
     (from.isOutput ? outputs_ : inputs_).erase(from.number);

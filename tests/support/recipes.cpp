@@ -32,7 +32,7 @@ const std::vector<Recipe> &AllRecipes() {
         for (const RecipeFile::Make make : Registered().files)
             for (Recipe &recipe : make())
                 recipes.push_back(std::move(recipe));
-        // The order of the files is the linker's.
+        // The order of the files depends on the linker.
         std::stable_sort(recipes.begin(), recipes.end(),
                          [](const Recipe &a, const Recipe &b) { return a.name < b.name; });
         return recipes;
@@ -47,7 +47,7 @@ std::map<std::string, std::string> AcceptedHashes(const char *file) {
     std::ifstream lines(file);
     for (std::string name, hash; lines >> name >> hash;)
         if (!accepted.emplace(name, hash).second)
-            throw std::logic_error(name + " stands twice in " + file);
+            throw std::logic_error(name + " occurs twice in " + file);
     return accepted;
 }
 

@@ -7,7 +7,8 @@
 
 namespace qx::test {
 
-// A function of one number, for arguments that reach each of its methods as the size grows.
+// A recipe for a function of one number, with arguments that reach each of its methods as the size
+// grows.
 inline Recipe OfNumber(const char *name, void (*function)(double, double *)) {
     return {name,
             [function](Call &c) {

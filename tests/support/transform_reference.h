@@ -12,7 +12,7 @@
 #include <cstring>
 #include <vector>
 
-// What the tests of the transform families share: transforms by their definition in long double,
+// Shared by the tests of the transform families: transforms by their definition in long double,
 // signals, and the memory of a node.
 
 namespace qx::test {
@@ -24,7 +24,7 @@ typedef std::vector<LongComplex> LongSpectrum;
 
 inline constexpr Long LongPi = 3.141592653589793238462643383279502884L;
 
-// exp(2 pi i numerator / denominator), exact in its reduction.
+// exp(2 pi i numerator / denominator), with exact argument reduction.
 inline LongComplex Turn(int64_t numerator, int64_t denominator) {
     const Long angle = 2 * LongPi * static_cast<Long>(numerator % denominator) / denominator;
     return {std::cos(angle), std::sin(angle)};
@@ -40,7 +40,7 @@ inline LongSpectrum Dft(const LongSpectrum &x, int sign = -1) {
     return sums;
 }
 
-// Values without a pattern in [-1, 1).
+// Pseudo-random values in [-1, 1).
 inline Signal RandomSignal(int32_t n, uint64_t seed = 1) {
     Signal x;
     for (int32_t i = 0; i < n; ++i) {
@@ -90,8 +90,8 @@ bool SameBits(const std::vector<T> &a, const std::vector<T> &b) {
            (a.empty() || std::memcmp(a.data(), b.data(), a.size() * sizeof(T)) == 0);
 }
 
-// The words in which a node keeps its plans: slots, and the host's instance data. The end of the
-// scope is the host's clean-up.
+// The words in which a node keeps its plans: slots, and the host's instance data. The destructor
+// acts as the host's clean-up.
 struct Node {
     PlanSlot slot = nullptr;
     PlanSlot second = nullptr;

@@ -8,8 +8,9 @@
 
 namespace qx::test {
 
-// What a host may do to the workspace at any time, chosen by `choice` from 0 to 7: reserve a region, give it
-// back, disable or enable it. Returns the code where it is none that this can have; else 0.
+// Makes a change to the workspace that a host may make at any time, selected by `choice` from 0 to
+// 7: reserve a region, release it, disable or enable it. Returns the code if it is unexpected for
+// this call, otherwise 0.
 inline ErrorCode ChangeWorkspace(uint32_t choice, uint32_t region, bool memoryMayEnd) {
     WorkspaceStatus status = {0, 0};
     std::set<ErrorCode> expected = {0};

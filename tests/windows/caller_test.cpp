@@ -7,8 +7,9 @@
 #define WIN32_LEAN_AND_MEAN
 #include <windows.h>
 
-// Every export under callers that differ in what the platform leaves open: the alignment of the
-// stack, the state of the x87 unit, the thread. The results are the same to the bit.
+// Calls every export from callers that differ in what the platform leaves unspecified: the
+// alignment of the stack, the state of the x87 unit, the thread. The results must be the same to
+// the bit.
 
 namespace qx::test {
 
@@ -28,8 +29,8 @@ struct Job {
 };
 int32_t Run(Job *job) { return job->recipe.run(job->call); }
 
-// Calls with the stack at `offset` modulo 16. Between here and the export everything is built to
-// keep 4 bytes, so over the four offsets each export is entered at every alignment.
+// Calls with the stack at `offset` modulo 16. All code between here and the export is built to keep
+// only 4-byte alignment, so over the four offsets each export is entered at every alignment.
 int32_t RunOnStackAt(uint32_t offset, Job *job) {
     int32_t result;
     __asm__ volatile("movl %%esp, %%ebx\n\t"
@@ -79,7 +80,7 @@ struct FloatingPointState {
         FloatingPointState state;
         __asm__ volatile("fnstcw %0" : "=m"(state.x87));
         __asm__ volatile("stmxcsr %0" : "=m"(state.sse));
-        state.sse &= ~uint32_t{0x3f}; // the flags of what has happened
+        state.sse &= ~uint32_t{0x3f}; // the sticky exception flags
         return state;
     }
     bool operator==(const FloatingPointState &) const = default;

@@ -5,8 +5,9 @@
 
 #include <cstddef>
 
-// The records that the host, or a program built by another compiler, shares with the module, where
-// words and addresses have 32 bits. Nothing to run: it compiles or it does not.
+// The layout of the records that the host, or a program built by another compiler, shares with the
+// module, if words and addresses have 32 bits. It is checked at compile time; there is nothing to
+// run.
 
 static_assert(sizeof(Array1DHandle) == 4 && sizeof(Array1DBlock) == 4);
 static_assert(sizeof(Array2DHandle) == 4 && sizeof(Array2DBlock) == 8);
@@ -39,8 +40,8 @@ static_assert(offsetof(FFTStage, raderPlan) == 16);
 static_assert(offsetof(FFTStage, raderCos) == 20 && offsetof(FFTStage, raderSin) == 24);
 static_assert(offsetof(FFTStage, raderGather) == 28 && offsetof(FFTStage, raderScatter) == 32);
 
-// A double stands at a multiple of 8 in a record of this platform, so the last word is followed by
-// four bytes of nothing.
+// A double in a record is aligned to 8 bytes on this platform, so four bytes of padding follow the
+// last word.
 static_assert(offsetof(HistInterval, upper) == 8 && offsetof(HistInterval, closure) == 16);
 static_assert(sizeof(HistInterval) == 24);
 static_assert(sizeof(HistSummary) == 12);

@@ -5,8 +5,8 @@
 #define WIN32_LEAN_AND_MEAN
 #include <windows.h>
 
-// The module loaded, used and unloaded again and again in one process, as a host does that opens
-// and closes projects. This program links nothing of the module.
+// Loads, uses and unloads the module repeatedly in one process, as a host does that opens and
+// closes projects. This program is not linked with the module.
 
 namespace {
 
@@ -42,7 +42,7 @@ void UseAndUnload() {
 }
 
 TEST(Reload, LeavesNoHandleBehind) {
-    UseAndUnload(); // what the system itself opens at a first load
+    UseAndUnload(); // includes what the system itself opens at a first load
     DWORD before = 0, after = 0;
     ASSERT_TRUE(GetProcessHandleCount(GetCurrentProcess(), &before));
     for (int i = 0; i < 20; ++i)

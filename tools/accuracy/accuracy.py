@@ -1,9 +1,9 @@
-"""Peak and rms error of the special functions, and of the peers that have them.
+"""Peak and RMS errors of the special functions, and of the other libraries that have them.
 
-Each file *_points.py beside this one has PAGE, TITLE and a list FUNCTIONS of Function. The error
+Each file *_points.py in this folder has PAGE, TITLE and a list FUNCTIONS of Function. The error
 of a value is |value - reference| / max(|reference|, scale) in units of eps = 2^-52, where the
 scale is 0, a number or a function of the arguments: for functions with zeros it is the modulus,
-which makes the error absolute there.
+so that the error is absolute near a zero.
 """
 
 import ctypes
@@ -22,10 +22,10 @@ EPS = 2.0**-52
 
 
 class Function:
-    """name: of the export. signature: letters of the arguments, d double, i int32, D and I the same
-    by reference, o an output, e an error code, n a null output. output: which of the outputs is
-    measured. rows: (interval, list of argument tuples). reference: of the arguments as mpf. peers:
-    {"GSL": callable, ...} over floats. note: what the reader of the table must know."""
+    """name: the export. signature: a letter for each argument: d double, i int32, D and I the same
+    by reference, o an output, e an error code, n a null output. output: the index of the output that
+    is measured. rows: (interval, list of argument tuples). reference: a function of the arguments as
+    mpf. peers: {"GSL": callable, ...} over floats. note: a remark above the table."""
 
     def __init__(self, name, signature, reference, rows, peers=None, scale=None, output=0, title=None,
                  note=""):
@@ -34,8 +34,8 @@ class Function:
         self.output, self.title, self.note = output, title or name, note
 
 
-# Points. Each gives a list of floats, the ends included, and so both sides of a threshold where two
-# intervals meet in it.
+# Points. Each function returns a list of floats that includes the ends, and therefore both sides of a threshold at
+# which two intervals meet.
 def linear(a, b, n=40, seed=1):
     r = random.Random(seed)
     return [a, b] + [r.uniform(a, b) for _ in range(n - 2)]
@@ -47,7 +47,7 @@ def logarithmic(a, b, n=40, seed=1):
 
 
 def around(x, n=6):
-    """The doubles next to a threshold, and some farther ones."""
+    """A threshold and the n doubles on either side of it."""
     points = [x]
     low = high = x
     for i in range(n):
@@ -57,7 +57,7 @@ def around(x, n=6):
 
 
 def pairs(first, second):
-    """Each of the first with one of the second."""
+    """Each element of first with one element of second, cyclically."""
     return [(f, second[i % len(second)]) for i, f in enumerate(first)]
 
 
@@ -104,14 +104,14 @@ def peer_library(path):
 
 
 def plain(library, name, signature):
-    """A peer's C function of doubles (d) and int32 (i), or None where the library lacks it."""
+    """A peer's C function of doubles (d) and int32 (i), or None if the library does not have it."""
     if library is None or not hasattr(library, name):
         return None
     types = {"d": ctypes.c_double, "i": ctypes.c_int32, "u": ctypes.c_uint32, "m": ctypes.c_uint}
     entry = getattr(library, name)
     entry.restype = ctypes.c_double
     entry.argtypes = [types[letter] for letter in signature]
-    extra = [0] * signature.count("m")  # GSL's mode of precision
+    extra = [0] * signature.count("m")  # GSL's precision mode
 
     def call(*arguments):
         cast = [int(a) if t in "iu" else float(a) for a, t in zip(arguments, signature.replace("m", ""))]
@@ -201,7 +201,7 @@ def table(function, library, verbose):
                 continue
             reference = mpmath.re(reference)
             if not mpmath.isfinite(reference) or not 1e-300 < abs(reference) < 1e308:
-                continue  # outside the range of doubles, where no relative error can be asked for
+                continue  # outside the range of doubles, where a relative error means nothing
             kept.append(point)
             references.append(reference)
             scale = function.scale
@@ -222,8 +222,8 @@ def table(function, library, verbose):
 
 
 HEADING = """Errors in units of eps = 2.2e-16, relative to the value or, for functions with zeros, to the modulus
-stated with them, against mpmath at 50 digits. Peak and RMS are ours; the columns of the peers hold
-their peaks on the same points. Made by `tools/accuracy/run`.
+given there, against mpmath at 50 digits. Peak and RMS are ours; the other columns are the peak errors
+of other libraries at the same points. Written by `tools/accuracy/run`.
 """
 
 

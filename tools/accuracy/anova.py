@@ -1,6 +1,6 @@
 #!/usr/bin/python3
 """Writes docs/accuracy/anova.md: the errors of the analysis of variance and of contingency tables,
-against exact fractions and probabilities of 40 digits, beside R's and SciPy's.
+against exact fractions and probabilities with 40 digits, next to R's and SciPy's.
 
     QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/anova.py
 
@@ -18,6 +18,7 @@ import numpy as np
 from scipy import stats
 
 import qx
+from pages import table
 
 ROOT = Path(__file__).resolve().parents[2]
 PAGE = ROOT / "docs/accuracy/anova.md"
@@ -37,7 +38,7 @@ R_VERSION = subprocess.run(["Rscript", "-e", "cat(R.version$major, R.version$min
 
 
 def moved(cells, offset):
-    """In eighths, away from 0: exact in doubles."""
+    """The data in eighths, with the offset added: exact in doubles."""
     return {cell: [int(float(offset)) + y / 8 for y in values] for cell, values in cells.items()}
 
 
@@ -60,7 +61,7 @@ def ours(cells, random_factors=(), significance=0.05):
 
 
 def of_r(cells):
-    """Sums of squares, f and p of the sources that R's analysis of a linear model has; all fixed."""
+    """Sums of squares, f and p of the sources in R's analysis of a linear model with fixed factors."""
     y, labels = columns(cells)
     names = "ABC"[:len(labels)]
     frame = ", ".join([f"y = c({','.join(map(repr, y))})"]
@@ -76,7 +77,7 @@ def of_r(cells):
 
 
 def error(value, exact):
-    """Relative, in units of eps; NaN where there is no such number."""
+    """The relative error in units of eps; 0 if either number is NaN."""
     exact = float("nan") if exact != exact else exact
     if exact != exact or value != value:
         return 0.0
@@ -115,7 +116,7 @@ def offset_rows():
 
 
 def random_rows():
-    """All choices of random factors, of the designs with more than one observation in a cell."""
+    """All choices of random factors for the designs with more than one observation per cell."""
     for name, cells in DATA:
         factors = len(next(iter(cells)))
         if len(next(iter(cells.values()))) == 1:
@@ -138,7 +139,7 @@ def random_rows():
 
 
 def critical_rows():
-    """Critical values of fixed factors, whose degrees are whole, beside R's and SciPy's."""
+    """Critical values for fixed factors, whose degrees of freedom are integers, next to R's and SciPy's."""
     for significance in SIGNIFICANCES:
         largest = [0.0] * 3
         for _, cells in DATA:
@@ -159,7 +160,7 @@ def critical_rows():
 
 
 def nist_sets():
-    """NIST's sets for one factor: name and samples, in the doubles nearest to the published decimals."""
+    """NIST's sets for one factor: name and samples, as the doubles nearest to the published decimals."""
     lines = [line for line in (ROOT / "src/stats/tests/data/nist_anova.dat").read_text().splitlines()
              if line and line[0] != "#"]
     while lines:
@@ -216,43 +217,36 @@ def contingency_rows():
         yield f"| {name} | {mpmath.nstr(p, 3)} | " + " | ".join(cells) + " |"
 
 
-def table(head, rows):
-    lines = ["| " + " | ".join(head) + " |", "|---" * len(head) + "|"]
-    for row in rows:
-        print(row, flush=True)
-        lines.append(row)
-    return "\n".join(lines)
-
-
 if __name__ == "__main__":
     PAGE.write_text(f"""# Accuracy of the analysis of variance
 
 `Anova2Way_head_2017` and `ANOVA3Way_head_2017` (their shorter forms give the same numbers), on
-published data. Largest relative errors over the sources of a table, in units of 2.2e-16, against exact
-fractions; those of p and of critical values against 40 digits. 0 is no wrong bit, up to 0.5 the nearest
-double. Written by `tools/accuracy/anova.py`.
+published data. The tables show the largest relative errors over the sources of an analysis, in units of 2.2e-16,
+against exact fractions; those of p and of critical values are against 40 digits. 0 means that every bit is
+correct, and up to 0.5 that the result is the nearest double. Written by `tools/accuracy/anova.py`.
 
-**Data away from 0.** The data in eighths, with a constant added, which changes no sum of squares; all
-factors fixed. R {R_VERSION}: `anova(lm(...))`.
+**Data away from 0.** The data are in eighths, with a constant added, which does not change the sums of squares;
+all factors are fixed. R {R_VERSION}: `anova(lm(...))`.
 
 {table(["Data", "Constant", "squares", "f", "p", "R: squares", "f", "p"], offset_rows())}
 
-**Random factors.** All choices of random factors. Refused are tables without a positive denominator,
-which the exact ones have neither.
+**Random factors.** All choices of random factors. Analyses without a positive denominator are refused; in exact
+arithmetic, they have no positive denominator either.
 
 {table(["Data", "Choices", "Refused", "squares", "f", "p", "critical"], random_rows())}
 
-**One factor**: f of NIST's sets, whose means are up to 1e13 standard deviations from 0, against exact fractions
-of the same doubles.
+**One factor.** Errors of f for NIST's sets, whose means are up to 1e13 standard deviations from 0, against exact
+fractions of the same doubles.
 
 {table(["Set", "Anova1Way_head_2017", "Anova1Way_head_2026", "SciPy f_oneway"], one_way_rows())}
 
-**Critical values** by significance, over all sources of the data above with fixed factors.
+**Critical values.** Largest errors by significance, over all sources of the data above with fixed factors.
 
 {table(["Significance", "ours", "R qf", "SciPy f.isf"], critical_rows())}
 
-**Contingency tables**: the statistic against exact fractions, p against 60 digits. The revision takes p of the
-rounded statistic, of which half an ulp counts as many times in a small p as half the statistic says.
+**Contingency tables.** The statistic is compared with exact fractions, p with 60 digits. The revision
+computes p from the rounded statistic; where p is small, the rounding error of half an ulp is multiplied by half
+the statistic.
 
 {table(["Table", "p", "Contingency_head: statistic", "p", "Contingency2026_head: statistic", "p",
         "SciPy: statistic", "p"], contingency_rows())}

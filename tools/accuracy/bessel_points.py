@@ -1,4 +1,4 @@
-"""Where Bessel functions and their kin, elliptic integrals, Dawson, Fresnel and zeta are measured."""
+"""The points at which Bessel and related functions, elliptic, Dawson's and Fresnel integrals and zeta are measured."""
 
 import mpmath
 from mpmath import mpf, pi, sqrt
@@ -7,7 +7,7 @@ from accuracy import (Function, around, from_gsl, from_scipy, from_std, linear, 
                       single)
 
 PAGE = "bessel.md"
-TITLE = "Accuracy: Bessel functions and their kin, elliptic integrals, Dawson, Fresnel, zeta"
+TITLE = "Accuracy: Bessel and related functions, elliptic, Dawson's and Fresnel integrals, zeta"
 
 
 def wave(order, x):

@@ -4,7 +4,7 @@ prints the table of docs/accuracy/chirp_z.md.
 
     QX_LIBRARY_DIR=build/release tools/accuracy/chirp_z.py
 
-The points are computed in long double and rounded, so that only the inverse errs.
+The points are computed in long double and rounded, so that the errors are those of the inverse alone.
 """
 
 import sys
@@ -22,7 +22,7 @@ TURN = 2 * np.arctan2(np.longdouble(0), np.longdouble(-1))
 
 
 def error(n, arc):
-    """The greatest of several relative errors, for signals without a pattern."""
+    """The largest relative error for three random signals."""
     w = complex(np.exp(-1j * float(TURN * arc / n)))
     angle = np.arctan2(np.longdouble(w.imag), np.longdouble(w.real))
     growth = np.log(np.longdouble(w.real) ** 2 + np.longdouble(w.imag) ** 2) / 2

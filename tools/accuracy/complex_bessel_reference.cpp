@@ -1,10 +1,10 @@
 // References for the complex Bessel and Airy functions, by the ball arithmetic of Arb (F.
 // Johansson, Arb: efficient arbitrary-precision midpoint-radius interval arithmetic, 2017): the
-// precision is raised until every value has 110 bits for certain. Needs libflint-arb-dev.
+// precision is raised until every value is certain to 110 bits. Needs libflint-arb-dev.
 //
-// A line "bessel ORDER RE IM" gives J, Y, I, K, H1, H2, a line "airy RE IM" gives Ai, Ai', Bi, Bi';
-// each value is a line: for scaled = 0 and 1 the parts as two doubles each, RE RE_LOW IM IM_LOW,
-// and last the amplitude of the oscillation over the absolute value: |f'| |z| / max(|s|, |z|^(2/3),
+// The input line "bessel ORDER RE IM" gives J, Y, I, K, H1, H2, the line "airy RE IM" gives Ai, Ai', Bi, Bi'.
+// Each value is an output line: for scaled = 0 and 1 the parts as two doubles each, RE RE_LOW IM IM_LOW,
+// then the amplitude of the oscillation over the absolute value: |f'| |z| / max(|s|, |z|^(2/3),
 // 1) with s^2 = order^2 -+ z^2; for Airy functions |f'| / sqrt |z|, for their derivatives |f| sqrt
 // |z|. The sign of a zero imaginary part chooses the side of a cut.
 
@@ -88,7 +88,7 @@ Ball K(double order, const Ball &z) {
 }
 const Ball kI(0, 1);
 
-// Of x + i y with y >= 0, from I and K of |order| in the right half-plane.
+// The functions of x + i y with y >= 0, from I and K of |order| in the right half-plane.
 void Bessel(double order, double x, double y, Ball (&f)[6]) {
     const double u = std::fabs(order);
     const Ball w(y, -x);
@@ -127,7 +127,7 @@ void PrintPart(const arb_t x) {
     arf_clear(rest);
 }
 
-// Conjugated where the point is below the real axis.
+// The value is conjugated if the point is below the real axis.
 void Print(Ball plain, Ball scaled, bool isBelow, double amplitude) {
     for (Ball *value : {&plain, &scaled}) {
         if (isBelow)
@@ -162,7 +162,7 @@ void BesselLines(double order, double x, double y) {
         decay, decay, Exp(Ball(-std::fabs(x))), Exp(z), Exp(Ball(y, -x)), Exp(Ball(-y, x))};
     const double size = z.size();
     for (int n = 0; n < 6; ++n) {
-        const int k = !isBelow || n < 4 ? n : 9 - n; // the Hankel functions change places
+        const int k = !isBelow || n < 4 ? n : 9 - n; // the Hankel functions are exchanged
         const bool isModified = k == 2 || k == 3;
         const Ball slope =
             k == 2 ? Ball(order) * f[k] + z * next[k] : Ball(order) * f[k] - z * next[k];

@@ -1,10 +1,10 @@
-"""How often the bounds of fits hold: draws data of known models with normal errors, fits them, and
+"""How often the bounds of fits hold: draws data from known models with normal errors, fits them, and
 counts the trials in which the 95 % bounds contain the curve, a new observation and the coefficients.
-Of N trials a share of 0.95 shows within 0.95 -+ 4 sqrt(0.0475 / N), with 10^4 trials 0.941 to 0.959.
+With N trials, a true fraction of 0.95 is observed within 0.95 -+ 4 sqrt(0.0475 / N): 0.941 to 0.959 for 10^4 trials.
 
     QX_LIBRARY_DIR=build/release PYTHONPATH=python /usr/bin/python3 tools/accuracy/coverage.py [TRIALS]
 
-Prints a table and fails where a share is outside 0.94 to 0.96.
+Prints a table and fails if a fraction is outside 0.94 to 0.96.
 """
 
 import sys
@@ -15,7 +15,7 @@ import qx
 X = np.linspace(0.5, 5, 24)
 DEVIATIONS = np.where(np.arange(24) % 3 == 0, 2.0, 1.0)  # of the errors, in units of the noise
 WEIGHTS = DEVIATIONS**-2
-AT = 7  # the sample at which curve and observation are looked at; its deviation is 1
+AT = 7  # the sample at which the bounds of curve and observation are checked; its deviation is 1
 H = np.column_stack([np.ones(24), np.sin(X), np.cos(X)])
 
 

@@ -1,4 +1,4 @@
-"""Where the distributions and their quantiles are measured."""
+"""The points at which the distributions and their quantiles are measured."""
 
 import mpmath
 from mpmath import mp, mpf
@@ -31,7 +31,7 @@ def chi_square(x, dof):
 
 
 def root(function, low, high):
-    """The increasing function's root between two numbers, to the digits of a double."""
+    """The root of an increasing function between two numbers, to the precision of a double."""
     low, high = mpf(low), mpf(high)
     with mp.workdps(25):
         for _ in range(400):
@@ -80,8 +80,9 @@ def peer(function, *order):
 TAILS = [-40.0, -12.5, -6.0, -3.3]
 PROBABILITIES = [1e-4, 0.01, 0.2, 0.45, 0.77, 0.95, 0.999]
 OF_X = {"GSL": from_gsl("gsl_cdf_ugaussian_P", "d"), "SciPy": from_scipy("ndtr")}
-LOW_PRECISION = "An approximation of low order, kept since results are compared across revisions; in absolute terms {}."
-BISECTION = "A bisection that stops at an absolute 1e-4, which is 4.5e11 eps; absolute where the value is below 1."
+LOW_PRECISION = "An approximation of low order, kept so that results stay comparable; in absolute terms {}."
+BISECTION = ("A bisection that stops at an absolute width of 1e-4, or 4.5e11 eps; errors are absolute where the value is "
+             "below 1.")
 
 FUNCTIONS = [
     Function("NormDist_head", "Do", normal, [("[-8, 0]", single(linear(-8, 0))), ("[0, 8]", single(linear(0, 8)))],
@@ -90,12 +91,12 @@ FUNCTIONS = [
              rows("t in [-40, -3]", TAILS) + rows("|t| in [0.001, 3]", linear(-3, 3, 8) + [-1e-3]) +
              [("|t| = 1e-6", product([-1e-6, 1e-6], DOFS))],
              {"GSL": from_gsl("gsl_cdf_tdist_P", "dd"), "SciPy": peer(from_scipy("stdtr"), 1, 0)},
-             note="From dof / (t^2 + dof), which nears 1 for small t and loses the digits of t^2."),
+             note="Computed from dof / (t^2 + dof), which approaches 1 for small t and loses the digits of t^2."),
     Function("FDist_head", "DIIoe", fisher,
              [(t, two(p)) for t, p in rows("f in [0.01, 1]", logarithmic(0.01, 1, 6)) +
               rows("f in [1, 50]", logarithmic(1, 50, 6))],
              {"GSL": from_gsl("gsl_cdf_fdist_P", "ddd"), "SciPy": peer(from_scipy("fdtr"), 1, 2, 0)},
-             note="1 less the upper tail: small probabilities have the absolute error of those near 1."),
+             note="Computed as 1 minus the upper tail: small probabilities have the absolute error of those near 1."),
     Function("ChiSquare_head", "DIoe", chi_square,
              [(t, [(x * d, d) for x, d in p]) for t, p in rows("x in [0.1, 0.8] dof", [0.1, 0.3, 0.5, 0.8]) +
               rows("x in [0.8, 1.2] dof", [0.9, 0.99, 1.0, 1.01, 1.1]) + rows("x in [1.2, 5] dof", [1.2, 2, 5])],
@@ -119,7 +120,7 @@ FUNCTIONS = [
 
 # The revisions: tails and logarithms by series with positive terms, in as many digits as 1 - p needs.
 def far(function):
-    """A function of the arguments, in the digits that a complement of 1e-320 needs."""
+    """A function evaluated with the digits that a complement of 1e-320 needs."""
     def value(*arguments):
         with mp.workdps(400):
             return +function(*(mpf(a) for a in arguments))
@@ -162,7 +163,7 @@ REAL = [0.3, 1.0, 2.5, 7.0, 30.0, 400.0]
 
 
 def chosen(peer_function, *order):
-    """A peer without the last argument, which chooses the value."""
+    """A peer without the last argument, which selects the value."""
     return peer_function and (lambda *a: peer_function(*[a[k] for k in order]))
 
 
@@ -198,7 +199,7 @@ FUNCTIONS += [
              [("survival, x in [0.001, 3] dof, 0.3 to 400 degrees", with_choice(CHI_POINTS, SURVIVAL))],
              {"GSL": chosen(from_gsl("gsl_cdf_chisq_Q", "dd"), 0, 1),
               "SciPy": lambda x, dof, what: from_scipy("chdtrc")(dof, x)}),
-    # The inverses on the points of their elders, which give the lower tail.
+    # The inverses at the points of their elders, which take the lower tail.
     Function("InvNdist2026_head", "DIoe", lambda p, tail: normal_quantile(p),
              [("p in [1e-300, 0.5)", with_choice(single(logarithmic(1e-300, 0.49)), 0)),
               ("p in [0.501, 1)", with_choice(single(linear(0.501, 1 - 1e-9)), 0))],

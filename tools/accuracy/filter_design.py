@@ -1,8 +1,8 @@
 #!/usr/bin/python3
-"""How far the gains of designed IIR filters are from the definition of their families: the greatest
+"""Compares the gains of designed IIR filters with the definition of their families: the largest
 difference over the pass band, for the elders' sections of second and fourth order, the sections of the
-revisions of 2026 and SciPy's sections, as the tables of docs/accuracy/filter_design.md. The response of the
-coefficients as they are stored and the definition are both evaluated by mpmath at 40 digits.
+revisions of 2026 and SciPy's sections. Prints tables of docs/accuracy/filter_design.md. mpmath evaluates the
+response of the stored coefficients and the definition at 40 digits.
 
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/filter_design.py
 """
@@ -98,7 +98,7 @@ def main():
             cells = []
             for order in ORDERS:
                 excess = excess_of(family, order)
-                # In the pass band, where an inverse Chebyshev filter has no edge of its own.
+                # In the pass band, whose edge an inverse Chebyshev design does not specify.
                 share = 0.5 if family == "inverse Chebyshev" else 1
                 if type_ == 0:
                     points = [mp.mpf(fl) * share * k / 24 for k in range(1, 25)]

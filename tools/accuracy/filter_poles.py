@@ -1,9 +1,9 @@
 #!/usr/bin/python3
-"""Poles, zeros and gain of IIR filters at 50 digits from the definitions of their families, and how far
-designs are from them: the tables of poles in docs/accuracy/filter_design.md.
+"""Poles, zeros and gain of IIR filters at 50 digits from the definitions of their families, and the distances of
+computed designs from them. Prints the tables of poles in docs/accuracy/filter_design.md.
 
 Elliptic poles come from the inverse of sn and from cd at complex arguments, Bessel poles are the roots of the
-polynomial; edges and levels are taken as the doubles that they are.
+polynomial; edges and levels are exactly the doubles that a design is given.
 
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/filter_poles.py
 """
@@ -18,7 +18,7 @@ TYPES = ("lowpass", "highpass", "bandpass", "bandstop")
 
 
 def angles(n):
-    """Of the poles of a Butterworth filter, from the positive imaginary axis to the negative one."""
+    """The angles of the poles of a Butterworth filter, from the positive imaginary axis to the negative one."""
     return [mp.pi * (n + 1 + 2 * i) / (2 * n) for i in range(n)]
 
 
@@ -74,7 +74,7 @@ FAMILIES = {"Butterworth": butterworth, "Chebyshev": chebyshev, "inverse Chebysh
 
 
 def digital(analog, order, type_, fl, fh):
-    """Zeros, poles and gain in z; the zeros at infinity of the prototype are where the type has them."""
+    """Zeros, poles and gain in z; zeros of the prototype at infinity are mapped according to the type."""
     zeros, poles, gain = analog
     low, high = (mp.tan(mp.pi * mp.mpf(f)) for f in (fl, fh or fl))
 
@@ -99,7 +99,7 @@ def digital(analog, order, type_, fl, fh):
 
 
 def farthest(found, exact):
-    """The greatest distance of a found one from its partner, in units of 2^-53."""
+    """The largest distance of a computed pole or zero from its exact partner, in units of 2^-53."""
     left, worst = list(exact), mp.mpf(0)
     for one in found:
         one = mp.mpmathify(complex(one))

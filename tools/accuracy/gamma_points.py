@@ -1,4 +1,4 @@
-"""Where the gamma and beta functions, factorials and the digamma function are measured."""
+"""The points at which the gamma and beta functions, factorials and the digamma function are measured."""
 
 import mpmath
 from mpmath import mpf
@@ -10,12 +10,12 @@ TITLE = "Accuracy: gamma and beta functions, factorials, digamma"
 
 
 def complete(points):
-    """a, x, selector for the complete form."""
+    """Arguments a, x and the selector of the complete form."""
     return [(a, 0.0, 1) for a, in single(points)]
 
 
 def first(function):
-    """A peer of the first argument alone."""
+    """A peer that takes only the first argument."""
     return function and (lambda a, *rest: function(a))
 
 
@@ -68,7 +68,7 @@ def lower_gamma(a, x):
 
 
 def regularised_beta(a, b, x):
-    """By the series of positive terms; I_x(a, b) = 1 - I_(1-x)(b, a) keeps it short."""
+    """By the series with positive terms; I_x(a, b) = 1 - I_(1-x)(b, a) keeps it short."""
     if x > a / (a + b):
         return 1 - regularised_beta(b, a, 1 - x)
     series = mpmath.hyp2f1(a + b, 1, a + 1, x, maxterms=10**6)
@@ -97,20 +97,21 @@ FUNCTIONS = [
               "SciPy": first(from_scipy("gamma"))}, title="QX_Gamma, complete"),
     Function("QX_LnGamma", "do", mpmath.loggamma, [(t, single(p)) for t, p in LN_GAMMA],
              {"GSL": from_gsl("gsl_sf_lngamma", "d"), "C++": from_std("std_lgamma", "d"),
-              "SciPy": from_scipy("gammaln")}, 1, note="Absolute where |ln gamma| < 1, near the zeros at 1 and 2."),
+              "SciPy": from_scipy("gammaln")}, 1,
+             note="Errors are absolute where |ln gamma| < 1, near the zeros at 1 and 2."),
     Function("QX_Stirling", "do", mpmath.gamma,
              [(t, single(p)) for t, p in (("[33, 143]", linear(33, 143.01608) + around(143.01608)),
                                           ("[143, 171.6]", linear(143.02, 171.6)), ("[10, 33]", linear(10, 33)))],
              {"GSL": from_gsl("gsl_sf_gamma", "d"), "C++": from_std("std_gamma", "d"), "SciPy": from_scipy("gamma")},
-             note="Meant for x > 33; its five terms leave what the last row shows below that."),
+             note="Intended for x > 33; below that, its five terms leave the error in the last row."),
     Function("QX_Gamma", "ddo", lower_gamma, INCOMPLETE,
              {"GSL": from_gsl("gsl_sf_gamma_inc_P", "dd"), "SciPy": from_scipy("gammainc")},
              title="QX_Gamma, incomplete: P(a, x)",
-             note="The common factor exp(a ln x - x - ln gamma(a)) loses digits in proportion to a ln a; beyond x = a "
-                  "the value is 1 - Q(a, x). Both stay, since results are compared across revisions."),
+             note="The common factor exp(a ln x - x - ln gamma(a)) loses digits in proportion to a ln a; beyond x = a, "
+                  "the value is 1 - Q(a, x). Both are kept so that results stay comparable."),
     Function("QX_GammaC", "ddo", lambda a, x: mpmath.gammainc(a, x, regularized=True), INCOMPLETE,
              {"GSL": from_gsl("gsl_sf_gamma_inc_Q", "dd"), "SciPy": from_scipy("gammaincc")}, title="QX_GammaC: Q(a, x)",
-             note="The same; below x = a and below x = 1 the value is 1 - P(a, x), which for tiny a leaves few digits."),
+             note="The same; below x = a and below x = 1, the value is 1 - P(a, x), which leaves few digits for tiny a."),
     Function("QX_Beta_85", "dddoi", lambda a, b, *rest: mpmath.beta(a, b),
              [(t, [(a, b, 0.0, 1) for a, b in p]) for t, p in BETA],
              {"GSL": lambda a, b, *rest: from_gsl("gsl_sf_beta", "dd")(a, b),
@@ -119,8 +120,8 @@ FUNCTIONS = [
     Function("QX_Beta", "dddo", regularised_beta, INCOMPLETE_BETA,
              {"GSL": from_gsl("gsl_sf_beta_inc", "ddd"), "SciPy": from_scipy("betainc")},
              title="QX_Beta, incomplete: I_x(a, b)", scale=mpf("0.001"),
-             note="Absolute where the value is below 0.001. The fractions are cut after 100 terms, which the last rows "
-                  "feel, and the common factor comes from logarithms of gamma."),
+             note="Errors are absolute where the value is below 0.001. The fractions end after 100 terms, which affects the "
+                  "last rows, and the common factor comes from logarithms of gamma."),
     Function("QX_Fact", "io", mpmath.factorial,
              [("n = 0 ... 33", fact(0, 33)), ("n = 34 ... 50", fact(34, 50)), ("n = 51 ... 170", fact(51, 170))],
              {"GSL": from_gsl("gsl_sf_fact", "u"), "C++": plus_one(from_std("std_gamma", "d")),
@@ -132,5 +133,5 @@ FUNCTIONS = [
               "SciPy": plus_one(from_scipy("gammaln"))}),
     Function("QX_Psi", "do", mpmath.digamma, [(t, single(p)) for t, p in PSI],
              {"GSL": from_gsl("gsl_sf_psi", "d"), "SciPy": from_scipy("psi")}, 1,
-             note="Absolute where |psi| < 1, near its zeros."),
+             note="Errors are absolute where |psi| < 1, near its zeros."),
 ]

@@ -1,4 +1,4 @@
-"""Where the hypergeometric functions of Gauss, Kummer and Tricomi are measured."""
+"""The points at which the hypergeometric functions of Gauss, Kummer and Tricomi are measured."""
 
 import random
 
@@ -24,7 +24,7 @@ def gauss_box(low, high, n=80):
 
 
 def with_integer(low, high, differences, n=60):
-    """c - a - b an integer."""
+    """Points with an integer c - a - b."""
     r = random.Random(2)
     points = []
     for _ in range(n):
@@ -97,31 +97,31 @@ TRICOMI = [("x in [0, 1], |a| < 2, b in [-2, 2]", boxes(60, (0.001, 1), (-2, 2),
 
 
 def moved(function):
-    """x stands first here, last with the peers."""
+    """A peer with x as the last argument instead of the first."""
     return function and (lambda x, *rest: function(*rest, x))
 
 
 GAUSS_PEERS = {"GSL": moved(from_gsl("gsl_sf_hyperg_2F1", "dddd")), "SciPy": moved(from_scipy("hyp2f1"))}
-GAUSS_NOTE = """From x = 0.2 on the value is the difference of two parts of the size of x^(1-c), where x is below 0.5
-and c large; c - a - b close to an integer costs the digits that it shares with it. At an integer the
-limit form is summed to 1.8e-11 of 1 + |sum|, which that difference multiplies."""
-KUMMER_NOTE = """A value is taken from the first method whose estimate of its error is below 1.8e-11, about 8e4 eps;
-where none is, the series counts down to 1.2e-4, also where the asymptotic form is closer, which happens
-around x = -36; `fails` stands where nothing was left and the value is a NaN."""
-TRICOMI_NOTE = """The asymptotic sum begins at x = 6, where its smallest term is large; where the terms rise from the
-first, for |a (1 + a - b)| > x, no digit is left. Below 6 the difference of two M loses the digits
-that they grow by, and an integer b takes the mean of its neighbours at 0.0005, by design."""
+GAUSS_NOTE = """From x = 0.2 on, the value is the difference of two parts of magnitude x^(1-c), large where x is below 0.5
+and c is large. If c - a - b is close to an integer, as many digits are lost as the two agree in. At an integer, the
+limit form is summed to 1.8e-11 of 1 + |sum|, an error that the difference magnifies."""
+KUMMER_NOTE = """The value comes from the first method whose error estimate is below 1.8e-11, about 8e4 eps. If there is
+no such method, the series is accepted up to an estimate of 1.2e-4, even where the asymptotic form is more
+accurate, which happens around x = -36; `fails` means that no method was accepted and the value is NaN."""
+TRICOMI_NOTE = """The asymptotic sum begins at x = 6, where its smallest term is still large; where the terms grow from the
+first one on, for |a (1 + a - b)| > x, no correct digit is left. Below 6, the difference of two values of M loses
+digits as these grow, and for integer b the value is the mean of those at b - 0.0005 and b + 0.0005, by design."""
 
-REVISION = "On the points of the elder."
+REVISION = "At the points of the elder."
 
 FUNCTIONS = [
     Function("QX_Gauss_2011", "ddddo", lambda x, a, b, c: mpmath.hyp2f1(a, b, c, x), GAUSS, GAUSS_PEERS,
              note=GAUSS_NOTE),
     Function("QX_Gauss", "ddddo", lambda x, a, b, c: mpmath.hyp2f1(a, b, c, x),
              [GAUSS[1], GAUSS[10], GAUSS[15]], GAUSS_PEERS,
-             note="Where it takes another way than QX_Gauss_2011: the series itself on [-0.5, 0.2)."),
+             note="The interval in which its method differs from QX_Gauss_2011: the series itself on [-0.5, 0.2)."),
     Function("QX_Gauss_2026", "ddddo", lambda x, a, b, c: mpmath.hyp2f1(a, b, c, x), GAUSS + FAR, GAUSS_PEERS,
-             note="On the points of QX_Gauss_2011, and below -1."),
+             note="At the points of QX_Gauss_2011, and below -1."),
     Function("QX_Kummer", "dddo", lambda x, a, b: mpmath.hyp1f1(a, b, x), KUMMER,
              {"GSL": moved(from_gsl("gsl_sf_hyperg_1F1", "ddd")), "SciPy": moved(from_scipy("hyp1f1"))},
              note=KUMMER_NOTE),

@@ -1,4 +1,4 @@
-"""Where the error function, the exponential, sine, cosine and hyperbolic integrals and the
+"""The points at which the error function, the exponential, sine, cosine and hyperbolic integrals and the
 dilogarithm are measured."""
 
 import mpmath
@@ -15,7 +15,7 @@ def rows(*intervals):
 
 
 def exponential(x, n):
-    """E_n(x); mpmath's own cancels unseen at large n and x, so the continued fraction serves."""
+    """E_n(x) by the continued fraction; mpmath's own function silently loses digits at large n and x."""
     if x <= 1 or n == 0:
         return mpmath.expint(n, x)
     tail = mpf(0)
@@ -25,7 +25,7 @@ def exponential(x, n):
 
 
 def expint_of_one(function):
-    """The C++ library has Ei alone: E_1(x) = -Ei(-x)."""
+    """The C++ library has only Ei: E_1(x) = -Ei(-x)."""
     return function and (lambda x, n: -function(-x) if n == 1 else float("nan"))
 
 
@@ -83,13 +83,13 @@ FUNCTIONS = [
     Function("QX_CosI", "do", cosine, COSINE,
              {"GSL": from_gsl("gsl_sf_Ci", "d"), "SciPy": from_scipy("sici", 1)},
              lambda x: 1 / x if x > 4 else mpf("0.47"),
-             note="In units of its largest value, 0.47, up to x = 4, where it has two zeros, and of 1 / x beyond."),
+             note="Relative to its largest value, 0.47, up to x = 4, where it has two zeros, and to 1 / x beyond."),
     Function("QX_SinhI", "do", mpmath.shi, HYPERBOLIC,
              {"GSL": from_gsl("gsl_sf_Shi", "d"), "SciPy": from_scipy("shichi", 0)}),
     Function("QX_CoshI", "do", mpmath.chi, HYPERBOLIC,
              {"GSL": from_gsl("gsl_sf_Chi", "d"), "SciPy": from_scipy("shichi", 1)}, 1,
-             note="Absolute where |Chi| < 1, near its zero at 0.52."),
+             note="Errors are absolute where |Chi| < 1, near its zero at 0.52."),
     Function("QX_Diln", "do", lambda x: mpmath.polylog(2, 1 - x), DILOGARITHM,
              {"GSL": lambda x: from_gsl("gsl_sf_dilog", "d")(1 - x), "SciPy": from_scipy("spence")},
-             note="GSL is given 1 - x, which rounds."),
+             note="GSL's argument is 1 - x, which is rounded."),
 ]

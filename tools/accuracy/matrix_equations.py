@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""Writes docs/accuracy/matrix_equations.md: residuals of Sylvester's and Lyapunov's equations, formed
-in long double, beside SciPy's on the same matrices.
+"""Writes docs/accuracy/matrix_equations.md: residuals of Sylvester and Lyapunov equations, computed
+in long double, next to SciPy's for the same matrices.
 
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/matrix_equations.py
 """
@@ -26,7 +26,7 @@ def noise(n, kind):
 
 
 def rotated(values, kind, above):
-    """A matrix with these eigenvalues, with `above` as the size of what is above the diagonal."""
+    """A matrix with these eigenvalues; `above` is the size of the elements above the diagonal of its Schur form."""
     n = len(values)
     q = np.linalg.qr(noise(n, kind))[0]
     return q @ (np.diag(values) + above * np.triu(noise(n, kind), 1)) @ q.conj().T
@@ -140,11 +140,11 @@ def main():
             print(lines[-1], flush=True)
     PAGE.write_text(f"""# Accuracy of matrix equations
 
-Residuals, formed in long double, in units of eps (|a| + |b|) |x|, for products of eps (|a| |b| + 1)
-|x|, with Frobenius norms: the worst over the orders {", ".join(map(str, ORDERS))}, beside SciPy's on
-the same matrices (its direct method for discrete equations to order {DIRECT}). Right sides are random,
-those of Lyapunov's equations symmetric; b of the Sylvester equations is random, of the size of a. A
-code says that an equation was refused at some of the orders. Written by
+Residuals, computed in long double, in units of eps (|a| + |b|) |x| (of eps (|a| |b| + 1) |x| for
+products), with Frobenius norms: the largest over the orders {", ".join(map(str, ORDERS))}, next to SciPy's for
+the same matrices (its direct method for discrete equations up to order {DIRECT}). Right-hand sides are random, and
+symmetric for Lyapunov equations; b of the Sylvester equations is random, of the magnitude of a. A
+code means that the equation was refused at some of the orders. Written by
 `tools/accuracy/matrix_equations.py`.
 
 """ + "\n".join(lines) + "\n")

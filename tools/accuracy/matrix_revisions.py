@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""Writes docs/accuracy/matrix_revisions.md: elders, revisions and LAPACK (through SciPy) on the same matrices
-of every size of elements.
+"""Writes docs/accuracy/matrix_revisions.md: elders, revisions and LAPACK (through SciPy) for the same matrices,
+with elements of all magnitudes.
 
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/matrix_revisions.py
 """
@@ -51,7 +51,7 @@ def long(a):
 
 
 def decomposition_ratios(a, u, s, v):
-    """Residual, and how far u and v are from orthonormal, in units of max(m, n) eps."""
+    """The residual and the distance of u and v from orthonormal, in units of max(m, n) eps."""
     unit = EPS * max(a.shape)
     residual = norm(long(u) * long(s) @ long(v).conj().T - long(a))
     apart = [norm(long(q).conj().T @ long(q) - np.eye(q.shape[1])) / unit for q in (u, v)]
@@ -66,7 +66,7 @@ def decompositions(a):
 
 
 def values_ratio(a):
-    """The singular values against LAPACK's of the matrix next to 1, in units of max(m, n) eps."""
+    """Errors of the singular values against LAPACK's for the matrix scaled to magnitude 1, in units of max(m, n) eps."""
     largest = np.abs(a).max() or 1.0
     power = 2.0 ** np.floor(np.log2(largest))
     expected = linalg.svdvals(a / power)
@@ -106,8 +106,8 @@ def conditioned(n, kind, condition):
 
 
 def solution_table():
-    """Relative errors of solutions, pseudo-inverses, norms and conditions, divided by eps times the condition
-    number, against the same in long double next to 1."""
+    """Relative errors of solutions, pseudo-inverses, norms and condition numbers, divided by eps times the condition
+    number, against long double results for the matrix scaled to magnitude 1."""
     lines = ["| Elements | least squares, elder | revision | dgelsd | pseudo-inverse, elder | revision | pinv "
              "| LU, revision | dgesv | condition estimate / exact |", "|---" * 10 + "|"]
     for power in POWERS:
@@ -157,7 +157,7 @@ def exponential_table():
     for name, matrices in kinds.items():
         worst_of = [0.0, 0.0, 0.0]
         for a in matrices:
-            # The squaring loses some digits of many.
+            # Squaring loses a few of the many digits.
             with mpmath.workdps(400 if np.abs(a).max() > 1e10 else 50):
                 exact = np.array(mpmath.expm(mpmath.matrix(a.tolist())).tolist())
                 size = np.abs(exact).max()
@@ -176,7 +176,7 @@ def values_function(a, function, digits):
         size = max(abs(value) for value in values)
         values = [mpmath.re(v) if abs(mpmath.im(v)) < 1e-13 * size and mpmath.re(v) < 0 else v for v in values]
         found = vectors * mpmath.diag([function(v) for v in values]) * vectors**-1
-        # Divided by the largest element, so that squares of errors fit.
+        # Divided by the largest element, so that squares of errors do not overflow.
         largest = max(abs(x) for x in found)
         return np.array((found / largest).tolist(), dtype=complex), float(largest)
 
@@ -234,7 +234,7 @@ def error_of(method, a, exact, size):
 
 
 def power_table():
-    """Errors of the inverse's cube in units of n eps times the condition number, which is 1000."""
+    """Errors of the cube of the inverse, in units of n eps times the condition number, which is 1000."""
     lines = ["| Elements | elder | revision | numpy.linalg.matrix_power |", "|---|---|---|---|"]
     for exponent in (-80, -30, -12, -8, 0, 80):
         worst_of = [0.0, 0.0, 0.0]
@@ -287,7 +287,7 @@ def properties_table():
 
 
 def schur_table():
-    """Graded matrices ordered by rising modulus: how many forms are out of order, and the worst residual and
+    """Graded matrices ordered by increasing modulus: how many forms are out of order, and the worst residual and
     distance of u from orthogonal in units of n eps."""
     lines = ["| Matrix | out of order, elder | revision | LAPACK, unordered: residual, orthogonality "
              "| elder | revision |", "|---" * 6 + "|"]
@@ -314,6 +314,66 @@ def schur_table():
     return lines
 
 
+def blocks_table():
+    """Orders at which the revisions work in blocks: the worst residual and distance from orthogonal or unitary; for
+    general eigenproblems, only the residual a v - v w."""
+    def hermitian(a, values, v):
+        return residual(a, long(v) * values @ long(v).conj().T), apart(v)
+
+    def general(a, values, v):
+        return (residual(long(a) @ long(v), long(v) * values) * float(norm(long(a) @ long(v)) / norm(long(a))),)
+
+    def triangular(a, q, r):
+        return residual(a, long(q) @ long(r)), apart(q)
+
+    def residual(a, product):
+        return float(norm(long(product) - long(a)) / norm(long(a)) / EPS / len(a))
+
+    def apart(q):
+        return float(norm(long(q).conj().T @ long(q) - np.eye(len(q))) / EPS / len(q))
+
+    def symmetric(year):
+        def solve(a):
+            if np.iscomplexobj(a):
+                values, vectors = qx.call(f"CxEigenValueVector{year}_head", a, 1, 1)
+                return values.real, vectors
+            vectors, values = qx.call(f"SymEvectorEvalue{year}_head", a, 1)
+            return values, vectors
+        return solve
+
+    def eigen(year):
+        return lambda a: (qx.call(f"CxEigenValueVector{year}_head", a, 0, 1) if np.iscomplexobj(a)
+                          else qx.call(f"EigenValueVector{year}_head", a, 1))
+
+    def factors(year):
+        def solve(a):
+            q, r = qx.call(("Cx" if np.iscomplexobj(a) else "") + f"QRDec{year}H", a, 0, 1)[-2:]
+            return q, r
+        return solve
+
+    problems = (("symmetric or Hermitian", hermitian, symmetric,
+                 lambda a: linalg.eigh(a, driver="evd"), True),
+                ("general eigenproblem", general, eigen, linalg.eig, False),
+                ("QR", triangular, factors, linalg.qr, False))
+    lines = ["| Problem | matrix | elder | revision | LAPACK |", "|---" * 5 + "|"]
+    for name, ratios, ours, peer, mirrored in problems:
+        for matrix in ("random", "graded", "of rank n/2"):
+            rows = [[], [], []]
+            for n in (70, 170, 300):
+                for kind in ("real", "complex"):
+                    a = KINDS[matrix](n, n, kind)
+                    a = a + a.conj().T if mirrored else a
+                    for row, solve in zip(rows, (ours(""), ours("2026"), peer)):
+                        try:
+                            row.append(ratios(a, *solve(a)))
+                        except qx.QxError:
+                            row.append((np.inf,))
+            cells = [", ".join(f"{x:.2g}" for x in worst(row)) for row in rows]
+            lines.append(f"| {name} | {matrix} | " + " | ".join(cells).replace("inf", "no convergence") + " |")
+            print(lines[-1], flush=True)
+    return lines
+
+
 def refined(a, b):
     """a^-1 b in long double, by refinement of the solution in double precision."""
     factors = linalg.lu_factor(a)
@@ -326,17 +386,17 @@ def refined(a, b):
 
 def main():
     tables = [decomposition_table(), solution_table(), exponential_table(), functions_table(), power_table(),
-              properties_table(), schur_table()]
+              properties_table(), schur_table(), blocks_table()]
     PAGE.write_text(f"""# Accuracy of the revisions of linear algebra
 
-Elders, revisions and LAPACK (through SciPy) on the same real and complex matrices, with elements of the size in the
-first column. Written by `tools/accuracy/matrix_revisions.py`.
+Elders, revisions and LAPACK (through SciPy) for the same real and complex matrices, with elements of the magnitude in
+the first column. Written by `tools/accuracy/matrix_revisions.py`.
 
 ## Singular values
 
 Worst over the shapes {", ".join(f"{m} by {n}" for m, n in SHAPES)}, in units of max(m, n) eps: |a - u diag(s) v^H| /
-|a| and how far u and v are from orthonormal, formed in long double, with Frobenius norms; then the values against
-LAPACK's of the matrix next to 1, relative to the largest one.
+|a| and the distance of u and v from orthonormal, computed in long double, with Frobenius norms; then the singular
+values, relative to the largest one, against those that LAPACK computes for the matrix scaled to magnitude 1.
 
 """ + "\n".join(tables[0]) + f"""
 
@@ -344,47 +404,55 @@ LAPACK's of the matrix next to 1, relative to the largest one.
 
 Relative errors in units of n eps times the condition number, which is 1000, worst over the orders
 {", ".join(map(str, ORDERS))}, against solutions that are refined in long double. The last column is the
-smallest quotient of the condition number that `EqsSetByLU2026_head` estimates and the exact one in the 1-norm.
+smallest ratio of the condition number that `EqsSetByLU2026_head` estimates to the exact one, in the 1-norm.
 
 """ + "\n".join(tables[1]) + """
 
 ## Exponential
 
 Errors relative to the largest element of the result, against mpmath: the worst over six random matrices of each of
-the orders 2, 3, 5 and 8, with normal elements of the given size; rotations; and matrices with one large element.
+the orders 2, 3, 5 and 8, with normally distributed elements of the given magnitude; rotations; and matrices with one
+large element.
 
 """ + "\n".join(tables[2]) + """
 
 ## Logarithm and square root
 
 Errors relative to the largest element of the result, the worst and the median over five matrices of each of the
-orders 2, 3, 5 and 8, against the eigenvalues and eigenvectors of mpmath with 100 digits. Eigenvalues that rounding
-has put beside the negative axis count as negative: their logarithm has +i pi.
+orders 2, 3, 5 and 8, against values from mpmath's eigenvalues and eigenvectors with 100 digits. Eigenvalues that
+rounding has moved off the negative axis count as negative: the imaginary part of their logarithm is +pi.
 
 """ + "\n".join(tables[3]) + """
 
 ## Negative powers
 
-The inverse's cube of real matrices of the orders 2, 5 and 10 with condition number 1000: the largest error relative to
-the largest element, in units of n eps times the condition number, against mpmath with 60 digits.
+The cube of the inverse of real matrices of the orders 2, 5 and 10 with condition number 1000: the largest error
+relative to the largest element, in units of n eps times the condition number, against mpmath with 60 digits.
 
 """ + "\n".join(tables[4]) + """
 
 ## Norm, condition and rank
 
-Of matrices with the condition number 1000 and the orders 1, 2, 5, 30 and 100, real and complex, against LAPACK's
-singular values next to 1: relative errors in units of n eps, those of the condition times the condition number. The
-ranks are those of products of n by n/2 matrices.
+Real and complex matrices of the orders 1, 2, 5, 30 and 100 with condition number 1000, against LAPACK's singular
+values of the matrices scaled to magnitude 1: relative errors in units of n eps, or of n eps times the condition
+number for the condition number. The ranks are those of products of n by n/2 matrices.
 
 """ + "\n".join(tables[5]) + """
 
 ## Ordered Schur forms
 
-Thirty real matrices of the orders 4 to 40 for each row, ordered by rising modulus of the eigenvalues: forms whose
-eigenvalues are out of order, with the code 0; then the worst residual and distance of u from orthogonal, formed in long
-double, in units of n eps.
+Thirty real matrices of the orders 4 to 40 for each row, ordered by increasing modulus of the eigenvalues: the number
+of forms whose eigenvalues are out of order although the code is 0; then the worst residual and the largest distance
+of u from orthogonal, computed in long double, in units of n eps.
 
-""" + "\n".join(tables[6]) + "\n")
+""" + "\n".join(tables[6]) + """
+
+## Eigenproblems and QR by blocks
+
+Matrices of the orders 70, 170 and 300, real and complex: the worst residual and, except for general eigenproblems, the
+largest distance of the vectors or q from orthonormal, computed in long double, in units of n eps.
+
+""" + "\n".join(tables[7]) + "\n")
 
 
 if __name__ == "__main__":

@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""The elders' noise, the revisions of 2026 and NumPy's Philox generator against the exact distributions: the
-tables of docs/accuracy/noise.md.
+"""Compares the elders' noise, the revisions of 2026 and NumPy's Philox generator with the exact distributions, and
+prints the tables of docs/accuracy/noise.md.
 
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/noise.py
 """
@@ -19,7 +19,7 @@ def row(*cells):
 
 
 def of_law(x, law):
-    """The p value of Kolmogorov and Smirnov's test; of whole numbers with few values that of chi-square."""
+    """The p value of the Kolmogorov-Smirnov test, or of the chi-square test for integers with few values."""
     if law.std() > 1e4 or not hasattr(law, "pmf"):
         if law.std() > 1e4:
             return stats.kstest((x - law.mean()) / law.std(), "norm").pvalue

@@ -1,12 +1,12 @@
 #!/usr/bin/python3
-"""How many Gaussian peaks the elder, the revision and SciPy miss, as in docs/accuracy/fitting.md.
+"""Counts the Gaussian peaks that the elder, the revision and SciPy miss, for docs/accuracy/fitting.md.
 
     peaks.py
 
-Exact peaks and dips of all widths from 1.5 samples to the range, at even or random places. With a level and
-bounds that hold the answer for the bounded fit, without either for the other one. A peak is missed where a
-parameter is off by more than 1e-6. SciPy's curve_fit starts where people start it: at the sample farthest
-from the median, with a tenth of the range as width.
+Exact peaks and dips of all widths from 1.5 samples to the range, at even or random abscissae; with a level and
+bounds that contain the answer for the bounded fit, without either for the other one. A peak is missed if a
+parameter is off by more than 1e-6. SciPy's curve_fit has a usual start: the sample farthest from the median, with
+a tenth of the range as width.
 """
 
 import sys

@@ -1,4 +1,4 @@
-// The special functions of the C++ library behind plain C names, for accuracy.py.
+// The special functions of the C++ library under plain C names, for accuracy.py.
 
 #include <cmath>
 #include <cstdint>
@@ -6,7 +6,7 @@
 
 namespace {
 
-// A refused argument is NaN.
+// Returns NaN for an argument that the library refuses.
 template <class Function>
 double Value(Function function) {
     try {

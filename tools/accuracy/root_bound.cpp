@@ -1,14 +1,14 @@
-// root_bound COUNT [SEED]: the residuals of COUNT polynomials' roots, in 113 bits. SIGTERM ends it
-// early, with what is done. Built and run as
+// root_bound COUNT [SEED]: the residuals of the roots of COUNT polynomials, in 113 bits. SIGTERM ends it
+// early and prints the results so far. Built and run as
 //
 //     g++ -std=gnu++20 -O2 -Iinclude -Ibuild/release/include tools/accuracy/root_bound.cpp
 //         -Lbuild/release -lqxanalysis -lqxrt -Wl,-rpath,$PWD/build/release -o root_bound
 //     nice -n 19 ./root_bound 100000
 //
-// Degrees are even over 1 to 200. Moduli of the coefficients are in turn 10^u with u even over -100
+// Degrees are uniform over 1 to 200. The moduli of the coefficients are in turn 10^u with u uniform over -100
 // to 100, normal, and normal times 10^(u/20); half of the polynomials are complex. Prints the largest
-// |p(z)| / (4 n eps sum |a_i||z|^i) of each kind, how many are above 1, how many calls have a code, and the
-// time of the calls. For |z| above 1 the reversed polynomial is taken at 1 / z.
+// |p(z)| / (4 n eps sum |a_i||z|^i) of each kind, how many are above 1, how many calls return a code, and the
+// time of the calls. For |z| above 1, the reversed polynomial is evaluated at 1 / z.
 
 #include "qx/host.h"
 #include "qx/polynomial_roots.h"
@@ -30,7 +30,7 @@ struct Complex {
     double re, im;
 };
 
-// |p(z)| over the bound.
+// |p(z)| divided by the bound.
 double Share(const std::vector<Complex> &a, Complex z) {
     const int n = static_cast<int>(a.size()) - 1;
     Quad x = z.re, y = z.im;

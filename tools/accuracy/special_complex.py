@@ -1,10 +1,10 @@
 #!/usr/bin/python3
-"""Errors of the complex Bessel and Airy functions beside SciPy's on the same points: writes
-docs/accuracy/special_complex.md. The references are those of complex_bessel_reference.cpp, by ball
-arithmetic; some of them are compared with mpmath's first. Needs g++, libflint-arb-dev,
+"""Writes docs/accuracy/special_complex.md: errors of the complex Bessel and Airy functions, next to SciPy's
+at the same points. The references come from complex_bessel_reference.cpp, by ball
+arithmetic; some of them are first compared with mpmath's values. Needs g++, libflint-arb-dev,
 python3-mpmath and python3-scipy.
 
-usage: special_complex.py [POINTS]             writes the page, 400 points a region if not told
+usage: special_complex.py [POINTS]             writes the page, by default with 400 points per region
        special_complex.py --worst POINTS SEED  prints the worst points of all regions, first by error
                                                over max(2 SciPy's, 8 eps), then by error over the bound
 """
@@ -28,7 +28,7 @@ import qx  # noqa: E402
 
 mp.dps = 40
 EPS = 2.0**-52
-FLOOR = 8  # eps, from where an error may not be above twice SciPy's
+FLOOR = 8  # eps; an error above it must be at most twice SciPy's
 BESSEL = ("J", "Y", "I", "K", "H1", "H2")
 AIRY = ("Ai", "Ai'", "Bi", "Bi'")
 PEERS = ((special.jv, special.jve), (special.yv, special.yve), (special.iv, special.ive),
@@ -36,7 +36,7 @@ PEERS = ((special.jv, special.jve), (special.yv, special.yve), (special.iv, spec
          (special.hankel2, special.hankel2e))
 AIRY_REGION = "Airy functions, |z| to 200"
 
-# One value: where, of which function, what was found, and the errors of ours and SciPy's in eps.
+# One value: the point, the function, its errors here and in SciPy, and the bound, in eps.
 Row = collections.namedtuple("Row", "order z name scaled mine peer bound")
 
 
@@ -68,7 +68,7 @@ def angle_of(region, r):
 
 
 def point(region, r):
-    """Order and argument: whole, half and other orders of both signs."""
+    """Order and argument: integer, half-integer and other orders of both signs."""
     size, order = size_and_order(region, r)
     form = r.randrange(5)
     if form == 0:
@@ -105,7 +105,7 @@ class References:
                        check=True)
 
     def __call__(self, lines, functions):
-        """An array: point, function, what is in a line of the program."""
+        """An array with the axes point, function, numbers in a line of the program's output."""
         text = subprocess.run([self.program], input="\n".join(lines), text=True, check=True,
                               capture_output=True).stdout
         return np.array(text.split(), dtype=float).reshape(len(lines), functions, 9)
@@ -125,13 +125,13 @@ def check_against_mpmath(references):
 
 
 def error(found, parts, size):
-    """In eps, of an array."""
+    """The errors of an array, in eps."""
     distance = np.hypot((found.real - parts[:, 0]) - parts[:, 1], (found.imag - parts[:, 2]) - parts[:, 3])
     return np.where(np.isfinite(found), distance / size / EPS, np.inf)
 
 
 def called(name, *arguments):
-    """NaN where a call fails."""
+    """The results of the calls; NaN for a call that fails."""
     def one(*a):
         try:
             return qx.call(name, *a)
@@ -141,12 +141,12 @@ def called(name, *arguments):
 
 
 def rows_of(values, k, partner, scaled, mine, peer, where, bound):
-    """The values of a function that a double holds."""
+    """The rows of one function, for values in the range of a double."""
     parts = values[:, k, 4 * scaled:4 * scaled + 4]
     size = np.hypot(parts[:, 0], parts[:, 2])
     inside = np.isfinite(size) & (size > 1e-290) & (size < 1e305)
     modulus = size * np.maximum(1, values[:, k, 8])
-    if partner is not None:  # the pair and the function's scale
+    if partner is not None:  # the modulus of the pair, and the scale of the function
         one, two = (np.hypot(*values[:, p, [0, 2]].T) for p in partner)
         larger, smaller = np.maximum(one, two), np.minimum(one, two)
         own = np.hypot(*values[:, k, [0, 2]].T)
@@ -218,16 +218,16 @@ def table(title, rows):
 
 HEAD = f"""# Accuracy: complex Bessel and Airy functions
 
-Errors in units of eps = 2.2e-16 against ball arithmetic of at least 110 bits, unscaled and scaled
-values together, at random points of each region, whole, half and other orders of both signs. An error
-is relative to the modulus: the larger of |J| and |Y| (Ai and Bi) where they are within 100 of each
-other, else the value itself; for I and K always the value. Next to a zero of a function the modulus
+Errors in units of eps = 2.2e-16 against ball arithmetic with at least 110 bits, for unscaled and scaled
+values together, at random points of each region, with integer, half-integer and other orders of both signs. An
+error is relative to the modulus: the larger of |J| and |Y| (Ai and Bi) where they are within a factor of 100 of
+each other, otherwise the value itself; for I and K always the value. Next to a zero of a function, the modulus
 is the amplitude of its oscillation there, |f'| |z| / sqrt |order^2 - z^2| (with + for I and K).
-Relative to the value itself an error grows without bound towards a zero.
+Relative to the value itself, an error would grow without bound towards a zero.
 
-The bound is 100 (1 + max(|order|, |z|) / 10), and |z|^1.5 more for unscaled Airy functions. SciPy's
-error at a single point may be anything down to 0, so that twice SciPy's is asked for from {FLOOR} eps
-on: the column "peak over max(2 SciPy's, {FLOOR})" stays below 1. Made by
+The bound is 100 (1 + max(|order|, |z|) / 10), and |z|^1.5 more for unscaled Airy functions. The errors should also
+be at most twice SciPy's; because SciPy's error at a single point can be anything down to 0, this comparison starts
+at {FLOOR} eps: the column "Peak over max(2 SciPy's, {FLOOR})" stays below 1. Written by
 `tools/accuracy/special_complex.py`, with SciPy {{}}; `--worst` searches for the worst points.
 """
 

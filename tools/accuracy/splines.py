@@ -1,6 +1,6 @@
 #!/usr/bin/python3
 """Writes docs/accuracy/splines.md: the errors of smoothing splines and least-squares splines against
-dense solutions with 80 digits, beside SciPy's.
+dense solutions with 80 digits, next to SciPy's.
 
     QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/splines.py
 
@@ -14,6 +14,7 @@ from mpmath import inverse, lu_solve, matrix, mp, mpf
 from scipy.interpolate import make_lsq_spline, make_smoothing_spline
 
 import qx
+from pages import table
 
 PAGE = Path(__file__).resolve().parents[2] / "docs/accuracy/splines.md"
 EPS = 2.0**-52
@@ -122,20 +123,12 @@ def text(value):
     return f"{value:.2g}" if value < 1e4 else f"{value:.0e}"
 
 
-def table(head, rows):
-    lines = ["| " + " | ".join(head) + " |", "|---" * len(head) + "|"]
-    for row in rows:
-        print(row, flush=True)
-        lines.append(row)
-    return "\n".join(lines)
-
-
 if __name__ == "__main__":
     PAGE.write_text(f"""# Accuracy of splines
 
-Errors against dense solutions with 80 digits, in units of 2.2e-16: of values, second derivatives and
-coefficients the largest error over the largest element, of the effective parameters the relative one.
-SciPy's are of the same samples. Written by `tools/accuracy/splines.py`.
+Errors against dense solutions with 80 digits, in units of 2.2e-16. For values, second derivatives and
+coefficients, the largest error is divided by the largest element; for the effective parameters, the error is
+relative. SciPy's errors are for the same samples. Written by `tools/accuracy/splines.py`.
 
 **Smoothing splines**, `CubicSplineFit_head` with lambda given, {N} samples.
 
@@ -144,7 +137,7 @@ SciPy's are of the same samples. Written by `tools/accuracy/splines.py`.
 
 **Least-squares splines**, `BSplineFit_head`, 202 samples on 0 to 1, of which at least 20
 are below 1e-4 and 80 below 0.1. SciPy
-solves the normal equations, whose condition is the square.
+solves the normal equations, whose condition number is the square.
 
 {table(["Knots", "Degree", "coefficients", "values", "SciPy: coefficients", "values"],
        least_squares_rows())}

@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Measures the errors of MultipleToneMeasurements: without noise, and with noise beside the Cramer-Rao
+"""Measures the errors of MultipleToneMeasurements, without noise, and with noise relative to the Cramer-Rao
 bound, and writes docs/accuracy/tones.md.
 
     QX_LIBRARY_DIR=build/release tools/accuracy/tones.py
@@ -23,7 +23,7 @@ TIMES = np.arange(N)
 
 
 def bins(rng, count, apart, within):
-    """Bins of tones at least `apart` from each other, all `within` so many or over the whole range."""
+    """Positions of tones in bins, at least `apart` from each other, in a band of `within` bins or the whole range."""
     while True:
         if within is None:
             found = np.sort(rng.uniform(1, N / 2 - 1, count))
@@ -34,7 +34,7 @@ def bins(rng, count, apart, within):
 
 
 def tones(rng, count, apart, within=None):
-    """Frequencies, amplitudes from 0.1 to 1 with the largest 1, phases."""
+    """Frequencies, amplitudes (from 0.1 to 1, the largest 1) and phases."""
     amplitudes = 10 ** rng.uniform(-1, 0, count)
     return (bins(rng, count, apart, within) / N, amplitudes / amplitudes.max(),
             rng.uniform(-np.pi, np.pi, count))
@@ -47,7 +47,7 @@ def samples(frequencies, amplitudes, phases):
 
 
 def bounds(frequencies, amplitudes, phases, sigma):
-    """The deviations of the Cramer-Rao bound, of frequencies, amplitudes and phases, with an unknown
+    """The standard deviations of the Cramer-Rao bound of frequencies, amplitudes and phases, with an unknown
     constant."""
     angles = 2 * np.pi * np.outer(TIMES, frequencies) + phases
     slopes = np.concatenate([-2 * np.pi * TIMES[:, None] / N * amplitudes * np.sin(angles), np.cos(angles),
@@ -78,7 +78,8 @@ def without_noise(rng, count, apart, within):
 
 
 def with_noise(rng, count, apart, within, decibels):
-    """Root mean square errors over the bound's deviations, and trials with other numbers of tones."""
+    """Root mean square errors over the bound's standard deviations, and the number of trials with another number of
+    tones."""
     sigma = np.sqrt(0.5) * 10 ** (-decibels / 20)
     ratios, other = [], 0
     for _ in range(TRIALS):
@@ -94,7 +95,7 @@ def with_noise(rng, count, apart, within, decibels):
 
 
 def false_tones(rng):
-    """How many of 10 TRIALS records of a tone in noise have a second one."""
+    """In how many of 10 TRIALS records of one tone in noise a second one is found."""
     frequency = np.array([0.1234])
     tone = samples(frequency, np.ones(1), np.zeros(1))
     return sum(measured(tone + rng.normal(0, 0.1, N), 2).shape[1] > 1 for _ in range(10 * TRIALS))
@@ -131,28 +132,28 @@ PAGE = """\
 frequencies, phases and amplitudes (the smallest at least a tenth of the largest). Distances are in
 bins of the record. Written by `tools/accuracy/tones.py`.
 
-**Without noise.** Greatest error of a record: of frequencies and amplitudes relative, of phases in
-radians. The last column counts records with an error above 1e-9 (the fit ended at other tones); they
-are not in the columns before it.
+**Without noise.** The largest error of a record: relative for frequencies and amplitudes, in radians for
+phases. The last column counts records with an error above 1e-9 (the fit ended at other tones); the other
+columns exclude them.
 
 | Tones | Median | Largest | Others |
 |---|---|---|---|
 {exact}
 
-**With white noise.** Root mean square errors over the deviations of the Cramer-Rao bound, which no
-estimate without bias can go below; the noise is that far below the largest tone, so up to 20 dB nearer
-to the smallest. The last column counts records with fewer tones found: the missing one could be noise.
-They are not in the ratios.
+**With white noise.** Root mean square errors, divided by the standard deviations of the Cramer-Rao bound, which no
+unbiased estimate can fall below. The noise level is relative to the largest tone, so it is up to 20 dB closer to
+the smallest. The last column counts records in which fewer tones were found, because the missing one could be
+noise; the ratios exclude them.
 
 | Tones | Noise | Frequency | Amplitude | Phase | Fewer |
 |---|---|---|---|---|---|
 {noisy}
 
-The fit is the estimate of maximum likelihood and reaches the bound where the tones stand out of the
-noise, half a bin apart, too. Ratios below 1 are within what so many records scatter, or of bounds so
-wide that the neighbour limits the error.
+The fit is the maximum-likelihood estimate and attains the bound if the tones are well above the noise, even half a
+bin apart. Ratios below 1 are within the statistical scatter for this number of records, or belong to bounds so
+wide that the neighbouring tone limits the error.
 
-**False tones.** Of {records} records of a tone in white noise {false} have a second tone.
+**False tones.** In {false} of {records} records of one tone in white noise, a second tone is found.
 """
 
 if __name__ == "__main__":

@@ -15,7 +15,7 @@ EPS = mpf(10) ** -25
 
 
 def smooth(function):
-    """Steps off a removable singularity."""
+    """The function, evaluated next to its removable singularity instead of at it."""
     return lambda z: function(z if z != 0 else EPS)
 
 
@@ -31,7 +31,7 @@ def j_part(n):
 
 
 def y_part(n):
-    # Y less its logarithm, an entire function of z; for n = 1 also less the pole.
+    # Y minus its logarithmic part, an entire function of z; for n = 1 also minus the pole.
     def part(z):
         x = sqrt(z)
         value = bessely(n, x) - 2 / pi * log(x) * besselj(n, x)
@@ -56,7 +56,7 @@ def modulus(n, which):
 for n in (0, 1):
     name = f"j{n}"
     t.add(f"{name}Small", f"J{n}(x) / x^{n} / ((z - j1^2) (z - j2^2)) in z = x^2", j_part(n), 0, 64, 8, 6)
-    # two ranges, since the terms of one would exceed its value at the ends by far
+    # two ranges, because over a single range the terms would far exceed the value at the ends
     for label, a, b, p, q in (("Low", 0, 16, 6, 5), ("Mid", 16, 64, 8, 6)):
         t.add(f"y{n}{label}", f"(Y{n}(x) - 2/pi ln x J{n}(x) + [n = 1] 2/(pi x)) / x^{n} in z = x^2",
               y_part(n), a, b, p, q, shift=2, centre=mpf(a + b) / 2 if a else None)

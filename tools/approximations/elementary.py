@@ -10,14 +10,14 @@ from mpmath import (cos, ellipe, ellipk, erfi, exp, fresnelc, fresnels, log, mpf
 
 from rational import Table
 
-# Points of fit that gather at small arguments.
+# Fitting points that cluster at small arguments.
 WARP = (lambda x: log(x), lambda y: exp(y))
 EPS = mpf(10) ** -25
 
 
 def elliptic(folder):
     t = Table("elementary.py", "QX_SPECIAL_TABLES_ELLIPTIC_H")
-    # the constant apart, so that only the smaller part has the rounding of a rational form
+    # the constant is separate, so that only the smaller part has the rounding of a rational form
     t.add("ellipticKSmall", "(K(m) - pi / 2) / m in m", lambda m: (ellipk(m) - pi / 2) / m if m else pi / 8,
           0, mpf(1) / 2, 6, 6)
     t.add("ellipticKNear", "K + ln(m1) K(m1) / pi in m1 = 1 - m",

@@ -11,7 +11,7 @@ from mpmath import (chi, ci, cos, e1, erf, erfc, euler, exp, log, mp, mpf, nstr,
 
 from rational import Table, as_double, nodes
 
-# Points of fit that gather at small arguments, and at those near -1.
+# Fitting points that cluster at small arguments, and at arguments near -1.
 LOGARITHM = (lambda x: log(x), lambda y: exp(y))
 LOGARITHM_FROM_ONE = (lambda x: log(x + 1), lambda y: exp(y) - 1)
 SQUARE_ROOT = (lambda x: sqrt(x), lambda y: y * y)
@@ -78,10 +78,10 @@ def chebyshev_value(coefficients, t):
 
 
 def chebyshev(table, name, what, function, argument, inverse, a, b, count=23):
-    """A Chebyshev series in argument(x), for x in [a, b], whatever part of [-2, 2] or more that is.
+    """A Chebyshev series in argument(x), for x in [a, b], which may map to less or more than [-2, 2].
 
     The polynomial interpolates at the Chebyshev points of the interval that is used and is then
-    written in the polynomials of [-2, 2].
+    expressed in the Chebyshev polynomials of [-2, 2].
     """
     used = nodes(argument(b), argument(a), count)
     known = [function(inverse(t)) for t in used]
@@ -115,10 +115,10 @@ def chebyshev(table, name, what, function, argument, inverse, a, b, count=23):
 
 
 def hyperbolic(folder):
-    mp.dps = 400  # the integrals grow like exp(x), and the fit is by differences
+    mp.dps = 400  # the integrals grow like exp(x), and the fit uses differences
     t = Table("integrals.py", "QX_SPECIAL_TABLES_HYPERBOLIC_INTEGRALS_H")
     t.lines[5:9] = ["// Made by tools/approximations/integrals.py. Each set: the coefficients of the Chebyshev",
-                    "// polynomials T_k(t / 2), k = 0, 1, ..., the first one doubled. The comment tells the",
+                    "// polynomials T_k(t / 2), k = 0, 1, ..., the first one doubled. The comment gives the",
                     "// function, t, the interval, and the largest relative error measured there, first with",
                     "// exact coefficients, then with these doubles."]
 

@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""Coefficients of the normal distribution: src/special/tables/normal.h. The nodes and weights of
-Gauss and Legendre's quadrature on [0, 1] beside them: src/special/tables/gauss_legendre.h.
+"""Coefficients of the normal distribution: src/special/tables/normal.h. Also nodes and weights of
+Gauss-Legendre quadrature on [0, 1]: src/special/tables/gauss_legendre.h.
 
 usage: normal.py REPOSITORY
 """
@@ -12,11 +12,11 @@ from mpmath import erf, erfc, exp, legendre, mp, mpf, pi, quad, sqrt
 from rational import Table
 
 NODES = 32
-LOGARITHM = (lambda x: mp.log(x), lambda y: exp(y))  # points of fit that gather at small arguments
+LOGARITHM = (lambda x: mp.log(x), lambda y: exp(y))  # fitting points that cluster at small arguments
 
 
 def mills(x):
-    """The upper tail beyond x over exp(-x^2 / 2)."""
+    """The upper tail beyond x, divided by exp(-x^2 / 2)."""
     return exp(x * x / 2) * erfc(x / sqrt(2)) / 2
 
 

@@ -1,8 +1,8 @@
-"""Rational approximations by interpolation at Chebyshev points, in many digits.
+"""Rational approximations by interpolation at Chebyshev points, in multiple precision.
 
 A rational interpolant at the Chebyshev points of the interval comes within a small factor of the
 minimax error. That is as good as minimax here, because degrees are chosen so that the error of
-the approximation stands well below half an ulp of a double.
+the approximation is well below half an ulp of a double.
 """
 
 from mpmath import mp, mpf, matrix, lu_solve, cos, pi
@@ -41,10 +41,10 @@ def solve(points, function, p, q):
 
 
 def fits(function, a, b, p, q, warp, centre):
-    """(centre, exact coefficients, coefficients as doubles), in several ways of rounding.
+    """(centre, exact coefficients, coefficients as doubles), with the coefficients rounded in several ways.
 
     The coefficients are in powers of the distance from the centre. Either all are rounded, or the
-    denominator is rounded first and the numerator then fitted to it, which makes up for the
+    denominator is rounded first and the numerator then fitted to it, which compensates for the
     rounding of the denominator where that is large.
     """
     low, high, unwarp = warp[0](a), warp[0](b), warp[1]
@@ -92,7 +92,7 @@ class Table:
         self.lines = [
             f"#ifndef {guard}", f"#define {guard}", "", '#include "special/rational.h"', "",
             f"// Made by tools/approximations/{script}. Each set: the centre, then numerator and",
-            "// denominator in ascending powers of the distance from the centre. The comment tells",
+            "// denominator in ascending powers of the distance from the centre. The comment gives",
             "// the degrees, the interval, and the largest relative error measured there, first with",
             "// exact coefficients, then with these doubles.", "",
             "namespace qx::table {", ""]
@@ -121,8 +121,8 @@ class Table:
 
     def add(self, name, what, function, a, b, p, q, warp=PLAIN, weight=lambda x: 1, shift=0,
             centre=None):
-        """With a shift the fit and the error are those of function + shift, which then has no zero.
-        The centre is given where about 0, or the middle of the interval, the terms would cancel."""
+        """With a shift, the fit and the error are those of function + shift, which then has no zero.
+        A centre is given if the terms would cancel in powers about 0 or about the middle of the interval."""
         a, b = mpf(a), mpf(b)
         best = None
         plain = function

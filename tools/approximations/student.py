@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes src/special/tables/student.h: what the density at 0 of Student's distribution lacks to the normal one.
+"""Writes src/special/tables/student.h: the relative deficit of Student's density at 0 against the normal density.
 
 usage: student.py REPOSITORY
 """

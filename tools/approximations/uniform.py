@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Coefficients of the expansions for large order: src/special/tables/uniform.h.
 
-The polynomials u_k of the expansions of Debye, exactly, and Olver's expansion about the turning
+The polynomials u_k of Debye's expansions, exactly, and Olver's expansion about the turning
 point, whose coefficients are smooth functions of z although their formulas are singular at z = 1.
 Source: F. W. J. Olver, Asymptotics and Special Functions, 1974, chapters 10 and 11.
 

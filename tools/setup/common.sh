@@ -1,18 +1,18 @@
 # shellcheck shell=bash
 # Shared by the set-up scripts; sourced, not run. Defines CACHE and:
 #   note TEXT...                a line of progress, on standard error
-#   fail TEXT...                says what is wrong and ends the script
-#   watched LABEL LOG COMMAND...   runs a command with its output in LOG, and tells how far it is
+#   fail TEXT...                reports an error and ends the script
+#   watched LABEL LOG COMMAND...   runs a command with its output in LOG and reports its progress
 #   must LABEL LOG COMMAND...      the same; a failure is shown and ends the script
-#   show_failure LOG            the lines of a log that tell why a build failed
+#   show_failure LOG            the lines of a log that explain why a build failed
 #   lock_cache NAME             waits until no other script holds this lock
 #   lock_file PATH              the same for a lock elsewhere
-#   check_clock ROOT            ends the script where files of a tree are from the future
-#   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
+#   check_clock ROOT            ends the script if files of a tree are from the future
+#   need_commands "PACKAGE..." COMMAND...   installs the packages if a command is missing
 
 CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-${HOME:-/root}/.cache}/qxanalysis}
 
-told=$SECONDS # when something was last written
+told=$SECONDS # the time of the last line written
 note() {
     echo "[$(basename "$0")] $*" >&2
     told=$SECONDS
@@ -22,10 +22,10 @@ fail() {
     exit 1
 }
 
-made=$(mkdir -p "$CACHE" 2>&1) || fail "there is no cache (${made#mkdir: }): QX_CACHE names another folder"
+made=$(mkdir -p "$CACHE" 2>&1) || fail "there is no cache (${made#mkdir: }): set QX_CACHE to another folder"
 
-# How far a command is, from the end of its log: [12/345] of a build, 12/34 of the tests, what apt is
-# at, or what a set-up script says.
+# The progress of a command, from the end of its log: [12/345] of a build, 12/34 of the tests, the current
+# package of apt, or the last note of a set-up script.
 progress() {
     tail -c 4096 "$1" | grep -aoE \
         -e '^\[([0-9]+/[0-9]+\]|(libm|lapack|native|setup|run)\].{1,60})' \
@@ -33,10 +33,10 @@ progress() {
         -e '^(Get:[0-9]+|(Unpacking|Setting up|I: [A-Z][a-z]+ing) [^ ]+)' | tail -n 1 || true
 }
 
-# On a terminal a line that goes on changing, else a line at least every ten seconds.
+# On a terminal, progress is one line that is updated, otherwise a line at least every ten seconds.
 #
-# The command runs in a process group of its own, so that Ctrl-C, or a signal that ends this script,
-# ends all that the command has started; within another watched command it stays in that one's group.
+# The command runs in its own process group, so that Ctrl-C, or a signal that ends this script,
+# ends everything that the command has started; inside another watched command it stays in the group of that command.
 watched() {
     local label=$1 log=$2 start=$SECONDS shown=-1 status=0 group=
     shift 2
@@ -71,7 +71,7 @@ watched() {
     return "$status"
 }
 
-# Ends the group, politely for half a second, and then this script by the same signal.
+# Ends the group, with half a second to finish, and then this script by the same signal.
 end_watched() {
     local signal=$1 pid=$2 start=$3 label=$4
     trap '' INT TERM HUP
@@ -87,7 +87,7 @@ end_watched() {
     kill "-$signal" "$BASHPID"
 }
 
-# What compilers, linkers, apt and cmake say of errors, with the lines around; without such lines the
+# The error messages of compilers, linkers, apt and cmake with the lines around them; if there are none, the
 # end of the log.
 show_failure() {
     local lines
@@ -100,11 +100,11 @@ show_failure() {
 must() {
     watched "$@" && return
     show_failure "$2"
-    fail "$1 failed: all of it is in $2"
+    fail "$1 failed: the whole output is in $2"
 }
 
-# Without a prompt, and with fresh lists. What a run that was killed has left half-installed is put
-# right first.
+# Installs without prompts and with fresh package lists, after repairing packages that an interrupted run has left
+# half-installed.
 apt_install() {
     export DEBIAN_FRONTEND=noninteractive
     dpkg --configure -a
@@ -115,10 +115,10 @@ install_packages() {
     must "installing $*" "$CACHE/apt-install.log" apt_install "$@"
 }
 
-# One script at a time works on a thing of the cache: two builds may be configured at once. The lock
-# is held until the script ends, or another file descriptor than 9 is closed.
+# Only one script at a time works on an entry of the cache, because two builds may be configured at once. The lock
+# is held until the script ends, or, for a file descriptor other than 9, until that is closed.
 lock_cache() {
-    [ -w "$CACHE" ] || fail "the cache $CACHE cannot be written to: QX_CACHE names another folder"
+    [ -w "$CACHE" ] || fail "the cache $CACHE cannot be written to: set QX_CACHE to another folder"
     lock_file "$CACHE/$1.lock" "${2:-9}"
 }
 
@@ -126,14 +126,14 @@ lock_file() {
     local file=$1 descriptor=${2:-9}
     eval "exec $descriptor>\"\$file\""
     flock -n "$descriptor" && return
-    note "waiting for another script, which has $file"
+    note "waiting for another script, which holds $file"
     until flock -w 9 "$descriptor"; do
         note "still waiting"
     done
 }
 
-# A build goes by the times of files. After a clock that was ahead it would run cmake again and again, or take for
-# new what is old.
+# A build depends on the times of files. If the clock was ahead, the build would run cmake again and again, or mistake
+# old files for new ones.
 check_clock() {
     local late
     late=$(cd "$1" && find CMakeLists.txt cmake include src host build/release -newermt '1 minute' -print -quit 2>/dev/null) || true
@@ -152,7 +152,7 @@ need_commands() {
     install_packages $packages
 }
 
-# The mirror that the machine itself installs from.
+# The mirror from which the machine itself installs.
 debian_mirror() {
     local mirror
     mirror=$(apt-get indextargets --format '$(SITE) $(RELEASE)' 'Created-By: Packages' 2>/dev/null |
@@ -161,23 +161,23 @@ debian_mirror() {
     echo "$mirror"
 }
 
-# For a Debian root of its own: sets `root` to its folder in the cache, under a lock. Ends the script
-# where it is known that the root cannot be made here.
+# For a separate Debian root: sets `root` to its folder in the cache, under a lock. Ends the script if it is
+# already known that the root cannot be made here.
 start_root() {
     root="$CACHE/$1"
     root_failed="$CACHE/$1.failed"
     lock_cache "$1"
     [ ! -f "$root/.complete" ] || return 0
-    # Not tried again at each of many tests.
+    # Many tests ask for the root: do not try again each time.
     if [ -n "$(find "$root_failed" -mmin -30 2>/dev/null)" ]; then
         note "no root: $(cat "$root_failed"). To try again: rm $root_failed"
         exit 77
     fi
-    [ "$(id -u)" = 0 ] || give_up "a Debian root can be made by root only (debootstrap and chroot)"
+    [ "$(id -u)" = 0 ] || give_up "only root can make a Debian root (debootstrap and chroot)"
     (need_commands debootstrap debootstrap) || give_up "debootstrap is missing"
 }
 
-# Exit code 77 says that the root cannot be made here.
+# Exit code 77 means that the root cannot be made here.
 give_up() {
     note "$1"
     echo "$1" >"$root_failed"

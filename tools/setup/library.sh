@@ -1,15 +1,15 @@
 # shellcheck shell=bash
-# Shared by the scripts that build a library which the module carries; sourced, not run. Defines:
-#   start_library NAME PACKAGE ARCHIVE COMPILER FILE...   sets where the library is and unpacks its
-#                             source; ends the script where the library is already there, and with
-#                             status 1 where it is not and is only looked for
-#   finish_library LICENCE...  moves what has been built to its place and prints the archive's path
-#   need_tools "PACKAGE..." COMMAND...   need_commands; nothing where the library is only looked for
-#   unpack_source PACKAGE FOLDER   the pinned source with our patches
+# Shared by the scripts that build a library for the module to carry; sourced, not run. Defines:
+#   start_library NAME PACKAGE ARCHIVE COMPILER FILE...   sets the folder of the library and unpacks its
+#                             source; ends the script if the library is already there, and with
+#                             status 1 if it is missing and `find` was given
+#   finish_library LICENCE...  moves the built files to their place and prints the path of the archive
+#   need_tools "PACKAGE..." COMMAND...   need_commands; does nothing if `find` was given
+#   unpack_source PACKAGE FOLDER   unpacks the pinned source and applies our patches
 #
-# A library lies in a folder of the cache with its licences. The folder's name holds a hash of all that
-# the bits rest on: the pinned files, our patches, the script with its flags, the compiler. The scripts
-# take `target`, and `find` where nothing is to be built, from their arguments.
+# A library is in a folder of the cache with its licences. The folder's name includes a hash of everything
+# that affects the bits: the pinned files, our patches, the script with its flags, the compiler. The scripts
+# set `target` from their arguments, and `find` if they must not build anything.
 . "$(dirname "${BASH_SOURCE[0]}")/common.sh"
 . "$(dirname "${BASH_SOURCE[0]}")/targets.sh"
 
@@ -71,7 +71,7 @@ finish_library() {
     echo "$archive"
 }
 
-# Fetched or from the folder that QX_SOURCES names, the files must be the pinned ones.
+# Whether fetched or from the folder QX_SOURCES, the files must be the pinned ones.
 unpack_source() {
     local package=$1 folder=$2 place=${QX_SOURCES:-$CACHE/sources} files patch
     need_commands "dpkg-dev patch" dpkg-source patch
@@ -96,7 +96,7 @@ unpack_source() {
     done
 }
 
-# Says which file is missing or another one.
+# Reports a file that is missing or is not the pinned one.
 check_source() {
     local package=$1 place=$2 lines hash file bad=0
     lines=$(pinned "$package") || return
@@ -121,8 +121,8 @@ fetch() {
         "cannot be fetched (no network?): see $log, or name a folder with its files in QX_SOURCES"
 }
 
-# The machine's own Debian sources as source-package lines, Signed-By included, in a folder of
-# their own: neither the machine's lists nor its sources are touched, and no root is needed.
+# Writes the machine's own Debian sources as source-package lines, Signed-By included, to a separate
+# folder: neither the machine's lists nor its sources are touched, and root is not needed.
 debian_source_lists() {
     local folder=$1 list
     mkdir -p "$folder/parts" "$folder/lists/partial" "$folder/cache"
@@ -139,7 +139,7 @@ debian_source_lists() {
         fail "no Debian source among /etc/apt/sources.list*, so no source package can be fetched"
 }
 
-# What a killed run leaves is fetched anew: the files get their names when all are there.
+# Files get their names only when all are there, so that those of an interrupted run are fetched again.
 fetch_source() {
     local package=$1 apt="$CACHE/apt-source" work="$CACHE/sources.work" version
     version=$(pinned "$package" | head -n 1 | cut -d ' ' -f 2)

@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Prints the coefficients of the tail of the arctangent that src/mathlib/atan2.c holds:
+"""Prints the coefficients of the tail of the arctangent in src/mathlib/atan2.c:
 (atan(t) - t) / t^3 in powers of t^2, for |t| up to 7/16, by Chebyshev interpolation."""
 import mpmath as mp
 

@@ -1,8 +1,8 @@
 """
-The exports of the QX analysis library as they are in C, and the stand-in host that makes their arrays.
+The exports of the QX analysis library with their C signatures, and the stand-in host that creates their arrays.
 
-An array is a handle, a pointer to the pointer to a block: the sizes, then the elements. Numbers that an export
-writes are given as a `Ref`. 0 is success, a negative code a failure, a positive one a warning.
+An array is a handle, a pointer to a pointer to a block: the sizes, then the elements. Numbers that an export
+writes are passed as a `Ref`. 0 is success, a negative code is a failure, a positive one a warning.
 """
 module QXAnalysis
 
@@ -13,10 +13,10 @@ const libqxrt = joinpath(folder, "libqxrt")
 const libqxanalysis = joinpath(folder, "libqxanalysis")
 const DBL, CDB, INT = Int32(10), Int32(13), Int32(3)
 
-# The module looks for its host among the libraries of the process, when it is loaded.
+# When the module is loaded, it looks for its host among the libraries of the process.
 __init__() = dlopen(libqxrt)
 
-"An array of numbers, which is given back by `release`."
+"An array of numbers; `release` frees it."
 array(x::Vector{Float64}) =
     ccall((:QXHostCopy1D, libqxrt), Ptr{Cvoid}, (Int32, Int32, Ptr{Float64}), DBL, length(x), x)
 release(handle) = ccall((:QXHostFree, libqxrt), Cvoid, (Ptr{Cvoid},), handle)

@@ -1,8 +1,8 @@
-//! The exports of the QX analysis library as they are in C, and the stand-in host that makes their arrays.
+//! The exports of the QX analysis library with their C signatures, and the stand-in host that creates their arrays.
 //!
-//! An array is a handle, a pointer to the pointer to a block: the sizes, then the elements. Elements may
-//! stand at any byte, so they are read by `read_unaligned`, or by `elements`, which copies them. 0 is
-//! success, a negative code a failure, a positive one a warning.
+//! An array is a handle, a pointer to a pointer to a block: the sizes, then the elements. Elements need not
+//! be aligned, so read them with `read_unaligned`, or with `elements`, which copies them. 0 is
+//! success, a negative code is a failure, a positive one a warning.
 
 #![allow(non_camel_case_types, non_snake_case, non_upper_case_globals, clippy::missing_safety_doc)]
 
@@ -12,7 +12,7 @@ pub type ErrorCode = i32;
 
 include!("exports.rs");
 
-/// Codes of the elements of an array.
+/// Codes of the element types of an array.
 pub mod element {
     pub const I32: i32 = 3;
     pub const U8: i32 = 5;
@@ -38,7 +38,7 @@ extern "C" {
     pub fn QXHostErrorName(code: ErrorCode) -> *const c_char;
 }
 
-/// An array of numbers; null where there is no memory. It is given back by QXHostFree.
+/// An array of numbers, to be freed by QXHostFree; null if there is not enough memory.
 pub fn array(values: &[f64]) -> DBL1D {
     let count = i32::try_from(values.len()).expect("more elements than an array may have");
     unsafe { QXHostCopy1D(element::DBL, count, values.as_ptr().cast()).cast() }
@@ -47,7 +47,7 @@ pub fn array(values: &[f64]) -> DBL1D {
 /// The elements of an array of numbers.
 ///
 /// # Safety
-/// The handle must be one of this host's, and no call may have it meanwhile.
+/// The handle must come from this host, and no call may use it at the same time.
 pub unsafe fn elements(handle: DBL1D) -> Vec<f64> {
     let block = *handle;
     let first = block.add(1).cast::<f64>();

@@ -1,7 +1,7 @@
-"""The commands of python3 -m qx: every module here with a function add(commands) is one or more.
+"""The commands of python3 -m qx. Every module here that has a function add(commands) defines one or more.
 
-`add` declares parsers, and each sets `run` to the function that takes the options. Modules import
-what they need inside that function, so that one command does not pay for the others."""
+`add` declares the parsers, each of which sets `run` to the function that takes the options. Modules import
+what they need inside that function, so that a command does not load what only others need."""
 
 import importlib
 import pkgutil

@@ -46,9 +46,9 @@ def show_export(options):
 
 
 def add(commands):
-    command = add_command(commands, "list", LIST_EXAMPLES, help="finds exports by words in name and text")
+    command = add_command(commands, "list", LIST_EXAMPLES, help="finds exports by words in their names and texts")
     command.add_argument("pattern", nargs="*", help="words, or a name with * and ?")
     command.set_defaults(run=list_exports)
-    command = add_command(commands, "show", SHOW_EXAMPLES, help="declaration and documentation of an export")
+    command = add_command(commands, "show", SHOW_EXAMPLES, help="shows the declaration and the documentation of an export")
     command.add_argument("name")
     command.set_defaults(run=show_export)

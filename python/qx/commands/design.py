@@ -14,15 +14,15 @@ examples:
   python3 -m qx design windowed highpass 0.5 --rate 100 --taps 401 --window hamming
   python3 -m qx design narrow lowpass 20 25 --rate 8000 --ripple 0.1 --attenuation 60
 
-The page and the numbers of an earlier design in the folder are replaced; other files of these names
-only with --force.
+The page and the numbers of an earlier design in the folder are replaced. Other files of these names are
+replaced only with --force.
 
-edges: one of a lowpass or highpass, two of a bandpass or bandstop; of equiripple and narrow filters
-the edges of pass and stop bands, twice as many, in ascending order."""
+edges: one for a lowpass or highpass, two for a bandpass or bandstop. Equiripple and narrow filters take
+the edges of the pass and stop bands, twice as many, in ascending order."""
 
 
 def made(options):
-    """The Design that the options ask for."""
+    """The Design for the options."""
     from .. import design
     kind, edges, rate = options.type, options.edges, options.rate
     if options.family in design.FAMILIES:
@@ -55,25 +55,25 @@ def design_filter(options):
 
 
 def add(commands):
-    command = add_command(commands, "design", EXAMPLES, help="designs a filter and plots what it does")
+    command = add_command(commands, "design", EXAMPLES, help="designs a filter and plots its responses")
     command.add_argument("family", choices=["butterworth", "chebyshev", "inverse-chebyshev", "elliptic",
                                             "bessel", "windowed", "equiripple", "narrow"])
     command.add_argument("type", choices=["lowpass", "highpass", "bandpass", "bandstop"])
     command.add_argument("edges", type=positive, nargs="+", metavar="EDGE")
     command.add_argument("--rate", type=positive, default=1.0, metavar="HZ",
-                         help="samples per second (edges are in its unit); 1 if it is not given")
-    command.add_argument("--order", type=int, default=4, help="of the lowpass behind an IIR filter (4)")
+                         help="samples per second, 1 by default (edges are in its unit)")
+    command.add_argument("--order", type=int, default=4, help="order of the lowpass prototype of an IIR filter (4)")
     command.add_argument("--ripple", type=positive, default=1.0, metavar="DB",
-                         help="of the pass band (1 dB)")
+                         help="ripple of the pass band (1 dB)")
     command.add_argument("--attenuation", type=positive, default=60.0, metavar="DB",
-                         help="of the stop band (60 dB)")
+                         help="attenuation of the stop band (60 dB)")
     command.add_argument("--fourth", action="store_true",
-                         help="sections of fourth order in place of second")
-    command.add_argument("--taps", type=int, default=101, help="of windowed and equiripple filters (101)")
+                         help="uses sections of fourth rather than second order")
+    command.add_argument("--taps", type=int, default=101, help="length of windowed and equiripple filters (101)")
     command.add_argument("--window", choices=["hanning", "hamming", "blackman"],
-                         help="of windowed filters; without one the response is cut off")
+                         help="window of windowed filters; without it, the response is truncated")
     command.add_argument("--weight", type=positive, default=1.0, metavar="W",
-                         help="of a deviation in the stop band of equiripple filters (1)")
-    command.add_argument("--output", default="out", metavar="FOLDER", help="for the page and the numbers")
+                         help="weight of deviations in the stop band of equiripple filters (1)")
+    command.add_argument("--output", default="out", metavar="FOLDER", help="folder for the page and the numbers")
     add_force(command)
     command.set_defaults(run=design_filter)

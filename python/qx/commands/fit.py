@@ -14,11 +14,11 @@ examples:
   python3 -m qx fit bells.csv --model gaussian --fix c=0 --plot bell.svg
   python3 -m qx fit bells.csv --model polynomial --order 3 --x time --y x --method squares
 
-A drawing of an earlier fit (SVG) is replaced; another file of that name only with --force."""
+A plot of an earlier fit (SVG) is replaced. Another file of that name is replaced only with --force."""
 
 
 def values(texts):
-    """What NAME=NUMBER, as often as it was given, says of the parameters."""
+    """The numbers of all options NAME=NUMBER, by the name of the parameter."""
     said = {}
     for text in texts:
         name, _, value = text.partition("=")
@@ -51,18 +51,18 @@ def add(commands):
     command.add_argument("file")
     command.add_argument("--model", required=True, metavar="MODEL",
                          help="line, polynomial, exponential, power, logarithm or gaussian")
-    command.add_argument("--order", type=int, default=2, help="of a polynomial, 2 by default")
-    command.add_argument("--x", metavar="NAME", help="column, a name or a number; the first by default")
-    command.add_argument("--y", metavar="NAME", help="the first other column by default")
+    command.add_argument("--order", type=int, default=2, help="order of a polynomial, 2 by default")
+    command.add_argument("--x", metavar="NAME", help="column of x, by name or number; the first by default")
+    command.add_argument("--y", metavar="NAME", help="column of y; the first other column by default")
     command.add_argument("--weights", metavar="NAME", help="column of weights; none by default")
     command.add_argument("--method", choices=METHODS, default="squares",
                          help="least squares, least absolute residuals, or bisquare weights, which "
-                              "leave out what lies far off")
+                              "ignore outliers")
     for name, text in (("guess", "start value of a parameter"), ("lower", "least value of a parameter"),
                        ("upper", "greatest value of a parameter"), ("fix", "value of a parameter")):
         command.add_argument(f"--{name}", metavar="NAME=NUMBER", action="append", default=[],
-                             help=text + "; may be repeated")
+                             help=text + "; can be repeated")
     reading.missing(reading.add_options(command, signal=False), "skip")
-    command.add_argument("--plot", metavar="FILE", help="out/fit.svg by default; .png and .pdf, too")
+    command.add_argument("--plot", metavar="FILE", help="file of the plot, out/fit.svg by default; can also be .png or .pdf")
     add_force(command)
     command.set_defaults(run=fit)

@@ -5,8 +5,8 @@ import argparse
 from ..outputs import add_force
 from .values import add_command, positive
 
-# Kept here for the help, so that the libraries are loaded only to generate; a test holds the list to
-# the signals that there are.
+# Listed here for the help, so that the libraries are loaded only to generate a signal. A test checks that
+# the list is complete.
 NAMES = ("sine square triangle sawtooth chirp white gauss periodic gamma poisson binomial ramp pulse "
          "impulse sinc gauss-pulse monopulse triangle-pulse").split()
 
@@ -33,26 +33,26 @@ def generate(options):
 
 
 def add(commands):
-    command = add_command(commands, "generate", EXAMPLES, help="writes a wave, a noise or a pulse, CSV or WAV")
+    command = add_command(commands, "generate", EXAMPLES, help="writes a wave, noise or a pulse as CSV or WAV")
     command.add_argument("signal", choices=NAMES, metavar="SIGNAL", help=", ".join(NAMES))
     command.add_argument("target", metavar="OUT.wav|OUT.csv")
     command.add_argument("--rate", type=positive, default=44100.0, metavar="HZ",
                          help="samples per second, 44100 by default")
     command.add_argument("--seconds", type=positive, default=1.0, help="length, 1 by default")
     command.add_argument("--amplitude", type=float, default=1.0,
-                         help="peak, or standard deviation of gauss, or factor; 1 by default")
+                         help="peak value, standard deviation (gauss) or factor; 1 by default")
     command.add_argument("--frequency", type=float, default=100.0, metavar="HZ",
-                         help="of waves and pulses, 100 by default")
+                         help="frequency of waves and pulses, 100 by default")
     command.add_argument("--to", type=float, default=1000.0, metavar="HZ",
-                         help="where a chirp ends, 1000 by default")
+                         help="final frequency of a chirp, 1000 by default")
     command.add_argument("--phase", type=float, default=0.0, metavar="DEGREES")
     command.add_argument("--duty", type=float, default=50.0, metavar="PERCENT")
-    command.add_argument("--delay", type=float, default=0.0, metavar="SECONDS", help="of pulses")
-    command.add_argument("--width", type=positive, default=0.1, metavar="SECONDS", help="of pulses")
-    command.add_argument("--seed", type=seed, default=1, help="of noises, 1 by default")
-    command.add_argument("--order", type=int, default=1, help="of gamma noise")
-    command.add_argument("--mean", type=float, default=1.0, help="of Poisson noise")
-    command.add_argument("--trials", type=int, default=1, help="of binomial noise")
-    command.add_argument("--probability", type=float, default=0.5, help="of binomial noise")
+    command.add_argument("--delay", type=float, default=0.0, metavar="SECONDS", help="for pulses")
+    command.add_argument("--width", type=positive, default=0.1, metavar="SECONDS", help="for pulses")
+    command.add_argument("--seed", type=seed, default=1, help="seed of noise, 1 by default")
+    command.add_argument("--order", type=int, default=1, help="for gamma noise")
+    command.add_argument("--mean", type=float, default=1.0, help="for Poisson noise")
+    command.add_argument("--trials", type=int, default=1, help="for binomial noise")
+    command.add_argument("--probability", type=float, default=0.5, help="for binomial noise")
     add_force(command)
     command.set_defaults(run=generate)

@@ -6,7 +6,7 @@ from ..outputs import add_force
 from . import reading
 from .values import add_command
 
-SHOWN = 20  # lines of a table on the terminal
+SHOWN = 20  # rows of a table that the terminal shows
 PEAKS_EXAMPLES = """\
 examples:
   python3 -m qx peaks examples/data/ecg_208_360hz.csv
@@ -14,8 +14,8 @@ examples:
   python3 -m qx peaks examples/data/ecg_208_360hz.csv --threshold 1.2 --csv peaks.csv
   python3 -m qx peaks examples/data/ecg_208_360hz.csv --events --csv beats.csv
 
-The prominence of a peak is its height above the higher of the two lowest values on either side of it
-before a higher peak, or the end, is reached."""
+On either side of a peak, take the lowest value before a higher peak or the end is reached. The prominence
+of the peak is its height above the higher of these two values."""
 PULSE_EXAMPLES = """\
 examples:
   python3 -m qx generate pulse gate.csv --rate 1000 --delay 0.2 --width 0.3
@@ -101,7 +101,7 @@ def peaks(options):
             side = "below" if options.valleys else "above"
             said.append(f"{side} {options.threshold:.6g} {read.unit}".rstrip())
         if found.prominence > 0:
-            said.append(f"that stand out by {found.prominence:.6g} {read.unit}".rstrip())
+            said.append(f"with a prominence of at least {found.prominence:.6g} {read.unit}".rstrip())
         kind = "valley" if options.valleys else "peak"
         print(f"{read.name}: {len(rows)} {kind}{'s' * (len(rows) != 1)} {' and '.join(said)}".rstrip())
     if len(places) > 1:
@@ -113,7 +113,7 @@ def peaks(options):
 
 
 def event_pulses(read):
-    """The pulses of all events, with places in the whole recording."""
+    """The pulses of all events, with positions in the whole recording."""
     import dataclasses
 
     from .. import measuring
@@ -129,7 +129,7 @@ def pulse(options):
     from ..tables import InputError
     read, step = opened(options)
     direction = measuring.FALLING if options.falling else measuring.RISING
-    found = None  # all of them, where they are needed
+    found = None  # all pulses, where they are needed
     if options.events:
         found = event_pulses(read)
     elif options.csv:
@@ -154,12 +154,12 @@ def pulse(options):
             ("second edge, 90% to 10%", one.second_duration * step, time),
             ("slew rate", one.slew_rate / step, f"{unit or '1'}/{'s' if read.rate else 'sample'}"),
             ("overshoot", one.first_overshoot, "%"),
-            ("overshoot behind it", one.second_overshoot, "%")):
+            ("overshoot after it", one.second_overshoot, "%")):
         print(f"  {label:<24} {value:>12.6g} {its_unit}".rstrip())
     if options.csv:
         names = ["pulse", f"start ({time})", f"end ({time})", f"width ({time})",
                  f"first edge ({time})", f"second edge ({time})", "overshoot (%)",
-                 "overshoot behind it (%)"]
+                 "overshoot after it (%)"]
         write_table(options.csv, names, [
             (i, p.start * step, p.end * step, p.width * step, p.first_duration * step,
              p.second_duration * step, p.first_overshoot, p.second_overshoot)
@@ -167,8 +167,8 @@ def pulse(options):
 
 
 def add_common(command):
-    command.add_argument("file", help="- is standard input")
-    command.add_argument("--csv", metavar="FILE", help="writes the table there")
+    command.add_argument("file", help="the recording; - is standard input")
+    command.add_argument("--csv", metavar="FILE", help="writes the table to this file")
     add_force(command)
     reading.missing(reading.add_options(command), "skip", "interpolate")
 
@@ -176,18 +176,18 @@ def add_common(command):
 def add(commands):
     command = add_command(
         commands, "peaks", PEAKS_EXAMPLES, help="finds the peaks of a recording",
-        description="Finds peaks, by parabolas through windows of samples, or repeated events.")
+        description="Finds peaks, by parabolas fitted to windows of samples, or repeated events.")
     add_common(command)
     command.add_argument("--threshold", type=float, metavar="VALUE",
-                         help="peaks lie above it, valleys below")
+                         help="finds peaks above this value, or valleys below it")
     command.add_argument("--prominence", type=float, metavar="VALUE",
-                         help="peaks stand out by so much at least; without this and --threshold by two "
-                         "fifths of what the third most prominent one does, and by a fifth of the first")
+                         help="least prominence of a peak; without this and --threshold, two fifths of the "
+                         "third largest prominence, and at least a fifth of the largest")
     command.add_argument("--width", type=width, default=5, metavar="SAMPLES",
-                         help="of a parabola, 5 by default; wider ones pass over noise")
-    command.add_argument("--valleys", action="store_true", help="seeks valleys instead")
+                         help="samples under a parabola, 5 by default; wider parabolas are less sensitive to noise")
+    command.add_argument("--valleys", action="store_true", help="finds valleys instead")
     command.add_argument("--events", action="store_true",
-                         help="repeated bursts of steep slope instead, such as heart beats")
+                         help="finds repeated bursts of steep slope instead, such as heart beats")
     command.set_defaults(run=peaks)
 
     command = add_command(
@@ -195,9 +195,9 @@ def add(commands):
         description="Measures a pulse between two states: levels, edges, width, overshoot.")
     add_common(command)
     command.add_argument("--number", type=number, default=1, metavar="N",
-                         help="which pulse, the first by default")
+                         help="number of the pulse, the first by default")
     command.add_argument("--events", action="store_true",
-                         help="those of repeated events, such as heart beats, each between levels of "
-                         "its own")
-    command.add_argument("--falling", action="store_true", help="pulses that begin with a falling edge")
+                         help="measures the pulses of repeated events, such as heart beats, each with its "
+                         "own levels")
+    command.add_argument("--falling", action="store_true", help="measures pulses that begin with a falling edge")
     command.set_defaults(run=pulse)

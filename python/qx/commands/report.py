@@ -15,10 +15,11 @@ examples:
   python3 -m qx report examples/data --workers 2 --output many
   python3 -m qx report "examples/data/*.csv" --rate 360
 
-Pages of an earlier report in the folder are replaced; other files of their names only with --force."""
+Pages of an earlier report in the folder are replaced. Other files of these names are replaced only with
+--force."""
 
 
-LISTED = 10  # files on the terminal
+LISTED = 10  # files listed on the terminal
 
 
 def report_on(options):
@@ -27,13 +28,13 @@ def report_on(options):
     if many.is_many(options.files):
         return report_on_many(options, reading)
     from .. import isolation
-    isolation.prepare()  # while this process loads what comes after reading
+    isolation.prepare()  # while this process loads the modules needed after reading
     from .. import outputs, recording, report
     path = os.path.join(options.output, "report.html")
     outputs.check(path, options.force, "report", outputs.identities(options.files))
     with bar() as shown:
         read = recording.read(options.files[0], **reading, progress=shown.update)
-        lines = report.write(read, path)  # long recordings are passed several times
+        lines = report.write(read, path)  # long recordings are read several times
     for line in lines:
         print(line)
     print(f"\nThe report with plots: {path}")
@@ -62,7 +63,7 @@ def report_on_many(options, reading):
     read = sum(not outcome.failure for outcome in found)
     print(f"{read} of {len(found)} recordings were read: {os.path.join(options.output, 'index.html')}")
     if left := many.left_out(options.files):
-        print(f"left out by their endings: {printable(', '.join(left[:LISTED]))}"
+        print(f"skipped because of their file name extensions: {printable(', '.join(left[:LISTED]))}"
               + f" and {len(left) - LISTED} more, which the index lists" * (len(left) > LISTED))
     if not read:
         raise many.InputError("no recording could be read")
@@ -77,17 +78,17 @@ def count(text):
 
 def add(commands):
     command = add_command(commands, "report", EXAMPLES,
-                          help="analyses recordings, text tables or audio files",
-                          description="Analyses a recording, or many: each has a page then, and "
-                          "an index leads to them.")
-    command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN", help="- is standard input")
+                          help="analyses recordings: text tables, audio files and others",
+                          description="Analyses one or more recordings. If there are several, each has a "
+                          "page, and an index links to them.")
+    command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN", help="the recordings; - is standard input")
     reading_options.missing(reading_options.add_options(command), "skip", "interpolate")
     command.add_argument("--output", default="out", metavar="FOLDER",
-                         help="where the pages go, out by default")
+                         help="folder for the pages, out by default")
     command.add_argument("--workers", type=count, metavar="N",
-                         help="processes for many recordings; as many as processors by default")
+                         help="number of processes for many recordings; by default, the number of processors")
     command.add_argument("--scheduler", metavar="ADDRESS",
-                         help="of a Dask cluster that is given many recordings; its workers have this "
-                         "package and reach the files by the same paths")
-    add_force(command, "replaces files that are no pages of an earlier report")
+                         help="address of a Dask cluster that processes many recordings; its workers need this "
+                         "package and access to the files by the same paths")
+    add_force(command, "also replaces files that are not pages of an earlier report")
     command.set_defaults(run=report_on)

@@ -13,9 +13,9 @@ examples:
   python3 -m qx resample tone.wav tone44.wav --rate 44100
   python3 -m qx resample tone.wav tone.flac --rate 96000
 
-The ending of the new file says its format: .wav, .flac, .aiff, .w64 or .rf64. It has the sample
-format of the old one where there is such a thing. Samples that the filter takes beyond full scale
-are clipped in formats of whole numbers, and counted."""
+The extension of the new file determines its format: .wav, .flac, .aiff, .w64 or .rf64. The sample format of
+the old file is kept where the new format has it. In integer formats, samples that the filter takes beyond
+full scale are clipped and counted."""
 
 
 def rate(text):
@@ -31,7 +31,7 @@ def resample(options):
     from .. import outputs
     from ..resampling import resample_file
     outputs.check(options.target, options.force, inputs=outputs.identities([options.source]))
-    # A file that is done within a second needs no bar.
+    # No bar is shown for a file that is done within a second.
     with tqdm.tqdm(unit=" frames", unit_scale=True, delay=1, leave=False, disable=not sys.stderr.isatty()) as bar:
         done = resample_file(options.source, options.target, options.rate, bar.update,
                              lambda sound: bar.reset(sound.frames))
@@ -53,5 +53,5 @@ def add(commands):
     command.add_argument("target", metavar="OUT")
     command.add_argument("--rate", type=rate, required=True, metavar="HZ",
                          help="samples per second of the new file")
-    add_force(command, "replaces a file that exists; never the one that is read")
+    add_force(command, "replaces an existing file, but never the file that is read")
     command.set_defaults(run=resample)

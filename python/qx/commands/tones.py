@@ -14,8 +14,9 @@ examples:
   python3 -m qx tones tone.wav --harmonics 5 --full-scale 1 --csv tones.csv
   python3 -m qx tones examples/data/ecg_208_360hz.csv --count 8 --plot hum.svg
 
-Harmonics are those of the largest tone, or of the one near --fundamental. THD, SINAD, SNR and ENOB follow
-IEEE 1241. A drawing of an earlier run (SVG) is replaced; other files of that name only with --force."""
+Harmonics are measured for the largest tone, or for the tone near --fundamental. THD, SINAD, SNR and ENOB
+follow IEEE 1241. A plot of an earlier run (SVG) is replaced. Other files of that name are replaced only with
+--force."""
 
 
 def tones(options):
@@ -38,7 +39,7 @@ def tones(options):
                                             options.harmonics, options.full_scale)
             drawn = long_tones.spectrum(read.whole, rate)
             print(f"Tones of all {read.whole.count} samples; the spectrum is a mean over parts of {long_tones.SEGMENT} "
-                  f"samples, harmonics are means over {long_tones.MOST_PARTS} of them at most")
+                  f"samples, harmonics are means over at most {long_tones.MOST_PARTS} of them")
         else:
             found = topic.tones(read.values, rate, options.count)
             analysis = measure.harmonics(read.values, rate, options.fundamental, options.harmonics,
@@ -48,14 +49,14 @@ def tones(options):
     amplitude = f"amplitude ({read.unit})" if read.unit else "amplitude"
     names = [frequency, amplitude, "phase (rad)"]
     many = len(found.frequencies)
-    print(f"{many} tone{'s' * (many != 1)}, which leave {found.residual_rms:.6g} {read.unit}".rstrip()
+    print(f"{many} tone{'s' * (many != 1)}; residual {found.residual_rms:.6g} {read.unit}".rstrip()
           + f" (root mean square); resolution {found.resolution:.4g}{' Hz' * bool(read.rate)}")
     columns = list(zip(found.frequencies, found.frequency_errors, found.amplitudes, found.amplitude_errors,
                        found.phases))
     show_texts([names[0], "±", names[1], "±", names[2]],
                [(*uncertain(*row[:2]), *uncertain(*row[2:4]), f"{row[4]:.6g}") for row in columns])
     if not found.significant.all():
-        print("Could be noise: " + ", ".join(f"{f:.6g}" for f in found.frequencies[~found.significant]))
+        print("May be noise: " + ", ".join(f"{f:.6g}" for f in found.frequencies[~found.significant]))
     print("Harmonics")
     rows = [(h, *row) for h, row in enumerate(zip(analysis.frequencies, analysis.amplitudes,
                                                   analysis.phases), 1)]
@@ -77,17 +78,19 @@ def tones(options):
 def add(commands):
     command = add_command(
         commands, "tones", EXAMPLES, help="measures tones, harmonics and noise of a recording",
-        description="Measures the tones of a recording, and harmonics, distortion and noise.")
+        description="Measures the tones of a recording, its harmonics, distortion and noise.")
     command.add_argument("file")
     command.add_argument("--count", type=number, default=5, metavar="N",
-                         help="so many tones at most, 5 by default; fewer where the rest could be noise")
+                         help="largest number of tones, 5 by default; fewer if the rest could be noise")
     command.add_argument("--fundamental", type=positive, metavar="HZ",
-                         help="about where the tone is whose harmonics are measured; the largest by default")
-    command.add_argument("--harmonics", type=number, default=10, metavar="N", help="up to this one, 10 by default")
+                         help="approximate frequency of the tone whose harmonics are measured; by default, "
+                         "the largest tone")
+    command.add_argument("--harmonics", type=number, default=10, metavar="N", help="highest harmonic, 10 by default")
     command.add_argument("--full-scale", type=positive, metavar="VALUE",
-                         help="amplitude of a sine at full scale, for ENOB; that of the tone by default")
+                         help="amplitude of a full-scale sine, for ENOB; by default, that of the tone")
     reading.missing(reading.add_options(command), "interpolate")
-    command.add_argument("--csv", metavar="FILE", help="writes both tables there")
-    command.add_argument("--plot", metavar="FILE", help="out/tones.svg by default; .png and .pdf, too")
+    command.add_argument("--csv", metavar="FILE", help="writes both tables to this file")
+    command.add_argument("--plot", metavar="FILE",
+                         help="file of the plot, out/tones.svg by default; can also be .png or .pdf")
     add_force(command)
     command.set_defaults(run=tones)

@@ -1,4 +1,4 @@
-"""What the parsers and options of several commands share."""
+"""Functions that the parsers and options of several commands share."""
 
 import argparse
 import sys
@@ -12,14 +12,14 @@ def positive(text):
 
 
 def add_command(commands, name, examples, **texts):
-    """The parser of a command, whose help ends with examples as they stand. `texts` has `help`, a
-    line, and `description` where that is not enough."""
+    """The parser of a command, whose help ends with the examples, unchanged. `texts` contains `help`, one
+    line, and `description` where one line is not enough."""
     texts.setdefault("description", texts["help"][:1].upper() + texts["help"][1:] + ".")
     return commands.add_parser(name, epilog=examples,
                                formatter_class=argparse.RawDescriptionHelpFormatter, **texts)
 
 
 def bar():
-    """A bar of samples on a terminal, behind which nothing stays; what is done within a second needs none."""
+    """A progress bar of samples on a terminal, removed at the end. Work done within a second shows no bar."""
     import tqdm
     return tqdm.tqdm(unit=" samples", unit_scale=True, delay=1, leave=False, disable=not sys.stderr.isatty())

@@ -1,12 +1,12 @@
-"""verify: whether the library gives here the bits that were published."""
+"""The command verify: whether the library's results on this machine have the published bits."""
 
 import os
 import subprocess
 import sys
 
 EPILOG = """\
-Every export is called with the arguments of its recipes, and a hash of all results is compared with the one
-that was published with this version. It takes some seconds. The status is 0 where all agree.
+Every export is called with the arguments of its recipes, and a hash of all results is compared with the hash
+published with this version. This takes a few seconds. The exit status is 0 if all agree.
 
 examples:
   python3 -m qx verify
@@ -17,15 +17,15 @@ PROGRAM, PUBLISHED = "print_hashes", "hashes.txt"
 
 def add(commands):
     import argparse
-    command = commands.add_parser("verify", help="compare the results of all exports with the published ones",
+    command = commands.add_parser("verify", help="compares the results of all exports with the published ones",
                                   description=__doc__, epilog=EPILOG,
                                   formatter_class=argparse.RawDescriptionHelpFormatter)
     command.set_defaults(run=verify)
 
 
 def _files():
-    """The program that prints the hashes, and those that were published: both beside the libraries, or in
-    the tree."""
+    """The program that prints the hashes, and the published hashes. Both are beside the libraries, or in
+    the source tree."""
     from ..library import library
     folder = library().folder
     for published in (folder / PUBLISHED, folder.parent.parent / "tests/conformance" / PUBLISHED):
@@ -38,7 +38,7 @@ def _files():
 def verify(options):
     program, published = _files()
     due = dict(line.split() for line in published.read_text("utf-8").splitlines())
-    # Where there is no /proc the program cannot find what lies beside it.
+    # Without /proc, the program cannot find the files beside it.
     ran = subprocess.run([program], capture_output=True, text=True,
                          env={**os.environ, "LD_LIBRARY_PATH": str(program.parent)})
     if ran.returncode:
@@ -49,7 +49,7 @@ def verify(options):
         print(f"{name}: {found.get(name, 'no result')}, published {due[name]}")
     others = len(found.keys() - due.keys())
     print(f"{len(due) - len(differing)} of {len(due)} exports give the published bits here"
-          + (f"; of {others} more the last bits depend on the processor" if others else "") + ".")
+          + (f"; the last bits of {others} more depend on the processor" if others else "") + ".")
     if differing:
         sys.stdout.flush()
-        raise ValueError(f"{len(differing)} exports give other results than those published")
+        raise ValueError(f"{len(differing)} exports give other results than the published ones")

@@ -10,8 +10,8 @@ examples:
   python3 -m qx view examples/data/ecg_208_360hz.csv
   python3 -m qx view --port 8800 examples/data/ecg_208_360hz.csv
 
-The page is served to this machine alone, under the address that is printed, until Ctrl-C. It has all samples,
-of recordings of any length: they are put into temporary files, 8 bytes each."""
+The page is served to this machine only, at the address that is printed, until Ctrl-C. It shows all samples of
+recordings of any length. They are kept in temporary files, 8 bytes each."""
 
 
 def port(text):
@@ -44,6 +44,6 @@ def add(commands):
                           description="Serves pages of recordings to a browser on this machine.")
     command.add_argument("files", nargs="+", metavar="FILE")
     reading.missing(reading.add_options(command), "skip", "interpolate")
-    command.add_argument("--port", type=port, default=0, help="any that is free by default")
+    command.add_argument("--port", type=port, default=0, help="port of the address; any free port by default")
     command.add_argument("--open", action="store_true", help="opens the page in a browser")
     command.set_defaults(run=view)

@@ -1,8 +1,8 @@
 """Functions of one channel over arrays of any dimension.
 
-A channel is what lies along one axis; the others number the channels. Each channel is a call of its own,
-so its bits are those that it has alone. Where there is enough to do, channels run in threads, side by
-side while the exports work.
+The values along one axis form a channel; the other axes number the channels. Each channel is processed by
+a separate call, so its results have the same bits as if it were alone. Where there is enough work, channels
+are processed in threads, which run in parallel while they are inside the exports.
 """
 
 from __future__ import annotations
@@ -22,12 +22,12 @@ from ..outcomes import QxError, at, keeping, named, warn
 
 Channel = Callable[[NDArray[Any]], Any]  # a function of one channel
 
-ENOUGH = 1 << 15  # elements from which on threads are worth their while
-LARGE = 1 << 16  # bytes of a result from which on it is copied at once to where it belongs
+ENOUGH = 1 << 15  # number of elements from which threads pay off
+LARGE = 1 << 16  # bytes of a result from which it is copied into its row immediately
 
 
 class _Last(int):
-    """The default axis: the last one, and the rows of a pandas table, whose columns are channels."""
+    """The default axis: the last one; for a pandas table, the rows, so that its columns are the channels."""
 
     def __repr__(self) -> str:
         return "-1"
@@ -40,7 +40,7 @@ LAST = _Last(-1)
 
 
 class _Workers:
-    """The threads, made when they are first needed; a forked process makes its own."""
+    """The worker threads, created when they are first needed; a forked process creates its own."""
 
     def __init__(self) -> None:
         self.begin()
@@ -50,7 +50,7 @@ class _Workers:
         self.lock, self.here = threading.Lock(), threading.local()
 
     def is_one(self) -> bool:
-        """Whether this thread is one of them, which must not wait for the others."""
+        """Whether this thread is a worker, which must not wait for other workers."""
         return bool(getattr(self.here, "is_worker", False))
 
     def _begin(self) -> None:
@@ -69,12 +69,12 @@ if hasattr(os, "register_at_fork"):
 
 
 def processors() -> int:
-    """How many processors this process may use."""
+    """The number of processors that this process may use."""
     return len(os.sched_getaffinity(0)) if hasattr(os, "sched_getaffinity") else os.cpu_count() or 1
 
 
 def many(function: Callable[[Any], Any], channels: Sequence[Any] | NDArray[Any], size: int) -> list[Any]:
-    """The results of the function for each of the channels, in order; `size` elements in all."""
+    """The results of the function for each channel, in order. The channels have `size` elements in all."""
     if len(channels) < 2 or size < ENOUGH or processors() < 2 or _workers.is_one():
         return [function(channel) for channel in channels]
     try:
@@ -92,7 +92,7 @@ def is_pandas(x: object) -> bool:
 
 
 def as_array(x: ArrayLike) -> NDArray[Any]:
-    """x as an array of numbers; masked values are refused, since no export knows of a mask."""
+    """x as an array of numbers. Masked values are refused, since no export takes a mask."""
     if type(x) is np.ndarray:
         return x
     if isinstance(x, np.ma.MaskedArray) and np.ma.is_masked(x):
@@ -101,18 +101,18 @@ def as_array(x: ArrayLike) -> NDArray[Any]:
 
 
 def vector(x: ArrayLike, function: str, argument: str) -> NDArray[Any]:
-    """x as an array of one dimension, for what has no axis."""
+    """x as a one-dimensional array, for functions without an axis."""
     array = as_array(x)
     if array.ndim != 1:
-        raise ValueError(f"qx.{function}: {argument}: one dimension is needed; {array.ndim} came")
+        raise ValueError(f"qx.{function}: {argument}: one dimension is needed; got {array.ndim}")
     return array
 
 
 def along(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
-    """The function of one channel over all channels of x, which are along the axis.
+    """Applies a function of one channel to all channels of x along the axis.
 
-    What the function returns takes the channel's place: an array of any length, a number (the axis
-    disappears), or a tuple of such, for which a tuple comes back.
+    The result takes the place of the channel. It is an array of any length, a number, which removes the
+    axis, or a tuple of these, for which a tuple is returned.
     """
     if type(x) is np.ndarray and x.ndim == 1 and axis is LAST:
         return function(x)
@@ -123,17 +123,18 @@ def along(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
 
 def _check_axis(dimensions: int, axis: int) -> None:
     if not dimensions:
-        raise ValueError(f"{at('x')}: an array of at least one dimension is needed; a single value came")
+        raise ValueError(f"{at('x')}: an array of at least one dimension is needed; got a single value")
     try:
         place = operator.index(axis)
     except TypeError:
-        raise TypeError(f"{at('axis')}: a whole number is needed; {axis!r} came") from None
+        raise TypeError(f"{at('axis')}: a whole number is needed; got {axis!r}") from None
     if not -dimensions <= place < dimensions:
-        raise ValueError(f"{at('axis')}: {place} is none of an array of {dimensions} dimension{'s'[:dimensions - 1]}")
+        raise ValueError(f"{at('axis')}: {place} is out of bounds for an array of {dimensions} "
+                         f"dimension{'s'[:dimensions - 1]}")
 
 
 def _flat(x: NDArray[Any], axis: int) -> tuple[NDArray[Any], NDArray[Any]]:
-    """The channels in rows, and x with the axis as the last one."""
+    """The channels as rows, and x with the axis moved to the end."""
     moved = np.moveaxis(x, axis, -1)
     flat = moved.reshape(math.prod(moved.shape[:-1]), moved.shape[-1])
     if not len(flat):
@@ -155,17 +156,17 @@ def _along(function: Channel, x: NDArray[Any], axis: int) -> Any:
 
 
 class _Rows:
-    """The large results of channels in one array from the start: each is copied into its row as soon as it is
-    there, while the processor's cache has it, and its own memory serves the next channel. What does not fit
-    the rows, which the first result decides on, stays as it is."""
+    """Collects the large results of channels in one array. Each is copied into its row as soon as it is
+    computed, while it is in the processor's cache, and its memory is reused for the next channel. The first
+    result determines the shape of the rows; results of another shape are kept as they are."""
 
     def __init__(self, count: int) -> None:
         self.count, self.lock = count, threading.Lock()
-        self.arrays: dict[int, NDArray[Any]] = {}  # by the place in a tuple
-        self.filled: dict[int, int] = {}  # how many rows are
+        self.arrays: dict[int, NDArray[Any]] = {}  # by the position in a tuple
+        self.filled: dict[int, int] = {}  # the number of rows filled
 
     def kept(self, i: int, found: Any) -> Any:
-        """What is kept of the result of channel i."""
+        """The result of channel i, moved into its row where it fits."""
         if isinstance(found, tuple):
             return tuple(self._row(i, place, part) for place, part in enumerate(found))
         return self._row(i, 0, found)
@@ -184,13 +185,13 @@ class _Rows:
         return array[i]
 
     def whole(self, place: int, parts: Sequence[Any]) -> Sequence[Any] | NDArray[Any]:
-        """The array of all results, or these where they are not all in it."""
+        """The array of all results, or the separate results if some are not in it."""
         return self.arrays[place] if self.filled.get(place) == self.count else parts
 
 
 def by_channel(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
-    """What the function returns for one channel; for several, a list with that of each, and lists of lists
-    where x has more dimensions than two. Of a pandas table the columns are channels."""
+    """The result of the function for one channel; for several channels, a list of the results, nested where
+    x has more than two dimensions. The channels of a pandas table are its columns."""
     if is_pandas(x):
         axis = 0 if axis is LAST else axis
     x = as_array(x)
@@ -206,8 +207,8 @@ def by_channel(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
 
 def along_pairs(function: Callable[[NDArray[Any], NDArray[Any]], float], x: ArrayLike, y: ArrayLike,
                 axis: int = LAST) -> Any:
-    """The number that the function returns for each pair of channels of x and y, whose channels are
-    broadcast against each other; they may differ in length."""
+    """The number that the function returns for each pair of channels of x and y. The channels are broadcast
+    against each other, and may differ in length."""
     places = [0 if axis is LAST and is_pandas(one) else axis for one in (x, y)]
     arrays = [as_array(one) for one in (x, y)]
     for one, place in zip(arrays, places):
@@ -220,7 +221,7 @@ def along_pairs(function: Callable[[NDArray[Any], NDArray[Any]], float], x: Arra
 
 
 def _together(parts: Sequence[Any] | NDArray[Any], shape: tuple[int, ...], place: int) -> NDArray[Any]:
-    """The results of all channels as one array, with the channel's results along the axis `place`."""
+    """The results of all channels as one array, with the results of a channel along the axis `place`."""
     first = np.asarray(parts[0])
     if not isinstance(parts, np.ndarray) and any(np.shape(part) != first.shape for part in parts):
         together = np.empty(len(parts), object)
@@ -232,7 +233,7 @@ def _together(parts: Sequence[Any] | NDArray[Any], shape: tuple[int, ...], place
 
 
 def either(real: Channel, of_complex: Channel, x: Any, axis: int = LAST) -> Any:
-    """along(), with the function for real or for complex channels as x is the one or the other."""
+    """along(), with the function for real or for complex channels, depending on the type of x."""
     if type(x) is np.ndarray and x.ndim == 1 and axis is LAST:
         return of_complex(x) if x.dtype.kind == "c" else real(x)
     if type(x) is not np.ndarray and not is_pandas(x):
@@ -242,7 +243,7 @@ def either(real: Channel, of_complex: Channel, x: Any, axis: int = LAST) -> Any:
 
 
 def count_of(x: ArrayLike, axis: int = LAST) -> int:
-    """How many values a channel has."""
+    """The number of values in a channel."""
     shape = np.shape(x)
     _check_axis(len(shape), axis)
     return shape[0 if axis is LAST and is_pandas(x) else axis]
@@ -251,7 +252,8 @@ def count_of(x: ArrayLike, axis: int = LAST) -> int:
 # pandas
 
 def _of_pandas(function: Channel, x: Any, axis: int) -> Any:
-    """Series and tables: their index stays where as many values come back, their columns always."""
+    """Series and tables. They keep their index where the number of values is unchanged, and always keep their
+    columns."""
     place = 0 if axis is LAST else axis % x.ndim
     found = _along(function, as_array(x.to_numpy()), place)
     if isinstance(found, tuple):

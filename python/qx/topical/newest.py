@@ -103,7 +103,7 @@ NEWEST = {
         "matrix_rank": "Rank2026_head", "matrix_rank_complex": "CxRank2026_head", "eig":
         "EigenValueVector2026_head", "eig_complex": "CxEigenValueVector2026_head", "eig_general":
         "GenEigenEx_head", "eig_general_complex": "CxGenEigenEx_head", "eigh":
-        "SymEvectorEvalue_head", "svd": "SVD2026_head", "svd_complex": "CxSVD2026_head", "svdvals":
+        "SymEvectorEvalue2026_head", "svd": "SVD2026_head", "svd_complex": "CxSVD2026_head", "svdvals":
         "SVDS2026_head", "svdvals_complex": "CxSVDS2026_head", "qr": "QRDec2026H", "qr_complex": "CxQRDec2026H",
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
         "Schur2026_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
@@ -207,7 +207,7 @@ NEWEST = {
 
 
 class Served:
-    """The exports of a topic by the keys of the table; each is written at its first use."""
+    """The exports of a topic by the keys of the table; each is created when it is first used."""
 
     def __init__(self, topic: str) -> None:
         self._topic = topic
@@ -223,8 +223,8 @@ class Served:
 
 
 def served(topic: str) -> Served:
-    """The exports of a topic. From then on its module answers wrong names; type checkers do not see that, who
-    would take every name for one of the module's then."""
+    """The exports of a topic. Its module then also answers wrong names. Type checkers do not see this, since
+    they would then accept any name in the module."""
     module = sys.modules.get(f"{__package__.rpartition('.')[0]}.{topic}")
     if module:
         vars(module).setdefault("__getattr__", functools.partial(missing, module.__name__))
@@ -232,7 +232,7 @@ def served(topic: str) -> Served:
 
 
 def missing(module: str, name: str) -> NoReturn:
-    """Answers a wrong name in the module of a topic."""
+    """Raises the error for a wrong name in the module of a topic."""
     if name.startswith("_"):
         raise AttributeError(f"module {module!r} has no attribute {name!r}")
     raise AttributeError(f"{module} has no function {name}{answer(name, inner=module.rpartition('.')[2])}")
@@ -248,7 +248,7 @@ def function_of(topic: Any, key: str) -> Any:
 
 
 def public_names() -> dict[str, list[str]]:
-    """Where the public names of all topics are: name to topics."""
+    """The public names of all topics, each with the topics that have it."""
     found = {}
     for topic in TOPICS:
         for name in importlib.import_module(f"..{topic}", __package__).__all__:
@@ -257,8 +257,8 @@ def public_names() -> dict[str, list[str]]:
 
 
 def answer(name: str, more: Iterable[str] = (), inner: str = "") -> str:
-    """Where a name is that somebody looked for in another place, as the end of a message; what is near it in
-    the topic `inner`, where that was the place, comes first."""
+    """The end of a message that says where to find a name that was looked for in the wrong place. If it was
+    looked for in the topic `inner`, similar names of that topic come first."""
     places = public_names()
     if inner and name not in places:
         own = [known for known, topics in places.items() if inner in topics]

@@ -1,4 +1,4 @@
-"""Results of several parts, shown in words and as a table in notebooks."""
+"""Results of several parts, shown as text, or as a table in notebooks."""
 
 from __future__ import annotations
 
@@ -14,13 +14,13 @@ __all__ = ["Result", "result"]
 
 
 class Result:
-    """Base of results: shown line by line, unpacked as a tuple of the fields that `_unpacked` names,
-    or of all."""
+    """The base of results. They are shown line by line, and unpack into the fields that `_unpacked` names,
+    or into all."""
 
     _unpacked: ClassVar[tuple[str, ...]] = ()
 
     def _shown(self) -> list[tuple[str, str]]:
-        """Names and texts of what is shown."""
+        """The names and texts of the fields that are shown."""
         return [(field.name, _text(getattr(self, field.name))) for field in dataclasses.fields(self)
                 if field.repr]
 
@@ -59,5 +59,5 @@ if TYPE_CHECKING:
     from dataclasses import dataclass as result
 else:
     def result(of_class):
-        """A dataclass, derived from Result, that is shown as that says."""
+        """Makes a dataclass that keeps the representation of Result."""
         return dataclasses.dataclass(eq=False, repr=False)(of_class)

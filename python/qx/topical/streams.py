@@ -1,8 +1,9 @@
-"""One protocol for all that runs on blocks.
+"""The common interface of everything that works block by block.
 
-A stream is called with blocks of any size, one after the other, and returns what they give. All blocks
-together give the bits of one piece. `reset()` begins anew, `copy()` is a stream that goes on from here
-by itself, `finish()` returns what is still to come when the signal has ended. Streams can be pickled.
+A stream is called with successive blocks of any size, and returns the output for each. The outputs of all
+blocks together have the same bits as the output for a single block. `reset()` starts afresh, `copy()`
+returns an independent stream in the same state, and `finish()` returns the output that is still pending at
+the end of the signal. Streams can be pickled.
 """
 
 from __future__ import annotations
@@ -20,34 +21,34 @@ if TYPE_CHECKING:
 
 
 class Stream:
-    """A subclass has `_start()`, the state of a channel before its first value, and
-    `_step(state, block)`, which returns the output and the next state and leaves the given one as it
-    is; `_end(state)` where something is left at the end.
+    """The base of streams. A subclass defines `_start()`, which returns the state of a channel before its
+    first value, `_step(state, block)`, which returns the output and the next state without changing the
+    given one, and `_end(state)`, if output is pending at the end.
 
     Parameters
     ----------
     channels : int, optional
-        Blocks have two dimensions with so many channels. Without it they have one.
+        The number of channels of two-dimensional blocks. Without it, blocks have one dimension.
     axis : int
-        The axis of a block along which the samples are.
+        The axis of the samples in a block.
     dtype : type
-        Of the samples: `float` or `complex`; where the core has them also `numpy.float32` and
-        `numpy.complex64`.
+        The type of the samples: `float` or `complex`, and where the core supports them also
+        `numpy.float32` and `numpy.complex64`.
     """
 
     dtypes: ClassVar[tuple[np.dtype[Any], ...]] = (np.dtype(float), np.dtype(complex))
-    _output: Any = None  # the type of the results where it is another one
+    _output: Any = None  # the type of the results, if it differs from that of the samples
 
     def __init__(self, channels: int | None = None, axis: int = -1, dtype: DTypeLike = float) -> None:
         self.channels, self.axis, self.dtype = channels, axis, np.dtype(dtype)
         if self.dtype not in self.dtypes:
             known = ", ".join(str(one) for one in self.dtypes)
-            raise ValueError(f"{type(self).__name__}: dtype: {self.dtype} is none of {known}")
+            raise ValueError(f"{type(self).__name__}: dtype: {self.dtype} is not one of {known}")
         if channels is not None and channels < 1:
-            raise ValueError(f"{type(self).__name__}: channels: must be at least 1; {channels} came")
+            raise ValueError(f"{type(self).__name__}: channels: must be at least 1; got {channels}")
         if axis not in (-2, -1, 0, 1):
-            raise ValueError(f"{type(self).__name__}: axis: {axis} is none of a block")
-        self._last = axis in (-1, 1)  # the samples are along the last axis
+            raise ValueError(f"{type(self).__name__}: axis: {axis} is out of bounds for a block")
+        self._last = axis in (-1, 1)  # whether the samples are along the last axis
         self.reset()
 
     def _start(self) -> Any:
@@ -60,11 +61,11 @@ class Stream:
         return np.empty(0, self._output or self.dtype)
 
     def reset(self) -> None:
-        """Forgets all blocks so far."""
+        """Discards all blocks so far."""
         self._states = [self._start() for _ in range(self.channels or 1)]
 
     def copy(self) -> Self:
-        """A stream that has seen the same blocks and goes on by itself."""
+        """An independent stream in the same state."""
         other = copy.copy(self)
         other._states = list(self._states)  # no state is changed in place
         return other
@@ -80,7 +81,7 @@ class Stream:
         return self._through(self._checked(block, 2))
 
     def finish(self) -> Any:
-        """What is still to come when the signal has ended; begins anew."""
+        """Returns the output that is pending at the end of the signal. The stream starts afresh."""
         found = [self._end(state) for state in self._states]
         self.reset()
         return found[0] if self.channels is None else self._joined(found)
@@ -89,13 +90,13 @@ class Stream:
         array = as_array(block)
         if array.ndim != dimensions:
             raise ValueError(f"{type(self).__name__}: blocks of {dimensions} dimension"
-                             f"{'s'[:dimensions - 1]} are needed; {array.ndim} came")
+                             f"{'s'[:dimensions - 1]} are needed; got {array.ndim}")
         if array.dtype != self.dtype and not np.can_cast(array.dtype, self.dtype, "same_kind"):
-            raise TypeError(f"{type(self).__name__}: samples of {self.dtype} are needed; {array.dtype} "
-                            "came: name the dtype when the stream is made")
+            raise TypeError(f"{type(self).__name__}: samples of {self.dtype} are needed; got {array.dtype}; "
+                            "pass the dtype when creating the stream")
         if dimensions == 2 and array.shape[int(not self._last)] != self.channels:
             raise ValueError(f"{type(self).__name__}: blocks of {self.channels} channels are needed; "
-                             f"{array.shape[int(not self._last)]} came")
+                             f"got {array.shape[int(not self._last)]}")
         return array.astype(self.dtype, copy=False)
 
     def _through(self, block: NDArray[Any]) -> Any:

@@ -1,4 +1,4 @@
-"""Words for choices, and refusals in the words of the caller."""
+"""Words for choices, and errors in terms that the caller knows."""
 
 from __future__ import annotations
 
@@ -12,7 +12,7 @@ from ..library import library
 from ..outcomes import kind_of
 
 
-MOST = 1 << 64  # no count, order or seed is above
+MOST = 1 << 64  # larger counts, orders and seeds are refused
 
 
 def refuse(function: str, argument: str, rule: str, name: str = "ErrInvalidSelector") -> NoReturn:
@@ -22,7 +22,7 @@ def refuse(function: str, argument: str, rule: str, name: str = "ErrInvalidSelec
 
 
 def chosen(function: str, argument: str, value: Any, words: Mapping[Any, Any]) -> Any:
-    """What the dictionary has for a word; others are refused with a list of the words."""
+    """The dictionary's value for a word; unknown words are refused with a list of the known ones."""
     try:
         return words[value]
     except (KeyError, TypeError):
@@ -30,7 +30,7 @@ def chosen(function: str, argument: str, value: Any, words: Mapping[Any, Any]) -
     near = difflib.get_close_matches(value.lower(), [word for word in words if isinstance(word, str)], 1) \
         if isinstance(value, str) else []
     known = ", ".join(repr(word) for word in words)
-    refuse(function, argument, f"{value!r} is none of {known}" + "".join(
+    refuse(function, argument, f"{value!r} is not one of {known}" + "".join(
         f"; did you mean {word!r}?" for word in near))
 
 
@@ -39,16 +39,16 @@ def positive(function: str, argument: str, value: Any, name: str = "ErrNotStrict
     try:
         number = float(value)
     except (TypeError, ValueError):
-        raise TypeError(f"qx.{function}: {argument}: a number is needed; {value!r} came") from None
+        raise TypeError(f"qx.{function}: {argument}: a number is needed; got {value!r}") from None
     if not 0 < number < math.inf:
-        refuse(function, argument, f"must be above 0 and finite; {value} came", name)
+        refuse(function, argument, f"must be above 0 and finite; got {value}", name)
     return number
 
 
 def procedure(function: str, argument: str, value: Any) -> None:
-    """Refuses what cannot be called."""
+    """Refuses a value that is not callable."""
     if not callable(value):
-        raise TypeError(f"qx.{function}: {argument}: a function is needed; {value!r} came")
+        raise TypeError(f"qx.{function}: {argument}: a function is needed; got {value!r}")
 
 
 def whole_number(function: str, argument: str, value: Any, least: int | None = None,
@@ -58,10 +58,10 @@ def whole_number(function: str, argument: str, value: Any, least: int | None = N
         number = operator.index(value)
     except TypeError:
         if not (isinstance(value, float) and value.is_integer()):
-            raise TypeError(f"qx.{function}: {argument}: a whole number is needed; {value!r} came") from None
+            raise TypeError(f"qx.{function}: {argument}: a whole number is needed; got {value!r}") from None
         number = int(value)
     if abs(number) > MOST:
         refuse(function, argument, f"{value} is too large", name)
     if least is not None and number < least:
-        refuse(function, argument, f"must be at least {least}; {number} came", name)
+        refuse(function, argument, f"must be at least {least}; got {number}", name)
     return number

@@ -33,7 +33,7 @@ ErrorCode IntegralBySimpson(InOut<DBL1D> x, const double *initial, const double 
     return 0;
 }
 
-// What a formula needs beyond the data, and how the lack of it is told.
+// Checks the values that a formula needs beyond the data.
 ErrorCode CheckIntegralEnds(int32_t rule, int32_t initial, int32_t final) {
     switch (rule) {
     case Trapezoid:
@@ -71,7 +71,7 @@ ErrorCode IntegralFromZero(InOut<DBL1D> x, double dt, int32_t rule) {
     return RunningIntegral2017(x.view(), dt, rule, x.view());
 }
 
-// kept: the checks run in the reverse order of the integral's, and a step that is NaN fails here.
+// kept: the checks are in the reverse order of those of the integral, and a step that is NaN fails.
 ErrorCode CentralDerivative(InOut<DBL1D> x, const double *initial, const double *final, double dt) {
     if (const ErrorCode bad =
             LastFailed({{x.isEmpty(), ErrEmptyInput}, {!(dt > 0.0), ErrSamplingNotPositive}}))

@@ -9,8 +9,8 @@ namespace {
 
 constexpr auto DBL = ElementType::DBL;
 
-// d0 by 5 by 6 elements. The first size stands where a block of records has its count, so the rest
-// is cut into d0 parts of equal length; their last bytes are spare.
+// d0 by 5 by 6 elements. The first size is where a block of records has its count, so the rest is
+// split into d0 parts of equal length; their last bytes are unused.
 DBL3D Volume(Call &c, int number, int32_t d0) {
     constexpr int32_t cols = 5;
     constexpr int32_t planes = 6;

@@ -58,7 +58,8 @@ void ExpectClose(double value, Long exact) {
                 1e-14 * (1 + std::fabs(static_cast<double>(exact))));
 }
 
-// Panels of an even number of intervals gain a degree. Remainders of a lower rule limit it.
+// Panels with an even number of intervals gain a degree. A remainder integrated by a lower rule
+// limits the degree.
 TEST(DefiniteIntegrals, AreExactToTheirDegreeAtEveryCount) {
     for (int32_t rule = 0; rule < 4; ++rule)
         for (int32_t n = rule + 2; n < 40; ++n) {
@@ -77,7 +78,7 @@ TEST(DefiniteIntegrals, AreExactToTheirDegreeAtEveryCount) {
             ExpectClose(Definite(Sampled(startOfOwnOrder, n), rule, true),
                         ItsIntegral(startOfOwnOrder, end));
             ExpectClose(Definite(Sampled(atEnd, n), rule, false, -dt), ItsIntegral(atEnd, end));
-            // Not of a higher degree: so no other rule stands behind the name.
+            // Not exact for a higher degree, so that no other rule is mistaken for this one.
             const Long beyond = ItsIntegral(atEnd + 1, end);
             EXPECT_GT(std::fabs(Definite(Sampled(atEnd + 1, n), rule, false) - beyond),
                       1e-9 * beyond);
@@ -89,7 +90,7 @@ TEST(DefiniteIntegrals, RectanglesAndSmallCases) {
     EXPECT_EQ(Definite({1, 2, 3}, 1, false, 1.0), 4.0);
     EXPECT_EQ(Definite({1, 2, 4, 8}, 4, true, 0.5), 3.5);
     EXPECT_EQ(Definite({1, 2, 4, 8}, 5, true, -0.5), 7.0);
-    // Five samples of rule 2: a 3/8 panel and a trapezoid behind it, or a formula before it.
+    // Five samples with rule 2: a 3/8 panel followed by a trapezoid, or preceded by an end formula.
     EXPECT_NEAR(Definite({1, 0, 0, 0, 0}, 2, false, 1.0), 3.0 / 8, 1e-16);
     EXPECT_NEAR(Definite({0, 0, 0, 0, 1}, 2, false, 1.0), 1.0 / 2, 1e-16);
     EXPECT_NEAR(Definite({1, 0, 0, 0, 0}, 2, true, 1.0), 9.0 / 24, 1e-16);
@@ -162,7 +163,7 @@ TEST(DefiniteIntegrals, ProductsOverTwoAndThreeDimensions) {
         EXPECT_EQ(integrate(x.handle(), dts.handle(), 1, &result), 0);
         EXPECT_NEAR(result, plane, 1e-14 * plane);
     }
-    // The last dimension counts the planes, each of rows times columns.
+    // The last dimension counts the planes, each of size rows by columns.
     Volume volume(rows, cols, planes, [&](int32_t i) {
         return x[i % (rows * cols)] * square(i / (rows * cols) * 2.0);
     });
@@ -170,7 +171,7 @@ TEST(DefiniteIntegrals, ProductsOverTwoAndThreeDimensions) {
         EXPECT_EQ(integrate(volume.handle(), dts.handle(), 1, &result), 0);
         EXPECT_NEAR(result, plane * integral(16.0), 1e-14 * plane * integral(16.0));
     }
-    // The revisions differ where samples are left over.
+    // The revisions differ if samples are left over.
     double elder = 0;
     NumerIntegration3D_head(volume.handle(), dts.handle(), 2, &elder);
     NumerIntegration3D_2017_head(volume.handle(), dts.handle(), 2, &result);
@@ -215,9 +216,9 @@ TEST(DefiniteIntegrals, CodesOfTwoAndThreeDimensions) {
 
 // Running integrals.
 
-// A panel around a sample is the exact mean over an interval for the polynomials of its degree: the
-// trapezoid's and the 3/8 rule's over the interval before it, the others' around it, in which the
-// weights stand for shorter panels; a constant is exact for all.
+// For polynomials of its degree, the panel around a sample gives the exact mean over an interval:
+// the interval before the sample for the trapezoid and the 3/8 rule, the interval around it for the
+// others, whose weights belong to shorter panels. All rules are exact for a constant.
 TEST(RunningIntegrals, OfAConstantGrowEvenly) {
     for (int32_t rule = 0; rule < 6; ++rule)
         for (const int32_t n : {1, 2, 3, 7}) {
@@ -229,7 +230,7 @@ TEST(RunningIntegrals, OfAConstantGrowEvenly) {
         }
 }
 
-// One sample of 1 among zeros shows the weights, and by which neighbour each is met.
+// One nonzero sample shows the weights, and the neighbour to which each weight applies.
 TEST(RunningIntegrals, TakeTheStatedNeighbours) {
     const Samples weights[] = {{0, 0.5, 0.5, 0, 0},
                                {0, 1.0 / 6, 4.0 / 6, 1.0 / 6, 0},
@@ -241,7 +242,7 @@ TEST(RunningIntegrals, TakeTheStatedNeighbours) {
             Samples all(n + 4, 0.0);
             all[static_cast<std::size_t>(at + 2)] = 3.0;
             DBLArray x(Samples(all.begin() + 2, all.begin() + 2 + n));
-            // With one value before the data that is x[-1].
+            // A single value before the data is x[-1].
             const DBLArray initial(rule < 2 ? Samples{all[1]} : Samples{all[0], all[1]});
             const DBLArray final{all[n + 2], all[n + 3]};
             EXPECT_EQ(Integral90(x.handle(), initial.handle(), final.handle(), 0.5, rule), 0);
@@ -376,7 +377,7 @@ TEST(Derivatives, HaveTheirOrder) {
     EXPECT_EQ(x[0], 6.0);
 }
 
-// The values that a rule needs on either side, and as many with others behind them.
+// The values that a rule needs on either side, and longer arrays that begin with these.
 TEST(RunningForms, TakeTheFirstOfLongerEnds) {
     struct Needs {
         int32_t initial, final;

@@ -12,7 +12,7 @@ namespace {
 // kept: these exports size their output as DBL and empty it as CDB.
 typedef Out<DBL1D, OnFailure::Empty, ElementType::CDB> RealOut;
 
-// Interleaved complex data as the two arrays, of stride 2, that the engine takes.
+// Passes interleaved complex data to the engine as two arrays of stride 2.
 ErrorCode ForwardInterleaved(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n) {
     return FFTComplexForward(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n);
 }

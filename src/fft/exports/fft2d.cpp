@@ -7,14 +7,14 @@
 namespace qx {
 namespace {
 
-// The plan of the rows' length stands first in a node's two slots.
+// The plan for the length of the rows is in the first of a node's two slots.
 template <class Keep>
 ErrorCode AcquirePlans(Keep &keep, int32_t rows, int32_t cols) {
     const ErrorCode failed = keep.acquire(cols);
     return failed ? failed : keep.acquireSecond(rows);
 }
 
-// The inner routine catches negative starts, after all else has been tried.
+// The inner routine reports negative starts, after all other checks.
 ErrorCode CheckRegion(const MatrixRegion &region) {
     return FirstFailed(
         {{region.matrixRows < 1 || region.matrixCols < 1, ErrEmptyInput},

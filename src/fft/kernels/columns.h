@@ -10,17 +10,17 @@ namespace qx::QX_WIDTH {
 
 using std::ptrdiff_t;
 
-// Columns of packed complex values that stand in one Wide.
+// The number of columns of packed complex values in one Wide.
 constexpr int packedColumns = nativeLanes / 2;
 
-// Loops of eight lanes run where the columns fill them; those of four do the others.
+// Loops of eight lanes run where the columns fill the lanes; the loops of four do the rest.
 constexpr bool isWide = nativeLanes == 8;
 
 // ---- Columns copied to the stack ----
 //
-// Where the values of a column are a multiple of half a page apart, all of them fall into the same
-// few sets of the cache, and what one column brings in is gone before its neighbour reads it. So
-// several neighbours are copied to the stack at once, by whole cache lines.
+// Where the values of a column are a multiple of half a page apart, all of them map to the same few
+// sets of the cache, and the lines that one column loads are evicted before its neighbour reads them.
+// Therefore several neighbours are copied to the stack together, by whole cache lines.
 
 constexpr bool legsCollide(ptrdiff_t leg, int p) {
     return p > 4 && leg * ptrdiff_t{sizeof(DBL)} % 2048 == 0;
@@ -52,7 +52,7 @@ struct ColumnOut {
     }
 };
 
-// Interleaved and side by side.
+// Interleaved and contiguous.
 struct SideBySideIn {
     const DBL *x;
     QX_INLINE One at(int j) const { return One::load(x + 2 * j); }
@@ -74,8 +74,8 @@ struct TwiddledColumnIn {
     }
 };
 
-// Results of a half-complex column: real parts upward from `up`, imaginary parts downward from the
-// last block behind `down`; past the middle of the spectrum they change places.
+// Results of a half-complex column: real parts go upward from `up`, imaginary parts downward from the
+// last block from `down` on; past the middle of the spectrum they change places.
 template <int P>
 struct HalfComplexColumnOut {
     DBL *up, *down;
@@ -202,8 +202,8 @@ struct RealBlocksOut { // transform by transform
 
 // ---- Pairs of mirrored columns of half-complex blocks ----
 //
-// Columns k upward and m - k downward, in place: the real parts of Y_j stand at up + j leg, its
-// imaginary parts at down + j leg. `down` is the lowest of its columns.
+// Columns k upward and m - k downward: the real parts of Y_j are at up + j leg, its imaginary parts at
+// down + j leg. `down` is the lowest of the mirrored columns.
 
 struct PairLanesIn {
     const DBL *up, *down;
@@ -221,13 +221,13 @@ struct PairLanesIn {
     }
 };
 
-template <int P>
+template <int P, class Leg = ptrdiff_t>
 struct PairLanesOut {
     DBL *up, *down;
-    ptrdiff_t leg;
+    Leg leg;
     QX_INLINE void set(int q, Wide re, Wide im) const {
-        DBL *const upward = up + q * leg;
-        DBL *const downward = down + (P - 1 - q) * leg;
+        DBL *const upward = up + q * ptrdiff_t{leg};
+        DBL *const downward = down + (P - 1 - q) * ptrdiff_t{leg};
         if (q < (P + 1) / 2) {
             re.store(upward);
             im.reversed().store(downward);

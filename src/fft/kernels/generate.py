@@ -1,8 +1,9 @@
 #!/usr/bin/python3
 """Writes the straight-line transforms of the radices: one file kernels_<p>.cpp per radix, one for
-each of a few small lengths that are transformed whole, and kernels_choice.cpp. Beside a complex
-transform stands the real one of twice its length that is made of it, and with the odd primes from 11
-a table for their single transforms (whole.h).
+each of a few small lengths that are transformed whole, and kernels_choice.cpp; for the loops of eight
+lanes, passes_<p>.cpp and passes_choice.cpp. The file of a complex transform also holds the real
+transform of twice its length that is built from it, and for odd primes from 11 on a table for single
+transforms (whole.h).
 
     generate.py FOLDER
 
@@ -45,8 +46,10 @@ RADICES = [2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 
 WHOLE = [6, 12, 15, 20, 24, 28, 30, 36, 40, 48]
 # Real transforms of these are complex ones of half the length; below 20 the direct ones are faster.
 BY_HALF = [n for n in range(20, 65, 2) if n // 2 in RADICES + WHOLE]
-# Radices with loops of eight lanes.
+# Radices with loops of eight lanes for complex data.
 WIDE = [4, 7, 8, 9, 10, 16, 32]
+# Those with stages of eight lanes for real data. Smaller ones fit the registers of four lanes.
+WIDE_REAL = [16, 32]
 # Composite length -> its factor r; coprime factors are recognised.
 SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 12: 3, 14: 2, 15: 3, 16: 4, 18: 2, 20: 4,
          24: 3, 28: 4, 30: 5, 32: 4, 36: 4, 40: 5, 48: 3}
@@ -200,7 +203,7 @@ class Transforms:
         return spectrum
 
     def coprime(self, x, r):
-        """Input m a + r b at frequency k has the phase a k / r + b k / m: no turning is left."""
+        """Input m a + r b at frequency k has the phase a k / r + b k / m, so no twiddles remain."""
         n = len(x)
         m = n // r
         rows = [self.transform([x[(m * a + r * b) % n] for b in range(m)]) for a in range(r)]
@@ -244,7 +247,7 @@ class Transforms:
 
 
 class Split(Transforms):
-    """Complex values are pairs (real, imaginary) of values; what is 0 costs nothing."""
+    """Complex values are pairs (real, imaginary) of values; a part that is 0 costs nothing."""
 
     zero = (0, 0)
 
@@ -340,7 +343,7 @@ EXPRESSIONS = {
 
 def text_of(name, p, transforms, outputs):
     """The statements that the outputs (store format, values) need, in the order in which the
-    algebra made them; a store stands behind the last of its values."""
+    algebra made them; a store follows the last of its values."""
     nodes = transforms.e.nodes
     stores = {}
     for form, values in outputs:
@@ -450,7 +453,7 @@ def side_by_side(part, n, body):
 
 
 def choice_file():
-    """What there is, for the choice at run time."""
+    """The kernels of each radix and length, for the choice at run time."""
     kernels = [f"    case {p}:\n        return KernelsFor<{p}>();" for p in sorted(RADICES)]
     complex_lengths = {*RADICES, *WHOLE}
     wholes = []
@@ -466,22 +469,33 @@ def choice_file():
 
 
 def passes_file_of(p):
-    return enclosed(f"The loops of {p} in eight lanes", [
+    texts = [
         packed_text(p),
-        f"template <>\nvoid TakeWidePasses<{p}>(LanesPasses &passes) {{\n"
+        f"template <>\nvoid TakeWideComplex<{p}>(LanesPasses &passes) {{\n"
         f"    passes.complexLeaf = ComplexLanesLeaf<{p}>;\n"
         f"    passes.complexTwiddle = ComplexLanesTwiddle<{p}>;\n"
-        "    passes.complexLanes = nativeLanes;\n}\n"], "kernel_set")
+        "    passes.complexLanes = nativeLanes;\n}\n"]
+    if p in WIDE_REAL:
+        texts += [split_text(p),
+                  f"template <>\nvoid TakeWideReal<{p}>(LanesPasses &passes) {{\n"
+                  f"    passes.realTwiddle = RealWideTwiddle<{p}>;\n"
+                  "    passes.realLanes = nativeLanes;\n}\n"]
+    return enclosed(f"The loops of {p} in eight lanes", texts, "kernel_set")
 
 
 def passes_choice_file():
-    """Stages whose columns fill no eight lanes stay with four."""
-    cases = [f"    case {p}:\n        TakeWidePasses<{p}>(passes);\n        break;" for p in WIDE]
+    """Stages whose columns do not fill eight lanes stay with four, as do short real ones."""
+    def choice(passes, radices, condition):
+        cases = [f"        case {p}:\n            TakeWide{passes}<{p}>(passes);\n            break;"
+                 for p in radices]
+        return "\n".join([f"    if ({condition}) {{\n        switch (radix) {{", *cases,
+                          "        default:\n            break;\n        }\n    }"])
     return enclosed("The choice of loops in eight lanes", [
         "LanesPasses PassesOf(int32_t radix, int32_t m) {",
         "    LanesPasses passes = avx2::PassesOf(radix, m);",
-        "    if (m % packedColumns != 0)\n        return passes;\n    switch (radix) {",
-        *cases, "    default:\n        break;\n    }\n    return passes;\n}\n"], "kernel_set")
+        choice("Complex", WIDE, "m % packedColumns == 0"),
+        choice("Real", WIDE_REAL, "fillsWideRealLanes(m) && m * radix >= 1024"),
+        "    return passes;\n}\n"], "kernel_set")
 
 
 def enclosed(title, texts, header="whole"):

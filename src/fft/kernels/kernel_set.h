@@ -4,14 +4,16 @@
 #include "fft/kernels/columns.h"
 #include "fft/kernels/kernels.h"
 
+#include <type_traits>
+
 // The loops around the straight-line transforms of one radix.
 
 namespace qx::QX_WIDTH {
 
-// ---- Large bodies stand alone ----
+// ---- Large bodies that all loops share ----
 //
-// The transforms of the larger primes are so long that one copy of each, between arrays, serves all
-// loops. Narrower data rides along in the first lanes, which takes no longer.
+// The transforms of the larger primes are so long that all loops share one copy of each, which works
+// between arrays. Narrower data uses the first lanes, which takes no longer.
 
 constexpr bool standsAlone(int radix) { return radix >= 17 && radix % 2; }
 
@@ -92,13 +94,13 @@ QX_INLINE void RunReal(const In &in, const Out &out) {
 
 // ---- Leaves ----
 
-// How many rows of a leaf are copied to the stack together, `leafBundle` neighbouring columns in all
-// of `width` DBL units each; 0 where they do not lie so.
-inline ptrdiff_t RowsTogether(const LeafColumns &columns, ptrdiff_t width) {
+// How many rows of a leaf are copied to the stack together, `bundle` neighbouring columns in all of
+// `width` DBL units each; 0 if the columns are not neighbours.
+inline ptrdiff_t RowsTogether(const LeafColumns &columns, ptrdiff_t bundle, ptrdiff_t width) {
     const ptrdiff_t count = columns.count[0];
-    if (columns.inStride[0] != width || leafBundle % count != 0)
+    if (columns.inStride[0] != width || bundle % count != 0)
         return 0;
-    const ptrdiff_t rows = leafBundle / count;
+    const ptrdiff_t rows = bundle / count;
     const bool follow = rows == 1 || columns.inStride[1] == count * width;
     return follow && columns.count[1] % rows == 0 ? rows : 0;
 }
@@ -137,12 +139,13 @@ __attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
 
 template <int P>
 void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
-    constexpr int width = 2 * leafBundle;
+    constexpr int width = 2 * complexBundle;
 #ifdef QX_HAS_EIGHT_LANES
     if (isWide && (columns.inStride[0] != 2 || columns.count[0] % packedColumns != 0))
-        return avx2::KernelsOf(P)->lanes.complexLeaf(in, out, columns);
+        return avx2::KernelsFor<P>()->lanes.complexLeaf(in, out, columns);
 #endif
-    const ptrdiff_t together = legsCollide(columns.legStride, P) ? RowsTogether(columns, 2) : 0;
+    const ptrdiff_t together =
+        legsCollide(columns.legStride, P) ? RowsTogether(columns, complexBundle, 2) : 0;
     if (together == 0) {
         ComplexLeafRows<P>(in, out, columns);
         return;
@@ -183,7 +186,7 @@ private:
     ptrdiff_t b_ = 0;
 };
 
-// Columns in any place; lanes behind the last one repeat it.
+// Columns in any place; lanes after the last column repeat it.
 template <int P>
 __attribute__((noinline)) void RealLeafWalk(const DBL *in, DBL *out, const LeafColumns &columns) {
     for (ColumnWalk walk(columns); !walk.atEnd();) {
@@ -224,26 +227,63 @@ __attribute__((noinline)) void RealLeafRows(const DBL *in, DBL *out, const LeafC
     }
 }
 
+// Columns whose inputs follow one another across the rows of the rectangle (LieInOrder).
 template <int P>
-void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
-    if (columns.inStride[0] != 1 || columns.count[0] < nativeLanes) {
-        RealLeafWalk<P>(in, out, columns);
-        return;
+__attribute__((noinline)) void RealLeafInOrder(const DBL *in, DBL *out,
+                                               const LeafColumns &columns) {
+    ColumnWalk walk(columns);
+    const ptrdiff_t count = columns.count[0] * columns.count[1];
+    for (ptrdiff_t i = 0; i < count; i += nativeLanes) {
+        RealBlocksOut h;
+        ptrdiff_t inAt, outAt;
+        for (int lane = 0; lane < nativeLanes; ++lane) {
+            walk.take(&inAt, &outAt);
+            h.h[lane] = out + outAt;
+        }
+        RunReal<P, Wide>(RealLanesIn{in + i, columns.legStride}, h);
     }
-    const ptrdiff_t together = legsCollide(columns.legStride, P) ? RowsTogether(columns, 1) : 0;
-    if (together == 0) {
-        RealLeafRows<P>(in, out, columns);
-        return;
-    }
-    double rows[P * leafBundle];
+}
+
+// Whether all columns are neighbours, and fill the lanes.
+inline bool LieInOrder(const LeafColumns &columns) {
+    return columns.inStride[0] == 1 && columns.inStride[1] == columns.count[0] &&
+           columns.count[0] * columns.count[1] % nativeLanes == 0;
+}
+
+// Copies the columns to the stack, `Bundle` at a time, and transforms them there. Returns false, and
+// does nothing, if the columns are not neighbours.
+template <int P, int Bundle>
+bool RealLeafOnStack(const DBL *in, DBL *out, const LeafColumns &columns) {
+    const ptrdiff_t together = RowsTogether(columns, Bundle, 1);
+    if (together == 0)
+        return false;
+    double rows[P * Bundle];
     const LeafColumns onStack = {{columns.count[0], together},
                                  {1, columns.count[0]},
                                  {columns.outStride[0], columns.outStride[1]},
-                                 leafBundle};
+                                 Bundle};
     for (ptrdiff_t b = 0; b < columns.count[1]; b += together) {
-        CopyRows<leafBundle>(in + b * columns.inStride[1], columns.legStride, rows, leafBundle, P);
-        RealLeafRows<P>(rows, out + b * columns.outStride[1], onStack);
+        CopyRows<Bundle>(in + b * columns.inStride[1], columns.legStride, rows, Bundle, P);
+        DBL *const results = out + b * columns.outStride[1];
+        if (columns.count[0] % nativeLanes == 0)
+            RealLeafRows<P>(rows, results, onStack);
+        else
+            RealLeafInOrder<P>(rows, results, onStack);
     }
+    return true;
+}
+
+template <int P>
+void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
+    if (legsCollide(columns.legStride, P) && (RealLeafOnStack<P, realBundle>(in, out, columns) ||
+                                              RealLeafOnStack<P, realBundle / 2>(in, out, columns)))
+        return;
+    if (columns.count[0] % nativeLanes != 0 && LieInOrder(columns))
+        RealLeafInOrder<P>(in, out, columns);
+    else if (columns.inStride[0] != 1 || columns.count[0] < nativeLanes)
+        RealLeafWalk<P>(in, out, columns);
+    else
+        RealLeafRows<P>(in, out, columns);
 }
 
 template <int P>
@@ -299,7 +339,7 @@ void ComplexTwiddleKernel(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *tw
     }
 }
 
-// `count` neighbouring columns, as many as fill the lanes.
+// `count` neighbouring columns, a multiple of those that fill the lanes.
 template <int P>
 __attribute__((noinline)) void ComplexTwiddleColumns(const DBL *in, ptrdiff_t inLeg, DBL *out,
                                                      ptrdiff_t outLeg, ptrdiff_t count,
@@ -343,8 +383,8 @@ void ComplexLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStag
     }
 }
 
-// Where a stage of the real path finds its blocks and where its results go, each at a leg of its
-// own.
+// Where a stage of the real path reads its blocks and where it writes its results, each with its own
+// leg.
 struct RealBlocks {
     const DBL *in;
     ptrdiff_t inLeg;
@@ -374,7 +414,7 @@ __attribute__((noinline)) void RealPairColumns(const TwiddledColumnIn &in,
     RunPacked<P, One>(in, out);
 }
 
-// The pairs of columns from k to the last.
+// The pairs of columns from k to the last one.
 template <int P>
 void RealPairs(const RealBlocks &blocks, const DBL *twiddleCos, const DBL *twiddleSin,
                ptrdiff_t stride, ptrdiff_t m, ptrdiff_t k) {
@@ -397,7 +437,7 @@ void RealTwiddleKernel(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, 
     RealPairs<P>(inPlace, twiddleCos, twiddleSin, stride, m, 1);
 }
 
-// `count` neighbouring pairs of columns, as many as fill the lanes, in place; `down` is behind the
+// `count` neighbouring pairs of columns, a multiple of the lanes, in place; `down` is one past the
 // highest of the mirrored columns.
 template <int P>
 __attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, ptrdiff_t count,
@@ -411,23 +451,64 @@ __attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, 
     }
 }
 
-// The pairs from k on, as many as make up blocks of `Copied`, by way of the stack. Returns the
-// next.
+// The same for `Columns` pairs, with the results in `rows`, which has 2 Columns values in each row: those
+// of the upward columns in the first half, those of the mirrored ones in the second. `up` and `down` may
+// point into `rows` at these places.
+template <int P, int Columns>
+__attribute__((noinline)) void RealPairLanesToRows(const DBL *up, const DBL *down, ptrdiff_t leg,
+                                                   DBL *rows, const DBL *lanes) {
+    typedef std::integral_constant<int, 2 * Columns> Width;
+    DBL *upward = rows;
+    DBL *downward = rows + 2 * Columns;
+    for (int k = 0; k < Columns; k += nativeLanes) {
+        down -= nativeLanes;
+        downward -= nativeLanes;
+        SplitTransform<P>::template run<Wide>(PairLanesIn{up, down, leg, lanes},
+                                              PairLanesOut<P, Width>{upward, downward, {}});
+        up += nativeLanes;
+        upward += nativeLanes;
+        lanes += 2 * nativeLanes * (P - 1);
+    }
+}
+
+// Passes the pairs from k to `last`, as many as fill blocks of `Copied`, through the stack. Returns the
+// next k.
 template <int P, int Copied>
 ptrdiff_t RealPairsOnStack(const RealBlocks &blocks, const FFTStage &stage, ptrdiff_t m,
-                           ptrdiff_t k) {
+                           ptrdiff_t k, ptrdiff_t last) {
     constexpr int width = 2 * Copied;
     double rows[P * width];
-    for (; k + Copied - 1 <= (m - 1) / 2; k += Copied) {
+    for (; k + Copied - 1 <= last; k += Copied) {
         const ptrdiff_t down = m - k - (Copied - 1);
-        CopyRows<Copied>(blocks.in + k, blocks.inLeg, rows, width, P);
-        CopyRows<Copied>(blocks.in + down, blocks.inLeg, rows + Copied, width, P);
-        RealPairLanes<P>(rows, rows + width, width, Copied,
-                         stage.realLanes + 2 * (k - 1) * (P - 1));
+        const DBL *const lanes = stage.realLanes + 2 * (k - 1) * (P - 1);
+        if (legsCollide(blocks.inLeg, P)) {
+            CopyRows<Copied>(blocks.in + k, blocks.inLeg, rows, width, P);
+            CopyRows<Copied>(blocks.in + down, blocks.inLeg, rows + Copied, width, P);
+            RealPairLanesToRows<P, Copied>(rows, rows + width, width, rows, lanes);
+        } else {
+            RealPairLanesToRows<P, Copied>(blocks.in + k, blocks.in + down + Copied, blocks.inLeg,
+                                           rows, lanes);
+        }
         CopyRows<Copied>(rows, width, blocks.out + k, blocks.outLeg, P);
         CopyRows<Copied>(rows + Copied, width, blocks.out + down, blocks.outLeg, P);
     }
     return k;
+}
+
+// Transforms the pairs up to `last`, as many as fill the lanes. Returns the next k.
+template <int P>
+ptrdiff_t RealPairsInLanes(const RealBlocks &blocks, const FFTStage &stage, ptrdiff_t m,
+                           ptrdiff_t last) {
+    ptrdiff_t k = 1;
+    if (legsCollide(m, P))
+        k = RealPairsOnStack < P, isWide ? 16 : 8 > (blocks, stage, m, k, last);
+    if (blocks.in != blocks.out)
+        return RealPairsOnStack<P, nativeLanes>(blocks, stage, m, k, last);
+    const ptrdiff_t left = last - (k - 1);
+    const ptrdiff_t whole = left - left % nativeLanes;
+    RealPairLanes<P>(blocks.out + k, blocks.out + m - k + 1, m, whole,
+                     stage.realLanes + 2 * (k - 1) * (P - 1));
+    return k + whole;
 }
 
 template <int P>
@@ -436,20 +517,31 @@ void RealLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStage &
     const RealBlocks blocks{in, inLeg, out, m};
     RealEdgeColumns<P>(blocks, 1, m);
     ptrdiff_t k = 1;
-    if constexpr (!standsAlone(P)) {
-        if (legsCollide(m, P))
-            k = RealPairsOnStack<P, 8>(blocks, stage, m, k);
-        if (in != out) {
-            k = RealPairsOnStack<P, nativeLanes>(blocks, stage, m, k);
-        } else {
-            const ptrdiff_t left = (m - 1) / 2 - (k - 1);
-            const ptrdiff_t whole = left - left % nativeLanes;
-            RealPairLanes<P>(out + k, out + m - k + 1, m, whole,
-                             stage.realLanes + 2 * (k - 1) * (P - 1));
-            k += whole;
-        }
-    }
+    if constexpr (!standsAlone(P))
+        k = RealPairsInLanes<P>(blocks, stage, m, (m - 1) / 2);
     RealPairs<P>(blocks, stage.twiddleCos, stage.twiddleSin, 1, m, k);
+}
+
+// In eight lanes, where the pairs together with the middle column fill them (fillsWideRealLanes). The
+// middle column passes through as one more pair; its own results, computed with the edge columns, are
+// saved before and restored after.
+template <int P>
+void RealWideTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStage &stage, ptrdiff_t m) {
+    const RealBlocks blocks{in, inLeg, out, m};
+    stage.passes.realEdges(in, inLeg, out, m);
+    double middle[P];
+    for (int q = 0; q < P; ++q)
+        middle[q] = out[q * m + m / 2];
+    RealPairsInLanes<P>(blocks, stage, m, m / 2);
+    for (int q = 0; q < P; ++q)
+        out[q * m + m / 2] = middle[q];
+}
+constexpr bool fillsWideRealLanes(ptrdiff_t m) { return m % 16 == 0; }
+
+// The edge columns as a function of their own, for the stages in eight lanes.
+template <int P>
+void RealLanesEdges(const DBL *in, ptrdiff_t inLeg, DBL *out, ptrdiff_t m) {
+    RealEdgeColumns<P>({in, inLeg, out, m}, 1, m);
 }
 
 template <int P>
@@ -459,7 +551,7 @@ constexpr KernelSet MakeKernels() {
             ComplexLeafKernel<P>,
             ComplexTwiddleKernel<P>,
             {ComplexLanesLeaf<P>, RealLanesLeaf<P>, ComplexLanesTwiddle<P>, RealLanesTwiddle<P>,
-             nativeLanes, nativeLanes}};
+             RealLanesEdges<P>, nativeLanes, nativeLanes}};
 }
 
 } // namespace qx::QX_WIDTH

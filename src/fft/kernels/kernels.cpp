@@ -8,8 +8,13 @@ int64_t ComplexLanesSize(const LanesPasses &passes, int32_t p, int32_t m) {
     return int64_t{m / (passes.complexLanes / 2)} * passes.complexLanes * (p - 1);
 }
 
+// The last column that runs in lanes: in eight lanes the middle one too (RealWideTwiddle).
+static ptrdiff_t LastInLanes(const LanesPasses &passes, ptrdiff_t m) {
+    return passes.realLanes == 8 ? m / 2 : (m - 1) / 2;
+}
+
 int64_t RealLanesSize(const LanesPasses &passes, int32_t p, int32_t m) {
-    return int64_t{(m - 1) / 2 / passes.realLanes} * passes.realLanes * 2 * (p - 1);
+    return int64_t{LastInLanes(passes, m) / passes.realLanes} * passes.realLanes * 2 * (p - 1);
 }
 
 void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table) {
@@ -33,7 +38,8 @@ void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table) {
 void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table) {
     const int lanes = stage.passes.realLanes;
     const ptrdiff_t pitch = p - 1;
-    for (ptrdiff_t block = 1; block + lanes - 1 <= (m - 1) / 2; block += lanes) {
+    const ptrdiff_t last = LastInLanes(stage.passes, m);
+    for (ptrdiff_t block = 1; block + lanes - 1 <= last; block += lanes) {
         for (int lane = 0; lane < lanes; ++lane) {
             const ptrdiff_t entry = (block + lane - 1) * pitch;
             for (ptrdiff_t j = 0; j < pitch; ++j) {

@@ -6,7 +6,7 @@
 #include <cstddef>
 #include <cstdint>
 
-// The straight-line transforms are written once and become part of every loop that uses them.
+// The straight-line transforms are written once and inlined into every loop that uses them.
 
 namespace qx::QX_WIDTH {
 
@@ -20,11 +20,11 @@ struct Complex {
 // `in.at(j)` gives value j, and `out.set(k, ...)` takes result k. Every value is read before any
 // result is given, so the two may be the same memory.
 
-// p complex values to p complex values, in a V real part beside imaginary part: set(k, value). A
-// Lanes<2> holds one column, a Lanes<4> two.
+// p complex values to p complex values, with real and imaginary parts interleaved in a V:
+// set(k, value). A Lanes<2> holds one column, a Lanes<4> two.
 template <int P>
 struct PackedTransform;
-// The same with the parts in a V each: at(j) is a Complex<V>, set(k, re, im).
+// The same with each part in a V of its own: at(j) is a Complex<V>, set(k, re, im).
 template <int P>
 struct SplitTransform;
 // p real values to the half-complex spectrum: setPair(k, h[k], h[k + 1]) for even k, and for odd p
@@ -56,7 +56,7 @@ QX_INLINE Lanes<N> Turned(Lanes<N> x, double c, double s) {
 // x times the packed w.
 template <int N>
 QX_INLINE Lanes<N> Twiddled(Lanes<N> x, Lanes<N> w) {
-    // Eight lanes have no instruction that adds and subtracts by turns.
+    // Eight lanes have no instruction that alternately adds and subtracts.
     if constexpr (N == 8)
         return x * FirstsTwice(w) + Swapped(x) * NegatedInPairs(SecondsTwice(w), true);
     else

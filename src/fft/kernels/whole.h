@@ -3,15 +3,15 @@
 
 #include "fft/kernels/kernel_set.h"
 
-// Single transforms, side by side.
+// Single transforms of contiguous values.
 
 namespace qx::QX_WIDTH {
 
 // ---- Primes ----
 //
-// One transform of an odd prime leaves no columns for the lanes, so they run over the frequencies.
-// The arithmetic is that of the straight-line transform: mirrored values are summed and subtracted,
-// and X[k] and X[P-k] are made of the same two sums over them, in ascending order.
+// A single transform has no columns to fill the lanes, so for odd primes the lanes hold frequencies.
+// The arithmetic is that of the straight-line transform: mirrored values are added and subtracted,
+// and X[k] and X[P-k] are formed from the same two sums over them, in ascending order.
 
 constexpr bool runsOverFrequencies(int p) { return p >= 11 && p % 2 != 0 && p != 15; }
 
@@ -22,14 +22,14 @@ struct PrimeTurns;
 
 template <int P>
 constexpr int primeRow = 2 * ((P / 2 + 1) / 2 * 2);
-// The registers that hold all frequencies, and how many accumulate at a time.
+// The number of registers that hold all frequencies, and how many of them accumulate at a time.
 template <int P>
 constexpr int primeWides = (P / 2 + packedColumns - 1) / packedColumns;
 template <int P, int Most>
 constexpr int primeBlock = (primeWides<P> + (primeWides<P> + Most - 1) / Most - 1) /
                            ((primeWides<P> + Most - 1) / Most);
 
-// The frequencies of the registers First to First + Count - 1, out of `start` and the pairs (sum,
+// The frequencies in the registers First to First + Count - 1, from `start` and the pairs (sum,
 // difference) of mirrored values.
 template <int P, int First, int Count>
 QX_INLINE void RealPrimeBlock(One start, const One *mirrored, DBL *h) {
@@ -75,7 +75,7 @@ QX_INLINE void RealPrime(const DBL *x, DBL *h) {
         RealPrimeBlock<P, primeWides<P> - rest, rest>(start, mirrored, h);
 }
 
-// The same of complex values: sums and i times the differences apart.
+// The same for complex values: sums and i times the differences are accumulated separately.
 template <int P, int First, int Count>
 QX_INLINE void ComplexPrimeBlock(One start, const One *sums, const One *differences, DBL *y) {
     Wide even[Count], odd[Count];
@@ -158,8 +158,8 @@ QX_INLINE void WholeRealTransform(const DBL *in, DBL *out) {
 // A real transform of P = 2 m values as a complex one of m: the values of even index are its real
 // parts, those of odd index its imaginary ones. With Z its spectrum, those of the even and of the
 // odd values are E = (Z[k] + conj Z[m-k]) / 2 and O = -i (Z[k] - conj Z[m-k]) / 2, and X[k] =
-// E + w O, X[m-k] = conj (E - w O) with w = exp(-2 pi i k / P). `turns` are cosine and sine,
-// halved, of the angles 2 pi k / P for k from 1 to (m - 1) / 2.
+// E + w O, X[m-k] = conj (E - w O) with w = exp(-2 pi i k / P). `turns` are the halved cosines
+// and sines of the angles 2 pi k / P for k from 1 to (m - 1) / 2.
 template <int P>
 QX_INLINE void RealByHalf(const DBL *in, DBL *h, const double *turns) {
     constexpr int m = P / 2;

@@ -47,8 +47,8 @@ DBLMatrix &Fill(DBLMatrix &matrix, uint64_t seed = 1) {
     return matrix;
 }
 
-// The region of `matrix` from (rowStart, colStart) on, padded with zeros, transformed by the
-// definition and put in order.
+// The region of `matrix` that begins at (rowStart, colStart), zero-padded, transformed by the
+// definition and reordered.
 template <class Matrix>
 LongSpectrum Expected(const Matrix &matrix, Shape start, Shape size, int32_t shift) {
     LongSpectrum region(std::size_t(size.rows) * size.cols);
@@ -108,8 +108,8 @@ TEST(TwoDimensional, ForwardTakesARegionPadsAndShifts) {
             }
 }
 
-// Columns of several factors are read where they are, or copied first: both as the transform of one column
-// alone.
+// Columns whose length has several factors are read in place or copied first. Both ways give the
+// bits of the transform of a single column.
 TEST(TwoDimensional, ColumnsHaveTheBitsOfOneAlone) {
     for (const Shape size : {Shape{64, 64}, {60, 17}, {77, 9}, {106, 5}, {1024, 8}, {300, 240}}) {
         SCOPED_TRACE(testing::Message() << size.rows << "x" << size.cols);
@@ -201,7 +201,7 @@ TEST(TwoDimensional, ChecksComeInOrder) {
     EXPECT_EQ(run(matrix, {least, 0}, {2, 3}), ErrIndexOutOfRange);
     EXPECT_EQ(run(matrix, {0, -1}, {2, 3}), ErrIndexOutOfRange);
     EXPECT_EQ(static_cast<const qx::PlanCell *>(node.slot)->plan->length, 3)
-        << "a negative start is found last of all, with the plans in their slots";
+        << "a negative start is checked last, when the plans are already in their slots";
     EXPECT_EQ(static_cast<const qx::PlanCell *>(node.second)->plan->length, 2);
 
     // One slot holds one plan, which is enough for a square.
@@ -227,7 +227,7 @@ TEST(TwoDimensional, ChecksComeInOrder) {
     EXPECT_EQ(realOut.rows(), 0);
 }
 
-TEST(TwoDimensional, AHostThatRefusesIsQuotedWithThePlansKept) {
+TEST(TwoDimensional, ARefusalReturnsTheHostsStatusAndKeepsThePlans) {
     CDBMatrix complex(2, 3), out;
     DBLMatrix real(2, 3), realOut;
     Fill(complex);
@@ -257,8 +257,8 @@ TEST(TwoDimensional, AHostThatRefusesIsQuotedWithThePlansKept) {
     }
 }
 
-// In a workspace that has no room, an inverse transform is whole, where its columns are plain sums,
-// or it fails; before, it told success with columns that were never written.
+// If the workspace is too small, an inverse transform either completes (if its columns are plain
+// sums) or fails; it once reported success with columns that were never written.
 TEST(TwoDimensional, InversesAreWholeOrFailWithoutWorkspace) {
     WorkspaceStatus status = {};
     ASSERT_EQ(0, InitializeAnalysisWorkspaceH(64, &status));
@@ -315,7 +315,7 @@ TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {
     EXPECT_EQ(
         ReFFT2D_H(real.handle(), 0, 0, 46341, 46341, 0, out.handle(), &fresh.slot, &fresh.second),
         ErrOutOfMemory);
-    EXPECT_EQ(probe.allocations(), 0) << "plans of lengths that no output can have";
+    EXPECT_EQ(probe.allocations(), 0) << "no plans are made for lengths that no output can have";
 }
 
 } // namespace

@@ -37,7 +37,7 @@ using qx::test::ToLong;
 
 constexpr double Rounding = 2e-15;
 
-// The `size` values from `offset` on, zeros where there are none, transformed and put in order.
+// The `size` values from `offset` on, zero-padded, transformed and reordered.
 template <class Values>
 LongSpectrum Expected(const Values &values, int64_t offset, int32_t size, int32_t shift) {
     LongSpectrum window(size);
@@ -190,7 +190,8 @@ TEST(OneDimensional, HalfComplexFormAndItsInverse) {
 
         ASSERT_EQ(InvReOXFFTHCH(out.handle(), back.handle(), &node.slot), 0);
         EXPECT_LT(MaxError(back.values(), ToLong(x)), Rounding);
-        EXPECT_LT(MaxError(out.values(), hartley), Rounding) << "the input is left in this form";
+        EXPECT_LT(MaxError(out.values(), hartley), Rounding)
+            << "the input is overwritten with this form";
         ASSERT_EQ(InvReOXFFTHCH_IDP(twin.handle(), backTwin.handle(), &node.instance), 0);
         EXPECT_TRUE(SameBits(back.values(), backTwin.values()));
         EXPECT_TRUE(SameBits(out.values(), twin.values()));
@@ -223,7 +224,7 @@ TEST(OneDimensional, ChecksComeInOrderAndEmptyTheOutput) {
     expect(ErrFFTSizeNotPositive,
            CxOXFFTH80(threeComplex.handle(), second.handle(), &node.slot, 9, 0, 0), second);
     EXPECT_EQ(node.slot, nullptr);
-    EXPECT_EQ(node.instance, nullptr) << "nothing is kept before the checks have passed";
+    EXPECT_EQ(node.instance, nullptr) << "nothing is stored before the checks have passed";
 
     DBLArray realOut(2);
     EXPECT_EQ(ReOXFFTHCH(none.handle(), realOut.handle(), &node.slot), ErrEmptyInput);
@@ -234,9 +235,9 @@ TEST(OneDimensional, ChecksComeInOrderAndEmptyTheOutput) {
     EXPECT_EQ(CxOXFFTH(noneComplex.handle(), out.handle(), &node.slot), ErrEmptyInput);
 }
 
-// Every export with the reshape that it asks for, the code under which it empties, and whether
-// its plan is there before the reshape.
-TEST(OneDimensional, AHostThatRefusesIsQuotedAndOrderShows) {
+// Every export with the resize that it requests, the code with which it empties the output, and
+// whether it acquires its plan before the resize.
+TEST(OneDimensional, ARefusalReturnsTheHostsStatusAndShowsTheOrder) {
     const DBLArray real(RandomSignal(6));
     const CDBArray complex(RandomComplex(6));
     struct Case {
@@ -299,7 +300,7 @@ TEST(OneDimensional, ASlotKeepsItsPlanUntilTheLengthChanges) {
     EXPECT_EQ(RegisteredSweeps(), before + 1);
     ASSERT_EQ(InvCxOXFFTH(in.handle(), out.handle(), &slot), 0);
     EXPECT_EQ(CellOf(slot)->plan, plan);
-    EXPECT_EQ(plan->refCount, 1) << "a plan of the right length is not acquired again";
+    EXPECT_EQ(plan->refCount, 1) << "a plan of the right length is not reacquired";
 
     ASSERT_EQ(CxOXFFTH80(in.handle(), out.handle(), &slot, 0, 10, 0), 0);
     EXPECT_EQ(slot, cell);
@@ -326,19 +327,20 @@ TEST(OneDimensional, InstanceDataIsSharedReleasedAndNeverSwept) {
     EXPECT_EQ(TransformUnreserveProc(&first), 0);
     EXPECT_EQ(first, nullptr);
     EXPECT_EQ(plan->refCount, 1);
-    EXPECT_EQ(TransformUnreserveProc(&first), 0) << "a word of null";
-    EXPECT_EQ(TransformUnreserveProc(nullptr), 0) << "and no word";
+    EXPECT_EQ(TransformUnreserveProc(&first), 0) << "a null word";
+    EXPECT_EQ(TransformUnreserveProc(nullptr), 0) << "no word at all";
     PlanSlot slot = nullptr;
     ASSERT_EQ(CxOXFFTH(in.handle(), out.handle(), &slot), 0);
     InstanceWord wrong = slot;
-    EXPECT_EQ(TransformUnreserveProc(&wrong), ErrInternal) << "no instance, but a slot's plan";
+    EXPECT_EQ(TransformUnreserveProc(&wrong), ErrInternal)
+        << "the plan of a slot, not of an instance";
     EXPECT_EQ(wrong, slot);
     RunSweeps();
     EXPECT_EQ(TransformUnreserveProc(&second), 0);
 }
 
-// What a node does call after call, in real time too: with its plan held and the workspace serving,
-// no export turns to the heap, whatever its length, window and order.
+// Repeated calls of a node, as in real-time use: while its plan is held and the workspace is
+// enabled, no export uses the heap, for any length, window and order.
 TEST(OneDimensional, AHeldPlanNeedsNoHeap) {
     if (!HeapProbe::works())
         GTEST_SKIP();

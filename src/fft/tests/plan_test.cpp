@@ -95,9 +95,9 @@ TEST(Plan, PrimePlansHoldTheirSubPlans) {
     }
 }
 
-// Where p - 1 has large prime factors in turn, the convolution is padded: long enough that nothing
-// wraps around wrongly, and done by kernels.
-TEST(Plan, PrimesWithoutSmallFactorsBelowAreConvolvedWithPadding) {
+// If p - 1 itself has large prime factors, the convolution is padded to a length that avoids
+// aliasing and has only factors with kernels.
+TEST(Plan, PrimesAboveANumberWithLargeFactorsAreConvolvedWithPadding) {
     for (const int32_t p : {167, 719, 10007, 24469}) {
         const PlanReference plan(p);
         ASSERT_TRUE(plan);
@@ -136,7 +136,7 @@ TEST(Plan, HoldsTheRootsAtTheirPlaces) {
         EXPECT_NEAR(table.stages[2]->rootSin[k], -std::sin(turn * k / 23), 1e-15);
     }
 
-    // 5 generates the units modulo 73; no smaller number does.
+    // 5 is the smallest generator of the units modulo 73.
     const PlanReference prime(73);
     const FFTStage &rader = *prime.get()->stages[0];
     int32_t power = 1;
@@ -147,9 +147,9 @@ TEST(Plan, HoldsTheRootsAtTheirPlaces) {
     }
 }
 
-// Threads that take and give back the same lengths at once, primes with plans inside plans among
-// them, end up with one plan per length and none in the end.
-TEST(Plan, IsSharedByThreadsThatBuildItAtOnce) {
+// Threads that simultaneously acquire and release the same lengths, among them primes with nested
+// plans, share one plan per length and leave none behind.
+TEST(Plan, IsSharedByThreadsThatBuildItSimultaneously) {
     constexpr int32_t lengths[] = {53, 106, 5003, 4096, 2809};
     std::atomic<int> faults = 0;
     std::vector<std::thread> threads;
@@ -179,8 +179,8 @@ void StandInTheMiddle() {
     builderMayGoOn->wait();
 }
 
-// While one thread builds a plan, which may take seconds, others get theirs.
-TEST(Plan, OfAnotherLengthIsBuiltByAThreadMeanwhile) {
+// While one thread builds a plan, which may take seconds, other threads can build theirs.
+TEST(Plan, OfAnotherLengthIsBuiltConcurrently) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();
     std::latch stands(1), mayGoOn(1);
@@ -202,7 +202,8 @@ TEST(Plan, OfAnotherLengthIsBuiltByAThreadMeanwhile) {
     qx::destroy_oxfft_table(slow);
 }
 
-// The orders of a prime hold the powers of its smallest generator: all residues, once each.
+// The permutations of a prime hold the powers of its smallest generator, that is, all nonzero
+// residues once each.
 TEST(Plan, OrdersOfPrimesAreThePowersOfAGenerator) {
     for (const auto &[p, generator] :
          {std::pair{53, 2}, {71, 7}, {191, 19}, {409, 21}, {5881, 31}}) {
@@ -214,7 +215,7 @@ TEST(Plan, OrdersOfPrimesAreThePowersOfAGenerator) {
     }
 }
 
-TEST(PlanSlot, IsRefusedWhereNobodyWouldSweepIt) {
+TEST(PlanSlot, IsRefusedIfItsSweepCannotBeRegistered) {
     PlanSlot slot = nullptr;
     qx::test::Host().sweepStatus = 5;
     EXPECT_EQ(qx::PlanSlotAcquire(&slot, 12), ErrOutOfMemory);
@@ -222,13 +223,13 @@ TEST(PlanSlot, IsRefusedWhereNobodyWouldSweepIt) {
     qx::test::ResetHost();
     {
         const PlanReference plan(12);
-        EXPECT_EQ(plan.get()->refCount, 1) << "the refused plan was given back";
+        EXPECT_EQ(plan.get()->refCount, 1) << "the refused plan was released";
     }
     ASSERT_EQ(qx::PlanSlotAcquire(&slot, 12), 0);
     qx::test::RunSweepOf(slot);
 }
 
-// Each allocation of a plan with three sub-plans fails in turn: nothing stays behind.
+// Each allocation of a plan with three sub-plans fails in turn, and nothing is left behind.
 TEST(Plan, IsBuiltWholeOrNotAtAll) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();
@@ -248,8 +249,8 @@ TEST(Plan, IsBuiltWholeOrNotAtAll) {
     EXPECT_EQ(held.get()->next, nullptr);
 }
 
-// Tables grow with the length whatever its factors are: a few dozen of them, none longer than
-// eight values for each one of the transform.
+// Tables grow in proportion to the length, whatever its factors: there are a few dozen of them,
+// none with more than eight values per value of the transform.
 TEST(Plan, TakesMemoryInProportionToItsLength) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();

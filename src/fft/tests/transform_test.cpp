@@ -27,7 +27,7 @@ std::vector<double> Noise(std::size_t n, uint64_t seed = 1) {
     return x;
 }
 
-// The definition. Roots are taken from a table of exact angles.
+// The definition, with roots from a table of exact angles.
 std::vector<Complex> Definition(const std::vector<double> &interleaved) {
     const std::size_t n = interleaved.size() / 2;
     std::vector<Complex> roots(n);
@@ -91,7 +91,7 @@ TEST(Transform, FollowsTheDefinition) {
         CheckLength(n);
 }
 
-// Single frequencies of long transforms, where columns are copied and bundled.
+// Single frequencies of long transforms, in which columns are copied and processed in bundles.
 TEST(Transform, FollowsTheDefinitionAtGreatLengths) {
     for (const int32_t n : {16384, 32768, 65536, 131072, 100000, 46656, 53 * 4096, 23 * 2048, 10007,
                             24469, 32 * 719}) {
@@ -118,7 +118,8 @@ TEST(Transform, FollowsTheDefinitionAtGreatLengths) {
     }
 }
 
-// Values at a stride, at 4 modulo 16 as the host has them, with untouched memory between them.
+// Strided values at addresses that are 4 modulo 16, as in the host, with guarded memory between
+// them.
 class Strided {
 public:
     Strided(std::size_t n, std::ptrdiff_t stride)
@@ -142,8 +143,8 @@ private:
     std::vector<unsigned char> bytes_;
 };
 
-// One length at other strides and alignments, in parts of their own, and beside a transform that
-// has the plan's buffer: the same bits.
+// A transform gives the same bits at other strides and alignments, with separate parts, and while
+// another transform uses the plan's buffer.
 void CheckStrides(int32_t n) {
     SCOPED_TRACE(n);
     const PlanReference plan(n);
@@ -152,7 +153,8 @@ void CheckStrides(int32_t n) {
     ASSERT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n));
     ASSERT_EQ(0, qx::FFTRealForward(plan.get(), x.data(), h.data(), 2, 1, n));
     void *const buffer = plan.get()->buffer.exchange(nullptr);
-    EXPECT_EQ(buffer != nullptr, n > 1200 && n != 53 * 53) << "kernels, and too long for the stack";
+    EXPECT_EQ(buffer != nullptr, n > 1200 && n <= 1 << 17 && n != 53 * 53)
+        << "only lengths with kernels, and too long for the stack, have a buffer";
     qx::FFTComplexForward(plan.get(), &x[0], &x[1], &unbufferedY[0], &unbufferedY[1], 2, 2, n);
     qx::FFTRealForward(plan.get(), x.data(), unbufferedH.data(), 2, 1, n);
     EXPECT_EQ(plan.get()->buffer.exchange(buffer), nullptr);
@@ -183,7 +185,8 @@ void CheckStrides(int32_t n) {
     }
 }
 
-// Inverses, whose passes over the whole array have a form of their own for values side by side.
+// The same for inverses, whose passes over the whole array have a separate form for contiguous
+// values.
 void CheckStridesOfInverses(int32_t n) {
     SCOPED_TRACE(n);
     const PlanReference plan(n);
@@ -209,11 +212,11 @@ TEST(Transform, GivesTheSameBitsAtEveryStrideAndAlignment) {
         CheckStridesOfInverses(n);
     }
     for (const int32_t n : {100, 107, 167, 210, 2 * 167, 529, 720, 1000, 1024, 2048, 2809, 8192,
-                            17 * 1024, 24010, 65536})
+                            17 * 1024, 24010, 65536, 1 << 17, 1 << 18})
         CheckStrides(n);
 }
 
-// The kernels themselves, as the plan holds them: leaves over several columns.
+// The kernels as the plan stores them, applied as leaves to several columns.
 TEST(Transform, LeafKernelsTakeColumns) {
     constexpr int32_t count = 5;
     for (const int32_t p :
@@ -286,7 +289,7 @@ TEST(Transform, RefusesAnotherLength) {
     EXPECT_EQ(y, std::vector<double>(32));
 }
 
-// The inverse works in its input: scaled, and turned into the Hartley form.
+// The inverse uses its input as work memory and leaves it scaled, in Hartley form.
 TEST(Transform, RealInverseLeavesTheHartleyForm) {
     const PlanReference plan(5);
     std::vector<double> h = {5, 10, 15, 20, 30}, out(5);
@@ -323,8 +326,9 @@ TEST(Transform, ThreadsShareAPlan) {
     }
 }
 
-// Kernels and plain sums need no scratch memory; Rader's algorithm reports its lack, in leaves and
-// in stages, and leaves the output alone. Memory given by the caller serves as well.
+// Kernels and plain sums need no scratch memory. Rader's algorithm reports missing memory, in
+// leaves and in stages, and does not change the output. Memory provided by the caller is used as
+// well.
 TEST(Transform, PrimesReportMissingScratchMemory) {
     ASSERT_EQ(0, qx::analysisWorkspace.reserve(64));
     ASSERT_EQ(0, qx::analysisWorkspace.setEnabled(true));
@@ -358,8 +362,8 @@ TEST(Transform, PrimesReportMissingScratchMemory) {
     ASSERT_EQ(0, qx::analysisWorkspace.giveBack());
 }
 
-// The work memory that a plan tells is all that is touched: guards behind it stay.
-TEST(Transform, WorkMemoryIsAsLongAsThePlanTells) {
+// Transforms write no more work memory than the plan states: guards after it are unchanged.
+TEST(Transform, WorkMemoryHasTheSizeThatThePlanStates) {
     for (const int32_t n : {53, 107, 167, 719, 106, 334, 2809, 53 * 59 * 3, 53 * 32, 10007}) {
         SCOPED_TRACE(n);
         const PlanReference plan(n);
@@ -370,7 +374,8 @@ TEST(Transform, WorkMemoryIsAsLongAsThePlanTells) {
         std::vector<double> work(std::max(complexWork, realWork) + 1, guard);
         qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n, work.data());
         EXPECT_EQ(work[complexWork], guard);
-        EXPECT_NE(work[complexWork - 8], guard) << "no more than a cache line is asked for in vain";
+        EXPECT_NE(work[complexWork - 8], guard)
+            << "at most a cache line of the requested memory is unused";
         work.assign(work.size(), guard);
         qx::FFTRealForward(plan.get(), &x[0], &y[0], 1, 1, n, work.data());
         EXPECT_EQ(work[realWork], guard);

@@ -14,7 +14,7 @@ namespace {
 template <class Handle>
 using Kept = InOut<Handle, OnFailure::Keep>;
 
-// kept: the exports for arrays keep the state if their byte is 1, those for one sample clear it if
+// kept: the exports for arrays keep the state if their byte is 1; those for one sample clear it if
 // theirs is not 0.
 bool ClearsUnlessKept(const uint8_t *keepState) { return *keepState != 1; }
 bool ClearsIfReset(const uint8_t *reset) { return *reset != 0; }
@@ -26,8 +26,8 @@ Outcome EmptiedOnFailure(View &view, Outcome outcome) {
     return outcome;
 }
 
-// Brings a state to its size. One of another size is worth nothing, and then neither is the other
-// one of the call. A refusal empties it.
+// Resizes a state to `size`. A state of the wrong size is discarded, together with its partner. If
+// the host refuses, the state is emptied.
 template <class View>
 Outcome Fit(View &state, int32_t size, bool &clears) {
     if (state.size() == size)
@@ -42,10 +42,10 @@ void Clear(View &state) {
                 sizeof *state.data() * static_cast<std::size_t>(state.size()));
 }
 
-// How many values a filter remembers for so many coefficients; none where there are none.
+// The number of values that a filter stores for this many coefficients; none if there are none.
 int32_t Memory(int32_t coefficients) { return std::max(0, coefficients - 1); }
 
-// What the coefficients that are given ask for.
+// The operation that the given coefficients imply.
 enum class Path { Nothing, FIR, IIR, Missing };
 Path DirectPath(bool hasA, bool hasB) {
     if (!hasB)
@@ -58,13 +58,12 @@ Path CascadePath(bool hasA, bool hasB) {
     return hasA || hasB ? Path::Missing : Path::Nothing;
 }
 
-// The signal is one of the handle type `Signal`.
+// The filter for a signal of the handle type `Signal`.
 template <class Signal, class Coefficients>
 using Filter = DirectForm<HandleTraits<Coefficients>::code, HandleTraits<Signal>::code>;
 
-// A filter of the FIR path does not read its a and yState. Inline, as what calls it, for the
-// exports that are called for each sample: a view handed on through memory takes as long as the
-// sample.
+// On the FIR path a and yState are not read. Inline, like its callers, for the exports that are
+// called for each sample: a view passed through memory takes as long as the sample.
 template <class Signal, class Coefficients>
 inline ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b,
                            VectorView<HandleTraits<Signal>::code> xState,
@@ -76,7 +75,7 @@ inline ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coeffi
                              : F::iir(b.view(), xState, a.view(), yState, x, y);
 }
 
-// Where the second one is refused the first is cleared all the same.
+// If the second resize is refused, the first state is still cleared.
 template <class XState, class YState>
 Outcome FitBoth(XState &xState, int32_t nb, YState &yState, int32_t na, bool clears) {
     if (const Outcome bad = Fit(xState, Memory(nb), clears))
@@ -92,8 +91,8 @@ Outcome FitBoth(XState &xState, int32_t nb, YState &yState, int32_t na, bool cle
     return 0;
 }
 
-// In place, with the states of x and y apart. What comes before the filtering leaves the states as
-// they are, a refused one excepted.
+// In place, with separate states of x and y. Errors before the filtering leave the states
+// unchanged, except one whose resize was refused.
 template <class Signal, class Coefficients>
 Outcome FilterTwoStates(Kept<Signal> x, In<Coefficients> a, In<Coefficients> b, Kept<Signal> xState,
                         Kept<Signal> yState, bool clears) {
@@ -130,7 +129,7 @@ Outcome FilterIntoComplex(In<DBL1D> x, Out<CDB1D> y, In<CDB1D> a, In<CDB1D> b, K
     return RunDirect<DBL1D>(path, a, b, xState.view(), yState.view(), x.view(), y.view());
 }
 
-// The state of x and that of y in one array.
+// The states of x and y in one array.
 template <class Signal>
 inline Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, InOut<Signal> &state,
                          bool clears, VectorView<HandleTraits<Signal>::code> x) {
@@ -180,7 +179,7 @@ Outcome FilterCascade(Kept<Signal> x, int32_t form, In<DBL1D> a, In<DBL1D> b, Ke
         return 0;
     if (path == Path::Missing)
         return EmptiedOnFailure(x, ErrSizesDisagree);
-    // kept: unlike the other codes this one leaves x as it is.
+    // kept: unlike the other codes, this one leaves x unchanged.
     if (SectionOrder(form) == 0)
         return ErrInvalidSelector;
     const Outcome outcome = RunCascade(form, a, b, state, clears, x.view());
@@ -196,7 +195,7 @@ Outcome RunSample(typename HandleTraits<Signal>::T *sample, int32_t mode, const 
     if (mode < SecondOrderSections || mode > DirectFIR)
         return ErrInvalidSelector;
     const bool isCascade = mode < DirectIIR;
-    // kept: with the numerator at hand the FIR mode does not look at a, without it does.
+    // kept: the FIR mode ignores a if there is a numerator; without one it does not.
     const bool hasA = !a.isEmpty() && (mode != DirectFIR || b.isEmpty());
     const Path path = isCascade ? CascadePath(hasA, !b.isEmpty()) : DirectPath(hasA, !b.isEmpty());
     if (path == Path::Nothing)
@@ -209,7 +208,7 @@ Outcome RunSample(typename HandleTraits<Signal>::T *sample, int32_t mode, const 
     return RunJoined<Signal>(path, a, b, state, clears, x);
 }
 
-// kept: a failure leaves 0 in the sample, and not the NaN of other scalars.
+// kept: a failure leaves 0 in the sample, not the NaN of other scalars.
 template <class Signal>
 Outcome FilterSample(typename HandleTraits<Signal>::T *x, int32_t mode, In<DBL1D> a, In<DBL1D> b,
                      InOut<Signal> state, bool clears) {

@@ -34,8 +34,8 @@ bool HasInfinity(const In<RemezBand1D> &bands) {
     return false;
 }
 
-// kept: iterations that run out leave the last deviation in *ripple, so it is no OutDBL; and the
-// function result says that the design itself had no memory.
+// kept: if the iteration limit is reached, *ripple is the last deviation, so it is not an OutDBL.
+// The function result says whether the design itself ran out of memory.
 Outcome Equiripple(int32_t n, double fs, In<RemezBand1D> bands, int32_t type, Out<DBL1D> h,
                    double *ripple, int32_t maxIterations) {
     constexpr int32_t designHasNoMemory = 2;
@@ -52,7 +52,7 @@ Outcome Equiripple(int32_t n, double fs, In<RemezBand1D> bands, int32_t type, Ou
     return status == ErrOutOfMemory ? Outcome::OfHost(designHasNoMemory) : Outcome(status);
 }
 
-// The caller's record, whose arrays are outputs of the call.
+// The caller's record, with arrays that are outputs of the call.
 class OutDesign {
 public:
     OutDesign(NarrowFIRDesign *design)
@@ -120,7 +120,7 @@ Outcome RunNarrow(const NarrowFIRFilter &filter, const In<Signal> &x,
     return FilterNarrowFIR<HandleTraits<Signal>::code>(x.view(), filter, y.view());
 }
 
-// kept: an empty x leaves y as it is.
+// kept: an empty x leaves y unchanged.
 template <class Signal>
 Outcome FilterNarrow(In<Signal> x, InDesign design, Out<Signal, OnFailure::Keep> y) {
     if (x.isEmpty())

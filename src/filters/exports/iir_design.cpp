@@ -9,7 +9,7 @@
 namespace qx {
 namespace {
 
-// What all exports are given by reference.
+// The arguments that all exports take by reference.
 struct Arguments {
     FilterBand band;
     int32_t order, type;
@@ -17,7 +17,7 @@ struct Arguments {
     Arguments(const double *fs, const double *fl, const double *fh, const int32_t *n,
               const int32_t *filterType)
         : band{*fs, *fl, *fh}, order(*n), type(*filterType) {
-        // An upper edge that passes the checks of a band wherever the cut-off does.
+        // An upper edge that passes the checks of a band whenever the cut-off does.
         if (type == Lowpass || type == Highpass)
             band.fh = (band.fs * 0.5 + band.fl) * 0.5;
     }
@@ -39,8 +39,8 @@ bool HasBadSelector(const Arguments &arguments, int32_t form) {
     return arguments.type < Lowpass || arguments.type > Bandstop || SectionOrder(form) == 0;
 }
 
-// The checks come when the outputs have their sizes: check() those of the design, then that of the
-// selectors. `design` takes the band and the request.
+// The checks run after the outputs have been resized: check() runs those of the design, then the
+// selectors are checked. `design` receives the band and the request.
 template <class Check, class Design>
 Outcome DesignInto(const Arguments &arguments, int32_t form, const Check &check,
                    const Design &design, Out<DBL1D> &a, Out<DBL1D> &b) {
@@ -81,7 +81,7 @@ Outcome Chebyshev(Arguments arguments, double ripple, int32_t form, Out<DBL1D> a
     return DesignInto(arguments, form, check, design, a, b);
 }
 
-// kept: unlike in the elliptic design, the attenuation comes before the Nyquist frequency.
+// kept: unlike in the elliptic design, the attenuation is checked before the Nyquist frequency.
 Outcome InvChebyshev(Arguments arguments, double attenuation, int32_t form, Out<DBL1D> a,
                      Out<DBL1D> b) {
     const auto check = [=](bool isAbove) {
@@ -108,7 +108,7 @@ Outcome Elliptic(Arguments arguments, double ripple, double attenuation, int32_t
     return DesignInto(arguments, form, check, design, a, b);
 }
 
-// The outputs of the designs by poles and zeros.
+// The outputs of the designs with poles and zeros.
 struct Places {
     Out<DBL1D> &a, &b;
     Out<CDB1D> &zeros, &poles;
@@ -128,7 +128,7 @@ ErrorCode CheckDesign(const FilterBand &band, int32_t order, int32_t type) {
                         {!((isBand ? fh : fl) < fs * 0.5), ErrAboveNyquist}});
 }
 
-// `fill` takes the sections.
+// `fill` adds the poles and zeros to the sections.
 template <class Fill>
 Outcome DesignByPoles(const FilterBand &band, int32_t order, int32_t type, double gainAt0,
                       const Fill &fill, const Places &places) {

@@ -16,7 +16,7 @@ const DBL *DataOrNull(const In<DBL1D> &weights) {
     return weights.isEmpty() ? nullptr : weights.data();
 }
 
-// Differentiators that are not wanted stay as they are unless the call fails.
+// Differentiators that are not requested are left unchanged unless the call fails.
 Outcome FitMatrices(int32_t order, int32_t frame, In<DBL1D> weights, bool wantsDifferentiators,
                     Out<DBL2D> smoothing, Out<DBL2D> differentiators) {
     if (const ErrorCode failed = CheckFit(order, frame, weights))
@@ -40,7 +40,7 @@ Outcome SmoothByFit(In<DBL1D> x, int32_t order, int32_t frame, In<DBL1D> weights
     return SavitzkyGolayFilter(x.data(), x.size(), order, frame, DataOrNull(weights), y.data());
 }
 
-// A right rank below 0 is the left one.
+// A negative right rank means the left rank.
 Outcome SmoothByMedian(InOut<DBL1D> x, int32_t leftRank, int32_t rightRank) {
     const int32_t right = rightRank < 0 ? leftRank : rightRank;
     if (const ErrorCode failed =

@@ -18,7 +18,7 @@ Outcome Fit(Kept &state, int32_t size, bool &clears) {
 }
 void Clear(Kept &state) { Fill(state.data(), state.size(), 0.0); }
 
-// All four states or none.
+// Keeps all four states, or clears all of them.
 Outcome RunDirect(Kept &x, const In<DBL1D> &a, const In<DBL1D> &b, Kept *const (&states)[4],
                   bool clears) {
     auto &[xForward, xBackward, yForward, yBackward] = states;
@@ -35,7 +35,7 @@ Outcome RunDirect(Kept &x, const In<DBL1D> &a, const In<DBL1D> &b, Kept *const (
                            {xBackward->view(), yBackward->view()}, x.view());
 }
 
-// Failures leave x as it is.
+// Failures leave x unchanged.
 Outcome FilterDirect(Kept x, In<DBL1D> a, In<DBL1D> b, Kept xForward, Kept xBackward, Kept yForward,
                      Kept yBackward, int32_t keepState) {
     if (x.isEmpty())
@@ -50,7 +50,7 @@ Outcome FilterDirect(Kept x, In<DBL1D> a, In<DBL1D> b, Kept xForward, Kept xBack
     return outcome;
 }
 
-// kept: here the states stay as they are as well, but for one that has another size by then.
+// kept: here a failure also leaves the states unchanged, except one that has already been resized.
 Outcome FilterCascade(Kept x, int32_t form, In<DBL1D> a, In<DBL1D> b, Kept forward, Kept backward,
                       int32_t keepState) {
     if (x.isEmpty())

@@ -12,14 +12,14 @@ constexpr auto CDB = ElementType::CDB;
 const uint8_t clears = 0;
 const uint8_t keeps = 1;
 
-// A decaying recursion, behind an a[0] of 2.
+// A decaying recursion, after an a[0] of 2.
 double Denominator(int32_t i) { return i == 0 ? 2.0 : 0.25 / i; }
 // Poles well inside the unit circle.
 double SectionDenominator(int32_t i) { return i % 2 == 0 ? -0.3 : 0.1; }
 
 constexpr int32_t taps = 40;
 
-// Without a denominator the numerator may be missing as well.
+// Without a denominator the numerator may be missing, too.
 template <ElementType Coefficients>
 auto A(Call &c, int32_t count) {
     c.mayBeEmpty(1);
@@ -28,7 +28,7 @@ auto A(Call &c, int32_t count) {
     return c.in<Coefficients>(1, count, Denominator);
 }
 
-// The states are inputs whose sizes the export corrects.
+// The states are inputs that the export resizes if necessary.
 template <ElementType Signal>
 auto State(Call &c, int number, int32_t count) {
     c.mayBeEmpty(number);

@@ -11,7 +11,7 @@ namespace {
 constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 
-// What Parks returns beside ErrOutOfMemory where the host has refused nothing.
+// The function result of Parks for ErrOutOfMemory if the host has refused nothing.
 constexpr int32_t designHasNoMemory = 2;
 
 struct NarrowNumbers {

@@ -10,11 +10,12 @@ namespace {
 
 constexpr auto DBL = ElementType::DBL, CDB = ElementType::CDB;
 
-// What the exports have in common: order, type and form of a variant, and edges of a rate of 1000.
+// What the exports have in common: order, type and form of a variant, and edges for a rate of 1000.
 struct Design {
     int32_t order, type, form;
 
-    // `export_` is called with ripple and attenuation, where it has them, between band and order.
+    // `export_` is called with ripple and attenuation, if it has them, between the band and the
+    // order.
     template <class Export, class... Levels>
     int32_t plain(Call &c, Export export_, Levels... levels) const {
         return export_(c.byReference(1000.0), c.byReference(80.0), c.byReference(210.0),

@@ -10,7 +10,7 @@ constexpr auto DBL = ElementType::DBL;
 
 double Weight(int32_t i) { return i % 3 == 0 ? -0.5 : 1.0 + 0.125 * i; }
 
-// The frame follows the size, so that there are ends and a middle at every one of them.
+// The frame depends on the size, so that every size has ends and a middle.
 int32_t Frame(const Call &c) { return c.n / 3 * 2 + 3 > 51 ? 51 : c.n / 3 * 2 + 3; }
 
 Recipe Matrices(const char *name, int32_t order, bool isWeighted, int32_t wantsDifferentiators) {
@@ -33,7 +33,7 @@ Recipe Filter(const char *name, int32_t order, bool isWeighted) {
             }};
 }
 
-// Signals with zeros of either sign among the values.
+// Signals whose values include zeros of either sign.
 double Coarse(int32_t i) {
     const int32_t value = i * 37 % 11 - 5;
     return value == 0 && i % 2 != 0 ? -0.0 : value / 4 * 0.25;

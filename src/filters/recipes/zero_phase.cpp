@@ -11,7 +11,7 @@ constexpr auto DBL = ElementType::DBL;
 double Denominator(int32_t i) { return i == 0 ? 2.0 : 0.25 / i; }
 double SectionDenominator(int32_t i) { return i % 2 == 0 ? -0.3 : 0.1; }
 
-// The states are inputs whose sizes the export corrects.
+// The states are inputs that the export resizes if necessary.
 DBL1D State(Call &c, int number) {
     c.mayBeEmpty(number);
     return c.spoiled<DBL>(number, 3);

@@ -12,27 +12,15 @@
 #include <limits>
 #include <memory>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::Host;
-using qx::test::LongComplex;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::Reshape;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
 
 const uint8_t clears = 0;
 const uint8_t keeps = 1;
 constexpr double tiny = std::numeric_limits<double>::min();
 
-// Poles inside the unit circle: the coefficients behind a[0] add up to less than it.
+// Poles inside the unit circle: the moduli of the coefficients after a[0] sum to less than that of
+// a[0].
 template <class Values>
 Values Damped(Values a) {
     for (auto &value : a)
@@ -61,7 +49,7 @@ LongSpectrum Filtered(const LongSpectrum &b, const LongSpectrum &a, const LongSp
     return y;
 }
 
-// A filter with its memory: what goes in comes out filtered, by one of the exports.
+// A filter with its state, run by one of the exports.
 template <class In, class Out>
 using Stream = std::function<std::vector<Out>(const std::vector<In> &)>;
 
@@ -151,7 +139,7 @@ auto InPiecesToTheBit(const Make &make, const Values &x) {
     return expected;
 }
 
-TEST(DirectFilter, FollowsTheDifferenceEquationHoweverItIsCut) {
+TEST(DirectFilter, FollowsTheDifferenceEquationInBlocksOfAnySize) {
     for (const int32_t na : {0, 1, 2, 6})
         for (const int32_t nb : {1, 2, 3, 70}) {
             SCOPED_TRACE(testing::Message() << na << " " << nb);
@@ -228,7 +216,7 @@ LongSpectrum ThroughSections(int order, const Signal &a, const Signal &b, LongSp
     return x;
 }
 
-TEST(CascadeFilter, IsTheSectionsOneAfterTheOtherHoweverItIsCut) {
+TEST(CascadeFilter, IsItsSectionsInSequenceInBlocksOfAnySize) {
     for (const int32_t form : {0, 1})
         for (const int32_t sections : {1, 2, 3, 4, 5, 7, 8, 9, 12, 17}) {
             SCOPED_TRACE(testing::Message() << form << " " << sections);
@@ -239,7 +227,7 @@ TEST(CascadeFilter, IsTheSectionsOneAfterTheOtherHoweverItIsCut) {
                 value *= 0.9 / order;
             for (std::size_t i = 0; i < b.size(); i += static_cast<std::size_t>(order) + 1)
                 b[i] += 1.5;
-            // A response that dies, and more samples than go through the sections at once.
+            // A decaying response, and more samples than pass through the sections together.
             Signal x = RandomSignal(5000, 3);
             std::fill(x.begin() + 500, x.begin() + 3000, 0.0);
             const auto y =
@@ -257,8 +245,8 @@ TEST(CascadeFilter, IsTheSectionsOneAfterTheOtherHoweverItIsCut) {
         }
 }
 
-// Lanes that hold no section, NaN and the flush of one lane must not reach another sample.
-TEST(CascadeFilter, BrokenAndVanishingValuesStayWhereTheyBelong) {
+// Unused lanes, a NaN and the flush to zero in one lane must not affect other samples.
+TEST(CascadeFilter, NaNAndVanishingValuesDoNotSpread) {
     const Signal a = {-0.5, 0.1, 0.3, 0.2, 0.0, 0.0}, b = {1, 2, 1, 0.5, 0, 0.25, 1e-280, 0, 0};
     Signal x = RandomSignal(400, 5);
     for (std::size_t i = 120; i < 240; ++i)
@@ -287,7 +275,7 @@ TEST(Filtering, ARecursionDecaysToZeroAndNotToDenormals) {
         EXPECT_EQ(y.back(), 0.0);
         for (const double value : y)
             EXPECT_TRUE(value == 0.0 || value > tiny);
-        EXPECT_GT(y[1900], 0.0) << "not before its time";
+        EXPECT_GT(y[1900], 0.0) << "not flushed too early";
     }
     // The last section of a cascade, of however many, has outputs below its states.
     for (std::size_t sections = 1; sections <= 17; ++sections) {
@@ -300,7 +288,7 @@ TEST(Filtering, ARecursionDecaysToZeroAndNotToDenormals) {
     }
     const auto infinite =
         TwoStates<DBLArray, DBLArray>(IIR_Filter, Signal{0}, Signal{1})(Signal{3});
-    EXPECT_TRUE(std::isinf(infinite[0])) << "nobody tests a[0]";
+    EXPECT_TRUE(std::isinf(infinite[0])) << "a[0] is not tested";
 }
 
 TEST(Filtering, StatesHaveTheSizeOfTheCoefficients) {
@@ -316,8 +304,9 @@ TEST(Filtering, StatesHaveTheSizeOfTheCoefficients) {
     EXPECT_EQ(x.values(), (Signal{0.5, 1, 1.5}));
 }
 
-// One flag keeps, the other clears, and a state of another size is cleared in any case.
-TEST(Filtering, TheSensesOfTheFlagsAreOpposite) {
+// One flag keeps the state, the other clears it, and a state of another size is cleared in any
+// case.
+TEST(Filtering, TheFlagsHaveOppositeMeanings) {
     const DBLArray a{1, -0.5}, b{1, 1};
     for (const int flag : {0, 1, 2, 255}) {
         const auto byte = static_cast<uint8_t>(flag);
@@ -346,7 +335,7 @@ TEST(Filtering, TheSensesOfTheFlagsAreOpposite) {
         ErrorCode err = 99;
         IIR_Filter(x.handle(), a.handle(), b.handle(), xState.handle(), yState.handle(), &keeps,
                    &err);
-        EXPECT_EQ(x[0], 1.0) << "the other state is worth nothing, too";
+        EXPECT_EQ(x[0], 1.0) << "the other state is discarded, too";
     }
 }
 
@@ -366,13 +355,13 @@ TEST(Filtering, TheFIRModeOfOneSampleIgnoresA) {
     }
 }
 
-// What is left of x and of the states where the coefficients do not fit.
+// The sizes of x and of the states after a call whose coefficients do not match.
 TEST(Filtering, EachExportCleansUpInItsOwnWay) {
     struct Case {
         Signal x, a, b;
         int32_t form;
         ErrorCode code;
-        int32_t xLeft; // by the exports with apart states and by the cascade; -1: not asked
+        int32_t xLeft; // with separate states and with the cascade; -1: not checked
         int32_t cascadeLeft;
     };
     const Signal x = {1, 2, 3};
@@ -441,7 +430,7 @@ TEST(Filtering, ARefusedStateIsEmptiedAndTheSignalIsNot) {
         EXPECT_EQ(x.size(), 3);
         EXPECT_EQ(refused == 1 ? xState.size() : yState.size(), 0);
         if (refused == 2) {
-            EXPECT_EQ(xState.values(), (Signal{0, 0})) << "of its new size, and cleared";
+            EXPECT_EQ(xState.values(), (Signal{0, 0})) << "resized and cleared";
         }
     }
     const DBLArray a{1, 1}, b{1, 1, 1}, state;
@@ -453,7 +442,7 @@ TEST(Filtering, ARefusedStateIsEmptiedAndTheSignalIsNot) {
     ResetHost();
 }
 
-// Without coefficients y is x.
+// Without coefficients, y equals x.
 TEST(Filtering, ARealSignalPassesAnAbsentComplexFilter) {
     const DBLArray x{1, -2}, xState{3};
     const CDBArray none, y, yState;
@@ -465,3 +454,4 @@ TEST(Filtering, ARealSignalPassesAnAbsentComplexFilter) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -15,15 +15,9 @@
 #include <numbers>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::Array1D;
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::ReadTable;
-using qx::test::ResetHost;
-using qx::test::TableRow;
-using qx::test::TestData;
 typedef std::vector<double> Signal;
 typedef std::complex<double> Complex;
 
@@ -79,7 +73,7 @@ TEST(FIRCoefs, AreTheFourierSeriesOfTheIdealResponse) {
         }
 }
 
-TEST(FIRCoefs, ClampsTheTypeAndTellsWhatCannotBe) {
+TEST(FIRCoefs, ClampsTheTypeAndRefusesImpossibleDesigns) {
     ResetHost();
     for (const auto &[type, clamped] : {std::pair{9, 3}, {-4, 0}, {2, 2}}) {
         CutOff design = {1, 0.1, 0.2, 9, type};
@@ -96,7 +90,7 @@ TEST(FIRCoefs, ClampsTheTypeAndTellsWhatCannotBe) {
         {{1, 0.1, 0.2, 8, 1}, ErrBadTapCount},      {{1, 0.1, 0.2, 8, 3}, ErrBadTapCount},
         {{1, 0.1, 0.6, 8, 3}, ErrAboveNyquist},     {{1, 0.3, 0.2, 8, 3}, ErrBadCutoff},
     };
-    CutOff none = {1, 0.1, 0.2, 0, 7}; // taps come before the type is clamped
+    CutOff none = {1, 0.1, 0.2, 0, 7}; // the taps are checked before the type is clamped
     none.values();
     EXPECT_EQ(none.type, 7);
     for (const auto &[design, code] : cases) {
@@ -128,7 +122,7 @@ struct Equiripple {
     }
 };
 
-// The greatest weighted deviation from what is desired, at the points of the design.
+// The largest weighted deviation from the desired response at the points of the design.
 double PeakOnGrid(const Signal &h, const Equiripple &design) {
     const bool isOdd = design.n % 2 != 0, isMultiband = design.kind == 0;
     const double step = 0.5 / (16 * (design.n / 2 + (isOdd && isMultiband)));
@@ -160,7 +154,7 @@ TEST(Parks, ReachesWhatSciPyReaches) {
         ASSERT_EQ(design.err, 0) << row.text;
         const double peak = PeakOnGrid(h, design);
         EXPECT_NEAR(peak, row.value, 1e-6 * row.value + 1e-11) << row.text;
-        // The exchange may overlook an extremum that is hardly greater.
+        // The exchange may miss an extremum that is only slightly larger.
         EXPECT_NEAR(design.ripple, peak, 2e-3 * peak) << row.text;
         for (std::size_t i = 0; i < h.size(); ++i)
             ASSERT_EQ(h[i], design.kind == 0 ? h[h.size() - 1 - i] : -h[h.size() - 1 - i]);
@@ -169,25 +163,27 @@ TEST(Parks, ReachesWhatSciPyReaches) {
 
 TEST(Parks, IsTheBestInClosedForm) {
     ResetHost();
-    // h[1] + 2 h[0] cos(w): the best line between two bands with |cos| from c to 1, up to 1 and 0.
+    // h[1] + 2 h[0] cos(w): the best line for two bands with |cos| from c to 1 and desired values 1
+    // and 0.
     Equiripple three = {3, 0, {{1, 0, 200, 1}, {0, 800, 1000, 1}}, 2000};
     const Signal h = three.taps();
     const double c = std::cos(pi * 0.2), slope = 1 / (1 + c);
     EXPECT_NEAR(h[1], 0.5, 1e-15);
     EXPECT_NEAR(h[0], slope / 2, 1e-15);
     EXPECT_NEAR(three.ripple, slope * (1 - c) / 2, 1e-15);
-    // A Hilbert transformer of three taps: 2 h sin(w) is nearest to 1 between its two extremes.
+    // A Hilbert transformer of three taps: for the best h, 2 h sin(w) has equal deviations from 1
+    // at both extremes.
     Equiripple hilbert = {3, 2, {{1, 0.125, 0.375, 1}}};
     const double low = std::sin(2 * pi * 0.125);
     EXPECT_NEAR(std::fabs(hilbert.taps()[0]), 1 / (1 + low), 1e-15);
     EXPECT_NEAR(hilbert.ripple, (1 - low) / (1 + low), 1e-15);
 }
 
-// What a grid of few points has at its ends shows in the result.
+// With few grid points, the result shows which points the grid has at its ends.
 TEST(Parks, BandsEndAtTheirEdgesAndBeforeAForcedZero) {
     ResetHost();
-    // A band of just one step has both its edges, 1 and c on the axis of cosines, a narrower one
-    // has its upper edge alone, -1.
+    // A band of exactly one step has both its edges as points (cosines 1 and c), a narrower band
+    // only its upper edge (cosine -1).
     Equiripple step = {3, 0, {{1, 0, 1.0 / 64, 1}, {0, 0.495, 0.5, 1}}};
     const double c = std::cos(2 * pi / 64);
     EXPECT_EQ(step.taps().size(), 3U);
@@ -205,7 +201,7 @@ TEST(Parks, IsCountedAndLimited) {
     Equiripple usual = {41, 0, lowpass}, hundred = {41, 0, lowpass, 1, 100};
     EXPECT_EQ(usual.taps(), hundred.taps());
     EXPECT_EQ(usual.ripple, hundred.ripple);
-    // Nothing is done in one round; a few leave a deviation below the final one.
+    // One round gives no result; after a few, the deviation is still below the final one.
     Equiripple one = {41, 0, lowpass, 1, 1}, few = {41, 0, lowpass, 1, 4};
     EXPECT_TRUE(one.taps().empty() && few.taps().empty());
     EXPECT_EQ(one.err, ErrBadDesignField);
@@ -213,7 +209,8 @@ TEST(Parks, IsCountedAndLimited) {
     EXPECT_TRUE(std::isnan(one.ripple));
     EXPECT_GT(few.ripple, 0.5 * usual.ripple);
     EXPECT_LT(few.ripple, usual.ripple);
-    // Long filters, whose products of distances exceed the doubles, and the limit.
+    // Long filters, whose products of distances exceed the range of doubles, and the limit of the
+    // length.
     Equiripple longest = {2501, 0, {{1, 0, 0.2, 1}, {0, 0.2005, 0.5, 1}}};
     EXPECT_EQ(longest.taps().size(), 2501U);
     EXPECT_EQ(longest.err, 0);
@@ -221,17 +218,17 @@ TEST(Parks, IsCountedAndLimited) {
     EXPECT_TRUE(beyond.taps().empty());
     EXPECT_EQ(beyond.err, ErrOutOfMemory);
     EXPECT_EQ(beyond.status, 2);
-    // More bands than points: the grid holds two a band.
+    // More bands than points: the grid has two points in each band.
     Equiripple crowded = {5, 0, {}};
     for (int b = 0; b < 400; ++b)
         crowded.bands.push_back({b < 200 ? 1.0 : 0.0, b / 800.0, (b + 0.5) / 800.0, 1});
     crowded.bands.back().fHigh = 0.5;
     EXPECT_EQ(crowded.taps().size(), 5U);
-    EXPECT_NEAR(crowded.ripple, 0.5, 0.1); // of a step that no band leaves out
+    EXPECT_NEAR(crowded.ripple, 0.5, 0.1); // of a step without a transition band
 }
 
-// Two heaps of points: products far below the smallest double on one, and far above the greatest on
-// the way to the other.
+// Two clusters of points: products far below the smallest double in one cluster, and far above the
+// largest on the way to the other.
 TEST(Parks, MultipliesDistancesBeyondTheRangeOfADouble) {
     constexpr int32_t n = 2041;
     Signal x, product(n);
@@ -253,7 +250,7 @@ TEST(Parks, MultipliesDistancesBeyondTheRangeOfADouble) {
     }
 }
 
-TEST(Parks, TellsWhatCannotBeInOrder) {
+TEST(Parks, RefusesImpossibleDesignsInOrder) {
     ResetHost();
     const RemezBand pass = {1, 0, 0.2, 1}, stop = {0, 0.3, 0.5, 1};
     const struct {
@@ -343,7 +340,7 @@ bool Stops(const Goal &g, double f) {
                          : away <= g.fStop / 2;
 }
 
-// Centres from end to end put the wanted image at the first place, at the last one and between, on
+// Centres over the whole range make the wanted image the first, the last or one in between, on
 // either side of the model's axis.
 std::vector<Goal> NarrowGoals() {
     std::vector<Goal> goals = {{1, 0.01, 0.012, 0, 0},           {1, 0.488, 0.49, 0, 0},
@@ -387,6 +384,19 @@ TEST(NarrowFIR, KeepsItsPromisesWithFewTaps) {
     EXPECT_GT(stretches, 40);
 }
 
+// Mirrored at a quarter of the sampling rate, a band needs the same filters, with an interpolator
+// that passes the last image instead of the first.
+TEST(NarrowFIR, NeedsAsManyTapsAtEitherEnd) {
+    ResetHost();
+    for (const double center : {15.0, 22.0, 30.0, 41.0, 55.0, 70.0}) {
+        const Narrow low(Goal{1000, 10, 14, center, 2}), high(Goal{1000, 10, 14, 500 - center, 2});
+        EXPECT_GT(low.design.M, 1);
+        EXPECT_EQ(low.design.M, high.design.M) << center;
+        EXPECT_EQ(low.model.size(), high.model.size()) << center;
+        EXPECT_EQ(low.interpolator.size(), high.interpolator.size()) << center;
+    }
+}
+
 TEST(NarrowFIR, FiltersByStretchedModelAndInterpolator) {
     ResetHost();
     const Signal x = {1.0, -2.0, 0.5, 3.0}, model = {1.0, 4.0, -2.0}, smooth = {0.5, 0.25, -1.0};
@@ -406,7 +416,7 @@ TEST(NarrowFIR, FiltersByStretchedModelAndInterpolator) {
             Signal expected = convolved(x, taps);
             if (M > 1)
                 expected = convolved(expected, smooth);
-            if (kind >= 3) // what the filter leaves, at the delay of its middle
+            if (kind >= 3) // adds the input, delayed to the centre of the filter
                 for (std::size_t i = 0; i < x.size(); ++i)
                     expected[i + (expected.size() - x.size()) / 2] += x[i];
             EXPECT_EQ(narrow.filtered(x), expected) << M << " " << kind;
@@ -424,7 +434,7 @@ TEST(NarrowFIR, FiltersByStretchedModelAndInterpolator) {
         }
 }
 
-TEST(NarrowFIR, TellsWhatCannotBe) {
+TEST(NarrowFIR, RefusesImpossibleDesigns) {
     ResetHost();
     const struct {
         Goal goal;
@@ -472,3 +482,4 @@ TEST(NarrowFIR, TellsWhatCannotBe) {
 }
 
 } // namespace
+} // namespace qx::test

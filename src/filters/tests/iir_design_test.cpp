@@ -15,14 +15,9 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::ReadTable;
-using qx::test::ResetHost;
-using qx::test::TableRow;
-using qx::test::TestData;
 typedef std::complex<long double> Complex;
 
 constexpr long double pi = std::numbers::pi_v<long double>;
@@ -106,7 +101,7 @@ int FamilyOf(const std::string &name) {
     return family;
 }
 
-// In all forms; the split of a band filter into second-order sections costs some digits.
+// All forms; splitting a band filter into second-order sections costs some digits.
 TEST(IIRDesign, AgreesWithSciPyInThePassBand) {
     ResetHost();
     for (const TableRow &row : ReadTable(TestData("iir_design.dat"))) {
@@ -125,7 +120,7 @@ TEST(IIRDesign, AgreesWithSciPyInThePassBand) {
     }
 }
 
-// The analog frequency of the prototype at a frequency of the filter.
+// The analog prototype frequency that corresponds to a frequency of the filter.
 long double PrototypeFrequency(const Design &d, double frequency) {
     const long double at = std::tan(pi * frequency / d.fs), low = std::tan(pi * d.fl / d.fs),
                       high = std::tan(pi * d.fh / d.fs);
@@ -154,7 +149,7 @@ double ClosedFormGain(const Design &d, double frequency) {
     return static_cast<double>(1 / std::sqrt(1 + excess));
 }
 
-// Pass band and stop band, at a rate that is not 1, and far beyond the orders that are in use.
+// Pass band and stop band, at a sampling rate other than 1, and for orders far beyond those in use.
 TEST(IIRDesign, HasTheGainOfItsDefinition) {
     ResetHost();
     for (int family = BW; family <= InvChebyshev; ++family)
@@ -213,7 +208,7 @@ TEST(IIRDesign, IsStableUpToOrder40) {
 
 TEST(IIRDesign, LaysOutItsSections) {
     ResetHost();
-    // A real pole: (g (1 + z^-1) / (1 + g)) / (1 + (g - 1) / (g + 1) z^-1). Bessel has the same.
+    // A real pole: (g (1 + z^-1) / (1 + g)) / (1 + (g - 1) / (g + 1) z^-1); the same for Bessel.
     for (const int family : {BW, Bessel}) {
         const Cascade one = Designed({family, 1, Lowpass});
         const double g = std::tan(static_cast<double>(pi) * 0.1);
@@ -223,7 +218,7 @@ TEST(IIRDesign, LaysOutItsSections) {
         EXPECT_EQ(one.b[1], one.b[0]);
         EXPECT_TRUE(one.a[1] == 0 && one.b[2] == 0);
     }
-    // It stands first: alone, before products of pairs, and as one that stays whole beside a 1.
+    // The real pole comes first: alone, before products of pairs, and as a section beside a 1.
     Design odd = {BW, 5, Lowpass};
     odd.form = 1;
     const Cascade fourth = Designed(odd), second = Designed({BW, 5, Lowpass});
@@ -239,7 +234,7 @@ TEST(IIRDesign, LaysOutItsSections) {
               (std::vector<double>{0, 0}));
     EXPECT_EQ(std::vector<double>(split.b.begin() + 3, split.b.begin() + 6),
               (std::vector<double>{1, 0, 0}));
-    // What is asked for in the form that it comes in is not touched.
+    // Sections requested in the form that they already have are not changed.
     for (int32_t type = Lowpass; type <= Bandstop; ++type)
         for (int family = BW; family <= Bessel; ++family) {
             Design design = {family, 6, type};
@@ -275,7 +270,7 @@ TEST(IIRDesign, SplitsSectionsIntoFactors) {
     for (double first = 0.1; first < 3; first += 0.17)
         for (double second = 0.15; second < 3; second += 0.23)
             ExpectSplit({-std::cos(first), 0.25}, {-2 * 0.9 * std::cos(second), 0.81});
-    // Double roots; real roots, alone and beside a pair; roots that are nearly one.
+    // Double roots; real roots, alone and with a pair; nearly equal roots.
     ExpectSplit({-1.2, 0.5}, {-1.2, 0.5});
     ExpectSplit({-1.2, 0.35}, {-1.5, 0.54});
     ExpectSplit({-1.2, 0.35}, {0.2, 0.54});
@@ -291,8 +286,8 @@ TEST(IIRDesign, SplitsSectionsIntoFactors) {
               ErrCoefficientSizes);
 }
 
-// Where the gain of filters of even order is below 1, in the middle of their band.
-TEST(IIRDesign, PutsTheGainIntoTheTellingSection) {
+// In the middle of the band, where filters of even order have a gain below 1.
+TEST(IIRDesign, PutsTheGainIntoTheDecidingSection) {
     ResetHost();
     const double center = std::atan(std::sqrt(std::tan(static_cast<double>(pi) * 0.1) *
                                               std::tan(static_cast<double>(pi) * 0.23))) /
@@ -312,7 +307,7 @@ TEST(IIRDesign, PutsTheGainIntoTheTellingSection) {
             }
 }
 
-TEST(IIRDesign, TellsWhatCannotBeInOrder) {
+TEST(IIRDesign, RefusesImpossibleDesignsInOrder) {
     ResetHost();
     struct Case {
         Design design;
@@ -356,7 +351,7 @@ TEST(IIRDesign, TellsWhatCannotBeInOrder) {
         EXPECT_EQ(cascade.err, code) << design.family << " " << design.order << " " << design.type;
         EXPECT_TRUE(cascade.a.empty() && cascade.b.empty());
     }
-    // Powers that are 0 or infinite are none either.
+    // Powers that are 0 or infinite are refused as well.
     const auto isLost = [](const Design &design) {
         const Cascade cascade = Designed(design);
         EXPECT_EQ(cascade.err, 0);
@@ -371,7 +366,7 @@ TEST(IIRDesign, TellsWhatCannotBeInOrder) {
     EXPECT_TRUE(isLost({Elliptic, 2, Lowpass, 0.1, 0.2, 8e-193, 40}));
     EXPECT_TRUE(isLost({Elliptic, 2, Lowpass, 0.1, 0.2, 1, 3083}));
     EXPECT_FALSE(isLost({Elliptic, 2, Lowpass, 0.1, 0.2, 1, 3082}));
-    // The edge of a band may be half the sampling rate; NaN is no error.
+    // A band edge may be half the sampling rate; NaN is not an error.
     EXPECT_EQ(Designed({BW, 3, Bandpass, 0.1, 0.5}).err, 0);
     for (int family = BW; family <= Bessel; ++family)
         for (const int32_t form : {0, 1}) {
@@ -383,7 +378,7 @@ TEST(IIRDesign, TellsWhatCannotBeInOrder) {
 
 struct PoleZeroCascade : Cascade {
     std::vector<std::complex<double>> zeros, poles;
-    double factor = 7.0; // of the products over zeros and poles
+    double factor = 7.0; // the factor of the product over zeros and poles
 };
 
 std::vector<std::complex<double>> Numbers(const CDBArray &array) {
@@ -431,10 +426,10 @@ double FromNearest(const std::vector<std::complex<double>> &found, std::complex<
     return least;
 }
 
-// Narrow bands at 1e-4 of the rate, wide ones, and edges next to half of it, to order 30.
+// Narrow bands at 1e-4 of the rate, wide bands, and edges close to half the rate, up to order 30.
 TEST(IIRDesign2026, HasPolesZerosAndGainOfFiftyDigits) {
     ResetHost();
-    constexpr double pole = 0, factor = 2; // what a row has; the others are zeros
+    constexpr double pole = 0, factor = 2; // the kinds of rows; all others are zeros
     std::string last;
     PoleZeroCascade made;
     for (const TableRow &row : ReadTable(TestData("pole_zero_designs.dat"))) {
@@ -453,8 +448,8 @@ TEST(IIRDesign2026, HasPolesZerosAndGainOfFiftyDigits) {
     }
 }
 
-// The sections are the poles and zeros in their order, the gain is in their leading coefficients,
-// and the product is the filter that its elder makes.
+// The sections hold the poles and zeros in order, the gain is in their leading coefficients, and
+// their product is the filter of the elder export.
 TEST(IIRDesign2026, MakesSectionsOfItsPolesAndZeros) {
     ResetHost();
     for (int family = BW; family <= Bessel; ++family)
@@ -492,7 +487,7 @@ TEST(IIRDesign2026, MakesSectionsOfItsPolesAndZeros) {
             }
 }
 
-TEST(IIRDesign2026, OrdersItsSectionsAndKeepsThemAt1InTheMiddle) {
+TEST(IIRDesign2026, OrdersItsSectionsAndGivesThemUnitGainMidband) {
     ResetHost();
     for (int family = BW; family <= Bessel; ++family)
         for (int32_t type = Lowpass; type <= Bandstop; ++type) {
@@ -513,8 +508,8 @@ TEST(IIRDesign2026, OrdersItsSectionsAndKeepsThemAt1InTheMiddle) {
         }
 }
 
-// What the elders lose: Bessel poles one by one at high orders, ripples below the rounding of 1,
-// narrow bands.
+// Designs in which the elders lose digits: Bessel filters of high orders, ripples below the
+// rounding of 1, narrow bands.
 TEST(IIRDesign2026, DesignsWhereItsEldersLoseDigits) {
     ResetHost();
     for (const int32_t order : {40, 151, 500}) {
@@ -542,7 +537,7 @@ TEST(IIRDesign2026, DesignsWhereItsEldersLoseDigits) {
     }
 }
 
-TEST(IIRDesign2026, RefusesWhatNoFilterHas) {
+TEST(IIRDesign2026, RefusesImpossibleDesigns) {
     ResetHost();
     struct Case {
         Design design;
@@ -580,3 +575,4 @@ TEST(IIRDesign2026, RefusesWhatNoFilterHas) {
 }
 
 } // namespace
+} // namespace qx::test

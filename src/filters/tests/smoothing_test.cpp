@@ -11,14 +11,8 @@
 #include <limits>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
-using qx::test::Long;
-using qx::test::RandomSignal;
-using qx::test::SameBits;
-using qx::test::Signal;
 
 constexpr double nan = std::numeric_limits<double>::quiet_NaN();
 
@@ -43,7 +37,7 @@ public:
             normBefore = norm;
         }
     }
-    // What sample j adds to the value at place i.
+    // The weight of sample j in the value at place i.
     Long element(int i, int j) const {
         Long sum = 0;
         for (std::size_t k = 0; k < basis_.size(); ++k)
@@ -74,8 +68,8 @@ struct Shape {
     int order, frame;
     double bound;
 };
-// Four times the measured error: the inverse of the normal equations loses what their condition
-// number costs.
+// Four times the measured error; the inverse of the normal equations loses digits according to
+// their condition number.
 constexpr Shape shapes[] = {{1, 3, 2e-15},   {2, 5, 2e-15},    {2, 3, 4e-15},
                             {4, 5, 4e-14},   {3, 21, 4e-15},   {5, 31, 3e-14},
                             {6, 101, 5e-14}, {1, 1001, 1e-16}, {8, 33, 3e-12}};
@@ -100,7 +94,7 @@ TEST(SavitzkyGolay, MatricesAreTheProjectionOntoPolynomials) {
                     worst = std::max(worst, static_cast<double>(std::fabs(
                                                 smoothing.at(i, j) - reference.element(i, j))));
             EXPECT_LT(worst, bound) << order << " " << frame;
-            // Row i finds the coefficient of t^i, in units of the frame's half.
+            // Row i gives the coefficient of t^i, in units of half the frame.
             const double half = frame / 2;
             for (int power = 0; power <= order; ++power) {
                 for (int i = 0; i <= order; ++i) {
@@ -115,13 +109,13 @@ TEST(SavitzkyGolay, MatricesAreTheProjectionOntoPolynomials) {
     }
 }
 
-TEST(SavitzkyGolay, WeightsCountByTheirSizeAlone) {
+TEST(SavitzkyGolay, OnlyTheMagnitudeOfWeightsCounts) {
     const DBLMatrix plain(1, 1), weighted(1, 1), kept(2, 3);
     const DBLArray none, ones{1, -1, 1, 1, -1};
     ASSERT_EQ(SavitzkyGolayCoefH(2, 5, none.handle(), 0, plain.handle(), kept.handle()), 0);
     ASSERT_EQ(SavitzkyGolayCoefH(2, 5, ones.handle(), 0, weighted.handle(), kept.handle()), 0);
     EXPECT_TRUE(SameBits(plain.values(), weighted.values()));
-    EXPECT_EQ(kept.rows() * 10 + kept.cols(), 23) << "differentiators were not wanted";
+    EXPECT_EQ(kept.rows() * 10 + kept.cols(), 23) << "differentiators were not requested";
 }
 
 Signal Smooth(const Signal &x, int order, int frame, const Signal &weights = {}) {
@@ -148,7 +142,7 @@ TEST(SavitzkyGolay, TheFilterTakesTheFrameAroundEachSampleAndTheEndsFromTheOuter
     }
 }
 
-TEST(SavitzkyGolay, PolynomialsPassWithTheirEnds) {
+TEST(SavitzkyGolay, PolynomialsPassUnchangedIncludingTheirEnds) {
     Signal quadratic;
     for (int i = 0; i < 40; ++i)
         quadratic.push_back(3 - 2 * i + 0.25 * i * i);
@@ -182,10 +176,10 @@ TEST(SavitzkyGolay, Failures) {
     qx::test::ResetHost();
     EXPECT_EQ(coefficients(2, 46340, none), ErrBadTapCount);
     for (const qx::test::Reshape &reshape : qx::test::Host().reshapes)
-        EXPECT_EQ(reshape.count, 0) << "no memory is asked of the host for what is refused";
+        EXPECT_EQ(reshape.count, 0) << "a refused call requests no memory from the host";
     EXPECT_EQ(filter(2, 5, none), ErrSizesDisagree);
     EXPECT_EQ(y.size() + smoothing.rows() + differentiators.rows(), 0);
-    // Powers that depend on each other in double precision.
+    // Powers that are linearly dependent in double precision.
     EXPECT_EQ(coefficients(8, 223, none), 0);
     EXPECT_EQ(coefficients(8, 225, none), ErrSingularMatrix);
 }
@@ -242,7 +236,7 @@ TEST(MedianFilter, EveryWindowHasItsMedian) {
                 << n << ": " << left << ", " << right;
 }
 
-// A list that is searched and changed value by value.
+// The reference: a sorted list that is searched and updated value by value.
 Signal MediansOfAList(const Signal &x, int left, int right) {
     std::vector<double> line(left, 0.0);
     line.insert(line.end(), x.begin(), x.end());
@@ -264,7 +258,7 @@ Signal MediansOfAList(const Signal &x, int left, int right) {
     return medians;
 }
 
-TEST(MedianFilter, NaNStaysAsItDoesInASortedListSearchedByEquality) {
+TEST(MedianFilter, NaNBehavesAsInASortedListSearchedByEquality) {
     int affected = 0;
     for (const int n : {10, 300, 2000}) {
         for (const int at : {0, 1, 4, n / 2, n - 1}) {
@@ -297,7 +291,7 @@ TEST(MedianFilter, BothExportsAndTheirLimits) {
     EXPECT_EQ(symmetric(x, 1), 0);
     EXPECT_EQ(x.values(), (Signal{1, 4, 1}));
     EXPECT_EQ(symmetric(x, 2), 0);
-    EXPECT_EQ(x.values(), (Signal{1, 1, 1})) << "two zeros before and behind";
+    EXPECT_EQ(x.values(), (Signal{1, 1, 1})) << "padded with two zeros at either end";
     EXPECT_EQ(MedianFilter({5, 1, 4}, 1, -1), (Signal{1, 4, 1}));
     EXPECT_TRUE(SameBits(MedianFilter({5, nan, -0.0}, 0, 0), {5, nan, -0.0}));
 
@@ -314,3 +308,4 @@ TEST(MedianFilter, BothExportsAndTheirLimits) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -10,16 +10,8 @@
 #include <algorithm>
 #include <cmath>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
 
 struct States {
     DBLArray xForward, xBackward, yForward, yBackward;
@@ -44,7 +36,7 @@ Signal Cascade(const Signal &x, int32_t form, const Signal &a, const Signal &b) 
     return signal.values();
 }
 
-// The impulse response of a pass, and its correlation with itself: the response of both passes.
+// The impulse response of both passes: the autocorrelation of that of one pass.
 LongSpectrum ResponseOfBothPasses(const Signal &a, const Signal &b, int32_t reach) {
     LongSpectrum h(static_cast<std::size_t>(reach) + 1);
     for (std::size_t t = 0; t < h.size(); ++t) {
@@ -64,7 +56,7 @@ TEST(ZeroPhase, TheResponseIsThatOfTheFilterCorrelatedWithItself) {
     constexpr int32_t middle = 60;
     Signal impulse(2 * middle + 1);
     impulse[middle] = 1.0;
-    // Poles of magnitude 0.5, so that nothing is left at the ends.
+    // Poles of magnitude 0.5, so that the response decays completely before the ends.
     for (const auto &[a, b] : {std::pair<Signal, Signal>{{1, -0.5}, {0.25, 0.25}},
                                {{2, 0, 0.5}, {1, 2, -1, 3}},
                                {{}, {3, -1, 4, 1, 5}},
@@ -72,9 +64,9 @@ TEST(ZeroPhase, TheResponseIsThatOfTheFilterCorrelatedWithItself) {
         const Signal y = Direct(impulse, a, b);
         EXPECT_LT(MaxError(y, ResponseOfBothPasses(a, b, middle)), 1e-15);
         for (std::size_t i = 0; i < middle; ++i)
-            EXPECT_NEAR(y[i], y[y.size() - 1 - i], 1e-15 * y[middle]) << "no phase";
+            EXPECT_NEAR(y[i], y[y.size() - 1 - i], 1e-15 * y[middle]) << "zero phase";
     }
-    // 1 - 0.5 z and 1 + 0.25 z z, once as sections of second, once of fourth order.
+    // 1 - 0.5 z and 1 + 0.25 z z, as sections of second and of fourth order.
     const Signal a = {1, -0.5, 0.25, -0.125};
     const Signal direct = Direct(impulse, a, {0.125, 0.375, 0.25});
     EXPECT_LT(MaxError(Cascade(impulse, 0, {-0.5, 0, 0, 0.25}, {0.125, 0.25, 0, 1, 1, 0}),
@@ -97,11 +89,12 @@ TEST(ZeroPhase, GainsActTwiceAndNothingElseHappens) {
     EXPECT_TRUE(SameBits(Cascade(x, 0, {0, 0}, {0.5, 0, 0}), quarter));
 }
 
-// As many zeros as coefficients go through both passes: a slow filter's tail is cut there. The
-// padding of a cascade follows the upper coefficients of its first section.
+// Both passes include as many padding zeros as there are coefficients; the tail of a slow filter is
+// cut off there. The padding of a cascade depends on the upper coefficients of its first section.
 TEST(ZeroPhase, ThePaddingFollowsTheCoefficients) {
     const auto tail = [](const Signal &response, int32_t pad, double pole) {
-        // The last output is the forward response at it, met by what lies up to `pad` behind it.
+        // The last output sums the squares of the forward response over the sample and the `pad`
+        // samples after it.
         double sum = 0;
         for (int32_t i = 0; i <= pad; ++i)
             sum += std::pow(pole, 2 * i);
@@ -128,7 +121,8 @@ TEST(ZeroPhase, StatesCarryOnOrAreCleared) {
     EXPECT_FALSE(SameBits(Direct(x, a, b, states, 1), fresh)) << "kept";
     EXPECT_TRUE(SameBits(Direct(x, a, b, states, 0), fresh)) << "cleared";
     (*states.xBackward.handle())->dimSize = 0;
-    EXPECT_TRUE(SameBits(Direct(x, a, b, states, 1), fresh)) << "one of another size clears all";
+    EXPECT_TRUE(SameBits(Direct(x, a, b, states, 1), fresh))
+        << "a state of another size clears all";
     // An FIR filter has no y.
     Direct(x, {}, b, states, 1);
     EXPECT_EQ(states.yForward.size() + states.yBackward.size(), 0);
@@ -170,9 +164,10 @@ TEST(ZeroPhase, FailuresLeaveTheSignal) {
     const DBLArray sections{1, 1, 1, 1}, numerators{1, 1, 1, 1, 1, 1};
     EXPECT_EQ(cascade(0, x, sections, numerators), 77);
     ResetHost();
-    EXPECT_EQ(forward.values(), (Signal{0, 0, 0, 0})) << "of its new size, and cleared";
+    EXPECT_EQ(forward.values(), (Signal{0, 0, 0, 0})) << "resized and cleared";
     EXPECT_EQ(backward.values(), (Signal{3, 4}));
     EXPECT_EQ(x.values(), (Signal{1, 2, 3}));
 }
 
 } // namespace
+} // namespace qx::test

@@ -10,11 +10,11 @@
 namespace qx {
 namespace {
 
-// What becomes of bound arrays that are too short or differ in length; what they hold for every
-// parameter still counts.
+// What happens if the arrays of bounds are too short or differ in length. Unless the fit fails, an
+// array that has a bound for every parameter is still used.
 enum class BadBounds { Fail, Warn, Pass };
 
-// The bounds of all parameters, infinite where there are none.
+// The bounds of all parameters, infinite if there are none.
 template <int32_t Count>
 class BoundsOf {
 public:
@@ -48,8 +48,8 @@ const DBL *GuessFrom(In<DBL1D> guess, ErrorCode *warning) {
     return nullptr;
 }
 
-// The frame of all: sizes, bounds, the fit, and the parameters where they belong. `request` has
-// the rest; a warning counts where all else is well.
+// The frame of all exports: checks sizes and bounds, fits, and writes the parameters. `request` has
+// the other arguments; a warning is returned if nothing fails.
 template <std::size_t Count, class Fit>
 ErrorCode FitBounded(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, In<DBL1D> lower, In<DBL1D> upper,
                      BadBounds rule, BoundedFit request, OutDBL (&parameters)[Count],
@@ -70,7 +70,7 @@ ErrorCode FitBounded(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, In<DBL1D> lower, 
     return status == 0 ? warning : status;
 }
 
-// What a request takes from the arguments as they are.
+// The part of a request that is taken from the arguments unchanged.
 BoundedFit RequestOf(const DBL *guess, uint16_t method, double tolerance, OutI32 iterations,
                      OutDBL mse) {
     return {.guess = guess,
@@ -83,13 +83,13 @@ BoundedFit RequestOf(const DBL *guess, uint16_t method, double tolerance, OutI32
 template <FitNorm Norm>
 Outcome BoundedLine(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance, OutI32 iterations,
                     In<DBL1D> lower, In<DBL1D> upper, OutDBL a, OutDBL b, OutDBL mse) {
-    // kept: the robust exports go on with bounds of bad length
+    // kept: the robust exports continue with bounds of a wrong length
     constexpr BadBounds rule = Norm == leastSquares ? BadBounds::Fail : BadBounds::Warn;
     OutDBL p[] = {a, b};
     const ErrorCode status =
         FitBounded(y, x, w, lower, upper, rule,
                    RequestOf(nullptr, Norm, tolerance, iterations, mse), p, 0, FitBoundedLine);
-    // A limit that is reached leaves the results where they are.
+    // The results are kept when the limit is reached.
     return status == ErrIterationLimit ? Outcome::WithResults(status) : status;
 }
 
@@ -114,7 +114,7 @@ Outcome BoundedLog(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double base, OutI32
                    In<DBL1D> guess, In<DBL1D> lower, In<DBL1D> upper, uint16_t method,
                    double tolerance, OutDBL a, OutDBL b, OutDBL mse) {
     ErrorCode warning = 0;
-    GuessFrom<2>(guess, &warning); // kept: the fit has its own start
+    GuessFrom<2>(guess, &warning); // kept: the guess is not used; the fit has its own start
     OutDBL p[] = {a, b};
     return FitBounded(y, x, w, lower, upper, BadBounds::Fail,
                       RequestOf(nullptr, method, tolerance, iterations, mse), p, warning,
@@ -127,9 +127,9 @@ Outcome BoundedGaussian(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double toleran
     ErrorCode warning = 0;
     const DBL *start = GuessFrom<4>(guess, &warning);
     if (start != nullptr && !std::isfinite(start[0]))
-        start = nullptr; // kept: only the first element is looked at
+        start = nullptr; // kept: only the first element is checked
     OutDBL p[] = {a, m, s, c};
-    // kept: no test of the bounds' lengths
+    // kept: the lengths of the bounds are not checked
     return FitBounded(y, x, w, lower, upper, BadBounds::Pass,
                       RequestOf(start, method, tolerance, iterations, mse), p, warning,
                       FitBoundedGaussian);

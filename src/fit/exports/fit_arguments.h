@@ -24,10 +24,10 @@ FitSamples SamplesOf(Y y, In<DBL1D> x, Weights w) {
     return {x.view(), y.view(), WeightsOf(w)};
 }
 
-// kept: the oldest exports take standard deviations in the place of weights
+// kept: the oldest exports take standard deviations instead of weights
 enum class Given { Weights, Deviations };
 
-// What a fit is to count its samples with, from a checked argument.
+// The weights of a fit, from a checked argument.
 class SampleWeights {
 public:
     ErrorCode make(std::nullptr_t, Given) { return 0; }
@@ -49,7 +49,7 @@ private:
     Scratch<ElementType::DBL> memory_;
 };
 
-// What a fit gives beside its coefficients: its values in the place of y, and the MSE; or nothing.
+// The outputs of a fit beside its coefficients: its values, which replace y, and the MSE; or none.
 struct ValuesInPlace {
     typedef InOut<DBL1D> Y;
     typedef OutDBL MSE;
@@ -61,14 +61,15 @@ struct CoefficientsOnly {
     static FitOutput output(Y, MSE) { return {}; }
 };
 
-// A guess of `count` values. A shorter one counts as none, and of a longer one the first count.
+// A guess of `count` values. A shorter array counts as no guess; of a longer one the first values
+// count.
 class Guess {
 public:
     Guess(In<DBL1D> guess, int32_t count)
         : data_(guess.size() >= count ? guess.data() : nullptr),
           isOdd_(!guess.isEmpty() && guess.size() != count) {}
     const DBL *data() const { return data_; }
-    // The code of a fit, to which an odd guess adds a warning.
+    // The code of a fit, or a warning if the fit succeeded and the guess has another size.
     ErrorCode merge(ErrorCode status) const {
         return status == 0 && isOdd_ ? WarnFitIncomplete : status;
     }
@@ -78,7 +79,7 @@ private:
     bool isOdd_;
 };
 
-// The code of an end; the limit leaves the results where they are.
+// The code for the end of an iteration; the results are kept when the limit is reached.
 inline Outcome OutcomeOf(FitEnd end) {
     switch (end) {
     case FitEnd::Limit:

@@ -12,8 +12,8 @@
 namespace qx {
 namespace {
 
-// The models: how many coefficients each has (0: any number), the codes of its own, and its value
-// and derivatives at a sample.
+// The models: how many coefficients each has (0: any number), its own codes, and its value and
+// derivatives at a sample.
 
 struct Line {
     static constexpr int32_t count = 2;
@@ -84,7 +84,7 @@ private:
     LogBase logarithm_;
 };
 
-// Where the bounds go. The lengths of the coefficients' arrays are those of the fit.
+// The outputs for the bounds. The arrays of coefficients have the lengths of those of the fit.
 struct ConfidenceOutputs {
     Out<DBL1D> &lowerCoefficients, &upperCoefficients, &lower, &upper;
 };
@@ -112,7 +112,7 @@ Outcome Bounds(const FittedModel &model, In<DBL1D>, double confidence,
     return BoundsOfFit(model, confidence, BoundsOf::Observation, {}, out.lower.view(),
                        out.upper.view());
 }
-// Coefficients beyond the parameters of the model are given and have no width.
+// Coefficients beyond the parameters of the model are given constants whose interval has no width.
 Outcome Bounds(const FittedModel &model, In<DBL1D> coefficients, double confidence,
                const ConfidenceOutputs &out) {
     const int32_t count = coefficients.size();
@@ -138,7 +138,7 @@ struct Samples {
                (w.isEmpty() || CheckFinite(w.data(), w.size()) == 0) &&
                CheckFinite(coefficients.data(), coefficients.size()) == 0;
     }
-    // The samples whose weight is not 0.
+    // The number of samples whose weight is not 0.
     int32_t countUsed() const {
         int32_t used = y.size();
         for (const double weight : w.view())
@@ -148,7 +148,7 @@ struct Samples {
     const DBL *weights() const { return w.isEmpty() ? nullptr : w.data(); }
 };
 
-// The checks that all share, behind those of the model's own.
+// The common checks, which follow those of the model.
 ErrorCode CheckDegrees(int32_t used, int32_t k, double confidence) {
     return FirstFailed({{used <= k, ErrTooFewForParameters},
                         {!(confidence > 0.0 && confidence < 1.0), ErrProbabilityOutOfRange}});
@@ -192,7 +192,7 @@ Outcome CurveBounds(const Model &curve, In<DBL1D> x, const Samples &samples, dou
                   samples.coefficients, confidence, out);
 }
 
-// The powers that a polynomial fit determines; terms beyond them are given.
+// Bounds for the powers that a polynomial fit determines; terms beyond them are given constants.
 template <class Outputs>
 Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
                          const Outputs &out) {
@@ -248,7 +248,7 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
                   samples.coefficients, confidence, out);
 }
 
-// What the frames of confidence and prediction are made of: the type of x and the bounds.
+// The parameters of the frames of confidence and prediction: the type of x and the bounds.
 template <class Model>
 struct OfCurve {
     typedef In<DBL1D> X;
@@ -283,7 +283,7 @@ Outcome Pred(typename Of::X x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double con
     return Of::bounds(x, {y, w, c}, confidence, PredictionOutputs{lower, upper});
 }
 
-// A base of NaN is out of range, an infinite one is not finite.
+// A base that is NaN is reported as out of range, an infinite base as not finite.
 template <class Outputs>
 Outcome LogarithmBounds(In<DBL1D> x, const Samples &samples, double base, double confidence,
                         const Outputs &out) {

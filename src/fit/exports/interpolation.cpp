@@ -26,7 +26,7 @@ Outcome Spline(In<DBL1D> y, In<DBL1D> x, double firstSlope, double lastSlope,
                                    secondDerivatives.view());
 }
 
-// The one export that takes null handles.
+// The only export that accepts null handles.
 ErrorCode SplineValue(DBL1D y, DBL1D x, DBL1D secondDerivatives, double xi, OutDBL yi) {
     if (y == nullptr || x == nullptr || secondDerivatives == nullptr)
         return ErrSizeMismatch;

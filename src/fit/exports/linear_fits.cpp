@@ -26,7 +26,7 @@ Outcome StraightLine(typename Gives::Y y, In<DBL1D> x, Weights w, OutDBL slope, 
     return 0;
 }
 
-// What the revisions of the polynomial fit have added to its arguments.
+// The arguments that the revisions of the polynomial fit have added.
 struct PolynomialTerms {
     ConstRealVector w;
     FixedTerms fixed;
@@ -88,7 +88,7 @@ Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int3
     const int32_t k = h.cols(), side = wantCovariance != 0 ? k : 0;
     if (y.size() != h.rows() || !WeightsFit(w, y.size()))
         return ErrSizeMismatch;
-    if (side > h.rows()) // before a covariance is sized that would be larger than all data
+    if (side > h.rows()) // checked before resizing a covariance that would be larger than all data
         return ErrPolynomialOrderTooHigh;
     if (const Outcome bad = SizeOutputs(k, y.size(), side, coefficients, fit, covariance))
         return bad;

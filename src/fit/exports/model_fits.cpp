@@ -10,7 +10,7 @@
 namespace qx {
 namespace {
 
-// Without iteration, as the oldest exports fit.
+// Fits without iteration, as the oldest exports do.
 template <class Gives, class Deviations>
 Outcome LogLinearExp(typename Gives::Y y, In<DBL1D> x, Deviations deviations, OutDBL a, OutDBL b,
                      typename Gives::MSE mse) {
@@ -28,7 +28,7 @@ Outcome LogLinearExp(typename Gives::Y y, In<DBL1D> x, Deviations deviations, Ou
     return status;
 }
 
-// The frame of the others: the sizes, the guess, and the parameters where they belong.
+// The frame of the others: checks the sizes, takes the guess, and writes the parameters.
 template <class Gives, std::size_t Count, class Fit>
 Outcome Iterated(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guessed,
                  OutDBL (&parameters)[Count], typename Gives::MSE mse, OutI32 iterations,
@@ -75,7 +75,7 @@ Outcome Gaussian(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance
     return Iterated<Gives>(y, x, w, tolerance, guess, p, mse, iterations, floor, FitGaussian);
 }
 
-// The peak within bounds, whose level is fixed at 0.
+// The peak of the bounded fit, with its level fixed at 0.
 Outcome PeakAtEveryScale(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance,
                          In<DBL1D> guess, OutDBL a, OutDBL c, OutDBL s, OutDBL mse,
                          OutI32 iterations, double) {

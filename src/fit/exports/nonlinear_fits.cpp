@@ -10,7 +10,7 @@
 namespace qx {
 namespace {
 
-// The procedures of the caller with what they are given.
+// The procedures of the caller and their arguments.
 struct CallersModel {
     FitProcedure model, jacobian;
     void *context;
@@ -36,7 +36,8 @@ struct CallersModel {
     }
 };
 
-// What is free within the bounds, which have as many elements as parameters or none.
+// Counts the parameters that are free within the bounds, which have as many elements as there are
+// parameters, or none.
 ErrorCode CheckBounds(In<DBL1D> lower, In<DBL1D> upper, int32_t count, int32_t *free) {
     *free = count;
     for (int32_t j = 0; j < count; ++j) {

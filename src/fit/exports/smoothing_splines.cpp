@@ -37,7 +37,7 @@ ErrorCode CheckSmoothing(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, 
     return 0;
 }
 
-// Each piece in powers of x - x[i].
+// The coefficients of each piece in powers of x - x[i].
 void FindPieces(ConstRealVector x, ConstRealVector values, ConstRealVector second,
                 const RealMatrix &pieces) {
     for (int32_t i = 0; i < pieces.rows(); ++i) {

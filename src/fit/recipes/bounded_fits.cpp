@@ -22,7 +22,7 @@ DBL1D Weights(Call &c, int number) {
     c.mayBeEmpty(number);
     return c.in<DBL>(number, c.n, [](int32_t i) { return 0.5 + i % 4; });
 }
-// Any, but for their number.
+// An array of any values, which may be empty.
 DBL1D Values(Call &c, int number, std::initializer_list<double> values) {
     c.mayBeEmpty(number);
     return c.in<DBL>(number, static_cast<int32_t>(values.size()), [values](int32_t i) {

@@ -8,7 +8,7 @@ namespace {
 constexpr auto DBL = ElementType::DBL;
 
 double Position(int32_t i) { return 0.25 * (i % 16) + 0.5; }
-// Falls slowly, with a disturbance of some percent.
+// A slow decay with a disturbance of a few percent.
 double Decay(int32_t i) { return 8.0 / (1.0 + Position(i)) * (1.0 + 0.03125 * (i % 5 - 2)); }
 double Peak(int32_t i) {
     const double z = Position(i) - 2.5;

@@ -16,7 +16,7 @@ double Peak(int32_t i) {
     return 4.0 / (1.0 + z * z) + 0.5 + 0.03125 * (i % 5 - 2) + (i % 11 == 7);
 }
 
-// The resonance a / (1 + ((x - m) / s)^2) + c, for which arithmetic is enough.
+// The resonance a / (1 + ((x - m) / s)^2) + c, which needs nothing but basic arithmetic.
 int32_t Resonance(void *, const ::DBL *x, int32_t xCount, const ::DBL *p, int32_t, ::DBL *out,
                   int32_t n) {
     if (xCount < n || x[0] > 1e200)

@@ -9,29 +9,31 @@
 
 #include <gtest/gtest.h>
 
+#include <bit>
 #include <cstdlib>
 #include <functional>
 #include <limits>
+#include <map>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
-using qx::test::HeapProbe;
-using qx::test::Noise;
 typedef std::vector<double> Values;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
 constexpr uint16_t methods[] = {qx::leastSquares, qx::leastAbsolute, qx::bisquare};
 
-// The models as they are defined.
+// The definitions of the models.
 typedef std::function<double(double x, const Values &p)> Model;
 const Model line = [](double x, const Values &p) { return p[0] * x + p[1]; };
-const Model exponential = [](double x, const Values &p) { return p[0] * exp(p[1] * x) + p[2]; };
-const Model power = [](double x, const Values &p) { return p[0] * pow(x, p[1]) + p[2]; };
-const Model logarithm = [](double x, const Values &p) { return p[0] * log(p[1] * x); };
+const Model exponential = [](double x, const Values &p) {
+    return p[0] * std::exp(p[1] * x) + p[2];
+};
+const Model power = [](double x, const Values &p) { return p[0] * std::pow(x, p[1]) + p[2]; };
+const Model logarithm = [](double x, const Values &p) { return p[0] * std::log(p[1] * x); };
 const Model gaussian = [](double x, const Values &p) {
-    return p[0] * exp(-pow((x - p[1]) / p[2], 2) / 2) + p[3];
+    return p[0] * std::exp(-std::pow((x - p[1]) / p[2], 2) / 2) + p[3];
 };
 constexpr double natural = 2.71828;
 
@@ -156,7 +158,7 @@ protected:
     DBL x[n], y[n], w[n];
 };
 
-// All three ways to the same sums: closed forms, given derivatives, differences.
+// Closed forms, given derivatives and differences all give the same sums.
 TEST_F(BoundedFitSums, DoNotDependOnTheWayToTheDerivatives) {
     for (const DBL *const weights :
          {static_cast<const DBL *>(nullptr), static_cast<const DBL *>(w)})
@@ -182,7 +184,8 @@ TEST_F(BoundedFitSums, DoNotDependOnTheWayToTheDerivatives) {
         }
 }
 
-// In lanes as by one sample after the other, whatever their number, and where exp overflows.
+// Lanes give the sums of a loop over single samples, for any number of samples, and if exp
+// overflows.
 TEST_F(BoundedFitSums, AreTheSameInLanes) {
     for (const CoreModel &core : CoreModels())
         for (int32_t count = 1; count <= n; ++count)
@@ -211,7 +214,8 @@ TEST_F(BoundedFitSums, AreTheSameInLanes) {
             }
 }
 
-// g is what the cost falls by: n times its derivative is -2 g, or -g for absolute residuals.
+// g is the direction of descent: n times the derivative of the cost is -2 g, or -g for absolute
+// residuals.
 TEST_F(BoundedFitSums, PointDownhill) {
     for (const qx::FitNorm method : {qx::leastSquares, qx::leastAbsolute})
         for (const CoreModel &core : CoreModels()) {
@@ -242,7 +246,7 @@ TEST_F(BoundedFitSums, BisquareLeavesOutWhatLiesFarOff) {
     EXPECT_EQ(near.cost, far.cost);
     for (std::size_t i = 0; i < near.a.size(); ++i)
         EXPECT_EQ(near.a[i], far.a[i]);
-    // Residuals without spread leave the weights of the caller.
+    // If the residuals have no spread, the weights of the caller remain.
     for (int i = 0; i < n; ++i)
         y[i] = core.model.value(x[i], core.p.data(), 3, nullptr);
     const qx::FitSamples exact = {{x, n}, {y, n}, {w, n}};
@@ -307,7 +311,7 @@ TEST(BoundedLM, ChecksItsArguments) {
     EXPECT_EQ(run(3, 0, {{infinite, 3}, {}}, p), ErrNonFiniteInput) << "no finite cost";
 }
 
-// Steps are worked off in memory that is taken once, and the limit ends them with the best point.
+// All steps use memory that is allocated once, and at the limit the best point is returned.
 TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
     Fit f = Sampled(exponential, {2, -1, 0.5}, 0, 4, 30, 0.1, 3);
     const qx::FitModel model = qx::FitModelOf<qx::ExponentialModel>();
@@ -328,7 +332,7 @@ TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
     }
     for (std::size_t i = 1; i < costs.size(); ++i)
         EXPECT_LT(costs[i], costs[i - 1]);
-    // An exact fit ends although nothing falls any more.
+    // An exact fit ends although its cost no longer falls.
     const DBL x[] = {0, 1, 2, 3}, y[] = {2, 2, 2, 2};
     DBL p[] = {0, 0, 2};
     int32_t iterations = -1;
@@ -338,32 +342,51 @@ TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
     EXPECT_EQ(mse, 0.0);
 }
 
-// Long after the damping has fallen to 0 a step is worse: the same one would be tried for ever.
+// A model of one coefficient whose cost falls until its evaluations have reached `turn`.
+struct TurningModel {
+    int32_t turn, calls = 0;
+
+    qx::FitModel model() {
+        return {1, [](double, const DBL *, int32_t, const void *) { return 0.0; }, nullptr,
+                [](const qx::FitSamples &, const DBL *, int32_t, double *mse, DBL *a, DBL *, DBL *g,
+                   const void *self) {
+                    // The fit treats the model as constant, but the model counts its calls.
+                    auto &m = *static_cast<TurningModel *>(const_cast<void *>(self));
+                    *mse = ++m.calls < m.turn ? 1.0 - 1e-4 * m.calls : 2.0;
+                    *a = *g = 1.0;
+                },
+                this};
+    }
+};
+
+// The damping grows tenfold with each step that is worse, up to 10000 inclusive.
+TEST(BoundedLM, GivesUpWhereTheDampingExceedsItsLimit) {
+    TurningModel turning = {2};
+    const DBL x[] = {0}, y[] = {0};
+    DBL p[] = {0};
+    int32_t iterations = 100;
+    double lambda = 1, mse;
+    EXPECT_EQ(qx::BoundedLM(turning.model(), {{x, 1}, {y, 1}, {}}, 0, {}, p, &iterations, 1e-300,
+                            &lambda, &mse),
+              0);
+    EXPECT_EQ(lambda, 100000.0);
+    EXPECT_EQ(iterations, 4);
+    EXPECT_EQ(turning.calls, 6) << "the start and five steps";
+}
+
+// A step increases the cost long after the damping has fallen to 0; without a check, the same step
+// would be repeated endlessly.
 TEST(BoundedLM, DoesNotRepeatAStepWithoutDamping) {
-    struct Calls {
-        int32_t *count;
-    };
-    int32_t calls = 0;
-    const Calls user = {&calls};
-    const qx::FitModel model = {
-        1, [](double, const DBL *, int32_t, const void *) { return 0.0; }, nullptr,
-        [](const qx::FitSamples &, const DBL *, int32_t, double *mse, DBL *a, DBL *, DBL *g,
-           const void *constants) {
-            const int32_t count = ++*static_cast<const Calls *>(constants)->count;
-            *mse = count < 1000 ? 1.0 - 1e-4 * count : 2.0;
-            *a = *g = 1.0;
-        },
-        &user};
     const DBL x[] = {0}, y[] = {0};
     for (const int32_t limit : {1000000, std::numeric_limits<int32_t>::max() - 1}) {
-        calls = 0;
+        TurningModel turning = {1000};
         DBL p[] = {0};
         int32_t iterations = limit;
         double lambda = 0.1, mse;
-        EXPECT_EQ(qx::BoundedLM(model, {{x, 1}, {y, 1}, {}}, 0, {}, p, &iterations, 1e-300, &lambda,
-                                &mse),
+        EXPECT_EQ(qx::BoundedLM(turning.model(), {{x, 1}, {y, 1}, {}}, 0, {}, p, &iterations,
+                                1e-300, &lambda, &mse),
                   0);
-        ASSERT_LT(calls, 1100);
+        ASSERT_LT(turning.calls, 1100);
         EXPECT_EQ(iterations, limit + 1);
         EXPECT_EQ(lambda, 0.0);
         EXPECT_LT(mse, 0.91);
@@ -371,7 +394,7 @@ TEST(BoundedLM, DoesNotRepeatAStepWithoutDamping) {
 }
 
 // Every set of the statistical reference data from both starts, by differences alone. The starts
-// that lead elsewhere are far from the answer on purpose.
+// that lead to other minima are deliberately far from the answer.
 TEST(BoundedLM, FindsTheCertifiedValues) {
     const std::vector<std::string> elsewhere = {"BoxBOD 1", "MGH10 1", "MGH17 1"};
     const auto sets = qx::test::ReadNistSets(qx::test::TestData("nist_nonlinear.dat"));
@@ -388,8 +411,8 @@ TEST(BoundedLM, FindsTheCertifiedValues) {
                 continue;
             }
             EXPECT_GE(digits, 6.3);
-            EXPECT_LT(steps, 2000) << "it ends by itself";
-            // Those of Lanczos1 are rounding errors.
+            EXPECT_LT(steps, 2000) << "converges before the limit";
+            // The certified sum for Lanczos1 consists of rounding errors.
             const double part = set.name == "Lanczos1" ? 0.01 : 6e-10;
             EXPECT_NEAR(squares, set.squares, part * set.squares);
         }
@@ -397,7 +420,7 @@ TEST(BoundedLM, FindsTheCertifiedValues) {
     EXPECT_EQ(missed, elsewhere);
 }
 
-// The exports against other code and definitions.
+// Comparisons of the exports with other code and with definitions.
 
 struct Problem {
     std::string model;
@@ -471,7 +494,7 @@ TEST(BoundedFits, FindTheOptimumThatSciPyFinds) {
         const double cost = Cost(f, model);
         EXPECT_LE(cost, problem.cost * (1 + 1e-6));
         EXPECT_NEAR(f.mse, cost, 1e-9 * cost);
-        const bool isOther = cost < problem.cost * (1 - 1e-6); // and a better minimum
+        const bool isOther = cost < problem.cost * (1 - 1e-6); // another, better minimum
         for (std::size_t i = 0; i < f.p.size(); ++i) {
             EXPECT_GE(f.p[i], f.lower[i]);
             EXPECT_LE(f.p[i], f.upper[i]);
@@ -483,7 +506,7 @@ TEST(BoundedFits, FindTheOptimumThatSciPyFinds) {
     EXPECT_EQ(problems, 1000);
 }
 
-// Without a guess, clean data give back what they were made of.
+// Without a guess, the fit recovers the parameters from which the data were generated.
 TEST(BoundedFits, StartByThemselves) {
     const struct {
         const char *model;
@@ -554,7 +577,7 @@ TEST(BoundedFits, DrawRobustLinesThroughTheTelephones) {
     EXPECT_EQ(f.status, 0);
     EXPECT_NEAR(f.p[0], 0.11, 0.005) << "the slope of the years that counted calls";
     EXPECT_NEAR(f.mse, Cost(f, line), 1e-9);
-    // Within bounds that cut the answer off, with the best intercept that is left.
+    // With bounds that exclude the answer, the best remaining intercept is found.
     f.lower = {0.15, -inf};
     f.upper = {inf, inf};
     f.iterations = 1000;
@@ -603,7 +626,7 @@ TEST(BoundedFits, RobustMethodsDoNotFollowOutliers) {
     }
 }
 
-// Far off, and all on one side of a plain fit.
+// Outliers far off, all on one side of a plain fit.
 TEST(BoundedFits, BisquareBeginsWhereTheBulkOfTheDataLies) {
     for (const char *const name : {"line", "logarithm"}) {
         const Values p = {2.5, 1.5};
@@ -619,10 +642,10 @@ TEST(BoundedFits, BisquareBeginsWhereTheBulkOfTheDataLies) {
     }
 }
 
-// Where it ends, the line is that of the biweights that its own residuals and leverages give.
+// The final line is the weighted fit with the biweights of its own residuals and leverages.
 TEST(BoundedFits, BisquareLinesAllowForLeverage) {
     Fit f = Sampled(line, {2.5, 1.5}, 0, 5, 12, 0.8, 9);
-    f.x.back() = 30; // nearly all of the leverage, and off the line of the others
+    f.x.back() = 30; // has nearly all of the leverage and is off the line of the other samples
     f.y.back() = 70;
     f.method = qx::bisquare;
     const std::size_t n = f.x.size();
@@ -744,6 +767,11 @@ TEST(BoundedFits, CheckTheirArguments) {
              f.guess = {nan, 1, 0, 0};
          },
          0, 0, ErrNonFiniteInput, ErrNonFiniteInput, 0, 0},
+        {"infinite guess",
+         [](Fit &f) {
+             f.guess = {inf, 1, 0, 0};
+         },
+         0, 0, ErrNonFiniteInput, ErrNonFiniteInput, 0, 0},
     };
     for (const auto &test : cases)
         for (const auto &[name, expected] :
@@ -767,13 +795,14 @@ TEST(BoundedFits, CheckTheirArguments) {
         }
 }
 
-TEST(BoundedFits, TellWhereThereIsNothingToFit) {
+TEST(BoundedFits, ReportWhereThereIsNothingToFit) {
     Fit f = Sampled(gaussian, {1, 2, 1, 0}, 0, 4, 20, 0.1, 2);
     f.y.assign(20, nan);
     EXPECT_EQ(f("gaussian").status, ErrNoUsableFit);
     f.y.assign(20, 0.0);
-    EXPECT_EQ(f("exponential").status, ErrPolynomialOrderTooHigh) << "no side of the offset";
-    // Equal abscissae give no line, as without bounds, unless the bounds leave but one.
+    EXPECT_EQ(f("exponential").status, ErrPolynomialOrderTooHigh)
+        << "no samples on either side of the offset";
+    // Equal abscissae do not determine a line, as without bounds, unless the bounds allow only one.
     f = Sampled(line, {1, 2}, 1, 1, 5, 0.5, 3);
     EXPECT_FALSE(std::isfinite(f("line").p[0]));
     f.lower = {0.5, -inf};
@@ -783,8 +812,8 @@ TEST(BoundedFits, TellWhereThereIsNothingToFit) {
     EXPECT_NEAR(f.p[1], (f.y[0] + f.y[1] + f.y[2] + f.y[3] + f.y[4]) / 5 - 0.5, 1e-12);
 }
 
-TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
-    // Nothing free and nothing given: the bounds come back.
+TEST(BoundedFits, NeedFewerSamplesWithFixedCoefficients) {
+    // With nothing free and no samples the fit returns the bounds.
     for (const char *const name : {"line", "exponential", "power", "logarithm", "gaussian"}) {
         Fit f;
         f.lower = f.upper = {2, 3, 4, 5};
@@ -794,7 +823,7 @@ TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
         EXPECT_EQ(f.mse, 0.0);
         EXPECT_TRUE(f.fit.empty());
     }
-    // As many samples as free coefficients: the model goes through them.
+    // With as many samples as free coefficients, the model interpolates them.
     const struct {
         const char *model;
         Values p;
@@ -832,7 +861,7 @@ TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
             for (std::size_t i = 0; i < test.p.size(); ++i)
                 EXPECT_NEAR(f.p[i], test.p[i], method == qx::bisquare ? 1e-2 : 1e-5);
         }
-    // Without a guess the bounds are the start: a deviation of 0 would be none.
+    // Without a guess the bounds are the start; a deviation of 0 would not be a valid start.
     Fit f;
     f.x = {1, 2};
     f.y = {3, 4};
@@ -842,7 +871,7 @@ TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
 }
 
 TEST(BoundedFits, EndAtTheirLimits) {
-    // Nothing but the limit is told of lines, whose results stay.
+    // Lines report that the limit was reached, but keep their results.
     Fit f = Telephones();
     f.method = qx::leastAbsolute;
     f.iterations = 1;
@@ -851,7 +880,7 @@ TEST(BoundedFits, EndAtTheirLimits) {
     EXPECT_EQ(f.iterations, 1);
     EXPECT_NEAR(f.mse, Cost(f, line, qx::leastAbsolute), 1e-12);
     EXPECT_NEAR(f.fit[3], line(53, f.p), 1e-12);
-    // Models have a step in each pass even where none is allowed.
+    // Models take one step in each pass even if the limit allows none.
     for (const int32_t limit : {0, -5, 1}) {
         Fit g = Sampled(exponential, {2, -1, 0.5}, 0, 4, 30, 0.3, 3);
         g.guess = {1, -0.2, 0};
@@ -863,12 +892,51 @@ TEST(BoundedFits, EndAtTheirLimits) {
     }
 }
 
+// A bisquare line that recurs ends the fit. Each line is compared with that of the latest round
+// whose number is a power of two. The rounds begin after those of the fit by least absolute
+// residuals.
+TEST(BoundedFits, EndWhenLinesRecur) {
+    Fit f;
+    f.x = {8, 0, 9, 9, 3, 2, 6};
+    f.y = {-3, 0, 5, -1, 5, 1, 0};
+    f.lower = {-1, -inf};
+    f.upper = {-0.5, inf};
+    f.method = qx::leastAbsolute;
+    f.tolerance = 0.01;
+    const int32_t before = f("line").iterations;
+    f.method = qx::bisquare;
+    f.tolerance = 1e-17;
+    std::map<uint32_t, Values> lines;
+    uint32_t round = static_cast<uint32_t>(before);
+    for (bool isFound = false; !isFound && round < 100;
+         isFound = lines[round] == lines[std::bit_floor(round - 1)]) {
+        Fit limited = f;
+        limited.iterations = before + static_cast<int32_t>(++round);
+        EXPECT_EQ(limited("line").status, ErrIterationLimit);
+        lines[round] = limited.p;
+    }
+    f.iterations = 1000;
+    EXPECT_EQ(f("line").status, ErrIterationLimit);
+    EXPECT_EQ(f.iterations, before + static_cast<int32_t>(round));
+    EXPECT_GT(std::bit_floor(round - 1), static_cast<uint32_t>(before)) << "all lines are known";
+}
+
+// If a peak and a dip are equally close to the data, the fit begins at the peak.
+TEST(BoundedFits, PreferThePeakToTheEqualDip) {
+    Fit f;
+    f.x = {-4, -3, -2, -1, 0, 1, 2, 3, 4};
+    f.y = {-2, 2, 2, 3, 0, -3, -2, -2, 2};
+    EXPECT_EQ(f("gaussian").status, 0);
+    EXPECT_GT(f.p[0], 0.0);
+    EXPECT_LT(f.p[1], 0.0);
+}
+
 TEST(BoundedFits, KnowTheBasesOfLogarithms) {
     for (const double base : {2.0, 10.0, 2.71828, 2.718281828459045}) {
         Fit f = Sampled(logarithm, {3, 0.7}, 0.5, 9, 12, 0, 1);
         f.base = base;
         f.upper = {inf, inf};
-        f.lower = {-inf, 0.9}; // cuts the answer off
+        f.lower = {-inf, 0.9}; // excludes the answer
         f("logarithm");
         const double logOfBase = base == 2.71828 ? 1 : std::log(base);
         EXPECT_EQ(f.p[1], 0.9);
@@ -897,8 +965,8 @@ TEST(BoundedFits, KnowTheBasesOfLogarithms) {
 
 // The revision of the Gaussian fit.
 
-// A peak or a dip of any width from one and a half samples to the range, at even or random places,
-// within bounds that hold it.
+// A peak or a dip with a width from one and a half samples to the whole range, at even or random
+// abscissae, within bounds that contain it.
 Fit ExactPeak(Noise &noise, Values *truth) {
     const auto uniform = [&](double from, double to) {
         return from + (to - from) * (0.5 + 0.5 * noise.symmetric());
@@ -946,7 +1014,7 @@ TEST(BoundGaussianFit2026, FindsEveryExactPeak) {
     RecordProperty("missed by the elder", missed);
 }
 
-// As the best of 51 starts of SciPy.
+// As good as the best of 51 starts of SciPy.
 TEST(BoundGaussianFit2026, ReachesTheLeastSquares) {
     std::istringstream in = qx::test::Uncommented(qx::test::TestData("nonlinear_fits.dat"));
     int peaks = 0;
@@ -978,12 +1046,12 @@ TEST(BoundGaussianFit2026, ReachesTheLeastSquares) {
     EXPECT_EQ(peaks, 60);
 }
 
-// The other norms leave out what lies off, and a dip whose s is bounded below 0 is found, too.
+// The other norms ignore outliers, and a dip whose s is bounded to negative values is found, too.
 TEST(BoundGaussianFit2026, KnowsTheOtherNorms) {
     const Values truth = {-2, 1.5, 0.3, 4};
     Fit f = Sampled(gaussian, truth, 0, 4, 80, 0.001, 9);
     f.tolerance = 1e-9;
-    // By the sum of the residuals a peak on an outlier alone may be worth more than the dip.
+    // By the sum of absolute residuals, a peak at a single outlier may fit better than the dip.
     for (const double off : {1.0, 30.0})
         for (const uint16_t method : {qx::leastAbsolute, qx::bisquare}) {
             Fit outliers = f;
@@ -998,7 +1066,7 @@ TEST(BoundGaussianFit2026, KnowsTheOtherNorms) {
     EXPECT_LT(LargestError(Fit(f)("peak"), truth), 0.005);
     f.upper[2] = f.lower[2] = 0;
     EXPECT_EQ(Fit(f)("peak").status, ErrFitStartValues);
-    // Where all is fixed no samples are needed, and of a constant nothing is known.
+    // If everything is fixed, no samples are needed; constant data do not determine a peak.
     f = {.x = {}, .y = {}, .lower = truth, .upper = truth};
     EXPECT_EQ(f("peak").p, truth);
     f = {.x = {1, 2, 3, 4, 5}, .y = {2, 2, 2, 2, 2}};
@@ -1007,3 +1075,4 @@ TEST(BoundGaussianFit2026, KnowsTheOtherNorms) {
 }
 
 } // namespace
+} // namespace qx::test

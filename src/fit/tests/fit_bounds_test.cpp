@@ -13,18 +13,8 @@
 #include <sstream>
 #include <string>
 
+namespace qx::test {
 namespace {
-
-using qx::TwoSidedT;
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
-using qx::test::infinity;
-using qx::test::Inverse;
-using qx::test::Long;
-using qx::test::nan;
-using qx::test::Noise;
-using qx::test::Samples;
-using qx::test::TestData;
 
 constexpr double eps = 0x1p-52;
 
@@ -60,8 +50,8 @@ Bounds Pred(PredExport pred, const Samples &x, const Samples &y, const Samples &
     return result;
 }
 
-// The logarithm to the base 3 and the matrix of the terms 1, x, sin x as exports of the common
-// form.
+// The logarithm to base 3 and the matrix of the terms 1, x, sin x, wrapped in the common form of
+// the exports.
 ErrorCode ConfLog3(DBL1D x, DBL1D y, DBL1D w, DBL1D c, double confidence, DBL1D lowerC,
                    DBL1D upperC, DBL1D lower, DBL1D upper) {
     return ConfBndLog_head(x, y, w, c, 3.0, confidence, lowerC, upperC, lower, upper);
@@ -293,7 +283,7 @@ TEST(FitBounds, AreThoseOfRsPredict) {
     EXPECT_EQ(fits, 5);
 }
 
-// Standard deviations of the coefficients, certified: 11 digits of them.
+// Certified standard deviations of the coefficients, with 11 digits.
 TEST(FitBounds, DeviationsCertifiedByNIST) {
     for (const auto &set : qx::test::ReadNistSets(TestData("nist_nonlinear.dat"))) {
         if (set.name != "DanWood")
@@ -361,7 +351,7 @@ TEST(FitBounds, SamplesWithoutWeightHaveBoundsAndDoNotCount) {
     EXPECT_GT(eight.upper[6] - 200.0, 20.0);
 }
 
-TEST(FitBounds, PolynomialsBeyondWhatIsFittedKeepTheirGivenTerms) {
+TEST(FitBounds, PolynomialsKeepGivenTermsAboveTheFittedOrder) {
     Samples x, y, c(31, 0.0);
     for (int i = 0; i < 200; ++i) {
         x.push_back(std::cos(0.0157 * i));
@@ -376,7 +366,7 @@ TEST(FitBounds, PolynomialsBeyondWhatIsFittedKeepTheirGivenTerms) {
     EXPECT_LT(found.lowerC[25], found.upperC[25]);
 }
 
-TEST(FitBounds, SizesOfUnitsCostNoDigits) {
+TEST(FitBounds, ScalingOfUnitsCostsNoDigits) {
     const Samples x = {1, 2, 3, 4, 5, 6}, y = {2, 3, 7, 8, 8, 11};
     const Bounds plain = Conf(ConfBndLinear_head, x, y, {}, {2, 0}, 0.9);
     for (const double unit : {0x1p-500, 0x1p500, 0x1p900}) {
@@ -472,3 +462,4 @@ TEST(FitBounds, DependentColumnsAreFoundAtAnyLength) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -71,7 +71,7 @@ TEST(Interpolation, PolynomialIsLagranges) {
             }
         }
     }
-    // The last correction takes in the point that is farthest away of those left over.
+    // The last correction adds the farthest of the remaining points.
     const Value parabola = At(PolyInterp_head, {0, 1, 2}, {0, 1, 4}, 0.25);
     EXPECT_EQ(parabola.yi, 0.0625);
     EXPECT_EQ(parabola.dy, 0.0625 - 0.25);
@@ -87,7 +87,7 @@ TEST(Interpolation, RationalFollowsRationals) {
         EXPECT_NEAR(value.yi, f(xi), 4e-9);
         EXPECT_LT(std::fabs(value.dy), 1e-3);
     }
-    // Near a pole, where no polynomial follows.
+    // Near a pole, which no polynomial can follow.
     const auto pole = [](double t) { return 1.0 / (t - 2.1); };
     EXPECT_NEAR(At(RatInterp_head, x, Of(x, pole), 2.05).yi, pole(2.05), 1e-6);
     for (std::size_t i = 0; i < x.size(); ++i) {
@@ -95,7 +95,8 @@ TEST(Interpolation, RationalFollowsRationals) {
         EXPECT_EQ(value.yi, f(x[i]));
         EXPECT_EQ(value.dy, 0.0);
     }
-    // 1 / x through (-1, -1) and (1, 1) has its pole at 0; in the tableau but for the offset.
+    // 1 / x through (-1, -1) and (1, 1) has its pole at 0. The tableau meets it there only if
+    // rounding removes the offset.
     EXPECT_EQ(At(RatInterp_head, {-1, 1}, {-1, 1 - 1e-10 + 1e-10}, 0.5).code, 0);
     EXPECT_EQ(At(RatInterp_head, {-1, 1}, {-1e7, 1e7}, 0.0).code, ErrDuplicateAbscissa);
 }
@@ -119,8 +120,9 @@ double SplineAt(const Samples &x, const Samples &y, const Samples &s, double xi)
     return yi;
 }
 
-// A cubic is its own spline with its own slopes, inside and beyond, up and down.
-TEST(Splines, GiveACubicBack) {
+// The spline of a cubic with its own end slopes is the cubic, inside and outside the range, for
+// ascending and descending abscissae.
+TEST(Splines, ReproduceACubic) {
     const auto f = [](double t) { return 1 + t * (-2 + t * (0.5 + 0.25 * t)); };
     const auto slope = [](double t) { return -2 + t * (1 + 0.75 * t); };
     Samples x = {-1.0, -0.2, 0.5, 2.0, 2.5, 4.0};
@@ -138,7 +140,8 @@ TEST(Splines, GiveACubicBack) {
     }
 }
 
-// Continuity of the first derivative is what the system says; and 0 at natural ends.
+// The system of equations expresses continuity of the first derivative; the second one is 0 at
+// natural ends.
 TEST(Splines, AreSmoothWithNaturalEnds) {
     const Samples x = {0.0, 1.0, 1.5, 3.0, 4.0};
     const Samples y = {1.0, -1.0, 2.0, 0.0, 0.5};
@@ -160,7 +163,7 @@ TEST(Splines, AreSmoothWithNaturalEnds) {
     const Samples s = Spline(x, y, -3.0, natural);
     EXPECT_EQ(s[4], 0.0);
     EXPECT_NEAR((SplineAt(x, y, s, 1e-6) - y[0]) / 1e-6, -3.0, 1e-4);
-    EXPECT_EQ(Spline({2.0}, {5.0}, 1.0, 1.0), Samples{0.0}) << "a point has no bend";
+    EXPECT_EQ(Spline({2.0}, {5.0}, 1.0, 1.0), Samples{0.0}) << "a single point has no curvature";
     EXPECT_EQ(Spline({2.0, 3.0}, {5.0, 6.0}, natural, natural), (Samples{0.0, 0.0}));
 }
 

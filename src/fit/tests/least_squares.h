@@ -9,7 +9,7 @@
 #include <utility>
 #include <vector>
 
-// Least squares from its definition, in extended precision.
+// Least squares by definition, in extended precision.
 
 namespace qx::test {
 
@@ -20,7 +20,7 @@ typedef std::vector<Samples> Rows;
 inline const double nan = std::numeric_limits<double>::quiet_NaN();
 inline const double infinity = std::numeric_limits<double>::infinity();
 
-// The inverse of a square matrix, by Gauss and Jordan's elimination with row exchanges.
+// The inverse of a square matrix, by Gauss-Jordan elimination with row exchanges.
 inline std::vector<std::vector<Long>> Inverse(std::vector<std::vector<Long>> a) {
     const std::size_t n = a.size();
     std::vector<std::vector<Long>> inverse(n, std::vector<Long>(n));
@@ -53,7 +53,7 @@ struct Solution {
     std::vector<std::vector<Long>> covariance;
 };
 
-// From the normal equations, for well-conditioned rows. `w` may be empty.
+// Solves the normal equations, for well-conditioned rows. `w` may be empty.
 inline Solution SolveNormal(const Rows &rows, const Samples &y, const Samples &w) {
     const std::size_t k = rows[0].size();
     std::vector<std::vector<Long>> normal(k, std::vector<Long>(k));

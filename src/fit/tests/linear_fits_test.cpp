@@ -15,21 +15,8 @@
 #include <map>
 #include <string>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
-using qx::test::I32Array;
-using qx::test::infinity;
-using qx::test::Long;
-using qx::test::MeanSquare;
-using qx::test::nan;
-using qx::test::Noise;
-using qx::test::Rows;
-using qx::test::Samples;
-using qx::test::Solution;
-using qx::test::SolveNormal;
-using qx::test::TestData;
 
 double RelativeError(double found, Long exact) {
     const Long error = std::fabs(found - exact);
@@ -133,7 +120,7 @@ std::map<std::string, ReferenceSet> ReferenceSets() {
     return sets;
 }
 
-// The worst coefficient.
+// The largest error of a coefficient.
 double ErrorOf(const Samples &found, const Samples &exact) {
     double worst = found.size() == exact.size() ? 0.0 : infinity;
     for (std::size_t j = 0; j < exact.size() && j < found.size(); ++j)
@@ -211,7 +198,7 @@ Problem RandomProblem(int32_t n, int32_t k, uint64_t seed) {
 }
 
 TEST(LinearFits, AllMethodsSolveTheNormalEquations) {
-    // Sizes at and across the blocks of rows that are reduced together.
+    // Sizes at and beyond the blocks of rows that are reduced together.
     for (const auto &[n, k] :
          {std::pair(1, 1), std::pair(3, 3), std::pair(20, 4), std::pair(1528, 1),
           std::pair(1537, 1), std::pair(5000, 5), std::pair(300, 60)}) {
@@ -245,7 +232,7 @@ TEST(LinearFits, AllMethodsSolveTheNormalEquations) {
     }
 }
 
-TEST(LinearFits, ColumnsOfAnySizeCostNoDigits) {
+TEST(LinearFits, ScalingOfColumnsCostsNoDigits) {
     const Problem problem = RandomProblem(100, 4, 7);
     const Solution exact = SolveNormal(problem.rows, problem.y, {});
     Rows scaled = problem.rows;
@@ -285,8 +272,8 @@ PolynomialFit FitPowersRefined(const Samples &x, const Samples &y, int32_t order
 }
 
 TEST(LinearFits, RevisionsKeepTheDigitsOfNISTsSets) {
-    // What is certified is of the decimal data, of which Norris, Pontius and Wampler2 lose digits in
-    // binary; so do the powers of Filip as a matrix.
+    // The certified values are those of the decimal data. Norris, Pontius and Wampler2 lose digits
+    // in the conversion to binary, as do the powers of Filip as a matrix.
     const std::map<std::string, double> bounds = {{"Norris", 2e-14},
                                                   {"Pontius", 1e-13},
                                                   {"Filip", 5e-8},
@@ -320,7 +307,7 @@ TEST(LinearFits, RevisionsSolveProblemsOfAnySize) {
     for (const auto &sizes : {std::pair(3, 3), std::pair(1537, 1), std::pair(300, 60)}) {
         const Problem problem = RandomProblem(sizes.first, sizes.second, 31);
         const Solution exact = SolveNormal(problem.rows, problem.y, problem.w);
-        // Rows, weights and targets of sizes at which squares overflow or vanish.
+        // Rows, weights and targets whose squares overflow or underflow.
         for (const auto &scales : {std::pair(0, 0), std::pair(-400, 380), std::pair(420, -440)}) {
             SCOPED_TRACE(std::to_string(sizes.first) + " " + std::to_string(scales.first));
             Problem scaled = problem;
@@ -361,8 +348,8 @@ TEST(LinearFits, RevisionsSolveProblemsOfAnySize) {
 }
 
 TEST(LinearFits, RevisedPolynomialsAreExact) {
-    // Integers, so that the data hold the polynomial exactly. Far from 0 the constant is what is left of
-    // terms that are 4e12 times as large.
+    // Integers, so that the data represent the polynomial exactly. Far from 0, the constant is what
+    // remains of terms that are 4e12 times as large.
     for (const double middle : {0.0, 1000.0}) {
         Samples x, y;
         for (int i = -40; i <= 40; ++i) {
@@ -409,7 +396,8 @@ TEST(LinearFits, MatricesOfLowRank) {
         twice[i][2] = 2.0 * twice[i][0];
         empty[i][1] = 0.0;
     }
-    // Cut at n eps the shortest of the solutions remains: that for one column, shared out.
+    // With the cut at n eps, the minimum-norm solution remains: the solution for one column,
+    // distributed over both.
     const GeneralFit shortest = FitRows(GenLSFit80_head, twice, problem.y, {}, 6, 1);
     Rows two = twice;
     for (Samples &row : two)
@@ -418,7 +406,7 @@ TEST(LinearFits, MatricesOfLowRank) {
     EXPECT_NEAR(shortest.c[0], static_cast<double>(exact.c[0]) / 5, 1e-14);
     EXPECT_NEAR(shortest.c[2], static_cast<double>(exact.c[0]) / 5 * 2, 1e-14);
     EXPECT_NEAR(shortest.covariance[0][0], static_cast<double>(exact.covariance[0][0]) / 25, 1e-14);
-    // A column of zeros is an exact lack of rank.
+    // A column of zeros makes the matrix exactly rank-deficient.
     for (const int32_t algorithm : {0, 6}) {
         const GeneralFit found = FitRows(GenLSFit80_head, empty, problem.y, {}, algorithm, 1);
         EXPECT_EQ(found.code, 0);
@@ -444,7 +432,7 @@ TEST(LinearFits, ChecksOfMatricesOfTerms) {
     EXPECT_EQ(code({{1, 2}}, {1}, {}, 9), ErrPolynomialOrderTooHigh);
     EXPECT_EQ(FitRows(GenLSFit80_head, {Samples(20000, 1.0)}, {1}, {}, 0, 1).code,
               ErrPolynomialOrderTooHigh)
-        << "and not for lack of memory for a covariance";
+        << "and not because the covariance needs too much memory";
     EXPECT_EQ(code(problem.rows, problem.y, {}, 7), ErrInvalidSelector);
     EXPECT_EQ(code(problem.rows, problem.y, {}, -1), ErrInvalidSelector);
     Problem broken = problem;
@@ -456,7 +444,7 @@ TEST(LinearFits, ChecksOfMatricesOfTerms) {
         EXPECT_EQ(code(broken.rows, problem.y, {}, algorithm), expected) << algorithm;
         EXPECT_EQ(code(problem.rows, problem.y, {1, 1, nan, 1, 1}, algorithm), expected);
     }
-    // A target that is not finite is no failure.
+    // A target that is not finite is not a failure.
     Samples y = problem.y;
     y[3] = nan;
     const GeneralFit lost = FitRows(GenLSFit80_head, problem.rows, y, {}, 0, 0);
@@ -516,7 +504,7 @@ TEST(LinearFits, LinesAreLeastSquares) {
         for (int32_t i = 0; i < n; ++i) {
             x.push_back(noise.symmetric() + 0.5);
             y.push_back(2.0 * x[i] - 1.0 + noise.symmetric());
-            w.push_back(noise.symmetric() * 1e100); // the size does not matter
+            w.push_back(noise.symmetric() * 1e100); // the scale does not matter
             rows.push_back({1.0, x[i]});
         }
         for (const Samples &weights : {Samples(), w}) {
@@ -530,7 +518,7 @@ TEST(LinearFits, LinesAreLeastSquares) {
             const auto mse = static_cast<double>(MeanSquare(y, weights, model));
             EXPECT_NEAR(line.mse, mse, (weights.empty() ? 1.0 : 1e100) * 1e-14);
 
-            // The same numbers without the fit, and y stays.
+            // The same coefficients without the fit, and y is unchanged.
             double slope, intercept;
             ErrorCode err = 1;
             const DBLArray data(y);
@@ -603,7 +591,7 @@ TEST(LinearFits, FixedTermsOfPolynomials) {
     EXPECT_NEAR(found.mse, static_cast<double>(MeanSquare(y, w, model)), 1e-15);
     EXPECT_NEAR(found.fit[17], static_cast<double>(model(17)), 1e-15);
 
-    // All given: nothing is solved, so the algorithm is not looked at.
+    // All terms are given: nothing is solved, so the algorithm is not checked.
     const PolynomialFit given = FitPowers({1, 2}, {1, 1}, 1, 99, {}, {1, 0}, {3.0, 2.0});
     EXPECT_EQ(given.code, 0);
     EXPECT_EQ(given.c, (Samples{2, 3}));
@@ -628,7 +616,7 @@ TEST(LinearFits, HighOrdersOfPolynomials) {
         EXPECT_EQ(capped.c[j], j < 26 ? highest.c[j] : 0.0);
     EXPECT_EQ(capped.mse, highest.mse);
 
-    // With fixed terms: among the first 26, or the first two free ones of all.
+    // With fixed terms: the free terms among the first 26, or the first two free terms of all.
     std::vector<int32_t> orders;
     for (int32_t j = 1; j < 28; ++j)
         orders.push_back(j);
@@ -664,7 +652,7 @@ TEST(LinearFits, ChecksOfPolynomials) {
     EXPECT_EQ(FitPowers(x, y, 3, 9).code, ErrPolynomialOrderTooHigh);
     EXPECT_EQ(FitPowers(x, y, std::numeric_limits<int32_t>::max(), 0).code,
               ErrPolynomialOrderTooHigh);
-    // Orders that fix nothing count all the same in the first check, and not in the second.
+    // Orders that fix nothing still count in the first check, but not in the second.
     EXPECT_EQ(FitPowers(x, y, 3, 0, {}, {9}, {0.0}).code, ErrPolynomialOrderTooHigh);
     EXPECT_EQ(FitPowers(x, y, 2, 7).code, ErrInvalidSelector);
     EXPECT_EQ(FitPowers({1, infinity, 3}, y, 1, 0).code, ErrNonFiniteInput);
@@ -741,7 +729,7 @@ double MedianOf(Samples values) {
     return values[values.size() / 2];
 }
 
-// Where it ends, the solution is that of the biweights that its own residuals give.
+// The final solution is the weighted fit with the biweights of its own residuals.
 TEST(LinearFits, BisquareFitOfTheStackLossIsAFixedPoint) {
     Rows rows;
     Samples loss, some;
@@ -827,7 +815,7 @@ TEST(LinearFits, WeightsOfRobustNorms) {
     const DBLArray exact({0, 0, 0, 0, 0, 0}), ones({1, 1, 1, 1, 1, 1});
     ASSERT_EQ(qx::LeastAbsoluteWeights(ViewOf(exact), {}, weights), 0);
     EXPECT_EQ(out[0], 1.0 / 1e-07);
-    // Without scale, or where most samples would be lost, the weights stay.
+    // If the scale is 0, or if most samples would be lost, the weights are unchanged.
     ASSERT_EQ(qx::BisquareWeights(ViewOf(exact), ViewOf(ones), ViewOf(w), 2, weights), 0);
     EXPECT_EQ(out.values(), (Samples{1, 2, 3, 1, 1, 1}));
     const DBLArray spread({-1, 1, 0.6, -1.1, 5e5, 0.9}), factors({1, 1, 2, 1, 2, 1});
@@ -839,7 +827,7 @@ TEST(LinearFits, WeightsOfRobustNorms) {
     const DBLArray broken({1, nan, 2, 1, 1, 1});
     EXPECT_EQ(qx::BisquareWeights(ViewOf(broken), ViewOf(ones), {}, 1, weights), ErrNaNInData);
     EXPECT_EQ(qx::LeastAbsoluteWeights(ViewOf(broken), {}, weights), ErrNaNInData);
-    // Leverages from 0.9999 on count as one.
+    // All leverages of 0.9999 and above are treated alike.
     DBLArray leverage({0.0, 0.75, 0.9999999, 1.0});
     qx::LeverageFactors(ViewOf(leverage), {}, {leverage.data(), 4});
     EXPECT_EQ(leverage[1], 2.0);
@@ -860,7 +848,7 @@ TEST(LinearFits, GoodnessOfFit) {
     EXPECT_EQ(rSquare, 1.0 - 2.0 / 14.0);
     EXPECT_EQ(rmse, 1.0);
     EXPECT_EQ(score({1, 2, 3, 6}, {1, 3, 3, 5}, {1, -3, 1, 4}, 1), 0);
-    EXPECT_EQ(sse, 1.0); // weights keep their signs, and the mean is the plain one
+    EXPECT_EQ(sse, 1.0); // weights keep their signs, and the mean is unweighted
     EXPECT_EQ(rSquare, 1.0 - 1.0 / (4.0 - 3.0 + 0.0 + 36.0));
     EXPECT_EQ(rmse, 1.0);
     EXPECT_EQ(score({3, 3}, {3, 3}, {}, 1), 0);
@@ -896,7 +884,7 @@ TEST(LinearFits, DampedSteps) {
     EXPECT_EQ(step({1, 1}, {2, 2, 2, 6}, {8, 16}, 1.0, &c), 0);
     EXPECT_NEAR(c[0], 1.0 + 16.0 / 11.0, 1e-15);
     EXPECT_NEAR(c[1], 1.0 + 12.0 / 11.0, 1e-15);
-    // A row of tiny elements has the pivot it needs.
+    // A row of tiny elements still provides a pivot.
     EXPECT_EQ(step({0, 0}, {1e-200, 2e-200, 1, 1}, {5e-200, 3}, 0.0, &c), 0);
     EXPECT_NEAR(c[0], 1.0, 1e-15);
     EXPECT_NEAR(c[1], 2.0, 1e-15);
@@ -909,3 +897,4 @@ TEST(LinearFits, DampedSteps) {
 }
 
 } // namespace
+} // namespace qx::test

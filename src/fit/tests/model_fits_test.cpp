@@ -10,19 +10,8 @@
 #include <functional>
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::HeapProbe;
-using qx::test::infinity;
-using qx::test::Long;
-using qx::test::MeanSquare;
-using qx::test::nan;
-using qx::test::Noise;
-using qx::test::Rows;
-using qx::test::Samples;
-using qx::test::Solution;
-using qx::test::SolveNormal;
 
 struct Fitted {
     ErrorCode code;
@@ -38,7 +27,7 @@ struct Settings {
     int32_t method = 1;
 };
 
-// Both exports of a pair: the coefficients are the same.
+// Both exports of a pair return the same coefficients.
 void ExpectSame(const Samples &p, const Samples &q, ErrorCode code, ErrorCode other) {
     EXPECT_EQ(code, other);
     for (std::size_t i = 0; i < p.size(); ++i)
@@ -140,8 +129,8 @@ Samples WeightsFor(const Samples &x) {
     return w;
 }
 
-// The fit, its values and its MSE belong together, and no step of a coefficient by some parts in a
-// million lowers the sum of squares.
+// The fit, its values and its MSE are consistent, and changing a coefficient by some parts in a
+// million does not lower the sum of squares.
 void ExpectMinimum(const Model &model, const Samples &x, const Samples &y, const Samples &w,
                    const Fitted &found, double step) {
     const auto mseAt = [&](const Samples &p) {
@@ -180,7 +169,7 @@ TEST(ModelFits, ExponentialsAndPowersAreLeastSquares) {
 }
 
 TEST(ModelFits, LineThroughLogarithms) {
-    // Weighted by w y^2, over the values that have the sign of most; zeros have none.
+    // Weighted by w y^2, over the values with the sign of the majority; zeros are left out.
     const Samples x = Evenly(25, -1.0, 2.0), w = WeightsFor(x);
     Samples y = Values(Exponential, {-1.5, 0.7}, x, 0.3);
     y[3] = 0.0;
@@ -200,7 +189,7 @@ TEST(ModelFits, LineThroughLogarithms) {
     EXPECT_NEAR(found.p[1], static_cast<double>(exact.c[1]), 1e-14);
     EXPECT_EQ(found.iterations, 123);
 
-    // The oldest exports, with standard deviations; 0 counts as 1.
+    // The oldest exports take standard deviations; 0 counts as 1.
     Samples deviations, same;
     for (std::size_t i = 0; i < x.size(); ++i) {
         deviations.push_back(i % 4);
@@ -233,15 +222,15 @@ TEST(ModelFits, LimitsOfGaussNewton) {
     const Fitted done = FitExp(x, y, {.iterations = 1000});
     EXPECT_LT(done.iterations, 20);
     EXPECT_LT(done.mse, one.mse);
-    // A floor above the MSE ends it at once, a wide tolerance soon; 0 selects 0.0001.
+    // A floor above the MSE ends the fit immediately, a wide tolerance soon; 0 selects 0.0001.
     EXPECT_EQ(FitExp(x, y, {.floor = 1.0}).iterations, 0);
     EXPECT_EQ(FitExp(x, y, {.tolerance = 0.4}).iterations, 1);
     EXPECT_EQ(FitExp(x, y, {.tolerance = 0.0}).iterations,
               FitExp(x, y, {.tolerance = 0.0001}).iterations);
     EXPECT_EQ(FitExp(x, y, {.tolerance = 0.0}).p, FitExp(x, y, {.tolerance = -1.0}).p);
 
-    // Steps that lead away are allowed in the first tenth of the limit only: on this way to the
-    // minimum there are some.
+    // Steps that increase the MSE are allowed only in the first tenth of the limit; this path to
+    // the minimum has some.
     Samples stairs(40, 0.0);
     for (int i = 0; i < 20; ++i)
         stairs[i] = 1.0;
@@ -251,7 +240,7 @@ TEST(ModelFits, LimitsOfGaussNewton) {
     EXPECT_GT(early.mse, 0.13);
     EXPECT_LT(late.mse, 0.09);
 
-    // Where a step leads away, the best parameters return.
+    // If a step increases the MSE, the best parameters are returned.
     const Samples wild = {1.0, 5.0};
     const Fitted astray = FitExp(x, y, {.guess = wild, .iterations = 0});
     const Long atGuess = MeanSquare(y, {}, [&](std::size_t i) { return Exponential(wild, x[i]); });
@@ -260,8 +249,8 @@ TEST(ModelFits, LimitsOfGaussNewton) {
     EXPECT_NEAR(near.p[0], done.p[0], 1e-6);
 }
 
-// With a small tolerance rounding ends an iteration in a cycle of steps. Its rounds are counted
-// without being made, so that a large limit costs no more than a small one.
+// With a small tolerance, rounding traps the iteration in a cycle of steps. The remaining rounds
+// are counted without being computed, so that a large limit costs no more than a small one.
 TEST(ModelFits, CyclesOfGaussNewtonCostNothing) {
     if (!HeapProbe::works())
         GTEST_SKIP();
@@ -301,7 +290,7 @@ TEST(ModelFits, Guesses) {
         EXPECT_EQ(lost.code, 0);
         EXPECT_TRUE(std::isnan(lost.p[0]) && std::isnan(lost.mse));
         EXPECT_EQ(lost.iterations, 0);
-        // A failure stands before the warning.
+        // A failure takes precedence over the warning.
         EXPECT_EQ(fit(x, {1, 2}, {.guess = {3.0}}).code, ErrSizeMismatch);
         EXPECT_EQ(fit(x, Samples(20, 0.0), {.guess = {3.0}}).code, ErrPolynomialOrderTooHigh);
     }
@@ -332,7 +321,7 @@ TEST(ModelFits, ChecksOfExponentialsAndPowers) {
     EXPECT_EQ(FitPower({1, 0, 3}, y).code, ErrNotStrictlyPositive);
     EXPECT_EQ(FitPower({1, nan, 3}, y).code, ErrNotStrictlyPositive);
     EXPECT_EQ(FitPower({1, -1, 3}, y, {.w = {0, 1, 0}}).code, ErrTooFewWeights);
-    // Data whose squares leave the range.
+    // Data whose squares overflow or underflow.
     for (const double scale : {1e-200, 1e200}) {
         const Fitted found = FitExp({0, 1}, {scale, scale * 0.5}, {.method = 0});
         EXPECT_NEAR(found.p[0] / scale, 1.0, 1e-13);
@@ -395,14 +384,14 @@ TEST(ModelFits, GaussianPeaksAreLeastSquares) {
             EXPECT_NEAR(found.p[2], 0.9, 0.1);
             ExpectMinimum(Peak, x, y, weights, found, 1e-5);
         }
-    // Where no trial is better the parameters stay, to the bit.
+    // If no trial is better, the parameters are unchanged, to the bit.
     const Samples z = Values(Peak, {2.0, 0.8, 0.9}, x, 0.05);
     const Samples best = FitPeak(x, z, {.iterations = 5000}).p;
     EXPECT_EQ(FitPeak(x, z, {.guess = best, .iterations = 0}).p, best);
     // A negative deviation is the same peak.
     const Samples y = Values(Peak, {2.0, 0.8, 0.9}, x, 0.05);
     EXPECT_EQ(FitPeak(x, y, {.guess = {2, 1, -1}}).p, FitPeak(x, y, {.guess = {2, 1, 1}}).p);
-    // Trials are counted, and never make it worse.
+    // Trials are counted, and never increase the MSE.
     double earlier = FitPeak(x, y, {.guess = {1, 0, 2}, .iterations = -1}).mse;
     for (const int32_t limit : {0, 1, 2, 5, 20}) {
         const Fitted found = FitPeak(x, y, {.guess = {1, 0, 2}, .iterations = limit});
@@ -412,8 +401,8 @@ TEST(ModelFits, GaussianPeaksAreLeastSquares) {
     }
 }
 
-// Exact peaks and dips from narrower than the distance of samples to wider than their range, in and
-// beyond it.
+// Exact peaks and dips, from narrower than the sample spacing to wider than the range, inside and
+// outside the range.
 TEST(ModelFits, TheRevisionFindsPeaksOfAnyWidth) {
     int missed = 0;
     for (const int n : {12, 40, 200})
@@ -424,7 +413,7 @@ TEST(ModelFits, TheRevisionFindsPeaksOfAnyWidth) {
                     const Samples samples = Values(Peak, truth, x, 0.0);
                     const auto isSeen = [a](double y) { return std::fabs(y / a) > 1e-3; };
                     if (std::count_if(samples.begin(), samples.end(), isSeen) < 4)
-                        continue; // it lies between the samples
+                        continue; // the peak lies between the samples
                     const DBLArray y(samples);
                     Samples p(3);
                     double mse;
@@ -461,7 +450,8 @@ TEST(ModelFits, EstimatesOfPeaks) {
     const auto estimate = [](const Samples &x, const Samples &y) {
         return FitPeak(x, y, {.iterations = -1});
     };
-    // A lone peak: through it and its nearest neighbours of the same sign, in any order of x.
+    // A single peak: the estimate passes through it and its nearest neighbours of the same sign,
+    // for any order of x.
     const Samples truth = {5.0, 0.1, 0.4}, x = {1.0, -1.0, 0.0, 3.0, -2.5};
     const Fitted lone = FitPeak(x, Values(Peak, truth, x, 0.0), {.iterations = 9});
     EXPECT_EQ(lone.code, 0);
@@ -475,7 +465,7 @@ TEST(ModelFits, EstimatesOfPeaks) {
     // A plateau.
     const Fitted plateau = estimate({0, 1, 2, 5, 6}, {0, 2, 2, 2, 0.1});
     EXPECT_EQ(plateau.p, (Samples{2.4, 3.0, 2.0}));
-    // From the logarithms; exact for samples of a peak that has one at its centre.
+    // The estimate from logarithms is exact for samples of a peak if one is at its centre.
     const Samples at = {0.0, 0.5, -0.3, 0.7};
     const Fitted exact = estimate(at, Values(Peak, {3.0, 0.0, 0.6}, at, 0.0));
     EXPECT_NEAR(exact.p[2], 0.6, 1e-15);
@@ -491,3 +481,4 @@ TEST(ModelFits, EstimatesOfPeaks) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -26,7 +26,7 @@ struct NistSet {
     std::vector<double> second; // predictor
 };
 
-// Lines that are not comments, of one file.
+// The lines of a file that are not comments.
 inline std::istringstream Uncommented(const std::string &path) {
     std::ifstream file(path);
     if (!file)
@@ -67,7 +67,7 @@ inline std::vector<NistSet> ReadNistSets(const std::string &path) {
     return sets;
 }
 
-// A number with its derivative by one parameter.
+// A number and its derivative with respect to one parameter.
 struct Dual {
     double value, slope = 0.0;
     Dual(double v) : value(v) {}
@@ -98,7 +98,7 @@ inline Dual sin(Dual a) { return {std::sin(a.value), std::cos(a.value) * a.slope
 inline Dual cos(Dual a) { return {std::cos(a.value), -std::sin(a.value) * a.slope}; }
 inline Dual atan(Dual a) { return {std::atan(a.value), a.slope / (1.0 + a.value * a.value)}; }
 
-// A model for numbers and for numbers with their derivatives, from one text.
+// A model for numbers and for dual numbers, from the same formula.
 struct NistModel {
     double (*value)(double x, double second, const double *b);
     Dual (*dual)(double x, double second, const Dual *b);
@@ -209,7 +209,7 @@ inline const std::map<std::string, NistModel> &NistModels() {
     return models;
 }
 
-// A set as the iteration takes it.
+// A set in the form that the iteration takes.
 struct NistProblem {
     const NistSet &set;
     NistModel functions;
@@ -249,7 +249,7 @@ struct NistProblem {
                   &mse);
         return {digits({p.begin(), p.end()}), mse * static_cast<double>(target.size()), iterations};
     }
-    // By the trust region, with derivatives or by differences.
+    // Fits by the trust-region method, with derivatives or by differences.
     NonlinearResult fit(int start, bool withDerivatives, std::vector<double> *parameters,
                         double tolerance = 0.0, const RealMatrix &covariance = {}) const {
         const auto values = [](const void *user, const DBL *p, DBL *out) {
@@ -297,7 +297,7 @@ struct NistProblem {
         }
         return sum;
     }
-    // The digits to which all parameters agree with the certified ones, of the 11 that there are.
+    // The number of digits, out of 11, to which all parameters agree with the certified ones.
     double digits(const std::vector<double> &p) const {
         double least = 11;
         for (std::size_t j = 0; j < p.size(); ++j) {

@@ -10,11 +10,9 @@
 #include <functional>
 #include <limits>
 
+namespace qx::test {
 namespace {
 
-using qx::FitEnd;
-using qx::test::DBLArray;
-using qx::test::Noise;
 typedef std::vector<double> Values;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -38,9 +36,9 @@ TEST(NonlinearFit, FindsTheCertifiedValues) {
     }
 }
 
-// From other starts around the answer: what is called converged has its digits, or is another
-// minimum, where no coefficient lowers the squares to either side.
-TEST(NonlinearFit, ClaimsWhatItHasFound) {
+// From other starts around the answer, a result reported as converged either has the certified
+// digits or is another minimum, where no change of a coefficient lowers the sum of squares.
+TEST(NonlinearFit, ReportsConvergenceOnlyAtMinima) {
     Noise noise(11);
     int converged = 0, elsewhere = 0;
     for (const auto &set : qx::test::ReadNistSets(qx::test::TestData("nist_nonlinear.dat"))) {
@@ -75,7 +73,7 @@ TEST(NonlinearFit, ClaimsWhatItHasFound) {
 
 typedef std::function<double(double x, const Values &p)> Model;
 const std::map<std::string, Model> models = {
-    {"decay", [](double x, const Values &p) { return p[0] * exp(-p[1] * x) + p[2]; }},
+    {"decay", [](double x, const Values &p) { return p[0] * std::exp(-p[1] * x) + p[2]; }},
     {"resonance",
      [](double x, const Values &p) {
          return p[0] / (1 + (x - p[1]) / p[2] * ((x - p[1]) / p[2])) + p[3];
@@ -84,7 +82,7 @@ const std::map<std::string, Model> models = {
     {"line", [](double x, const Values &p) { return p[0] * x + p[1]; }},
 };
 
-// A call with the model as its context.
+// A call that passes the model as its context.
 struct Fit {
     Model model;
     Values x, y, w = {}, guess, lower = {}, upper = {};
@@ -97,7 +95,7 @@ struct Fit {
     Values p = {}, residuals = {}, covariance = {};
     double cost = -1;
     int32_t reason = -1;
-    Values least = {}, most = {}; // what the model has been asked for
+    Values least = {}, most = {}; // the range of parameters at which the model was evaluated
     int calls = 0;
 
     static int32_t Evaluate(void *context, const DBL *x, int32_t xCount, const DBL *p,
@@ -142,7 +140,7 @@ Values Numbers(std::istream &in, std::size_t count) {
     return values;
 }
 
-// Losses, weights and bounds against SciPy's best of two starts.
+// Compares losses, weights and bounds with SciPy's best of two starts.
 TEST(NonlinearFit, ReachesTheLeastCost) {
     std::istringstream in = qx::test::Uncommented(qx::test::TestData("nonlinear_fits.dat"));
     int fits = 0, cut = 0;
@@ -192,8 +190,8 @@ Fit Decay(double sigma = 0.05) {
     return fit;
 }
 
-// The covariance of a line in closed form, with weights; of a fixed parameter it is 0.
-TEST(NonlinearFit, KnowsTheErrors) {
+// The covariance of a line in closed form, with weights; it is 0 for a fixed parameter.
+TEST(NonlinearFit, GivesTheErrorsOfParameters) {
     Fit fit = Decay();
     fit.model = models.at("line");
     fit.guess = {0, 0};
@@ -226,7 +224,7 @@ TEST(NonlinearFit, KnowsTheErrors) {
         Values p;
         problem.fit(1, true, &p, 0.0,
                     {covariance.data(), static_cast<int32_t>(count), static_cast<int32_t>(count)});
-        // The squares of Lanczos1 are rounding errors.
+        // The sum of squares of Lanczos1 consists of rounding errors.
         const double digits = set.name == "Lanczos1" ? 1e-2 : 1e-8;
         for (std::size_t j = 0; j < count; ++j)
             EXPECT_NEAR(std::sqrt(covariance[j * (count + 1)]), set.errors[j],
@@ -235,7 +233,7 @@ TEST(NonlinearFit, KnowsTheErrors) {
     }
 }
 
-// Units do not matter: neither those of x, y and parameters nor those of the weights.
+// Scaling of x, y, the parameters or the weights does not matter.
 TEST(NonlinearFit, KeepsItsDigitsAtAnySize) {
     const Values plain = Decay().run().p;
     for (const double size : {1e-140, 1e-30, 1e30, 1e140}) {
@@ -243,7 +241,7 @@ TEST(NonlinearFit, KeepsItsDigitsAtAnySize) {
         for (double &y : fit.y)
             y *= size;
         fit.model = [size](double x, const Values &p) {
-            return p[0] * exp(-p[1] / size * x) + p[2];
+            return p[0] * std::exp(-p[1] / size * x) + p[2];
         };
         fit.guess = {size, size, 0.1 * size};
         fit.run();
@@ -253,7 +251,7 @@ TEST(NonlinearFit, KeepsItsDigitsAtAnySize) {
     }
 }
 
-TEST(NonlinearFit, SaysWhyItEnds) {
+TEST(NonlinearFit, ReportsWhyItEnds) {
     Fit fit = Decay();
     fit.run();
     EXPECT_EQ(fit.code, 0);
@@ -266,7 +264,7 @@ TEST(NonlinearFit, SaysWhyItEnds) {
     EXPECT_EQ(fit.iterations, 2);
     EXPECT_GT(fit.cost, cost);
     EXPECT_EQ(fit.p.size(), 3U);
-    // Two parameters of which the sum alone counts, and one that does nothing, in an exact fit.
+    // Two parameters of which only the sum matters, and one without effect, in an exact fit.
     fit = Decay();
     fit.model = [](double, const Values &p) { return p[0] + p[1]; };
     fit.guess = {0, 0};
@@ -283,7 +281,7 @@ TEST(NonlinearFit, SaysWhyItEnds) {
     fit.run();
     EXPECT_EQ(fit.reason, 2);
     EXPECT_EQ(fit.cost, 0.0);
-    // Derivatives that are not those of the model.
+    // Wrong derivatives.
     fit = Decay();
     fit.jacobian = [](void *, const DBL *x, int32_t, const DBL *, int32_t, DBL *out, int32_t n) {
         for (int32_t i = 0; i < n; ++i, out += 3) {
@@ -300,7 +298,7 @@ TEST(NonlinearFit, SaysWhyItEnds) {
 
 int32_t Refuse(void *, const DBL *, int32_t, const DBL *, int32_t, DBL *, int32_t) { return 7; }
 
-TEST(NonlinearFit, RefusesWhatCannotBe) {
+TEST(NonlinearFit, RefusesInvalidArguments) {
     const auto code = [](const std::function<void(Fit &)> &change) {
         Fit fit = Decay();
         change(fit);
@@ -329,9 +327,8 @@ TEST(NonlinearFit, RefusesWhatCannotBe) {
     EXPECT_EQ(code([](Fit &fit) { fit.guess[0] = 1e200; }), ErrNonFiniteFunction);
 }
 
-// Two numbers for each sample, or none; a model that fits another one on its way; no heap but
-// scratch.
-TEST(NonlinearFit, HandsOnWhatItIsGiven) {
+// Two abscissae per sample; a model that runs another fit.
+TEST(NonlinearFit, PassesAllAbscissaeAndMayBeNested) {
     Fit plain = Decay(), pairs = Decay(), inner = Decay();
     plain.run();
     pairs.x.clear();
@@ -351,3 +348,4 @@ TEST(NonlinearFit, HandsOnWhatItIsGiven) {
 }
 
 } // namespace
+} // namespace qx::test

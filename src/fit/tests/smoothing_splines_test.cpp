@@ -8,18 +8,8 @@
 #include <cmath>
 #include <numeric>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
-using qx::test::infinity;
-using qx::test::Inverse;
-using qx::test::Long;
-using qx::test::nan;
-using qx::test::Noise;
-using qx::test::Rows;
-using qx::test::Samples;
-using qx::test::SolveNormal;
 
 typedef std::vector<std::vector<Long>> Square;
 
@@ -105,7 +95,7 @@ Exact Densely(const Data &data, Long lambda) {
     return exact;
 }
 
-TEST(SmoothingSplines, MinimiseAsTheDenseSolution) {
+TEST(SmoothingSplines, AgreeWithTheDenseSolution) {
     for (const int n : {3, 4, 9, 60}) {
         const Data data = Noisy(n);
         for (const double lambda : {1e-9, 1e-3, 1.0, 1e4}) {
@@ -153,8 +143,8 @@ TEST(SmoothingSplines, SmoothestWithinASumOfSquares) {
                     1e-13);
 }
 
-// Samples that nearly coincide count as one of their mean with the weights added, and so does the
-// trace. Formulas with differences of neighbours lose all digits here.
+// Samples that nearly coincide have the effect, also on the trace, of one sample with their mean
+// and the sum of their weights. Formulas with differences of neighbours lose all digits here.
 TEST(SmoothingSplines, CrowdedSamplesCountAsOne) {
     Data merged = Noisy(60), crowded;
     Noise noise(5);
@@ -193,7 +183,8 @@ TEST(SmoothingSplines, CrossValidationOfSamplesAtRandom) {
     double squares = 0.0;
     for (std::size_t i = 0; i < data.x.size(); ++i)
         squares += std::pow(found.values[i] - std::sin(data.x[i]), 2);
-    // Three times the share of the noise, of variance 1/3, that so many parameters take on.
+    // The bound is three times the part of the noise, of variance 1/3, that so many parameters
+    // absorb.
     EXPECT_LT(squares, found.effective);
 }
 
@@ -202,7 +193,7 @@ TEST(SmoothingSplines, CrossValidationOfThreeIsTheLine) {
     EXPECT_EQ(Smooth({1, 2, 4}, {1, 5, 2}, {}, 0, 0).lambda, infinity);
 }
 
-// Weights of very different size: no sample has more than one effective parameter.
+// Weights of very different sizes; no sample has more than one effective parameter.
 TEST(SmoothingSplines, EffectiveParametersOfUnequalDeviations) {
     Data data = Noisy(40);
     for (std::size_t i = 0; i < data.d.size(); ++i)
@@ -302,8 +293,8 @@ TEST(SmoothingSplines, LeastSquaresInTheirDefinition) {
         }
 }
 
-// What least squares leaves is orthogonal to each column, to the rounding errors of the columns and
-// y, wherever the knots lie; normal equations would fail here by the condition.
+// The residuals of least squares are orthogonal to each column, to within the rounding errors of
+// the columns and y, for any knots; normal equations would be too ill-conditioned here.
 TEST(SmoothingSplines, ResidualsAreOrthogonalForAnyKnots) {
     Noise noise(7);
     Samples x, y, w;
@@ -354,7 +345,7 @@ TEST(SmoothingSplines, LeastSquaresWithWeightsAtTheEdgesOfTheRange) {
     EXPECT_EQ(FitB(data.x, data.y, large, 3, 6).c, found.c);
 }
 
-// Quantiles among equal x are that x to the bit.
+// Quantiles among equal x equal that x to the bit.
 TEST(SmoothingSplines, KnotsAmongEqualSamples) {
     Samples x(300), y(300);
     for (int i = 0; i < 300; ++i) {
@@ -402,3 +393,4 @@ TEST(SmoothingSplines, CodesInTheirOrder) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -7,7 +7,7 @@ namespace {
 
 using qx::analysisWorkspace;
 
-// The frame of all four: an earlier failure in the record stops the chain of calls.
+// What the four exports share: an earlier failure in the record stops the chain of calls.
 template <class Operation>
 int32_t RunStep(WorkspaceStatus *status, Operation operation) {
     if (status->status != 0)
@@ -21,7 +21,7 @@ int32_t RunStep(WorkspaceStatus *status, Operation operation) {
 
 ErrorCode SetEnabled(bool enable) {
     const ErrorCode result = analysisWorkspace.setEnabled(enable);
-    // kept: the failure means that there is no region, so nothing is given back here
+    // kept: this failure means that there is no region, so this call gives nothing back
     if (result < 0)
         analysisWorkspace.giveBack();
     return result;

@@ -9,7 +9,7 @@
 #include <sys/wait.h>
 #endif
 
-// Where the module finds its host: each case in a process of its own.
+// Where the module finds its host; each case runs in a separate process.
 
 namespace {
 
@@ -64,7 +64,7 @@ TEST(Binding, WithoutAHostTheProcessEnds) {
     EXPECT_EQ(nowhere.exitCode, 1);
     EXPECT_EQ(nowhere.text, "Fatal Error: dataloom.lib was not called from a Dataloom process.\n");
 
-    // A host that lacks the function is not passed over for one that has it.
+    // A host that lacks the function is not skipped in favour of one that has it.
     const std::string missing =
         "Fatal Error: dataloom.lib could not locate \"HostRegisterSweep\".\n";
     for (const std::string &arguments : {std::string(), Library("qxrt")}) {

@@ -7,23 +7,8 @@
 #include <bit>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::ElementType;
-using qx::In;
-using qx::InErr;
-using qx::InErrWithHost;
-using qx::InOut;
-using qx::OnFailure;
-using qx::Out;
-using qx::Outcome;
-using qx::Returned;
-using qx::ReturnedWithHost;
-using qx::test::CDBMatrix;
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
-using qx::test::I32Array;
-using qx::test::Reshape;
 
 static_assert(sizeof(WorkspaceStatus) == 5);
 static_assert(offsetof(WorkspaceStatus, code) == 1);
@@ -31,7 +16,7 @@ static_assert(offsetof(WorkspaceStatus, code) == 1);
 constexpr int32_t hostRefusal = 77;
 constexpr uint64_t quietNaN = 0x7FF8000000000000;
 
-TEST(Frame, ElementsStandAtFourAndEight) {
+TEST(Frame, ElementsBeginAtFourAndEight) {
     const DBLArray x(5);
     const auto distance = [](const void *element, const void *block) {
         return static_cast<const char *>(element) - static_cast<const char *>(block);
@@ -60,7 +45,7 @@ TEST(Frame, ViewsFollowABlockThatMoves) {
     EXPECT_EQ(m.rows(), 1);
 }
 
-// A body with outputs of each kind, as far as it is told to go.
+// A body with outputs of each kind that stops at the given step.
 struct Outputs {
     DBLArray x{1.0, 2.0, 3.0};
     I32Array i = I32Array(3);
@@ -123,21 +108,21 @@ TEST(Frame, AFailureSettlesEveryOutputInOrderAndWarningsLeaveThem) {
     const Outputs outputs;
     qx::test::ResetHost(4, hostRefusal);
     EXPECT_EQ(outputs.call(returned, 5, -20061), -20061);
-    // The third is told another element than its own; the fourth is refused and emptied all the
-    // same; the kept one is not asked for.
+    // The third resize uses an element type that differs from that of its array; the fourth is
+    // refused, but the array is emptied nevertheless; the kept array is not resized.
     EXPECT_EQ(qx::test::Host().reshapes,
               (std::vector<Reshape>{{10, 1, 5}, {3, 1, 5}, {13, 1, 0}, {3, 1, 0}, {13, 2, 0}}));
     outputs.expectSettled();
     qx::test::ResetHost();
 }
 
-TEST(Frame, EachEndingTellsCodesAndTheHostsStatusInItsWay) {
+TEST(Frame, EachEndingReturnsCodesAndTheHostsStatusInItsWay) {
     ErrorCode err = 0;
     const auto inErr = [&err](auto &&...call) { return InErr(&err, call...); };
     const auto inErrWithHost = [&err](auto &&...call) { return InErrWithHost(&err, call...); };
     const auto expect = [&err](auto ending, ErrorCode status, bool isRefused, int32_t result,
                                ErrorCode code) {
-        // A positive status of the host is a refusal like any other.
+        // A positive status of the host is also a refusal.
         qx::test::ResetHost(isRefused ? 2 : 0, hostRefusal);
         err = 12345;
         const Outputs outputs;
@@ -158,7 +143,7 @@ TEST(Frame, EachEndingTellsCodesAndTheHostsStatusInItsWay) {
     expect(inErrWithHost, 0, true, hostRefusal, ErrOutOfMemory);
 }
 
-// Running sums of x into y, with the first element of z in front.
+// Running sums of x into y, which begin with the first element of z.
 ErrorCode Sums(In<DBL1D> x, In<DBL1D> z, Out<DBL1D> y) {
     const int32_t n = x.size();
     if (const Outcome bad = y.resize(n + 1))
@@ -176,7 +161,7 @@ TEST(Frame, AnInputThatIsAnOutputIsReadFromACopy) {
     EXPECT_EQ(x.values(), (std::vector<double>{10, 11, 13, 16}));
     EXPECT_EQ(returned(Sums, x.handle(), x.handle(), x.handle()), 0);
     EXPECT_EQ(x.values(), (std::vector<double>{10, 20, 31, 44, 60}));
-    // What is read and written by intention is the array itself.
+    // An array that is declared as read and written is not copied.
     const auto twice = [](InOut<DBL1D> a) -> ErrorCode {
         a.data()[0] *= 2;
         return 0;
@@ -185,7 +170,7 @@ TEST(Frame, AnInputThatIsAnOutputIsReadFromACopy) {
     EXPECT_EQ(z[0], 20);
 }
 
-// A record of the caller's with an array to read and one to write; it may lack either.
+// A record of the caller with an array to read and one to write, either of which may be missing.
 struct Pair {
     DBL1D read;
     DBL1D written;
@@ -203,7 +188,7 @@ public:
     Out<DBL1D> written;
 };
 
-TEST(Frame, TwoOutputsThatAreOneAreRefusedAndRecordsSeenThrough) {
+TEST(Frame, OneArrayAsTwoOutputsIsRefusedAlsoWithinRecords) {
     int bodies = 0;
     const auto body = [&bodies](InOutPair pair, InOut<DBL1D> x, qx::OutDBL,
                                 Out<DBL1D> y) -> Outcome {
@@ -224,7 +209,8 @@ TEST(Frame, TwoOutputsThatAreOneAreRefusedAndRecordsSeenThrough) {
     EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, a.handle()), 0);
     EXPECT_EQ(a.values(), (std::vector<double>{1, 3})) << "read from a copy";
     pair = {nullptr, nullptr};
-    EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, y.handle()), 0) << "no arrays, none met";
+    EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, y.handle()), 0)
+        << "no arrays, so none coincide";
     EXPECT_EQ(bodies, 3);
 
     pair = {a.handle(), b.handle()};
@@ -237,7 +223,7 @@ TEST(Frame, TwoOutputsThatAreOneAreRefusedAndRecordsSeenThrough) {
     EXPECT_EQ(bodies, 3) << "the body has not run";
 }
 
-TEST(Frame, AnInputThatIsSpoiledIsSpoiledInItsCopyWhereItIsTheOutput) {
+TEST(Frame, ASpoiledInputIsSpoiledInItsCopyIfItIsTheOutput) {
     const auto body = [](qx::Spoiled<DBL2D> in, Out<DBL2D> out) -> Outcome {
         if (const Outcome bad = out.resize(in.rows(), in.cols()))
             return bad;
@@ -256,7 +242,7 @@ TEST(Frame, AnInputThatIsSpoiledIsSpoiledInItsCopyWhereItIsTheOutput) {
     EXPECT_EQ(returned(body, b.handle(), b.handle()), 0);
     EXPECT_EQ(b.values(), (std::vector<double>{2, 3, 4, 5, 6, 7}));
 
-    // An array that says a negative size is empty and has nothing to copy.
+    // An array that claims a negative size is empty, so there is nothing to copy.
     const auto sizeOf = [](In<DBL1D> in, Out<DBL1D>) -> ErrorCode {
         return in.hasNegativeSize() && in.isEmpty() && in.size() == 0 ? -1 : 0;
     };
@@ -308,3 +294,4 @@ TEST(WorkspaceExports, ReportIntoTheRecordOfTheirCaller) {
 }
 
 } // namespace
+} // namespace qx::test

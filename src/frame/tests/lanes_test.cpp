@@ -11,7 +11,7 @@ namespace {
 
 using qx::Lanes;
 
-// Memory at 4 modulo 16, where the host's elements stand.
+// Memory at 4 modulo 16, where the host's elements begin.
 struct Offset {
     static constexpr int elements = 64;
     alignas(16) unsigned char bytes[4 + 8 * elements];

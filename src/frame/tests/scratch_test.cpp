@@ -18,7 +18,7 @@ namespace {
 using qx::AnalysisWorkspace;
 using qx::analysisWorkspace;
 
-constexpr int32_t overhead = 17; // of a scratch request in the region
+constexpr int32_t overhead = 17; // of a scratch request in the region, in bytes
 
 int32_t ModeOf(const void *block) {
     int32_t mode;
@@ -32,7 +32,7 @@ int32_t TotalSizeOf(const void *block) {
     return size;
 }
 
-// A region that is there and enabled while the scope lasts.
+// A region that exists and is enabled during the lifetime of this object.
 class EnabledRegion {
 public:
     explicit EnabledRegion(uint32_t size) {
@@ -66,9 +66,9 @@ TEST(Scratch, SizesThatInt32CannotHoldAreRefused) {
     EXPECT_EQ(complexes.resize(most / 16 + 1), ErrOutOfMemory);
 }
 
-// The first request of the process latches the default mode; before the attach that is the plain
-// heap. The owner lock took its memory then, so this program has seen mode 3 already.
-TEST(Scratch, BlocksGoBackToWhereTheyCameFrom) {
+// The first request of the process fixes the default mode; before the attach that is the plain heap
+// (mode 3). The owner lock took its memory at that time, so mode 3 is already in use here.
+TEST(Scratch, BlocksReturnToTheirSource) {
     void *beforeAttach = qx::ScratchAllocPointer(10);
     EXPECT_EQ(ModeOf(beforeAttach), 3);
     qx::AttachScratchHeap();
@@ -103,7 +103,7 @@ TEST(Scratch, PartsAreTakenTogetherOrNotAtAll) {
     I32 *indices = nullptr;
     uint8_t *flags = nullptr;
     qx::ScratchParts memory;
-    // In one block, and in one each: 32 rows are below eight mebibytes, 3000 are above.
+    // In one block, or in a block for each part: 32 rows need less than eight mebibytes, 3000 more.
     for (const int32_t rows : {32, 3000}) {
         ASSERT_EQ(memory.take(qx::Sized(flags, 5), qx::Sized(x, 3), qx::Sized(z, rows, 200),
                               qx::Sized(indices, 7)),
@@ -123,7 +123,7 @@ TEST(Scratch, PartsAreTakenTogetherOrNotAtAll) {
         EXPECT_EQ(z(rows - 1, 199).im + z(0, 0).re, 6.0);
         EXPECT_EQ(indices[0] + indices[6], 8);
     }
-    // The last part has no room: what came before it goes back, and no place is set.
+    // If the last part does not fit, the parts before it are released, and no pointer is set.
     const double *const before = x.data();
     EXPECT_EQ(memory.take(qx::Sized(x, 1 << 18), qx::Sized(flags, int64_t{1} << 31)),
               ErrOutOfMemory);
@@ -150,8 +150,8 @@ TEST(Scratch, ABlockMovesGrowsAndShrinksWithItsContent) {
         first[0] = 7;
         second = std::move(first);
         EXPECT_EQ(+second[0], 7);
-        // A failure gives the block up, once, wherever it lies.
-        EXPECT_EQ(second.resize(10000), ErrOutOfMemory) << "more than the region has";
+        // A failure releases the block, exactly once, wherever it is.
+        EXPECT_EQ(second.resize(10000), ErrOutOfMemory) << "more than the size of the region";
         EXPECT_EQ(second.data(), nullptr);
         EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
     }
@@ -175,7 +175,7 @@ TEST(Workspace, CapacityIsExactToTheByte) {
         EXPECT_EQ(block != nullptr, fits) << regionSize << " " << request;
         qx::ScratchFree(block);
     }
-    // The same bound for a sequence: every block costs its size and the overhead.
+    // The same bound for a sequence: every block takes its size plus the overhead.
     const EnabledRegion region(3 * (100 + overhead) + 1);
     std::vector<void *> blocks;
     while (void *block = qx::ScratchAllocPointer(100))
@@ -185,12 +185,12 @@ TEST(Workspace, CapacityIsExactToTheByte) {
         qx::ScratchFree(block);
 }
 
-TEST(Workspace, ExhaustionLastsUntilTheLastLiveBlockGoes) {
+TEST(Workspace, ExhaustionLastsUntilTheLastLiveBlockIsReleased) {
     const EnabledRegion region(200);
     void *first = qx::ScratchAllocPointer(10);
     void *second = qx::ScratchAllocPointer(10);
     EXPECT_EQ(qx::ScratchAllocPointer(200), nullptr);
-    EXPECT_EQ(qx::ScratchAllocPointer(1), nullptr) << "full although bytes are left";
+    EXPECT_EQ(qx::ScratchAllocPointer(1), nullptr) << "refused although bytes are left";
     EXPECT_EQ(analysisWorkspace.liveBlocks(), 2) << "a refused request is not counted";
     qx::ScratchFree(second);
     EXPECT_EQ(qx::ScratchAllocPointer(1), nullptr);
@@ -203,13 +203,13 @@ TEST(Workspace, ExhaustionLastsUntilTheLastLiveBlockGoes) {
     void *payload = &payload;
     EXPECT_EQ(analysisWorkspace.allocate(1000, &payload), ErrWorkspaceExhausted);
     EXPECT_EQ(payload, nullptr);
-    // No live block is to go, so the region is empty again at once.
+    // There is no live block, so the region is empty again immediately.
     void *afterRefusal = qx::ScratchAllocPointer(10);
     EXPECT_EQ(afterRefusal, first);
     qx::ScratchFree(afterRefusal);
 }
 
-TEST(Workspace, ReleasesInAnyOrderGiveEverythingBack) {
+TEST(Workspace, ReleasesInAnyOrderFreeTheWholeRegion) {
     constexpr int count = 6;
     std::vector<int> order(count);
     for (int i = 0; i < count; ++i)
@@ -226,8 +226,9 @@ TEST(Workspace, ReleasesInAnyOrderGiveEverythingBack) {
         for (int i : order) {
             qx::ScratchFree(blocks[static_cast<std::size_t>(i)]);
             released[static_cast<std::size_t>(i)] = true;
-            // Bytes come back when the released blocks reach the end. A run is known only to
-            // the block right behind it at the time, so what lies between may stay longer.
+            // Bytes become free when the released blocks reach the end. A run of released blocks is
+            // known only to the block directly after it at that time, so blocks in between may stay
+            // longer.
             const bool lastIsFree = released[count - 1];
             EXPECT_EQ(Bump() < full, lastIsFree);
             if (i == count - 1) {
@@ -247,7 +248,7 @@ TEST(Workspace, ReleasesInAnyOrderGiveEverythingBack) {
     } while (std::next_permutation(order.begin(), order.end()));
 }
 
-TEST(Workspace, ForwardAndReverseReleasesFallBackOverTheWholeRun) {
+TEST(Workspace, ForwardAndReverseReleasesFreeTheWholeRun) {
     const EnabledRegion region(1000);
     void *keep = qx::ScratchAllocPointer(1);
     const uint32_t start = Bump();
@@ -286,16 +287,16 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
         void *const first = block;
         ASSERT_EQ(qx::ScratchRealloc(&block, 24), 0);
         if (inRegion) {
-            EXPECT_EQ(block, first) << "a smaller block stays";
+            EXPECT_EQ(block, first) << "a smaller block is not moved";
             ASSERT_EQ(qx::ScratchRealloc(&block, 40), 0);
-            EXPECT_EQ(block, first) << "and one of its first size";
+            EXPECT_EQ(block, first) << "nor is one of its original size";
         }
         ASSERT_EQ(qx::ScratchRealloc(&block, 100), 0);
         EXPECT_TRUE(matches(block, 24));
-        EXPECT_EQ(TotalSizeOf(block), 48) << "stays that of the first request";
+        EXPECT_EQ(TotalSizeOf(block), 48) << "keeps the size of the first request";
         fill(block, 100);
 
-        // A move to another source copies no more than the stale size says.
+        // A move to another source copies no more than the stale size.
         analysisWorkspace.setEnabled(!inRegion);
         ASSERT_EQ(qx::ScratchRealloc(&block, 200), 0);
         EXPECT_EQ(ModeOf(block), inRegion ? 1 : 2);
@@ -306,7 +307,7 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
         EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
     }
 
-    // A move takes over the first size or the new one, whichever is less, and not a byte more.
+    // A move copies the first size or the new one, whichever is smaller, and not a byte more.
     struct Move {
         int32_t first, then, last, moved;
     };
@@ -314,7 +315,7 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
         for (const bool intoRegion : {false, true}) {
             analysisWorkspace.setEnabled(true);
             void *block = qx::ScratchAllocPointer(300);
-            std::memset(block, 0xEE, 300); // what the region's next block finds
+            std::memset(block, 0xEE, 300); // the content that the region's next block finds
             qx::ScratchFree(block);
             analysisWorkspace.setEnabled(!intoRegion);
             block = qx::ScratchAllocPointer(move.first);
@@ -328,7 +329,7 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
             qx::ScratchFree(block);
         }
 
-    // A resize that the region cannot serve has lost the old block.
+    // A resize that the region cannot serve loses the old block.
     analysisWorkspace.setEnabled(true);
     void *block = qx::ScratchAllocPointer(10);
     EXPECT_EQ(qx::ScratchRealloc(&block, 2000), ErrOutOfMemory);
@@ -344,15 +345,21 @@ TEST(Workspace, SweepEndsARunThatWasAborted) {
     void *leftBehind = qx::ScratchAllocPointer(10);
     EXPECT_NE(leftBehind, nullptr);
     EXPECT_EQ(analysisWorkspace.giveBack(), ErrWorkspaceStillInUse);
+    // The block of a second thread is in a unit outside the stack.
+    std::thread([] { EXPECT_NE(qx::ScratchAllocPointer(1), nullptr); }).join();
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 2);
     qx::test::RunSweeps();
     EXPECT_EQ(analysisWorkspace.liveBlocks(), -1);
     EXPECT_FALSE(analysisWorkspace.isEnabled());
     EXPECT_EQ(qx::test::RegisteredSweeps(), before);
     EXPECT_EQ(analysisWorkspace.giveBack(), 0);
+    ASSERT_EQ(analysisWorkspace.reserve(1000), 0);
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 0) << "nothing remains of the swept region";
+    EXPECT_EQ(analysisWorkspace.giveBack(), 0);
 }
 
-// Threads allocate, release in random order and resize; every block is filled with a pattern of
-// its own, so an overlap of two live blocks or a lost byte shows.
+// Threads allocate, release in random order and resize; every block is filled with a unique
+// pattern, so that an overlap of two live blocks or a lost byte is detected.
 TEST(Workspace, ThreadsNeverShareAByte) {
     constexpr int threads = 8;
     constexpr int rounds = 60000;
@@ -379,7 +386,7 @@ TEST(Workspace, ThreadsNeverShareAByte) {
         };
         for (int round = 0; round < rounds; ++round) {
             const auto act = random() % 8;
-            if (round % 64 == 63) { // an analysis ends: all goes, in one order or the other
+            if (round % 64 == 63) { // an analysis ends: all blocks are released, in either order
                 if (act % 2 == 0)
                     std::reverse(held.begin(), held.end());
                 for (const Held &h : held) {
@@ -432,12 +439,12 @@ TEST(Workspace, ThreadsNeverShareAByte) {
     EXPECT_EQ(faults, 0);
     EXPECT_EQ(Bump(), 0U);
     EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
-    // A refusal is possible while dead runs lie between live blocks, but it must stay rare.
+    // A refusal is possible while released runs lie between live blocks, but it must be rare.
     EXPECT_LT(refusals, threads * rounds / 100);
 }
 
-// One thread's blocks of the scratch front: allocates, checks and releases at random, each block
-// filled with a pattern of its own.
+// The scratch blocks of one thread: allocates, checks and releases at random, with a unique pattern
+// in each block.
 class Churn {
 public:
     Churn(unsigned seed, std::size_t most, int32_t largest)
@@ -496,8 +503,8 @@ void RunThreads(int threads, const std::function<void(int)> &work) {
         thread.join();
 }
 
-// Blocks that live side by side for ever, never all gone at once, in a region four times their
-// size: ten million requests and not one refusal.
+// Blocks come and go without ever all being released, in a region four times their size: ten million
+// requests and not one refusal.
 TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
     constexpr int threads = 8;
     const EnabledRegion region(1 << 20);
@@ -508,7 +515,7 @@ TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
     for (const Size size : {Size{2, 400}, Size{8, 4000}}) {
         std::atomic<int> refusals = 0;
         std::atomic<int> faults = 0;
-        std::barrier start(threads); // a thread that is alone so far follows the rule of one
+        std::barrier start(threads); // a thread that is alone follows the single-thread rule
         RunThreads(threads, [&](int seed) {
             Churn churn(static_cast<unsigned>(seed), static_cast<std::size_t>(size.blocks),
                         size.largest);
@@ -530,9 +537,9 @@ TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
     qx::ScratchFree(all);
 }
 
-// Regions of changing sizes come and go, enabled and disabled by some threads, under the blocks of
-// others. No block is lost or shared, and in the end nothing is left.
-TEST(Workspace, MayBeGivenBackWhileOthersWork) {
+// Some threads reserve and release regions of changing sizes, and enable and disable them, while
+// others use blocks. No block is lost or shared, and in the end nothing is left.
+TEST(Workspace, MayBeReleasedWhileOtherThreadsWork) {
     constexpr int rounds = 1000000 / 8;
     const int sweeps = qx::test::RegisteredSweeps();
     std::atomic<int> faults = 0;
@@ -570,7 +577,7 @@ TEST(Workspace, MayBeGivenBackWhileOthersWork) {
     });
     EXPECT_EQ(faults, 0);
     EXPECT_EQ(unexpected, 0);
-    EXPECT_GT(served, 0) << "the region was never enabled beside a request";
+    EXPECT_GT(served, 0) << "the region was never enabled during a request";
     analysisWorkspace.setEnabled(false);
     EXPECT_EQ(analysisWorkspace.giveBack(), 0);
     EXPECT_EQ(analysisWorkspace.liveBlocks(), -1);

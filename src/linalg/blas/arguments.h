@@ -8,7 +8,7 @@
 
 namespace qx::blas {
 
-// What the routines of BLAS read of their arguments.
+// How the BLAS routines read their arguments.
 
 inline bool Is(const char *option, char letter) {
     return *option == letter || *option == letter + 32;
@@ -17,7 +17,7 @@ inline bool Is(const char *option, char letter) {
 inline bool IsReal(double a, double value) { return a == value; }
 inline bool IsReal(CDB a, double value) { return a.re == value && a.im == 0.0; }
 
-// A vector with an increment; with a negative one its first element stands last.
+// A vector with an increment; if it is negative, the first element is the last in memory.
 template <ElementType E>
 struct Strided {
     ElementOf<E> *data;
@@ -27,9 +27,14 @@ struct Strided {
         : data(const_cast<ElementOf<E> *>(x) + (increment < 0 ? (1 - n) * increment : 0)),
           step(increment) {}
     ElementOf<E> &operator[](std::ptrdiff_t i) const { return data[i * step]; }
+    Strided from(std::ptrdiff_t i) const {
+        Strided rest = *this;
+        rest.data += i * step;
+        return rest;
+    }
 };
 
-// x[i] = factor x[i]; a factor of 0 does not read x, one of 1 changes nothing.
+// x[i] = factor x[i]; a factor of 0 does not read x, and a factor of 1 changes nothing.
 template <ElementType E>
 void Scale(const Strided<E> &x, std::ptrdiff_t n, typename ScalarOf<E>::type factor) {
     if (IsReal(factor, 1.0))

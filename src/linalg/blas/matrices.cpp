@@ -11,7 +11,7 @@ namespace {
 
 constexpr auto Real = ElementType::DBL, Complex = ElementType::CDB;
 
-// A matrix as a product takes it: element (i, j) is data[i * down + j * across].
+// A matrix as the products take it: element (i, j) is data[i * down + j * across].
 template <ElementType E>
 struct Operand {
     const ElementOf<E> *data;
@@ -28,7 +28,7 @@ struct Operand {
     }
 };
 
-// op(a), a being column after column.
+// op(a), where a is stored column by column.
 template <ElementType E>
 Operand<E> Operated(const char *trans, const ElementOf<E> *a, std::ptrdiff_t lda) {
     if (Is(trans, 'N'))
@@ -36,7 +36,7 @@ Operand<E> Operated(const char *trans, const ElementOf<E> *a, std::ptrdiff_t lda
     return {a, lda, 1, E == Complex && Is(trans, 'C')};
 }
 
-// c += factor a b, c being row after row.
+// c += factor a b, where c is stored row by row.
 void AddProductOf(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, double factor,
                   const Operand<Real> &a, const Operand<Real> &b, DBL *c, std::ptrdiff_t stride) {
     AddProductReal(m, n, k, {factor}, {a.data, a.down, a.across}, {b.data, b.down, b.across}, c,
@@ -64,8 +64,78 @@ void MatrixMatrix(const char *transA, const char *transB, std::ptrdiff_t m, std:
                      Operated<E>(transA, a, lda).transposed(), c, ldc);
 }
 
-// A triangular factor acts on the lines of b: its columns, where it stands on the right, else its
-// rows. To line i come multiples of the lines before it, or of those after it.
+// One triangle of c = alpha a b^H + conj(alpha) b a^H + beta c, by blocks of columns: the rectangle of a
+// block by products in place, its triangle by products into a copy of the square block.
+template <ElementType E>
+class RankTwoUpdate {
+public:
+    typedef typename ScalarOf<E>::type Scalar;
+
+    RankTwoUpdate(const char *trans, std::ptrdiff_t k, Scalar alpha, const ElementOf<E> *a,
+                  std::ptrdiff_t lda, const ElementOf<E> *b, std::ptrdiff_t ldb)
+        : k_(k), alpha_(alpha), a_(Operated<E>(trans, a, lda)), b_(Operated<E>(trans, b, ldb)) {}
+
+    void add(bool isLower, std::ptrdiff_t n, ElementOf<E> *c, std::ptrdiff_t ldc) const {
+        ElementOf<E> block[blockCols * blockCols];
+        for (std::ptrdiff_t j = 0; j < n; j += blockCols) {
+            const std::ptrdiff_t cols = std::min(blockCols, n - j), end = j + cols;
+            ElementOf<E> *const triangle = c + j + j * ldc;
+            CopyTriangle(isLower, cols, triangle, ldc, block, blockCols);
+            addRectangle(j, cols, j, cols, block, blockCols);
+            CopyTriangle(isLower, cols, block, blockCols, triangle, ldc);
+            for (std::ptrdiff_t i = 0; E == Complex && i < cols; ++i)
+                triangle[i + i * ldc] = ScalarOf<E>::Of(RealPart(triangle[i + i * ldc]));
+            const std::ptrdiff_t first = isLower ? end : 0;
+            addRectangle(first, isLower ? n - end : j, j, cols, c + first + j * ldc, ldc);
+        }
+    }
+
+private:
+    static constexpr std::ptrdiff_t blockCols = 64;
+
+    static void CopyTriangle(bool isLower, std::ptrdiff_t n, const ElementOf<E> *from,
+                             std::ptrdiff_t fromStride, ElementOf<E> *to, std::ptrdiff_t toStride) {
+        for (std::ptrdiff_t j = 0; j < n; ++j)
+            for (std::ptrdiff_t i = isLower ? j : 0; i < (isLower ? n : j + 1); ++i)
+                to[i + j * toStride] = from[i + j * fromStride];
+    }
+
+    // The elements of c from row i and column j on, which are the columns and rows of its transpose.
+    void addRectangle(std::ptrdiff_t i, std::ptrdiff_t rows, std::ptrdiff_t j, std::ptrdiff_t cols,
+                      ElementOf<E> *c, std::ptrdiff_t ldc) const {
+        if (rows <= 0)
+            return;
+        AddProductOf(cols, rows, k_, alpha_, Adjoint(b_.from(j, 0)), a_.from(i, 0).transposed(), c,
+                     ldc);
+        AddProductOf(cols, rows, k_, Conj(alpha_), Adjoint(a_.from(j, 0)),
+                     b_.from(i, 0).transposed(), c, ldc);
+    }
+    static Operand<E> Adjoint(Operand<E> a) {
+        a.isConjugated = E == Complex && !a.isConjugated;
+        return a;
+    }
+
+    std::ptrdiff_t k_;
+    Scalar alpha_;
+    Operand<E> a_, b_;
+};
+
+template <ElementType E>
+void AddRankTwo(const char *uplo, const char *trans, std::ptrdiff_t n, std::ptrdiff_t k,
+                typename ScalarOf<E>::type alpha, const ElementOf<E> *a, std::ptrdiff_t lda,
+                const ElementOf<E> *b, std::ptrdiff_t ldb, double beta, ElementOf<E> *c,
+                std::ptrdiff_t ldc) {
+    const bool isLower = Is(uplo, 'L');
+    for (std::ptrdiff_t j = 0; j < n; ++j) {
+        const std::ptrdiff_t first = isLower ? j : 0, rows = isLower ? n - j : j + 1;
+        Scale<E>({c + first + j * ldc, rows, 1}, rows, ScalarOf<E>::Of(beta));
+    }
+    if (n > 0 && k > 0 && !IsReal(alpha, 0.0))
+        RankTwoUpdate<E>(trans, k, alpha, a, lda, b, ldb).add(isLower, n, c, ldc);
+}
+
+// A triangular factor acts on the lines of b: its columns if the factor is on the right, otherwise
+// its rows. Multiples of the lines before line i, or of those after it, are added to line i.
 template <ElementType E>
 class TriangularFactor {
 public:
@@ -95,9 +165,9 @@ public:
 
 private:
     typedef typename ScalarOf<E>::type Scalar;
-    // Lines of a block meet each other here, those of different blocks in products.
+    // Lines of one block are combined here, those of different blocks by products.
     static constexpr std::ptrdiff_t blockLines = 64;
-    // As much of them at once, of rows in a copy.
+    // This many elements of each line are processed at once; rows are processed in a copy.
     static constexpr std::ptrdiff_t chunk = 32;
 
     template <class Action>
@@ -109,7 +179,7 @@ private:
         }
     }
 
-    // Adds `sign` times what the lines of other blocks give to those of this one.
+    // Adds `sign` times the contributions of the lines of other blocks to those of this one.
     void fromOtherBlocks(std::ptrdiff_t first, std::ptrdiff_t end, double sign) {
         const std::ptrdiff_t source = takesBefore_ ? 0 : end;
         const std::ptrdiff_t terms = takesBefore_ ? first : count_ - end;
@@ -147,7 +217,7 @@ private:
         }
     }
 
-    // The lines of a block, `stride` elements apart.
+    // Multiplies or solves within a block, whose lines are `stride` elements apart.
     template <bool Solve>
     void withinChunk(std::ptrdiff_t first, std::ptrdiff_t lines, ElementOf<E> *b,
                      std::ptrdiff_t stride, std::ptrdiff_t width) {
@@ -204,7 +274,8 @@ void Triangular(const char *side, const char *uplo, const char *trans, const cha
 
 } // namespace qx::blas
 
-using qx::blas::Complex, qx::blas::MatrixMatrix, qx::blas::Real, qx::blas::Triangular;
+using qx::blas::AddRankTwo, qx::blas::Complex, qx::blas::MatrixMatrix, qx::blas::Real,
+    qx::blas::Triangular;
 
 void dgemm_(const char *transA, const char *transB, const int32_t *m, const int32_t *n,
             const int32_t *k, const DBL *alpha, const DBL *a, const int32_t *lda, const DBL *b,
@@ -217,6 +288,17 @@ void zgemm_(const char *transA, const char *transB, const int32_t *m, const int3
             const int32_t *ldb, const CDB *beta, CDB *c, const int32_t *ldc, std::size_t,
             std::size_t) {
     MatrixMatrix<Complex>(transA, transB, *m, *n, *k, *alpha, a, *lda, b, *ldb, *beta, c, *ldc);
+}
+
+void dsyr2k_(const char *uplo, const char *trans, const int32_t *n, const int32_t *k,
+             const DBL *alpha, const DBL *a, const int32_t *lda, const DBL *b, const int32_t *ldb,
+             const DBL *beta, DBL *c, const int32_t *ldc, std::size_t, std::size_t) {
+    AddRankTwo<Real>(uplo, trans, *n, *k, *alpha, a, *lda, b, *ldb, *beta, c, *ldc);
+}
+void zher2k_(const char *uplo, const char *trans, const int32_t *n, const int32_t *k,
+             const CDB *alpha, const CDB *a, const int32_t *lda, const CDB *b, const int32_t *ldb,
+             const DBL *beta, CDB *c, const int32_t *ldc, std::size_t, std::size_t) {
+    AddRankTwo<Complex>(uplo, trans, *n, *k, *alpha, a, *lda, b, *ldb, *beta, c, *ldc);
 }
 
 void dtrmm_(const char *side, const char *uplo, const char *trans, const char *diag,

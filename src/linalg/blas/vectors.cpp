@@ -10,18 +10,20 @@ namespace {
 
 constexpr auto Real = ElementType::DBL, Complex = ElementType::CDB;
 
-// As much of a vector as is copied at once, and as many of the columns as are passed in one go.
+// The number of elements of a vector that are copied at once, and of columns that are passed in one
+// call.
 constexpr std::ptrdiff_t chunkRows = 512;
 constexpr std::ptrdiff_t chunkCols = 64;
 
-// The rows from i on of a matrix's columns from j on; a view has rows where we have columns.
+// The rows from i on of a matrix's columns from j on; the rows of the view are the columns of the
+// matrix.
 template <ElementType E>
 ConstMatrixView<E> Columns(const ElementOf<E> *a, std::ptrdiff_t lda, std::ptrdiff_t i,
                            std::ptrdiff_t rows, std::ptrdiff_t j, std::ptrdiff_t cols) {
     return {a + i + j * lda, static_cast<int32_t>(cols), static_cast<int32_t>(rows), lda};
 }
 
-// y += a x, the columns one after the other.
+// y += alpha a x, column by column.
 template <ElementType E>
 void AddByColumns(std::ptrdiff_t m, std::ptrdiff_t n, typename ScalarOf<E>::type alpha,
                   const ElementOf<E> *a, std::ptrdiff_t lda, const Strided<E> &x,
@@ -46,7 +48,7 @@ void AddByColumns(std::ptrdiff_t m, std::ptrdiff_t n, typename ScalarOf<E>::type
     }
 }
 
-// y += alpha a^T x, or a^H x: a sum for each column, of the sums over chunks of its rows.
+// y += alpha a^T x, or a^H x: for each column the sum of the sums over chunks of its rows.
 template <ElementType E>
 void AddByRows(std::ptrdiff_t m, std::ptrdiff_t n, typename ScalarOf<E>::type alpha,
                const ElementOf<E> *a, std::ptrdiff_t lda, bool conjugated, const Strided<E> &x,
@@ -87,6 +89,53 @@ void MatrixVector(const char *trans, std::ptrdiff_t m, std::ptrdiff_t n,
         AddByRows<E>(m, n, alpha, a, lda, E == Complex && Is(trans, 'C'), from, to);
 }
 
+// Fills a symmetric or Hermitian matrix, of which one triangle is given.
+template <ElementType E>
+void FillFromTriangle(bool isLower, std::ptrdiff_t n, const ElementOf<E> *a, std::ptrdiff_t lda,
+                      ElementOf<E> *whole) {
+    for (std::ptrdiff_t j = 0; j < n; ++j) {
+        whole[j + j * n] = ScalarOf<E>::Of(RealPart(a[j + j * lda]));
+        for (std::ptrdiff_t i = j + 1; i < n; ++i) {
+            const ElementOf<E> &given = isLower ? a[i + j * lda] : a[j + i * lda];
+            whole[i + j * n] = isLower ? given : ElementOf<E>(Conj(given));
+            whole[j + i * n] = isLower ? ElementOf<E>(Conj(given)) : given;
+        }
+    }
+}
+
+// y += alpha a x, where a is symmetric or Hermitian and one triangle of it is read: tile by tile down the
+// columns; each tile is multiplied with the part of x for its columns, and its transpose with the part
+// for its rows.
+template <ElementType E>
+void SymmetricMatrixVector(const char *uplo, std::ptrdiff_t n, typename ScalarOf<E>::type alpha,
+                           const ElementOf<E> *a, std::ptrdiff_t lda, const ElementOf<E> *x,
+                           std::ptrdiff_t incx, typename ScalarOf<E>::type beta, ElementOf<E> *y,
+                           std::ptrdiff_t incy) {
+    if (n <= 0)
+        return;
+    const Strided<E> from(x, n, incx), to(y, n, incy);
+    Scale<E>(to, n, beta);
+    if (IsReal(alpha, 0.0))
+        return;
+    constexpr std::ptrdiff_t tile = chunkCols;
+    const bool isLower = Is(uplo, 'L');
+    ElementOf<E> whole[tile * tile];
+    for (std::ptrdiff_t j = 0; j < n; j += tile) {
+        const std::ptrdiff_t cols = std::min(tile, n - j);
+        for (std::ptrdiff_t i = isLower ? j : 0; i < (isLower ? n : j + cols); i += tile) {
+            const std::ptrdiff_t rows = std::min(tile, n - i);
+            const ElementOf<E> *const part = a + i + j * lda;
+            if (i == j) {
+                FillFromTriangle<E>(isLower, cols, part, lda, whole);
+                AddByColumns<E>(cols, cols, alpha, whole, cols, from.from(j), to.from(j));
+            } else {
+                AddByColumns<E>(rows, cols, alpha, part, lda, from.from(j), to.from(i));
+                AddByRows<E>(rows, cols, alpha, part, lda, E == Complex, from.from(i), to.from(j));
+            }
+        }
+    }
+}
+
 template <ElementType E>
 void AddOuter(std::ptrdiff_t m, std::ptrdiff_t n, typename ScalarOf<E>::type alpha,
               const ElementOf<E> *x, std::ptrdiff_t incx, const ElementOf<E> *y,
@@ -125,7 +174,7 @@ void AddMultiple(std::ptrdiff_t n, typename ScalarOf<E>::type alpha, const Eleme
         to[i] = to[i] + alpha * from[i];
 }
 
-// The elements are of any type; s is, too.
+// The elements and s may be real or complex.
 template <ElementType E, class Sine>
 void Rotate(std::ptrdiff_t n, ElementOf<E> *x, std::ptrdiff_t incx, ElementOf<E> *y,
             std::ptrdiff_t incy, double c, Sine s) {
@@ -142,7 +191,7 @@ void Rotate(std::ptrdiff_t n, ElementOf<E> *x, std::ptrdiff_t incx, ElementOf<E>
 } // namespace qx::blas
 
 using qx::blas::AddMultiple, qx::blas::AddOuter, qx::blas::Complex, qx::blas::MatrixVector,
-    qx::blas::Real, qx::blas::Rotate;
+    qx::blas::Real, qx::blas::Rotate, qx::blas::SymmetricMatrixVector;
 
 void dgemv_(const char *trans, const int32_t *m, const int32_t *n, const DBL *alpha, const DBL *a,
             const int32_t *lda, const DBL *x, const int32_t *incx, const DBL *beta, DBL *y,
@@ -153,6 +202,17 @@ void zgemv_(const char *trans, const int32_t *m, const int32_t *n, const CDB *al
             const int32_t *lda, const CDB *x, const int32_t *incx, const CDB *beta, CDB *y,
             const int32_t *incy, std::size_t) {
     MatrixVector<Complex>(trans, *m, *n, *alpha, a, *lda, x, *incx, *beta, y, *incy);
+}
+
+void dsymv_(const char *uplo, const int32_t *n, const DBL *alpha, const DBL *a, const int32_t *lda,
+            const DBL *x, const int32_t *incx, const DBL *beta, DBL *y, const int32_t *incy,
+            std::size_t) {
+    SymmetricMatrixVector<Real>(uplo, *n, *alpha, a, *lda, x, *incx, *beta, y, *incy);
+}
+void zhemv_(const char *uplo, const int32_t *n, const CDB *alpha, const CDB *a, const int32_t *lda,
+            const CDB *x, const int32_t *incx, const CDB *beta, CDB *y, const int32_t *incy,
+            std::size_t) {
+    SymmetricMatrixVector<Complex>(uplo, *n, *alpha, a, *lda, x, *incx, *beta, y, *incy);
 }
 
 void dger_(const int32_t *m, const int32_t *n, const DBL *alpha, const DBL *x, const int32_t *incx,

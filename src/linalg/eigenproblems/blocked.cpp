@@ -1,16 +1,17 @@
 #include "linalg/aligned.h"
 #include "linalg/eigenproblems/general.h"
+#include "linalg/eigenproblems/symmetric.h"
 #include "linalg/lapack.h"
 
 namespace qx {
 namespace {
 
-// Eigenvectors out of LAPACK's columns, which are rows here.
+// Eigenvectors from LAPACK's columns, which are rows here.
 void WriteVectors(const ConstComplexMatrix &columns, ConstComplexVector,
                   const ComplexMatrix &vectors) {
     CopyTransposed<ElementType::CDB>(columns, vectors);
 }
-// A pair has its real and its imaginary part in the places of both.
+// For a conjugate pair, the two columns hold the real and the imaginary part.
 void WriteVectors(const ConstRealMatrix &columns, ConstComplexVector values,
                   const ComplexMatrix &vectors) {
     const int32_t n = columns.rows();
@@ -51,6 +52,35 @@ ErrorCode EigenBlocked(const ConstMatrixView<E> &a, ComplexVector values,
     return 0;
 }
 
+template <ElementType E>
+ErrorCode SymmetricEigenBlocked(const ConstMatrixView<E> &a, RealVector values,
+                                const MatrixView<E> &vectors) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty() && values.size() == a.rows());
+    const int32_t n = a.rows();
+    if (n < fewestBlockedSymmetric)
+        return SymmetricEigen<E>(a, values, vectors);
+    if (!AllFinite<E>(a))
+        return ErrNonFiniteInput;
+    MatrixView<E> columns;
+    RealVector found;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Aligned(Sized(columns, n, n)), Aligned(Sized(found, n))))
+        return failed;
+    CopyTransposed<E>(a, columns);
+    if (const int32_t info =
+            lapack::SymmetricEigen(n, columns.data(), found.data(), !vectors.isEmpty()))
+        return info > 0 ? ErrIterationLimit : lapack::CodeOf(info);
+    for (int32_t i = 0; i < n; ++i)
+        values[i] = found[i];
+    if (!vectors.isEmpty())
+        CopyTransposed<E>(columns, vectors);
+    return 0;
+}
+
+template ErrorCode SymmetricEigenBlocked(const ConstRealMatrix &, RealVector, const RealMatrix &);
+template ErrorCode SymmetricEigenBlocked(const ConstComplexMatrix &, RealVector,
+                                         const ComplexMatrix &);
 template ErrorCode EigenBlocked(const ConstRealMatrix &, ComplexVector, const ComplexMatrix &);
 template ErrorCode EigenBlocked(const ConstComplexMatrix &, ComplexVector, const ComplexMatrix &);
 

@@ -60,7 +60,7 @@ private:
         }
     }
 
-    // The eigenvector of the triangular matrix for its diagonal element j.
+    // The eigenvector of the triangular matrix that belongs to its diagonal element j.
     void substituteBack(int32_t j, double least) const {
         x_[j] = {1.0, 0.0};
         for (int32_t i = j - 1; i >= 0; --i) {
@@ -105,13 +105,14 @@ ErrorCode EigenGeneral(const ConstComplexMatrix &a, ComplexVector values,
     return ComplexEigenproblem().solve(a, values, vectors);
 }
 
-ErrorCode EigenHermitian(const ConstComplexMatrix &a, ComplexVector values,
+ErrorCode EigenHermitian(const ConstComplexMatrix &a, Steps steps, ComplexVector values,
                          const ComplexMatrix &vectors) {
     RealVector real;
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(real, a.rows())))
         return failed;
-    if (const ErrorCode failed = SymmetricEigen<E>(a, real, vectors))
+    const auto solve = steps == Steps::Blocked ? SymmetricEigenBlocked<E> : SymmetricEigen<E>;
+    if (const ErrorCode failed = solve(a, real, vectors))
         return failed;
     for (int32_t i = 0; i < a.rows(); ++i)
         values[i] = {real[i], 0.0};

@@ -74,7 +74,7 @@ private:
         return l;
     }
 
-    // The eigenvalue of the last block of two that lies nearer to its last element.
+    // The eigenvalue of the last 2 by 2 block that is nearer to its last element.
     CDB shift(int32_t last, int32_t turn) const {
         const CDB corner = at(last, last), below = at(last, last - 1);
         if (turn == 10 || turn == 20 || turn == 30)

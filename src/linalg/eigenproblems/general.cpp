@@ -15,7 +15,7 @@ namespace {
 constexpr auto E = ElementType::DBL;
 
 // Eigenvectors of the quasi-triangular matrix that the iteration leaves, by back substitution. x
-// and y are the real and the imaginary part of a vector, of which elements 0 to `last` are not 0.
+// and y are the real and the imaginary part of a vector, whose elements after `last` are 0.
 class QuasiTriangular {
 public:
     QuasiTriangular(const ConstRealMatrix &t, double norm, ConstComplexVector values, RealVector x,
@@ -30,7 +30,7 @@ public:
         for (int32_t i = last - 1; i >= 0; --i) {
             const double diagonal = at(i, i) - value;
             const double sum = product(i, known, last, x_);
-            if (values_[i].im < 0.0) { // the lower row of a pair waits for the upper one
+            if (values_[i].im < 0.0) { // the lower row of a pair is processed with the upper one
                 lowerDiagonal = diagonal;
                 lowerSum = sum;
                 continue;
@@ -44,7 +44,7 @@ public:
         }
     }
 
-    // The vector of the value with positive imaginary part, at last - 1.
+    // The vector of the eigenvalue with positive imaginary part, which is number last - 1.
     void complexVector(int32_t last) {
         const double value = values_[last].re, q = values_[last].im;
         startComplex(last, value, q);
@@ -123,7 +123,7 @@ private:
             set(i + 1, (-lower - upper * below) / CDB{lowerDiagonal, q});
     }
 
-    // Keeps what has been found so small that its products do not overflow.
+    // Scales down the elements found so far so that their products do not overflow.
     void shrink(int32_t from, int32_t to, double size, bool isComplex) {
         if (!(epsilon * size * size > 1.0))
             return;

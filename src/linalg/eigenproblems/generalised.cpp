@@ -45,7 +45,7 @@ public:
     // Right eigenvectors of unit length, in columns. The Schur vectors z are lost.
     ErrorCode writeVectors(ConstComplexVector alpha, const ComplexMatrix &vectors) {
         const int32_t info = lapack::GeneralisedVectors(n_, s_.data(), t_.data(), z_.data());
-        // A form of numbers that overflowed: NaN on the diagonal of t is no real number to LAPACK.
+        // The form has overflowed: LAPACK refuses a NaN on the diagonal of t as not being real.
         if (info < 0)
             return info == lapack::noMemory ? ErrOutOfMemory : ErrConditionTooHigh;
         if (info > 0)
@@ -101,8 +101,8 @@ private:
                 readValue(i, &alpha[i], &beta[i]);
         return 0;
     }
-    // An exchange leaves numbers of any phase on the diagonal of t. LAPACK wants them real and not
-    // negative, so column i of s, t and z is turned.
+    // An exchange leaves numbers of any phase on the diagonal of t. LAPACK expects them to be real
+    // and not negative, so column i of s, t and z is multiplied by a phase factor.
     void readValue(int32_t i, CDB *alpha, T *beta) const {
         const double size = Modulus(t_(i, i));
         if (size != 0.0) {
@@ -117,7 +117,7 @@ private:
         *alpha = {RealPart(s_(i, i)), ImagPart(s_(i, i))};
         *beta = t_(i, i);
     }
-    // As the blocks were moved.
+    // Moves the values as the blocks were moved.
     void moveValues(int32_t from, int32_t to, ComplexVector alpha, VectorView<E> beta) const {
         const int32_t size = E == ElementType::DBL && alpha[from].im != 0.0 ? 2 : 1;
         for (int32_t step = 0; step < size; ++step)

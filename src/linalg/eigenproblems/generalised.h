@@ -6,11 +6,11 @@
 
 namespace qx {
 
-// Problems of two matrices, through LAPACK.
+// Eigenproblems and singular values of two matrices, through LAPACK.
 
-// Generalised Schur form of the square a and b of one order: a becomes s and b t, with a = q s z^H
-// and b = q t z^H, ordered by the quotients alpha / beta; a quotient with beta 0 is infinite. q, z
-// and `vectors`, the right eigenvectors of unit length, may be empty.
+// Generalised Schur form of square matrices a and b of the same order: a becomes s and b becomes t,
+// with a = q s z^H and b = q t z^H, ordered by the quotients alpha / beta; a quotient with beta 0
+// is infinite. q, z and `vectors`, the right eigenvectors of unit length, may be empty.
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit, ErrConditionTooHigh, ErrSolverCount.
 template <ElementType E>
@@ -19,9 +19,9 @@ ErrorCode GeneralisedSchur(const MatrixView<E> &a, const MatrixView<E> &b, Schur
                            VectorView<E> beta, const ComplexMatrix &vectors);
 
 // Generalised singular values of a (m by n) and b (p by n): u^H a q and v^H b q are diagonal
-// matrices of alpha and of beta times the same triangle (0 r). a and b become LAPACK's results, in
-// which r stands. alpha and beta have n elements, of which the first k + l count.
-// ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
+// matrices of alpha and of beta times the same triangle (0 r). a and b are overwritten with
+// LAPACK's results, which contain r. alpha and beta have n elements, of which the first k + l
+// count. ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
 ErrorCode GeneralisedSingular(const MatrixView<E> &a, const MatrixView<E> &b,
                               GeneralisedRanks *ranks, RealVector alpha, RealVector beta,

@@ -40,7 +40,7 @@ private:
 
 // The double-shift QR iteration on a real Hessenberg matrix (J. G. F. Francis, "The QR
 // transformation", The Computer Journal 4, 1962, pages 332 to 345). With Schur vectors the whole
-// matrix becomes quasi-triangular, without them only the part that the eigenvalues need is kept up.
+// matrix becomes quasi-triangular; without them only the part that the eigenvalues need is updated.
 class RealQR {
 public:
     RealQR(const RealMatrix &h, Balanced range, double negligible, ComplexVector values,
@@ -150,8 +150,8 @@ private:
         return {0.75 * size, 0.75 * size, -0.4375 * size * size};
     }
 
-    // The row at which the bulge may start, because two elements in a row beside the diagonal are
-    // small, and the first column of the shifted product there.
+    // The row at which the bulge may start, because two consecutive subdiagonal elements are small,
+    // and the first column of the shifted product there.
     int32_t startOfBulge(int32_t l, int32_t last, const Shift &shift, double column[3]) const {
         int32_t m = last - 2;
         for (;; --m) {
@@ -227,7 +227,7 @@ private:
     ComplexVector values_;
     bool wantsVectors_;
     double norm_;
-    double shift_ = 0.0; // what has been taken from the diagonal
+    double shift_ = 0.0; // what has been subtracted from the diagonal
     ReflectionQueue vectors_;
 };
 

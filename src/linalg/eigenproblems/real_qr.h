@@ -11,9 +11,9 @@ double SumOfHessenberg(const ConstRealMatrix &h);
 
 // The double-shift QR iteration on a real Hessenberg matrix h, in the block `range`. With
 // `transposed`, which holds the transposed basis, h becomes the quasi-triangular Schur form and
-// `transposed` its transposed vectors; without it only the values come out. The form has a block of
-// two where a value has a positive imaginary part, and what it holds elsewhere below its diagonal
-// means nothing. An element beside the diagonal counts as 0 where it is within eps of its
+// `transposed` its transposed vectors; without it only the eigenvalues are computed. The form has a
+// block of two where a value has a positive imaginary part, and its other elements below the
+// diagonal are meaningless. A subdiagonal element counts as 0 where it is within eps of its
 // neighbours or at most `negligible`. ErrIterationLimit.
 ErrorCode RealSchurIteration(const RealMatrix &h, Balanced range, double negligible,
                              ComplexVector values, const RealMatrix &transposed);

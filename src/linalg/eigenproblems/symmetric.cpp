@@ -11,7 +11,8 @@ namespace qx {
 namespace {
 
 // The implicit QL iteration on the real symmetric tridiagonal matrix with diagonal d and e[i]
-// beside d[i] and d[i + 1]. The rotations go to `rows`, which holds the transposed vectors.
+// between d[i] and d[i + 1]. The rotations are applied to `rows`, which holds the transposed
+// vectors.
 class ImplicitQL {
 public:
     ImplicitQL(RealVector d, RealVector e, RotationQueue &rows)
@@ -48,7 +49,7 @@ private:
             const double f = s * e_[i], b = c * e_[i];
             r = std::hypot(f, g);
             e_[i + 1] = r;
-            if (r == 0.0) { // the block falls apart here
+            if (r == 0.0) { // the block splits here
                 d_[i + 1] -= p;
                 e_[m] = 0.0;
                 return;
@@ -110,8 +111,8 @@ public:
     }
 
 private:
-    // From the last row up: the reflection that clears row i but for the element beside the
-    // diagonal acts on the leading block of order i. Row i keeps its vector.
+    // From the last row up: the reflection that clears row i, except for the element next to the
+    // diagonal, acts on the leading block of order i. Row i stores the vector of the reflection.
     void reduce(RealVector diagonal) {
         for (int32_t i = n_ - 1; i > 0; --i) {
             T *const v = matrix_.row(i);
@@ -147,7 +148,7 @@ private:
             wConjugate[j] = Conj(w[j]);
             vConjugate[j] = Conj(v[j]);
         }
-        constexpr int32_t together = 4; // rows stay in the cache for the second update
+        constexpr int32_t together = 4; // the rows stay in the cache for the second update
         for (int32_t i = 0; i < n; i += together) {
             const int32_t rows = std::min(together, n - i);
             const MatrixView<E> block = matrix_.block(i, 0, rows, n);

@@ -28,8 +28,8 @@ private:
     double factor_;
 };
 
-// A given matrix, and the power of two that brings its largest element to between 0.5 and 1. For a
-// matrix of zeros the exponent is 0.
+// A given matrix, and the power of two by which it is divided to bring its largest element between
+// 0.5 and 1. For a matrix of zeros the exponent is 0.
 template <ElementType E>
 struct Given {
     Given(const ConstMatrixView<E> &matrix, bool isNegated)
@@ -90,8 +90,8 @@ void Scale(const SchurFactors<E> &factors, int exponent) {
     }
 }
 
-// a x + x b = c, or with `products` a x b - x = c. Where `lyapunov`, the equation has a^H in place
-// of b, and a is given for b as well.
+// a x + x b = c, or with `products` a x b - x = c. With `lyapunov`, the equation has a^H in place
+// of b, and the caller passes a for b as well.
 template <ElementType E>
 class EquationSolver {
 public:
@@ -146,8 +146,8 @@ private:
         return tFactors_.compute(NegligibleIn(bNorm_));
     }
 
-    // A common power of two is taken from a and b in a sum; in a x b - x one is taken from the
-    // larger of the two terms.
+    // In a sum, a common power of two is factored out of a and b; in a x b - x, the larger of the
+    // two terms determines it.
     void scaleTogether() {
         int bExponent = 0;
         if (products_) {
@@ -181,7 +181,7 @@ private:
         return false;
     }
 
-    // A square matrix for what is needed in between.
+    // A square work matrix of order n.
     MatrixView<E> square(int32_t n) const { return square_.block(0, 0, n, n); }
 
     // The right side c becomes the solution, divided by the power of two whose exponent is
@@ -200,9 +200,9 @@ private:
         return growth;
     }
 
-    // Adds the solution for the residual of a x b - x = c, which takes back what the products with
-    // four unitary matrices have cost in digits. Where that is no small correction, the equation is
-    // nearly singular and x stays.
+    // Adds the solution for the residual of a x b - x = c, which recovers the digits lost in the
+    // products with four unitary matrices. If this is not a small correction, the equation is
+    // nearly singular and x is left as it is.
     void refine() const {
         if (growth_ != 0)
             return;
@@ -211,7 +211,7 @@ private:
             AdjointInPlace<E>(square(n_));
         OrderedProduct<E>(solution_, square(n_), work_);
         a_.copyTo(square(m_), aExponent_);
-        c_.copyTo(correction_); // from here on the residual, and then the solution for it
+        c_.copyTo(correction_); // becomes the residual, and then the solution for it
         SubtractProduct<E>(square(m_), work_, correction_);
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < n_; ++j)

@@ -18,8 +18,9 @@ enum LyapunovEquation : int32_t {
 // a is m by m, b n by n, c and x m by n; n and m are positive. x shares no element with the others.
 // Through the Schur forms of a and b and back substitution by blocks (R. H. Bartels and G. W.
 // Stewart, 1972; for the products J. D. Gardiner, A. J. Laub, J. J. Amato and C. B. Moler,
-// "Solution of the Sylvester matrix equation AXB^T + CXD^T = E", 1992). Scaled by powers of two so
-// that nothing overflows but the result; with products, one step of iterative refinement.
+// "Solution of the Sylvester matrix equation AXB^T + CXD^T = E", 1992). The matrices are scaled by
+// powers of two so that nothing but the result can overflow; with products, one step of iterative
+// refinement follows.
 //
 // ErrNonFiniteInput, ErrIterationLimit, ErrSingularMatrix, ErrOverflow, ErrOutOfMemory.
 template <ElementType E>
@@ -27,7 +28,7 @@ ErrorCode SolveSylvester(const ConstMatrixView<E> &a, const ConstMatrixView<E> &
                          const ConstMatrixView<E> &c, SylvesterEquation equation,
                          const MatrixView<E> &x);
 
-// All of one order; x is Hermitian to the bit where q is.
+// All matrices have the same order; x is Hermitian to the bit where q is.
 template <ElementType E>
 ErrorCode SolveLyapunov(const ConstMatrixView<E> &a, const ConstMatrixView<E> &q,
                         LyapunovEquation equation, const MatrixView<E> &x);

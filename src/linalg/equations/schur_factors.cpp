@@ -36,7 +36,7 @@ ErrorCode SchurFactors<E>::compute(double negligible) {
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(SizedPadded(z, n_, n_), Sized(exchanges, n_)))
         return failed;
-    // Permutations alone: factors would spoil the backward stability.
+    // Permutations only: scaling would spoil the backward stability.
     const Balanced range = Balance<E>(t_, true, false, exchanges);
     if (const ErrorCode failed = ReduceToHessenberg<E>(t_, range.low, range.high, z))
         return failed;

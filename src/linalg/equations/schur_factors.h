@@ -5,16 +5,17 @@
 
 namespace qx {
 
-// a = z t z^H with unitary z and (quasi-)triangular t, by our own iteration and so with the same
-// bits on every processor. t has exact zeros below its diagonal, blocks of two aside.
+// a = z t z^H with unitary z and (quasi-)triangular t, by our own iteration and therefore with the
+// same bits on every processor. t has exact zeros below its diagonal, except in blocks of two.
 template <ElementType E>
 class SchurFactors {
 public:
-    // t() is a matrix of order n whose largest element is about 1, and becomes its Schur form.
-    // An element beside the diagonal counts as 0 where it is within eps of its neighbours or at most
+    // t() holds a matrix of order n whose largest element is about 1; compute() replaces it by its
+    // Schur form.
+    // A subdiagonal element counts as 0 where it is within eps of its neighbours or at most
     // `negligible`. With NegligibleIn(norm of a) the form is backward stable for the norm of a and
-    // not for small parts of a graded matrix, and strongly graded ones converge for it; with 0 some
-    // of these do not. ErrOutOfMemory from either, ErrIterationLimit from compute().
+    // not for small parts of a graded matrix, and strongly graded matrices converge; with 0 some of
+    // them do not. ErrOutOfMemory from either, ErrIterationLimit from compute().
     ErrorCode allocate(int32_t n);
     ErrorCode compute(double negligible);
     // The factors of a^H from those of a, with the rows and columns of t in reverse order, which
@@ -44,7 +45,7 @@ double FrobeniusNorm(const ConstMatrixView<E> &a) {
     return std::sqrt(squares);
 }
 
-// Each element that is dropped counts a little; all together they stay within the norm's eps.
+// Each dropped element adds to the error; together they stay within eps times the norm.
 inline double NegligibleIn(double norm) { return epsilon / 16.0 * norm; }
 
 // to = from^H.

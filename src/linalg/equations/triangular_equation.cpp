@@ -11,7 +11,7 @@ namespace {
 
 constexpr int growthLimit = 500; // exponent
 
-// Four unknowns at most: those of one block of two by two.
+// At most four unknowns: those of one 2 by 2 block.
 constexpr int mostUnknowns = 4;
 struct SmallSystem {
     int n;
@@ -125,7 +125,7 @@ private:
         solve(upper, cols);
     }
 
-    // Takes from f what the solved part y adds to it: s y t, or of a sum y t or s y alone.
+    // Subtracts the terms of the solved part y from f: s y t, or in a sum y t or s y alone.
     void subtractSolved(const ConstMatrixView<E> &s, const ConstMatrixView<E> &y,
                         const ConstMatrixView<E> &t, const MatrixView<E> &f, bool throughT) {
         if (equation_.products) {

@@ -13,15 +13,15 @@ struct TriangularEquation {
     ConstMatrixView<E> s, t;
     bool products;
     double tau;
-    // A pivot of the smallest systems that is below this is replaced by it.
+    // In the smallest systems, a pivot below this value is replaced by it.
     double leastPivot;
 };
 
-// y takes the place of f, divided by the power of two whose exponent is returned: 0, unless
-// elements grow beyond 2^500. Back substitution by blocks, which halves the longer side until one
-// element or one block of two by two is left (R. H. Bartels and G. W. Stewart, "Solution of the
-// matrix equation AX + XB = C", 1972; the halving after I. Jonsson and B. Kagstrom, "Recursive
-// blocked algorithms for solving triangular systems", 2002). `work` is as large as f.
+// y replaces f, divided by the power of two whose exponent is returned: 0, unless elements grow
+// beyond 2^500. Back substitution by blocks, which halves the longer side until one element or one
+// block of two by two is left (R. H. Bartels and G. W. Stewart, "Solution of the matrix equation AX
+// + XB = C", 1972; the halving after I. Jonsson and B. Kagstrom, "Recursive blocked algorithms for
+// solving triangular systems", 2002). `work` is as large as f.
 template <ElementType E>
 int SolveTriangularEquation(const TriangularEquation<E> &equation, const MatrixView<E> &f,
                             const MatrixView<E> &work);

@@ -7,7 +7,7 @@
 
 namespace qx {
 
-// What several exports of this family check and resize.
+// Checks and resizes that several exports of this family share.
 
 template <class Handle>
 constexpr ElementType elementOf = HandleTraits<Handle>::code;
@@ -22,7 +22,7 @@ ErrorCode SquareFirst(const Block<Matrix> &a) {
     return FirstFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
 }
 
-// A square output, or an empty one where it is not wanted.
+// Resizes an output to a square matrix, or to an empty one if it is not wanted.
 template <class Matrix>
 Outcome ResizeIf(bool wanted, Out<Matrix> &matrix, int32_t n) {
     return wanted ? matrix.resize(n, n) : matrix.resize(0, 0);

@@ -12,7 +12,6 @@ bool IsNoOutput(int32_t output) {
     return output != eigenValuesOnly && output != eigenValuesAndVectors;
 }
 
-enum class Steps { OneByOne, Blocked };
 template <Steps steps>
 Outcome Eigen(In<DBL2D> a, int32_t output, Out<CDB1D> values, Out<CDB2D> vectors) {
     if (const ErrorCode bad = SquareLast(a))
@@ -40,12 +39,13 @@ Outcome CxEigen(In<CDB2D> a, int32_t matrixType, int32_t output, Out<CDB1D> valu
     if ((matrixType != generalMatrix && matrixType != hermitianMatrix) || IsNoOutput(output))
         return ErrInvalidSelector;
     if (matrixType == hermitianMatrix)
-        return EigenHermitian(a.view(), values.view(), vectors.view());
+        return EigenHermitian(a.view(), steps, values.view(), vectors.view());
     const auto solve =
         steps == Steps::Blocked ? EigenBlocked<ElementType::CDB> : EigenGeneral<ElementType::CDB>;
     return solve(a.view(), values.view(), vectors.view());
 }
 
+template <Steps steps>
 Outcome SymEigen(InOut<DBL2D> a, int32_t output, Out<DBL1D> values) {
     if (const ErrorCode bad = SquareLast(a))
         return bad;
@@ -54,7 +54,9 @@ Outcome SymEigen(InOut<DBL2D> a, int32_t output, Out<DBL1D> values) {
     if (IsNoOutput(output))
         return ErrInvalidSelector;
     const RealMatrix vectors = output == eigenValuesAndVectors ? a.view() : RealMatrix();
-    return SymmetricEigen<ElementType::DBL>(a.view(), values.view(), vectors);
+    const auto solve = steps == Steps::Blocked ? SymmetricEigenBlocked<ElementType::DBL>
+                                               : SymmetricEigen<ElementType::DBL>;
+    return solve(a.view(), values.view(), vectors);
 }
 
 template <class Matrix>
@@ -107,7 +109,10 @@ int32_t CxEigenValueVector2026_head(CDB2D a, const int32_t *matrixType, const in
     return InErr(err, qx::CxEigen<Blocked>, a, *matrixType, *output, values, vectors);
 }
 int32_t SymEvectorEvalue_head(DBL2D a, const int32_t *output, DBL1D values, ErrorCode *err) {
-    return InErr(err, qx::SymEigen, a, *output, values);
+    return InErr(err, qx::SymEigen<OneByOne>, a, *output, values);
+}
+int32_t SymEvectorEvalue2026_head(DBL2D a, const int32_t *output, DBL1D values, ErrorCode *err) {
+    return InErr(err, qx::SymEigen<Blocked>, a, *output, values);
 }
 
 ErrorCode Schur80_head(DBL2D a, int32_t wantVectors, int32_t order, DBL2D u, CDB1D w) {

@@ -16,7 +16,7 @@ ErrorCode CheckPencil(const Block<Matrix> &a, const Block<Matrix> &b) {
                         {a.rows() != b.rows() || a.cols() != b.cols(), ErrBandVectorSize}});
 }
 
-// The order is checked before the outputs grow, and so before anything is computed.
+// The order is checked before the outputs are resized, and so before anything is computed.
 template <class Matrix>
 ErrorCode CheckPencilAndOrder(const Block<Matrix> &a, const Block<Matrix> &b, int32_t order) {
     if (const ErrorCode bad = CheckPencil(a, b))
@@ -24,7 +24,7 @@ ErrorCode CheckPencilAndOrder(const Block<Matrix> &a, const Block<Matrix> &b, in
     return IsNoSchurOrder(order) ? ErrInvalidSelector : 0;
 }
 
-// Of n by n, q and z if they are wanted.
+// Resizes the outputs of a form of order n, with q and z if they are wanted.
 template <class Matrix, class Vector>
 Outcome ResizeForm(int32_t n, bool withVectors, Out<Matrix> &q, Out<Matrix> &z, Out<CDB1D> &alpha,
                    Out<Vector> &beta) {
@@ -62,7 +62,7 @@ Outcome QZWithEigenvectors(InOut<Matrix> a, InOut<Matrix> b, int32_t order, Out<
                                                z.view(), alpha.view(), beta.view(), vectors.view());
 }
 
-// alpha / beta: infinite for beta 0, and NaN where both are 0.
+// alpha / beta: infinite if beta is 0, and NaN if both are 0.
 CDB EigenvalueOf(CDB alpha, CDB beta) {
     if (AbsSum(beta) != 0.0)
         return alpha / beta;

@@ -12,41 +12,48 @@ namespace {
 
 // kept: of the exports that have an `err`, the last failed check decides
 
-// A lack of rank as the older exports tell it: not at all.
+// The older exports do not report a lack of rank.
 ErrorCode WithoutRankWarning(ErrorCode status) { return status == WarnRankDeficient ? 0 : status; }
+
+// Checks a square system and its right side, and resizes x.
+template <class Matrix, class Vector>
+Outcome PrepareSystem(const In<Matrix> &a, const In<Vector> &b, Out<Vector> &x) {
+    if (const Outcome bad = LastFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                        {!a.isSquare(), ErrNotSquare},
+                                        {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    return x.resize(a.rows());
+}
+// The same with a right side in each column of b, where the first failed check decides.
+template <class Matrix>
+Outcome PrepareSystems(const In<Matrix> &a, const In<Matrix> &b, Out<Matrix> &x) {
+    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                         {!a.isSquare(), ErrNotSquare},
+                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    return x.resize(a.rows(), b.cols());
+}
 
 // LU.
 
 template <class Matrix, class Vector>
 Outcome SolveLU(In<Matrix> a, In<Vector> b, Out<Vector> x) {
-    if (const Outcome bad = LastFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
-                                        {!a.isSquare(), ErrNotSquare},
-                                        {b.size() != a.rows(), ErrSizeMismatch}}))
-        return bad;
-    if (const Outcome bad = x.resize(a.rows()))
+    if (const Outcome bad = PrepareSystem(a, b, x))
         return bad;
     return SolveByLU<elementOf<Matrix>>(a.view(), b.view(), x.view());
 }
 
-// kept: nothing is solved; the export always fails once its arguments are good.
+// kept: nothing is solved; the export always fails, even if its arguments are valid.
 template <class Matrix>
 Outcome SolveSetLU(In<Matrix> a, In<Matrix> b, Out<Matrix> x) {
-    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
-                                         {!a.isSquare(), ErrNotSquare},
-                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
-        return bad;
-    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+    if (const Outcome bad = PrepareSystems(a, b, x))
         return bad;
     return ErrNotAvailable;
 }
 
 template <class Matrix>
 Outcome SolveSetLU2026(In<Matrix> a, In<Matrix> b, Out<Matrix> x, OutDBL reciprocalCondition) {
-    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
-                                         {!a.isSquare(), ErrNotSquare},
-                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
-        return bad;
-    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+    if (const Outcome bad = PrepareSystems(a, b, x))
         return bad;
     return SolveSetByLU<elementOf<Matrix>>(a.view(), b.view(), x.view(),
                                            reciprocalCondition.address());
@@ -114,7 +121,8 @@ Outcome SolveLeastSquaresSet(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double t
     return Solve(a.view(), b.view(), x.view(), tolerance);
 }
 
-// The memory that is shown, with `more` elements than the plain method needs.
+// Resizes the output that serves as work memory, with `more` elements beyond those of the plain
+// method.
 Outcome ResizeWork(In<DBL2D> a, Out<DBL1D> &work, int64_t more) {
     const int64_t count = LeastSquaresWork(a.rows(), a.cols()) + more;
     if (count > std::numeric_limits<int32_t>::max())
@@ -153,11 +161,7 @@ Outcome SolveRefined(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x, double tolerance, i
 
 template <class Matrix, class Vector>
 Outcome SolveDefinite(In<Matrix> a, In<Vector> b, Out<Vector> x) {
-    if (const Outcome bad = LastFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
-                                        {!a.isSquare(), ErrNotSquare},
-                                        {b.size() != a.rows(), ErrSizeMismatch}}))
-        return bad;
-    if (const Outcome bad = x.resize(a.rows()))
+    if (const Outcome bad = PrepareSystem(a, b, x))
         return bad;
     return CholeskySolve<elementOf<Matrix>>(a.view(), upperTriangle, AsColumn(b.view()),
                                             AsColumn(x.view()));
@@ -165,11 +169,7 @@ Outcome SolveDefinite(In<Matrix> a, In<Vector> b, Out<Vector> x) {
 
 template <class Matrix>
 Outcome SolveDefiniteSet(In<Matrix> a, bool useUpper, In<Matrix> b, Out<Matrix> x) {
-    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
-                                         {!a.isSquare(), ErrNotSquare},
-                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
-        return bad;
-    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+    if (const Outcome bad = PrepareSystems(a, b, x))
         return bad;
     return CholeskySolve<elementOf<Matrix>>(a.view(), useUpper ? upperTriangle : lowerTriangle,
                                             b.view(), x.view());

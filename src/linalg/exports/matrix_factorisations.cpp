@@ -256,7 +256,7 @@ bool IsNoJob(int32_t job) { return job < balanceNothing || job > balanceBoth; }
 bool Permutes(int32_t job) { return (job & 1) != 0; }
 bool Scales(int32_t job) { return (job & 2) != 0; }
 
-// Outside the block the exchanges are counted from 1, as low and high are.
+// Outside the block, `scale` holds the indices of exchanges counted from 1, as are low and high.
 template <class Matrix>
 Outcome BalanceMatrix(InOut<Matrix> a, int32_t job, OutI32 low, OutI32 high, Out<DBL1D> scale) {
     const int32_t n = a.rows();
@@ -280,7 +280,7 @@ Outcome BalanceMatrix(InOut<Matrix> a, int32_t job, OutI32 low, OutI32 high, Out
     return 0;
 }
 
-// Whether an exchange of rows, counted from 1, leads to no row of a matrix of order n.
+// Whether an exchange, counted from 1, refers to a row that a matrix of order n does not have.
 bool LeavesRows(ConstRealVector exchanges, int32_t n) {
     for (const DBL &exchange : exchanges)
         if (!(exchange >= 1.0 && exchange < n + 1.0))

@@ -7,7 +7,7 @@
 namespace qx {
 namespace {
 
-// kept: of the exports without an `err` a shape that is not square comes before an empty one
+// kept: the exports without an `err` check for a square matrix before an empty one
 template <class Matrix>
 ErrorCode CheckShapeFirst(const Block<Matrix> &a) {
     return FirstFailed({{!a.isSquare(), ErrNotSquare}, {a.isEmpty(), ErrEmptyInput}});
@@ -65,7 +65,7 @@ Outcome SquareRootRealParts(InOut<DBL2D> a) {
     const ErrorCode status = MatrixSquareRoot(root, root);
     for (int32_t i = 0; status >= 0 && i < result.rows(); ++i)
         for (int32_t j = 0; j < result.cols(); ++j)
-            result(i, j) = root(i, j).re; // kept: the imaginary parts go without a sign
+            result(i, j) = root(i, j).re; // kept: the imaginary parts are dropped without a warning
     return status;
 }
 

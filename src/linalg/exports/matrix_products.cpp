@@ -20,7 +20,7 @@ Outcome Product(In<Matrix> a, In<Matrix> b, Out<Matrix> c, bool copied) {
     return 0;
 }
 
-// The copy that a caller asks for would change nothing here.
+// The copy that the caller may ask for would change nothing here.
 template <class Matrix, class Vector>
 Outcome MatrixTimesVector(In<Matrix> a, In<Vector> x, Out<Vector> y) {
     if (a.hasNegativeSize() || x.hasNegativeSize())

@@ -104,7 +104,7 @@ Outcome NormOfVector(In<Vector> x, double p, OutDBL norm) {
     norm = VectorNorm<elementOf<Vector>>(x.view(), p);
     return 0;
 }
-// A norm of 0, and one that is not finite, leaves the vector as it is.
+// If the norm is 0 or not finite, the vector is left as it is.
 template <class Vector>
 Outcome UnitVector(InOut<Vector> x, double p, OutDBL norm) {
     if (const ErrorCode bad = CheckNorm(x, p))

@@ -93,7 +93,7 @@ Outcome Expand(In<Vector> packed, int32_t triangle, Out<Matrix> out) {
     const int32_t n = OrderOfPacked(packed.size());
     if (const Outcome bad = FirstFailed({{packed.isEmpty(), ErrEmptyInput}, {n < 1, ErrNotSquare}}))
         return bad;
-    if (triangle < lowerTriangle || triangle > symmetric) // kept: nothing happens, with success
+    if (triangle < lowerTriangle || triangle > symmetric) // kept: does nothing and reports success
         return 0;
     if (const Outcome bad = out.resize(n, n))
         return bad;
@@ -133,7 +133,7 @@ Outcome Zeros(int32_t rows, int32_t cols, Out<Matrix> out) {
     if (rows < 1 || cols < 1)
         return ErrEmptyInput;
     const int64_t count = int64_t{rows} * cols;
-    Scratch<Traits::code> trial; // kept: the memory is tried out and given back
+    Scratch<Traits::code> trial; // kept: the memory is allocated as a trial and released
     if (const Outcome bad = trial.allocate(count))
         return bad;
     trial.release();

@@ -35,7 +35,7 @@ public:
             j = isolated ? low_ : j + 1;
         }
     }
-    // One pass over the block; whether it changed anything.
+    // Makes one pass over the block and returns whether it changed anything.
     bool scaleOnce() {
         bool changed = false;
         for (int32_t i = low_; i <= high_; ++i)
@@ -69,12 +69,11 @@ private:
             Swap(&at(j)[i], &at(m)[i]);
     }
 
-    // Below `least` elements lose digits by the scaling, and what comes out smaller by rounding
-    // alone may come out smaller again and again.
+    // Scaling makes elements below `least` lose digits, and sums that decrease by rounding alone
+    // may go on decreasing.
     static bool isFair(double x) { return x > least && x < 1.0 / least; }
 
-    // Whether an element that belongs to no sum, for it stands beside the block, would be too
-    // large.
+    // Whether an element outside the block, which neither sum includes, would become too large.
     bool overflowsBesides(int32_t i, double factor, double inverse) const {
         for (int32_t j = high_ + 1; j < n_; ++j)
             if (AbsSum(at(i)[j]) * inverse >= 1.0 / least)
@@ -93,7 +92,7 @@ private:
                 row += AbsSum(at(i)[j]);
             }
         const double sum = column + row;
-        // A sum whose double overflows would never meet its bound.
+        // A sum whose double overflows would never reach its bound.
         if (column == 0.0 || row == 0.0 || !(sum < 1.0 / least))
             return false;
         const double before = column;

@@ -7,11 +7,11 @@ namespace qx {
 
 // Balancing of a square matrix (B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation
 // of eigenvalues and eigenvectors", 1969): a similarity with a permutation, which isolates
-// eigenvalues in the corners, and with powers of two, which make rows and columns of the block in
-// between alike. The elements must be finite.
+// eigenvalues in the corners, and with powers of two, which give the rows and columns of the block
+// in between similar norms. The elements must be finite.
 //
 // Rows and columns low to high (from 0) are the block. scale[i] is the factor of row and column i
-// of the block, and outside of it the index with which i was exchanged.
+// inside the block, and the index with which i was exchanged outside it.
 struct Balanced {
     int32_t low, high;
 };
@@ -19,7 +19,7 @@ template <ElementType E>
 Balanced Balance(const MatrixView<E> &a, bool permute, bool scaleToo, RealVector scale);
 
 // Eigenvectors of the balanced matrix, in the columns of v, become those of the original one:
-// factors, then exchanges. Left eigenvectors take the inverse factors.
+// first the scaling is undone, then the exchanges. Left eigenvectors use the inverse factors.
 enum class EigenvectorSide { Right, Left };
 template <ElementType E>
 void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side,

@@ -48,7 +48,7 @@ private:
     // kept: compared with the machine epsilon itself, not with a multiple of the norm
     bool isNegligible(double x) const { return (std::fabs(x) + norm_) - norm_ < epsilon; }
 
-    // The first row of the block that ends with row k and has no zero beside its diagonal.
+    // The first row of the block that ends with row k and has no zero on its superdiagonal.
     int32_t startOfBlock(int32_t k) {
         for (int32_t l = k; l > 0; --l) {
             if (isNegligible(e_[l]))
@@ -61,7 +61,7 @@ private:
         return 0;
     }
 
-    // d[l - 1] is 0, so rotations of rows can remove e[l] too.
+    // d[l - 1] is 0, so rotations of rows can also remove e[l].
     void cancel(int32_t l, int32_t k) {
         double c = 0.0, s = 1.0;
         for (int32_t i = l; i <= k; ++i) {

@@ -6,12 +6,12 @@
 
 namespace qx {
 
-// How often an iteration for one singular value, or one eigenvalue of a symmetric matrix, may turn.
+// The largest number of iterations for one singular value, or one eigenvalue of a symmetric matrix.
 inline constexpr int32_t SVDIterationLimit = 100;
 
 // Makes the upper bidiagonal matrix with diagonal d and e[i] at row i - 1, column i (e[0] is 0)
-// diagonal. The rotations go to `left` and `right`, which hold the transposed factors. d may come
-// out negative. ErrIterationLimit.
+// diagonal. The rotations are applied to `left` and `right`, which hold the transposed factors.
+// Elements of d may become negative. ErrIterationLimit.
 ErrorCode DiagonaliseBidiagonal(RealVector d, RealVector e, RotationQueue &left,
                                 RotationQueue &right);
 

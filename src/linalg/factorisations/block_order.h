@@ -6,7 +6,7 @@
 
 namespace qx {
 
-// LAPACK's info of a Schur form, plain or generalised.
+// The code for LAPACK's info of a Schur form, plain or generalised.
 inline ErrorCode CodeOfSchur(int32_t info, int32_t n) {
     if (info < 0)
         return lapack::CodeOf(info);
@@ -29,7 +29,7 @@ public:
         sizes_[count_++] = size;
     }
 
-    // Before blocks are added anew.
+    // To be called before blocks are added again.
     void clear() { count_ = 0; }
     bool isInOrder() const {
         for (int32_t k = 1; k < count_; ++k)
@@ -39,7 +39,7 @@ public:
     }
 
     // Bubble sort. move(from, to) brings the block at row `from` up to row `to` and returns
-    // LAPACK's info; blocks that it finds too close to exchange stay as they are.
+    // LAPACK's info; blocks that LAPACK finds too close to exchange are left as they are.
     template <class Move>
     ErrorCode sort(Move move) {
         for (int32_t pass = 1; pass < count_; ++pass) {

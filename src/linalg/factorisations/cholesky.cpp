@@ -29,8 +29,8 @@ void AddMultiple(ElementOf<E> *y, typename ScalarOf<E>::type factor, const Eleme
     AddOuterProduct<E>({y, 1, n}, {&f, 1}, {x, n});
 }
 
-// Column j of the inverse of a lower triangle solves l x = e_j, so it needs the columns from j on
-// only, which still stand.
+// Column j of the inverse of a lower triangle solves l x = e_j, so it needs only the columns from j
+// on, which have not been overwritten yet.
 template <ElementType E>
 void InvertLower(ElementOf<E> *packed, int32_t n) {
     for (int32_t j = 0; j < n; ++j) {
@@ -60,35 +60,61 @@ void InvertUpper(ElementOf<E> *packed, int32_t n) {
     }
 }
 
-// The factor's columns as the rows of an upper triangle. In its packed form the rows are factored
-// one by one; in a square matrix they are halved until they are few, so that nearly all terms are
-// subtracted in products of blocks. Those of one element are subtracted in ascending order either
-// way.
-constexpr int32_t fewRows = 16;
-constexpr int32_t worthBlocks = 40;
-constexpr int32_t strip = 96; // of rows in a product, whose part left of the diagonal is in vain
+// The factor's columns as the rows of an upper triangle. In packed form the rows are factored one
+// by one; in a square matrix they are halved until only a few are left, so that nearly all terms
+// are subtracted in products of blocks. Either way the terms of one element are subtracted in
+// ascending order.
+constexpr int32_t fewRows = 48;
+constexpr int32_t worthBlocks = 112;
+constexpr int32_t worthLanes = 8; // of quotients
+constexpr int32_t strip = 96;     // rows in a product; its part left of the diagonal is not used
 
-template <ElementType E, class Row>
+// Rows of n elements, of which row k counts from element k on; and how they are stored.
+template <ElementType E>
+struct PackedRows {
+    ElementOf<E> *packed;
+    int32_t n;
+    static constexpr std::ptrdiff_t change = 1; // of the step from row to row
+
+    ElementOf<E> *operator()(int32_t j) const { return LowerColumn<E>(packed, n, j); }
+    std::ptrdiff_t step(int32_t j) const { return std::ptrdiff_t{n} - 1 - j; }
+};
+template <ElementType E>
+struct SquareRows {
+    MatrixView<E> matrix;
+    static constexpr std::ptrdiff_t change = 0;
+
+    ElementOf<E> *operator()(int32_t j) const { return matrix.row(j); }
+    std::ptrdiff_t step(int32_t) const { return matrix.stride(); }
+};
+
+template <ElementType E, class Rows>
 class Factorisation {
 public:
-    Factorisation(Row row, int32_t n) : row_(row), n_(n) {}
+    Factorisation(const Rows &rows, int32_t n) : row_(rows), n_(n) {}
 
     ErrorCode runOneByOne() { return factorOneByOne(0, n_) ? status_ : ErrNotPositiveDefinite; }
     ErrorCode runByHalves() { return factorByHalves(0, n_) ? status_ : ErrNotPositiveDefinite; }
 
 private:
-    // False where a pivot is not above 0.
+    // Returns false if a pivot is not above 0.
     bool factorOneByOne(int32_t first, int32_t end) {
         for (int32_t k = first; k < end; ++k) {
-            ElementOf<E> *const row = row_(k) + k;
-            for (int32_t j = first; j < k; ++j) {
-                const ElementOf<E> *const before = row_(j) + k;
-                AddMultiple<E>(row, -Conj(*before), before, n_ - k);
-            }
+            if (k > first)
+                subtractRows(first, k);
             if (!divide(k))
                 return false;
         }
         return true;
+    }
+    // Those from `first` on in row k.
+    void subtractRows(int32_t first, int32_t k) {
+        ElementOf<E> *const row = row_(k) + k, *const above = row_(first) + k;
+        const std::ptrdiff_t step = row_.step(first);
+        if constexpr (E == ElementType::DBL)
+            SubtractRowsAboveReal(row, n_ - k, above, step, row_.change, k - first);
+        else
+            SubtractRowsAboveComplex(row, n_ - k, above, step, row_.change, k - first);
     }
     bool factorByHalves(int32_t first, int32_t end) {
         if (end - first <= fewRows)
@@ -101,7 +127,7 @@ private:
         return factorByHalves(middle, end);
     }
 
-    // The terms of rows `first` to `middle` in `rows` rows from `top` on.
+    // Subtracts the terms of rows `first` to `middle` from `rows` rows from `top` on.
     void subtractTerms(int32_t first, int32_t middle, int32_t top, int32_t rows) {
         ElementOf<E> *const from = row_(first) + top, *const to = row_(top) + top;
         if constexpr (E == ElementType::DBL)
@@ -112,7 +138,19 @@ private:
                               {from, n_, 1, false}, to, n_);
     }
 
-    // Row k, whose terms have all been subtracted.
+    // Returns the largest modulus of the quotients.
+    static double divideRow(ElementOf<E> *row, int32_t count, double divisor) {
+        if constexpr (E == ElementType::DBL)
+            if (count >= worthLanes)
+                return DivideRow(row, count, divisor);
+        double largest = 0.0;
+        for (int32_t i = 0; i < count; ++i) {
+            row[i] = row[i] / divisor;
+            largest = std::max(largest, Modulus(row[i]));
+        }
+        return largest;
+    }
+    // Divides row k, whose terms have all been subtracted, by the root of its pivot.
     bool divide(int32_t k) {
         ElementOf<E> *const row = row_(k);
         const double pivot = RealPart(row[k]);
@@ -121,11 +159,8 @@ private:
         const double root = std::sqrt(pivot);
         row[k] = ScalarOf<E>::Of(root);
         const double least = std::min(least_, root);
-        double largest = std::max(largest_, root);
-        for (int32_t i = k + 1; i < n_; ++i) {
-            row[i] = row[i] / root;
-            largest = std::max(largest, Modulus(row[i]));
-        }
+        const double largest =
+            std::max(std::max(largest_, root), divideRow(row + k + 1, n_ - k - 1, root));
         if (least < 0x1p-26 * largest)
             status_ = ErrNotPositiveDefinite;
         least_ = least;
@@ -133,16 +168,11 @@ private:
         return true;
     }
 
-    Row row_;
+    Rows row_;
     int32_t n_;
     double largest_ = 0.0, least_ = HUGE_VAL;
     ErrorCode status_ = 0;
 };
-template <ElementType E, class Row>
-Factorisation<E, Row> FactorisationOf(const Row &row, int32_t n) {
-    return {row, n};
-}
-
 } // namespace
 
 template <ElementType E>
@@ -152,16 +182,14 @@ ErrorCode PackedCholesky(VectorView<E> triangle, int32_t n) {
     MatrixView<E> rows;
     ScratchParts memory;
     if (n < worthBlocks || memory.take(Sized(rows, n, n)) != 0)
-        return FactorisationOf<E>([=](int32_t j) { return LowerColumn<E>(packed, n, j); }, n)
-            .runOneByOne();
+        return Factorisation<E, PackedRows<E>>({packed, n}, n).runOneByOne();
     std::memset(rows.data(), 0, sizeof(ElementOf<E>) * static_cast<std::size_t>(rows.count()));
     const auto copy = [n](int32_t j, ElementOf<E> *to, const ElementOf<E> *from) {
         std::memcpy(to + j, from + j, sizeof(ElementOf<E>) * static_cast<std::size_t>(n - j));
     };
     for (int32_t j = 0; j < n; ++j)
         copy(j, rows.row(j), LowerColumn<E>(packed, n, j));
-    const ErrorCode status =
-        FactorisationOf<E>([&](int32_t j) { return rows.row(j); }, n).runByHalves();
+    const ErrorCode status = Factorisation<E, SquareRows<E>>({rows}, n).runByHalves();
     for (int32_t j = 0; j < n; ++j)
         copy(j, LowerColumn<E>(packed, n, j), rows.row(j));
     return Merge(status, memory.release());
@@ -175,7 +203,8 @@ ErrorCode InvertFromCholesky(VectorView<E> triangle, int32_t n) {
         if (AbsSum(LowerColumn<E>(packed, n, j)[j]) == 0.0)
             return ErrSingularMatrix;
     InvertLower<E>(packed, n);
-    // Element (i, j) of x^H x reads rows from i on of columns i and j, which still stand.
+    // Element (i, j) of x^H x reads rows from i on of columns i and j, which have not been
+    // overwritten yet.
     for (int32_t j = 0; j < n; ++j) {
         ElementOf<E> *const column = LowerColumn<E>(packed, n, j);
         for (int32_t i = j; i < n; ++i) {

@@ -5,23 +5,22 @@
 
 namespace qx {
 
-// Packed storage is that of linalg/matrix.h: a triangle of order n >= 1, column after column.
+// Packed storage is that of linalg/matrix.h: a triangle of order n >= 1, column by column.
 
-// a = l l^H of the lower triangle in place. Only the real parts of the diagonal count.
-// ErrNotPositiveDefinite where a pivot is not above 0, at once, or where one lies below
-// sqrt(2.2e-16) times the largest element of the factor so far; then the factor is complete all
-// the same.
+// Factors a = l l^H, the lower triangle of a being replaced by l. Only the real parts of the
+// diagonal count. ErrNotPositiveDefinite if a pivot is not above 0, which ends the factorisation,
+// or if a diagonal element of the factor is below sqrt(2.2e-16) times the largest element so far;
+// the factor is then still completed.
 template <ElementType E>
 ErrorCode PackedCholesky(VectorView<E> packed, int32_t n);
 
-// The inverse of l l^H from its factor, as a lower triangle in its place. ErrSingularMatrix where a
+// The inverse of l l^H from its factor, as a lower triangle, in place. ErrSingularMatrix if a
 // diagonal element is 0.
 template <ElementType E>
 ErrorCode InvertFromCholesky(VectorView<E> packed, int32_t n);
 
-// The inverse of a packed triangle, lower or upper, in its place. ErrNonFiniteInput;
-// ErrSingularMatrix where a diagonal element is at most 2.2e-16 of the largest element in absolute
-// value.
+// The inverse of a packed triangle, lower or upper, in place. ErrNonFiniteInput; ErrSingularMatrix
+// if a diagonal element is at most 2.2e-16 times the largest element in absolute value.
 template <ElementType E>
 ErrorCode InvertTriangle(VectorView<E> packed, int32_t n, Triangle triangle);
 

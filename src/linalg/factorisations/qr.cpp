@@ -42,8 +42,8 @@ public:
         for (int32_t k = 0; k < count_; ++k)
             step(k);
     }
-    // The lengths of the columns below the rows done are brought down from step to step, and made
-    // anew where that has cost half their digits (LAPACK's Working Note 176).
+    // The lengths of the columns below the finished rows are updated at each step, and recomputed
+    // where that has cost half their digits (LAPACK's Working Note 176).
     ErrorCode factorPivoted(IndexVector pivots) {
         RealVector length, reference;
         ScratchParts memory;
@@ -139,7 +139,7 @@ public:
                             Sized(products_, m_), Sized(removed_, m_));
     }
 
-    // Column j of a into column j of r.
+    // Projects column j of a onto the basis and writes the coefficients to column j of r.
     void addColumn(const ConstMatrixView<E> &a, int32_t j, const MatrixView<E> &r) {
         double largest = 0.0;
         for (int32_t i = 0; i < m_; ++i)
@@ -164,8 +164,8 @@ public:
         }
     }
 
-    // Basis vector j becomes the unit vector that lies farthest from those before, less its part
-    // along them.
+    // Basis vector j becomes the unit vector that is farthest from the earlier ones, minus its
+    // projection on them.
     void addAny(int32_t j) {
         int32_t farthest = 0;
         double least = 2.0;
@@ -199,8 +199,8 @@ private:
             return CDB{std::ldexp(value.re, exponent), std::ldexp(value.im, exponent)};
     }
 
-    // Takes from the vector, twice, its parts along the first `count` basis vectors: in the
-    // classical order all at once, in the modified order one after the other.
+    // Subtracts from the vector, twice, its projections on the first `count` basis vectors: all at
+    // once in the classical order, one after the other in the modified order.
     void project(int32_t count) {
         for (int32_t i = 0; i < count; ++i)
             sums_[i] = T{};
@@ -240,7 +240,7 @@ private:
     VectorView<E> vector_, sums_, products_, removed_;
 };
 
-// Rows of r and columns of q.
+// Whether q and r have the shapes of the factors.
 template <ElementType E>
 bool AreFactors(const ConstMatrixView<E> &a, QRForm form, const ConstMatrixView<E> &q,
                 const ConstMatrixView<E> &r) {
@@ -249,7 +249,7 @@ bool AreFactors(const ConstMatrixView<E> &a, QRForm form, const ConstMatrixView<
            (form == qrOnlyR || (q.rows() == m && q.cols() == size));
 }
 
-// Pivots are empty where the columns stay in their order.
+// `pivots` is empty if the columns keep their order.
 template <ElementType E>
 ErrorCode Decompose(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
                     const MatrixView<E> &q, const MatrixView<E> &r) {

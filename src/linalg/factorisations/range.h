@@ -8,7 +8,7 @@
 
 namespace qx {
 
-// a becomes a / 2^exponent: in two steps, since one factor could overflow.
+// a becomes a / 2^exponent: in two steps, since a single factor could overflow.
 template <ElementType E>
 void DivideByPower(const MatrixView<E> &a, int exponent) {
     const double factor = std::ldexp(1.0, -exponent / 2);
@@ -19,8 +19,9 @@ void DivideByPower(const MatrixView<E> &a, int exponent) {
 }
 
 // Multiplies a matrix of extreme elements by a power of two so that squares of them neither
-// overflow nor vanish, and returns the exponent that takes its values back. No digit changes.
-// Matrices of ordinary size are left alone; which are too small, the caller says.
+// overflow nor vanish, and returns the exponent that restores its values. No digit changes.
+// Matrices of ordinary size are left alone; `tooSmall` is the limit below which a matrix is scaled
+// up.
 template <ElementType E>
 int BringIntoRange(const MatrixView<E> &a, double tooSmall) {
     double largest = 0.0;
@@ -31,18 +32,18 @@ int BringIntoRange(const MatrixView<E> &a, double tooSmall) {
         return 0;
     int exponent;
     std::frexp(largest, &exponent);
-    // Large values stay large, for there are tests against absolute numbers.
+    // Large values stay large, because they are compared with absolute numbers.
     exponent -= largest > 1.0 ? 200 : 0;
     DivideByPower<E>(a, exponent);
     return exponent;
 }
 
-// Multiplies a matrix by the power of two that brings its largest element next to 2^target, and
-// returns the exponent that takes its values back; 0 for a matrix of zeros. No digit of an element
+// Multiplies a matrix by the power of two that brings its largest element near 2^target, and
+// returns the exponent that restores its values; 0 for a matrix of zeros. No digit of an element
 // changes, unless it is so much smaller than the largest one that it vanishes.
 template <ElementType E>
 int ScaleTo(const MatrixView<E> &a, int target) {
-    double largest = 0.0; // of parts: a sum of two could overflow
+    double largest = 0.0; // of real and imaginary parts: the sum of two could overflow
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
             largest =
@@ -56,7 +57,7 @@ int ScaleTo(const MatrixView<E> &a, int target) {
     return exponent;
 }
 
-// A copy of a matrix that ScaleTo has brought next to 1, or to 2^target: the matrix is the copy
+// A copy of a matrix that ScaleTo has brought near 1, or near 2^target: the matrix is the copy
 // times 2^exponent.
 template <ElementType E>
 struct ScaledCopy {
@@ -72,13 +73,13 @@ struct ScaledCopy {
     int exponent = 0;
 };
 
-// a 2^exponent with one rounding; what overflows is infinite.
+// a 2^exponent with one rounding; infinite on overflow.
 inline double TimesPower(double a, int exponent) { return std::ldexp(a, exponent); }
 inline CDB TimesPower(CDB a, int exponent) {
     return {std::ldexp(a.re, exponent), std::ldexp(a.im, exponent)};
 }
 
-// A copy whose columns are scaled one by one, for right sides of very different size.
+// A copy whose columns are scaled one by one, for right sides of very different magnitude.
 template <ElementType E>
 struct ScaledColumns {
     ErrorCode make(const ConstMatrixView<E> &b) {
@@ -90,7 +91,7 @@ struct ScaledColumns {
             exponents[j] = ScaleTo<E>(matrix.block(0, j, b.rows(), 1), 0);
         return 0;
     }
-    // The solutions for the copy and for a matrix that was divided by 2^exponent.
+    // Scales back x, the solutions for the copy and for a matrix that was divided by 2^exponent.
     void scaleBack(const MatrixView<E> &x, int exponent) const {
         for (int32_t i = 0; i < x.rows(); ++i)
             for (int32_t j = 0; j < x.cols(); ++j)

@@ -6,17 +6,17 @@
 
 namespace qx {
 
-// Elementary unitary matrices H = I - v v^H / kappa (A. S. Householder). H maps the vector x that
-// it is made from to (beta, 0, ..., 0) with real beta; its inverse is H^H, which has the conjugate
-// of kappa. kappa 0 stands for H = I.
+// Elementary unitary matrices H = I - v v^H / kappa (A. S. Householder). H maps the vector x from
+// which it is made to (beta, 0, ..., 0) with real beta; its inverse is H^H, which has the conjugate
+// of kappa. kappa = 0 means H = I.
 template <ElementType E>
 class Reflector {
     typedef ElementOf<E> T;
     typedef typename ScalarOf<E>::type Value;
 
 public:
-    // Which vectors need no reflection: none but the zero vector, or each that is already (beta,
-    // 0, ..., 0), as in LAPACK.
+    // Which vectors need no reflection: only the zero vector, or every vector that already is
+    // (beta, 0, ..., 0), as in LAPACK.
     enum class Leave { ZeroOnly, Reduced };
 
     // x[0], x[stride], ... becomes v. The vector is scaled by the sum of its absolute values, so
@@ -48,7 +48,7 @@ public:
     Value kappa = ScalarOf<E>::Of(0.0);
 };
 
-// a becomes H a: a - v (v^H a) / kappa. `work` has rows + cols elements at least.
+// a becomes H a: a - v (v^H a) / kappa. `work` has at least rows + cols elements.
 template <ElementType E>
 void ReflectFromLeft(const MatrixView<E> &a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
                      VectorView<E> work) {
@@ -66,7 +66,7 @@ void ReflectFromLeft(const MatrixView<E> &a, ConstVectorView<E> v, typename Scal
     AddOuterProduct<E>(a, v, product);
 }
 
-// a becomes a H: a - (a v) v^H / kappa. `work` has rows + cols elements at least.
+// a becomes a H: a - (a v) v^H / kappa. `work` has at least rows + cols elements.
 template <ElementType E>
 void ReflectFromRight(const MatrixView<E> &a, ConstVectorView<E> v,
                       typename ScalarOf<E>::type kappa, VectorView<E> work) {

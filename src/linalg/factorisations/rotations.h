@@ -6,8 +6,8 @@
 namespace qx {
 
 // Collects rotations of the rows of one matrix and applies them many at a time, so that a panel of
-// columns passes through hundreds of them while it is in the cache. Their order stays. Without a
-// matrix they are forgotten.
+// columns passes through hundreds of them while it is in the cache. Their order is kept. Without a
+// matrix they are discarded.
 class RotationQueue {
 public:
     RotationQueue() = default;

@@ -16,7 +16,7 @@ class OrderedSchur {
 public:
     explicit OrderedSchur(int32_t n) : n_(n) {}
 
-    // Without an order.
+    // Computes the form without ordering it.
     ErrorCode compute(const ConstMatrixView<E> &a, bool withVectors, ComplexVector w) {
         const int32_t vectorsOrder = withVectors ? n_ : 0;
         if (const ErrorCode failed =
@@ -40,7 +40,7 @@ public:
         return 0;
     }
     ErrorCode sortUntilInOrder(SchurOrder order, ComplexVector w) {
-        constexpr int mostRounds = 20; // two were enough for all that were tried
+        constexpr int mostRounds = 20; // two were enough in all cases tried
         for (int round = 0; round < mostRounds; ++round) {
             if (const ErrorCode failed = sort(order, w))
                 return failed;
@@ -58,10 +58,11 @@ public:
 
 private:
     T *vectors() const { return vectors_.isEmpty() ? nullptr : vectors_.data(); }
-    // Column after column, as LAPACK has it.
+    // The form is stored column by column, as LAPACK requires.
     T &at(int32_t i, int32_t j) const { return form_(j, i); }
 
-    // The blocks along the diagonal, each with the key by which they ascend.
+    // Lists the blocks along the diagonal, each with the key by which they are sorted in ascending
+    // order.
     void classify(SchurOrder order, ComplexVector w) {
         blocks_.clear();
         const double tiny = epsilon * sumOf(w);

@@ -5,7 +5,7 @@
 
 namespace qx {
 
-// How the eigenvalues stand along the diagonal.
+// The order of the eigenvalues along the diagonal.
 enum SchurOrder : int32_t {
     schurUnordered = 0,
     schurRealAscending = 1,
@@ -14,18 +14,18 @@ enum SchurOrder : int32_t {
     schurModulusDescending = 4
 };
 
-// Schur form a = z t z^H of a square matrix through LAPACK: z is unitary, t upper triangular, for
-// real elements with blocks of two for conjugate pairs, and w its eigenvalues. z may be empty. a
-// may be t.
+// Schur form a = z t z^H of a square matrix through LAPACK: z is unitary, t upper triangular (with
+// blocks of two for conjugate pairs if the elements are real), and w holds the eigenvalues. z may
+// be empty. a may be t.
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit, ErrConditionTooHigh.
 template <ElementType E>
 ErrorCode SchurDecompose(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
                          const MatrixView<E> &t, ComplexVector w);
 
-// The same with eigenvalues that are in order as they stand in t: an exchange with a block of two
-// changes small ones, so that blocks are sorted again by what they have become. ErrNonFiniteInput,
-// ErrOutOfMemory, ErrIterationLimit; WarnLowAccuracy where some stay out of order all the same.
+// The same with the eigenvalues in order as they appear in t: an exchange with a block of two
+// changes small eigenvalues, so the blocks are sorted again by their new values. ErrNonFiniteInput,
+// ErrOutOfMemory, ErrIterationLimit; WarnLowAccuracy if some remain out of order.
 template <ElementType E>
 ErrorCode SchurInOrder(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
                        const MatrixView<E> &t, ComplexVector w);

@@ -11,8 +11,8 @@
 namespace qx {
 namespace {
 
-// The decomposition of a tall matrix of m rows and n columns, m >= n. A wide one goes in as its
-// conjugate transpose, with u and v exchanged.
+// The decomposition of a tall matrix of m rows and n columns, m >= n. A wide matrix is passed as
+// its conjugate transpose, with u and v exchanged.
 template <ElementType E>
 class TallSVD {
     typedef ElementOf<E> T;
@@ -22,7 +22,7 @@ public:
     TallSVD(int32_t m, int32_t n, SVDScaling scaling) : m_(m), n_(n), scaling_(scaling) {}
 
     ErrorCode allocate(bool withVectors) {
-        // Later the transposed factors take the place of the matrix and its right reflectors.
+        // Later the transposed factors replace the matrix and its right reflectors.
         const int64_t across = withVectors ? n_ * int64_t{PaddedStride(m_)} : 0;
         T *first;
         if (const ErrorCode failed = memory_.take(
@@ -94,7 +94,7 @@ private:
     int bringIntoRange() {
         if (scaling_ == SVDScaling::Always)
             return ScaleTo<E>(matrix_, 200);
-        // kept: small values are not brought up, for what is below 2.2e-16 counts as zero
+        // kept: small matrices are not scaled up, because values below 2.2e-16 count as zero
         return BringIntoRange<E>(matrix_, 0.0);
     }
     void restoreRange(RealVector s, int exponent) const {
@@ -109,8 +109,8 @@ private:
         }
     }
 
-    // Clears column i below the diagonal. The reflection of the rows is left to reflectRow, which
-    // has every row in the cache for its own work, except for row i.
+    // Clears column i below the diagonal. The rows other than row i are reflected by reflectRow,
+    // which has each of them in the cache for its own work.
     double reflectColumn(int32_t i) {
         const int32_t rows = m_ - i, rest = n_ - i - 1;
         const Reflection reflection(at(i) + i, matrix_.stride(), rows, Reflection::Leave::ZeroOnly);
@@ -132,7 +132,7 @@ private:
         return reflection.beta;
     }
 
-    // Clears row i beyond the element beside the diagonal, and completes reflectColumn(i).
+    // Clears row i beyond its superdiagonal element, and completes reflectColumn(i).
     double reflectRow(int32_t i) {
         const int32_t rest = n_ - i - 1;
         T *const row = at(i) + i + 1;
@@ -180,7 +180,7 @@ private:
         a(i, i) = ScalarOf<E>::Of(1.0);
     }
 
-    // Exchange sort, which decides where equal values go.
+    // Exchange sort, which determines the order of equal values.
     void sortValues(RealVector s, I32 *order) const {
         for (int32_t i = 0; order != nullptr && i < n_; ++i)
             order[i] = i;
@@ -216,7 +216,7 @@ ErrorCode Complete(const ConstMatrixView<E> &thin, const MatrixView<E> &full) {
     return 0;
 }
 
-// Of a tall or square matrix. u may be larger than what the decomposition gives.
+// For a tall or square matrix. u may be larger than that of the decomposition.
 template <ElementType E>
 ErrorCode Vectors(TallSVD<E> &svd, const MatrixView<E> &u, RealVector s, const MatrixView<E> &v) {
     if (u.cols() == v.cols())

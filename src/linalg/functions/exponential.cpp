@@ -31,7 +31,7 @@ public:
         if (!std::isfinite(norm))
             return ErrNonFiniteInput;
         const int32_t squarings = Squarings(norm);
-        // Directly, for 2^squarings itself may overflow.
+        // Computed directly, since 2^squarings itself may overflow.
         const double factor = std::ldexp(1.0, -squarings);
         for (int32_t i = 0; i < n; ++i)
             for (int32_t j = 0; j < n; ++j)
@@ -77,7 +77,7 @@ private:
         return 0;
     }
 
-    // The scaled matrix becomes the quotient. A singular denominator is not looked for.
+    // The scaled matrix becomes the quotient. The denominator is not tested for singularity.
     ErrorCode divide(const ConstMatrixView<E> &numerator) {
         int32_t parity;
         LUDecompose<E>(denominator_, pivots_, &parity);

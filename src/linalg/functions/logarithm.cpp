@@ -16,7 +16,7 @@ constexpr auto E = ElementType::CDB;
 
 constexpr double reached = 1e-12;
 
-// log of z in its place; ErrDegenerateValue for 0.
+// Replaces z by log z; ErrDegenerateValue for 0.
 ErrorCode TakeLogarithm(CDB *z) {
     if (SquaredModulus(*z) == 0.0)
         return ErrDegenerateValue;
@@ -24,8 +24,8 @@ ErrorCode TakeLogarithm(CDB *z) {
     return 0;
 }
 
-// The largest modulus of a - b, relative to the largest of a plus the largest of b; infinity where
-// one of them is not finite.
+// The largest modulus of a - b, relative to the largest of a plus the largest of b; infinity if one
+// of them is not finite.
 double RelativeError(const ConstComplexMatrix &a, const ConstComplexMatrix &b) {
     if (!AllFinite<E>(a) || !AllFinite<E>(b))
         return HUGE_VAL;
@@ -39,8 +39,8 @@ double RelativeError(const ConstComplexMatrix &a, const ConstComplexMatrix &b) {
     return difference / (first + second);
 }
 
-// Through eigenvectors: v log(w) v^-1. ErrConditionTooHigh, ErrDegenerateValue (an eigenvalue is
-// 0), ErrSingularMatrix, and the codes of the eigenproblem.
+// By eigenvectors: v log(w) v^-1. ErrConditionTooHigh, ErrDegenerateValue (an eigenvalue is 0),
+// ErrSingularMatrix, and the codes of the eigenproblem.
 ErrorCode LogByEigen(const ConstComplexMatrix &a, const ComplexMatrix &log) {
     const int32_t n = a.rows();
     ComplexMatrix vectors, inverse;
@@ -69,9 +69,9 @@ ErrorCode LogByEigen(const ConstComplexMatrix &a, const ComplexMatrix &log) {
     return 0;
 }
 
-// 2^k times the logarithm of the k-th root of a, after as many roots as bring the norm of y = 1 -
-// root to 0.1: -(y + y^2 / 2 + ...) with ten terms. ErrIterationLimit after 100 roots, and the
-// codes of the roots.
+// 2^k times the logarithm of the 2^k-th root of a, where k square roots bring the norm of y = 1 -
+// root to at most 0.1: -(y + y^2 / 2 + ...) with ten terms. ErrIterationLimit after 100 roots, and
+// the codes of the square roots.
 ErrorCode LogByRoots(const ConstComplexMatrix &a, const ComplexMatrix &log) {
     constexpr int32_t mostRoots = 100, terms = 10;
     constexpr double radius = 0.1;
@@ -128,7 +128,7 @@ public:
     }
     ComplexMatrix log() const { return log_; }
 
-    // Whether exp of the logarithm gives a back. Else *status says whether something failed.
+    // Whether exp of the logarithm reproduces a. If not, *status reports whether something failed.
     bool isExact(ErrorCode *status) {
         CopyMatrix<E>(log_, exponential_);
         *status = MatrixExponential<E>(exponential_);
@@ -172,7 +172,8 @@ private:
         return AllFinite<E>(log_) ? WarnLowAccuracy : ErrNonFiniteInput;
     }
 
-    // The matrix with 1e-12 / n of a fixed sequence, the logistic map, on all its elements.
+    // The matrix, with 1e-12 / n times a fixed sequence (the logistic map) added to all its
+    // elements.
     void perturb(const ComplexMatrix &perturbed) const {
         const int32_t n = a_.rows();
         double x = 0.142857;
@@ -214,7 +215,8 @@ private:
     double error_ = 0.0, bestError_ = 0.0;
 };
 
-// What repeated roots give where the eigenvalues gave `failure`; the result replaces a.
+// Takes the logarithm by repeated roots after the eigenvalues led to `failure`; the result replaces
+// a.
 ErrorCode FallBackOnRoots(const ComplexMatrix &a, const ComplexMatrix &log, ErrorCode failure) {
     const ErrorCode status = LogByRoots(a, log);
     if (status == ErrOutOfMemory)

@@ -10,11 +10,11 @@ namespace qx {
 
 namespace {
 
-// out = base^power for a power that is not negative; base and spare become of no meaning.
+// out = base^power for a power that is not negative; base and spare are overwritten.
 template <ElementType E>
 void RaiseToPower(MatrixView<E> base, int64_t power, MatrixView<E> spare, MatrixView<E> result,
                   const MatrixView<E> &out) {
-    // Bit by bit from the lowest; the identity is never multiplied with.
+    // Bit by bit from the lowest, without multiplying by the identity.
     bool isIdentity = true;
     for (int64_t rest = power; rest > 0; rest >>= 1) {
         if ((rest & 1) != 0 && isIdentity) {

@@ -17,10 +17,10 @@ namespace {
 
 // The method of A. H. Al-Mohy and N. J. Higham, "A new scaling and squaring algorithm for the matrix
 // exponential", 2009: the degree of the Pade approximant and the number of squarings follow from
-// norms of powers of the matrix in place of powers of its norm, so that a matrix whose powers are
-// small is not squared more often than it needs.
+// norms of powers of the matrix instead of powers of its norm, so that a matrix whose powers are
+// small is not squared more often than necessary.
 
-// The coefficients of the approximants, and how large a norm each is good for.
+// The coefficients of the approximants, and the largest norm for which each serves.
 struct Degree {
     int32_t m;
     double theta;
@@ -49,7 +49,7 @@ class Exponential2009 {
     typedef MatrixView<E> Matrix;
 
 public:
-    // The result's memory serves as work memory before.
+    // The memory of the result serves as work memory until the end.
     explicit Exponential2009(Matrix out) : out_(out) {}
 
     ErrorCode find(const ConstMatrixView<E> &a) {
@@ -60,14 +60,14 @@ public:
                 Sized(sums_, n_), Sized(next_, n_), Sized(exponents_, n_), Sized(pivots_, n_)))
             return failed;
         CopyMatrix<E>(a, a_);
-        const bool isBalanced = oneNorm(a_) >= tooLargeForOnes;
+        const bool isBalanced = OneNorm<E>(a_) >= tooLargeForOnes;
         if (isBalanced)
             balance();
-        if (!formPowers()) { // those of 2^-power_ a do not overflow
+        if (!formPowers()) { // the powers of 2^-power_ a do not overflow
             power_ = ScaleTo<E>(a_, mostBinary);
             formPowers();
         }
-        norm_ = oneNorm(a_);
+        norm_ = OneNorm<E>(a_);
         const int32_t squarings = choose();
         approximate();
         if (const ErrorCode failed = divide())
@@ -83,11 +83,11 @@ public:
 
 private:
     static constexpr int mostBinary = 10;
-    static constexpr double tooLargeForOnes = 0x1p53; // rounding errors of the norm's size exceed 1
+    static constexpr double tooLargeForOnes = 0x1p53; // at such norms rounding errors exceed 1
     static constexpr int mostExponent = 1024;         // every element is below 2^mostExponent
 
     // a_ becomes D^-1 a_ D, where D is diagonal and has the powers of two 2^exponents_, so that the
-    // largest element is as small as that can make it, but not below 1: about the largest geometric
+    // largest element is as small as this can make it, but not below 1: about the largest geometric
     // mean of the moduli on a cycle, which is at most the spectral radius of the matrix of moduli.
     void balance() {
         for (int32_t i = 0; i < n_; ++i)
@@ -107,11 +107,11 @@ private:
         std::frexp(size, &exponent);
         return size > 0.0 ? exponent : -HUGE_VAL;
     }
-    // Sets exponents with which every scaled element is below 2^bound; false where there are none.
-    // exponents_[j] - exponents_[i] may be `bound` less the exponent of element (i, j) at most: with
-    // that as length of the edge from i to j, shortest paths are exponents (Bellman and Ford), those
-    // from anywhere to j (sums_) and negated ones from i to anywhere (next_). The mean of the two has
-    // the smaller values.
+    // Sets exponents with which every scaled element is below 2^bound; returns false if there are
+    // none. exponents_[j] - exponents_[i] may be at most `bound` minus the exponent of element (i,
+    // j). With that as the length of the edge from i to j, lengths of shortest paths are such
+    // exponents (Bellman and Ford): those from any node to j (sums_), and negated those from i to any
+    // node (next_). The mean of the two has smaller values.
     bool findExponents(int bound) {
         for (int32_t i = 0; i < n_; ++i)
             sums_[i] = next_[i] = 0.0;
@@ -143,16 +143,17 @@ private:
         OrderedProduct<E>(a_, a_, a2_);
         OrderedProduct<E>(a2_, a2_, a4_);
         OrderedProduct<E>(a2_, a4_, a6_);
-        // For the products of them that are estimated, and for the coefficients of the approximants.
+        // Leaves room for the products of powers that are estimated and for the coefficients of the
+        // approximants.
         constexpr double tooLarge = 0x1p600, tooLargeOnce = 0x1p960;
-        return oneNorm(a4_) < tooLarge && oneNorm(a6_) < tooLarge && oneNorm(a_) < tooLargeOnce &&
-               oneNorm(a2_) < tooLargeOnce;
+        return OneNorm<E>(a4_) < tooLarge && OneNorm<E>(a6_) < tooLarge &&
+               OneNorm<E>(a_) < tooLargeOnce && OneNorm<E>(a2_) < tooLargeOnce;
     }
 
-    // Sets the degree and scales the powers; how often the approximant is to be squared.
+    // Sets the degree, scales the powers and returns how often the approximant is to be squared.
     int32_t choose() {
         const double d6 = std::pow(normOfProduct({a2_, a2_, a2_}), 1.0 / 6.0);
-        const double d4 = std::pow(oneNorm(a4_), 0.25);
+        const double d4 = std::pow(OneNorm<E>(a4_), 0.25);
         if (power_ == 0) {
             degree_ = &degrees[0];
             if (serves(std::max(d4, d6)))
@@ -161,7 +162,7 @@ private:
             if (serves(std::max(d4, d6)))
                 return 0;
         }
-        const double exactD6 = std::pow(oneNorm(a6_), 1.0 / 6.0);
+        const double exactD6 = std::pow(OneNorm<E>(a6_), 1.0 / 6.0);
         const double d8 = std::pow(normOfProduct({a4_, a4_}), 0.125);
         const double third = std::max(exactD6, d8);
         if (power_ == 0)
@@ -182,8 +183,9 @@ private:
     }
     bool serves(double eta) const { return eta <= degree_->theta && moreSquarings(0) == 0; }
 
-    // How many more squarings hold the backward error of the approximant at 2^-halvings times the
-    // matrix to 2^-53: from the norm of the power 2 m + 1 of the moduli.
+    // The number of further squarings that keep the backward error of the approximant, at
+    // 2^-halvings times the matrix, within 2^-53. It follows from the norm of power 2 m + 1 of the
+    // matrix of moduli.
     int32_t moreSquarings(int32_t halvings) const {
         const int32_t m = degree_->m;
         for (int32_t j = 0; j < n_; ++j)
@@ -214,16 +216,6 @@ private:
         return std::max(0, int32_t(std::ceil((log + 53.0) / (2.0 * m))));
     }
 
-    static double oneNorm(const ConstMatrixView<E> &a) {
-        double largest = 0.0;
-        for (int32_t j = 0; j < a.cols(); ++j) {
-            double sum = 0.0;
-            for (int32_t i = 0; i < a.rows(); ++i)
-                sum += Modulus(a(i, j));
-            largest = std::max(largest, sum);
-        }
-        return largest;
-    }
     double normOfProduct(std::initializer_list<Matrix> factors) const {
         return EstimateOneNorm<E>(
             x_,
@@ -279,7 +271,7 @@ private:
         CopyMatrix<E>(odd_, spare());
         OrderedProduct<E>(a_, spare(), odd_);
     }
-    // After the last use of a^2 its memory is free.
+    // The memory of a^2, which is free after its last use.
     Matrix spare() const { return a2_; }
     void addTimes(Matrix to, double factor) const {
         for (int32_t i = 0; i < n_; ++i)

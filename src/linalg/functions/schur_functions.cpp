@@ -27,7 +27,7 @@ bool IsTriangular(const ConstMatrixView<E> &a) {
     return isUpper || isLower;
 }
 
-// The Schur form 2^exponent z t z^H of a matrix of any size of elements.
+// The Schur form 2^exponent z t z^H of a matrix with elements of any magnitude.
 template <ElementType E>
 struct ScaledSchurForm {
     // ErrOutOfMemory, ErrIterationLimit.
@@ -40,14 +40,15 @@ struct ScaledSchurForm {
         exponent = ScaleTo<E>(scaled, 0);
         norm = FrobeniusNorm<E>(scaled);
         rounding = IsTriangular<E>(a) ? 0.0 : n * epsilon * norm;
-        // First for small parts of graded matrices as well.
+        // The first attempt serves small parts of graded matrices as well.
         ErrorCode status = factors.compute(0.0);
         if (status == ErrIterationLimit) {
             CopyMatrix<E>(a, scaled);
             ScaleTo<E>(scaled, 0);
             status = factors.compute(NegligibleIn(norm));
         }
-        // Of single rows those of the triangle, from which they differ by rounding errors.
+        // Single eigenvalues are taken from the triangle, from which the computed ones differ by
+        // rounding errors.
         for (int32_t i = 0; i < n; ++i)
             if (E == Complex || factors.values()[i].im == 0.0)
                 factors.values()[i] = {RealPart(factors.t()(i, i)), ImagPart(factors.t()(i, i))};
@@ -57,10 +58,11 @@ struct ScaledSchurForm {
     SchurFactors<E> factors;
     int exponent = 0;
     double norm = 0.0;     // of t
-    double rounding = 0.0; // by which eigenvalues may be off in t; 0 for the triangle of a itself
+    double rounding = 0.0; // error bound of the eigenvalues in t; 0 if a itself is triangular
 };
 
-// The functions of 2^exponent t in the place of t, with its Frobenius norm and rounding errors.
+// Functions that replace t by the function of 2^exponent t, given the Frobenius norm of t and its
+// rounding errors.
 struct LogarithmOfScaled {
     template <ElementType E>
     ErrorCode replace(const MatrixView<E> &t, int exponent, double, double) {
@@ -95,7 +97,7 @@ class PairRotations {
 public:
     ErrorCode allocate(int32_t n) { return memory_.take(Sized(x_, n), Sized(y_, n)); }
 
-    // Each pair is turned so that the first of its eigenvalues stands first.
+    // Rotates each pair so that the first of its eigenvalues comes first.
     void triangulate(const ConstRealMatrix &t, ConstComplexVector values, const ComplexMatrix &c) {
         const int32_t n = t.rows();
         for (int32_t i = 0; i < n; ++i)
@@ -165,7 +167,7 @@ private:
     MatrixView<E> z_, half_;
 };
 
-// An eigenvalue that rounding errors may have put below the negative axis is put on it.
+// Moves an eigenvalue that rounding errors may have put below the negative axis onto the axis.
 void PutOnCut(const ComplexMatrix &t, double rounding) {
     for (int32_t i = 0; i < t.rows(); ++i)
         if (t(i, i).re < 0.0 && t(i, i).im <= 0.0 && -t(i, i).im <= rounding)
@@ -186,8 +188,8 @@ ErrorCode Apply(const ScaledSchurForm<Complex> &form, Function &function,
     return 0;
 }
 
-// In real arithmetic where all eigenvalues are real and none is negative; the result is real where
-// none is real and negative.
+// Uses real arithmetic if no eigenvalue is complex or negative. The result is real if no eigenvalue
+// is real and negative.
 template <class Function>
 ErrorCode Apply(const ScaledSchurForm<Real> &form, Function &function, const ComplexMatrix &out) {
     const int32_t n = out.rows();
@@ -235,7 +237,7 @@ CDB AsComplex(const ElementOf<E> &x) {
     return {RealPart(x), ImagPart(x) + 0.0}; // no negative zero
 }
 
-// Each element of the diagonal by itself, and zeros beside it.
+// Applies the function to each diagonal element; the other elements are 0.
 template <ElementType E, class Scalar>
 void ApplyToDiagonal(const ConstMatrixView<E> &a, const ComplexMatrix &out, Scalar function) {
     for (CDB &element : out.elements())

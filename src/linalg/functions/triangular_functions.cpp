@@ -16,8 +16,9 @@ namespace {
 
 constexpr int32_t smallOrder = 16;
 
-// What is at most `negligible` counts as 0 where small diagonal elements would make more than its
-// root of it. False where two zeros of the diagonal leave an element that no root has.
+// A remainder of the order of `negligible` counts as 0 if the division by small diagonal elements
+// would make it larger than sqrt(negligible). Returns false if there is no root, because the
+// remainder between two zeros on the diagonal is not 0.
 template <ElementType E>
 bool TakeRootByColumns(const MatrixView<E> &t, double negligible) {
     for (int32_t j = 0; j < t.cols(); ++j) {
@@ -27,7 +28,7 @@ bool TakeRootByColumns(const MatrixView<E> &t, double negligible) {
             for (int32_t k = i + 1; k < j; ++k)
                 rest -= t(i, k) * t(k, j);
             const typename ScalarOf<E>::type sum = t(i, i) + t(j, j);
-            // Each term of the rest may have come to the same.
+            // Each of the j - i terms of the remainder may be as large as `negligible`.
             if (AbsSum(rest) <= (j - i) * negligible &&
                 AbsSum(rest) >= std::sqrt(negligible) * AbsSum(sum))
                 t(i, j) = ScalarOf<E>::Of(0.0);
@@ -40,7 +41,7 @@ bool TakeRootByColumns(const MatrixView<E> &t, double negligible) {
     return true;
 }
 
-// With at most one small element on the diagonal.
+// For at most one small element on the diagonal.
 template <ElementType E>
 bool TakeRootByHalves(const MatrixView<E> &t, const MatrixView<E> &work) {
     const int32_t n = t.rows();
@@ -64,7 +65,8 @@ bool TakeRoot(const MatrixView<E> &t, const MatrixView<E> &work, double negligib
     return isFound && HoldsOnlyNumbers<E>(t);
 }
 
-// x becomes t^-1 x for an upper triangular t, in each element in ascending order of the blocks below.
+// x becomes t^-1 x for an upper triangular t, where each element adds the terms of the blocks below
+// in ascending order.
 template <ElementType E>
 void SolveUpper(const ConstMatrixView<E> &t, const MatrixView<E> &x) {
     const int32_t n = t.rows();
@@ -85,7 +87,7 @@ void SolveUpper(const ConstMatrixView<E> &t, const MatrixView<E> &x) {
             x(i, j) = rest / t(i, i);
         }
 }
-// The same for an upper triangular x, whose zeros are left alone.
+// The same for an upper triangular x, whose zeros are not touched.
 template <ElementType E>
 void SolveUpperForTriangle(const ConstMatrixView<E> &t, const MatrixView<E> &x) {
     const int32_t n = t.rows();
@@ -102,13 +104,14 @@ void SolveUpperForTriangle(const ConstMatrixView<E> &t, const MatrixView<E> &x) 
     SolveUpperForTriangle<E>(t.block(0, 0, half, half), x.block(0, 0, half, half));
 }
 
-// The multiple of 2 pi i by which a difference of two logarithms is not that of the quotient.
+// The multiple of 2 pi i by which the difference of two logarithms differs from the logarithm of
+// the quotient.
 double Turns(double, double) { return 0.0; }
 CDB Turns(CDB difference, CDB ofQuotient) {
     return {0.0, kTwoPi * std::nearbyint((difference.im - ofQuotient.im) / kTwoPi)};
 }
 
-// The difference of the logarithms of neighbours, without cancellation where these are close.
+// The difference of the logarithms of neighbours, without cancellation where they are close.
 template <class T>
 T DifferenceOfLogarithms(T from, T to, T fromLog, T toLog) {
     const T difference = toLog - fromLog;
@@ -118,9 +121,9 @@ T DifferenceOfLogarithms(T from, T to, T fromLog, T toLog) {
     return ofQuotient + Turns(difference, ofQuotient);
 }
 
-// The nodes and weights of the formula of C. F. Gauss on (0, 1), whose first ones are mirrored by
-// the last: x times the sum of w / (1 + node x) is the Pade approximant of log(1 + x). Theta is the
-// norm up to which an approximant's backward error is a rounding error.
+// The nodes and weights of the formula of C. F. Gauss on (0, 1), of which only the first half is
+// stored, because the others mirror it. x times the sum of w / (1 + node x) is the Pade approximant
+// of log(1 + x). Theta is the norm up to which an approximant's backward error is a rounding error.
 struct Approximant {
     double theta;
     double nodes[4], weights[4];
@@ -175,9 +178,9 @@ public:
     }
 
 private:
-    static constexpr int32_t mostRoots = 2000; // none has elements that need as many
+    static constexpr int32_t mostRoots = 2000; // no finite elements need as many
 
-    // Of the diagonal, and what follows from them beside it.
+    // Takes the logarithms of the diagonal, and the differences of neighbours.
     void takeLogarithms(const ConstMatrixView<E> &t) {
         for (int32_t i = 0; i < n_; ++i)
             logarithms_[i] = PrincipalLogarithm(t(i, i));
@@ -193,7 +196,7 @@ private:
 
     bool takeRoot() { return ++roots_ < mostRoots && TakeRoot<E>(root_, system_, 0.0); }
 
-    // Roots until the diagonal is within the approximants' reach.
+    // Takes roots until the diagonal is within reach of the approximants.
     bool bringDiagonalNear() {
         int32_t needed = 0;
         for (int32_t i = 0; i < n_; ++i)
@@ -209,7 +212,7 @@ private:
         return Modulus(ExpMinusOne(logarithm)) <= Theta(highestDegree);
     }
 
-    // More roots until an approximant serves, whose degree is set.
+    // Takes more roots until an approximant is accurate enough, and sets its degree.
     bool chooseDegree() {
         const double second = rootOfNorm(2);
         double third = rootOfNorm(3);
@@ -223,7 +226,7 @@ private:
             for (degree_ = 3; degree_ < highestDegree; ++degree_)
                 if (lower <= Theta(degree_))
                     return true;
-            // A root more is cheaper than the degrees that it saves.
+            // One more root is cheaper than the degrees that it saves.
             const bool isWorthRoot =
                 lower <= Theta(highestDegree) && 0.5 * lower <= Theta(5) && extra < 2;
             extra += isWorthRoot ? 1 : 0;
@@ -263,10 +266,10 @@ private:
         return std::pow(norm, 1.0 / power);
     }
 
-    // root_ - 1, whose diagonal and the elements beside it come from t without cancellation
-    // (A. H. Al-Mohy, "A more accurate Briggs method for the logarithm", 2012, has the diagonal in
-    // another way; N. J. Higham and L. Lin, "A Schur-Pade algorithm for fractional powers of a
-    // matrix", 2011, what is beside it).
+    // Replaces the diagonal of root_ by that of root_ - 1, and recomputes the superdiagonal, both
+    // from t without cancellation (A. H. Al-Mohy, "A more accurate Briggs method for the
+    // logarithm", 2012, computes the diagonal in another way; N. J. Higham and L. Lin, "A
+    // Schur-Pade algorithm for fractional powers of a matrix", 2011, have the superdiagonal).
     void subtractIdentity(const ConstMatrixView<E> &t) {
         for (int32_t i = 0; i < n_; ++i) {
             root_(i, i) = ExpMinusOne(divided(logarithms_[i]));

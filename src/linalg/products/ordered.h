@@ -20,7 +20,7 @@ struct ComplexOperand {
     bool isConjugated;
 };
 
-// What every term of a product is multiplied by.
+// The factor of every term of a product.
 struct RealFactor {
     double value;
 };
@@ -29,11 +29,11 @@ struct ComplexFactor {
 };
 
 // c += factor a b: to every c[i][j] the terms (factor a[i][p]) b[p][j] are added one by one, p
-// ascending, each with one rounding for a product and one for a sum; the factors 1 and -1 are no
+// ascending, with one rounding for each product and one for each sum; the factors 1 and -1 cause no
 // multiplication. a is m by k, b is k by n, the rows of c are cStride elements apart; c shares no
-// element with a and b. The real and the imaginary part of a complex term are x x' - y y' and
-// x y' + y x'. The order depends on nothing else, so the bits are the same at every width, and
-// however the matrices are cut into blocks.
+// element with a and b. The real and the imaginary part of a complex term are x x' - y y' and x y'
+// + y x'. The order depends on nothing else, so the bits are the same at every width, and however
+// the matrices are cut into blocks.
 //
 // Large products copy blocks of both operands into pages that are kept for the next caller
 // (products/panel_memory.h). Without such memory they are slower and give the same bits.

@@ -9,22 +9,22 @@ namespace {
 
 typedef Lanes<nativeLanes> L;
 
-// A tile of c, some rows of some vectors, stays in registers through `depth` terms. The part of b
-// that it meets is packed into panels as wide as the tile, padded with zeros at the right edge, the
-// part of a into slivers as high as the tile. A panel stays in the first cache, a block of slivers
-// in the second, a block of panels in the third.
-constexpr bool isWide = nativeLanes == 8; // with 32 registers in place of 16
+// A tile of c, a few rows of a few vectors, stays in registers through `depth` terms. The part of b
+// that it needs is packed into panels as wide as the tile, padded with zeros at the right edge, and
+// the part of a into slivers as high as the tile. A panel stays in the first cache, a block of
+// slivers in the second, a block of panels in the third.
+constexpr bool isWide = nativeLanes == 8; // with 32 registers instead of 16
 constexpr std::ptrdiff_t depth = isWide ? 192 : 256;
 constexpr std::ptrdiff_t blockRows = isWide ? 128 : 96;
 constexpr std::ptrdiff_t blockCols = 2048;
-// Of small products only the panels are packed, on the stack.
+// Small products pack only the panels, on the stack.
 constexpr std::ptrdiff_t smallDepth = 64;
 constexpr std::ptrdiff_t smallBand = 128;
 constexpr std::ptrdiff_t smallProduct = isWide ? 24 * 24 * 24 : 40 * 40 * 40;
-// Up to that size operands may stay where they are.
+// Operands of up to this size may be used without packing.
 constexpr std::ptrdiff_t mostInPlace = 160 * 160;
 
-// What happens to an element of a on its way: none of it where it has been packed.
+// How an element of a is changed when it is loaded; packed elements are loaded as they are.
 enum class Sign { plus, minus, scaled };
 struct Packed {
     static constexpr Sign sign = Sign::plus;
@@ -48,7 +48,7 @@ struct Real {
     static Sign signOf(Factor f) {
         return f.value == 1.0 ? Sign::plus : f.value == -1.0 ? Sign::minus : Sign::scaled;
     }
-    // Term q of `height` rows of an operand goes to to[q height] and on.
+    // Term q of `height` rows of an operand is written to to[q height] onwards.
     static void packSliver(const Operand &a, std::ptrdiff_t height, std::ptrdiff_t k, DBL *to) {
         std::ptrdiff_t r = 0;
         if (a.across == 1)
@@ -66,7 +66,7 @@ struct Real {
         for (std::ptrdiff_t i = 0; i < count; ++i)
             x[i] = factor.value * x[i];
     }
-    // The same of the columns of an operand, with zeros after them.
+    // The same for the columns of an operand, followed by zeros.
     static void packPanel(const Operand &b, std::ptrdiff_t cols, std::ptrdiff_t k, DBL *to) {
         if (cols == tileCols)
             return packSliver({b.data, b.across, b.down}, tileCols, k, to);
@@ -75,7 +75,7 @@ struct Real {
                 to[q * tileCols + j] = j < cols ? b.data[q * b.down + j * b.across] : 0.0;
     }
 
-    // The first k elements of as many rows as a vector has lanes, column after column.
+    // The first k elements of as many rows as a vector has lanes, written column by column.
     static void transpose(const DBL *x, std::ptrdiff_t down, std::ptrdiff_t k, DBL *to,
                           std::ptrdiff_t height) {
         std::ptrdiff_t q = 0;
@@ -91,7 +91,7 @@ struct Real {
             L::gather(x + q, down).store(to + q * height);
     }
 
-    // A row of b, of which nothing behind `width` elements is read.
+    // Loads a row of b, of which only `width` elements are read.
     template <std::ptrdiff_t Vectors>
     static QX_INLINE void loadRow(const DBL *b, std::ptrdiff_t width, L *row) {
         constexpr std::ptrdiff_t whole = (Vectors - 1) * nativeLanes;
@@ -115,7 +115,7 @@ struct Real {
             for (std::ptrdiff_t v = 0; v < Vectors; ++v)
                 x[v].store(c + v * nativeLanes);
         }
-        // The last vector in part.
+        // Loads a part of the last vector.
         QX_INLINE void loadPart(const DBL *c, std::ptrdiff_t width) {
             loadRow<Vectors>(c, width, x);
         }
@@ -140,7 +140,7 @@ struct Real {
     };
 };
 
-// The panel has the real parts of a vector's columns, then their imaginary parts, and so have the
+// The panel has the real parts of a vector's columns, then their imaginary parts, and so do the
 // sums.
 struct Complex {
     typedef CDB T;
@@ -191,7 +191,7 @@ struct Complex {
         }
     }
 
-    // A row of the panel, which is padded.
+    // Loads a row of the panel, which is padded.
     template <std::ptrdiff_t Vectors>
     static QX_INLINE void loadRow(const DBL *panel, std::ptrdiff_t, L *row) {
         QX_UNROLLED
@@ -223,7 +223,7 @@ struct Complex {
                 TurnsHigh(x[v], x[v + 1]).store(c + (v + 1) * nativeLanes);
             }
         }
-        // The only pair of vectors in part.
+        // Loads a part of the only pair of vectors.
         QX_INLINE void loadPart(const DBL *c, std::ptrdiff_t width) {
             static_assert(Vectors == 2);
             const std::ptrdiff_t whole = width < nativeLanes ? width : nativeLanes;
@@ -279,7 +279,7 @@ QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const 
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].load(c + r * cStride);
     const DBL *at = a.data, *panel = b.data;
-    // The next tile's rows are far from each other in memory; so they are fetched ahead.
+    // The next tile's rows are far from each other in memory; so they are prefetched.
     if constexpr (isWide)
         for (std::ptrdiff_t r = 0; r < Rows; ++r)
             for (std::ptrdiff_t v = 0; v < Field::vectors; ++v)
@@ -300,7 +300,7 @@ QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const 
         sums[r].store(c + r * cStride);
 }
 
-// At the right edge: `width` doubles of each of the rows, in no more vectors than they take.
+// At the right edge: adds `width` doubles of each row, in no more vectors than they need.
 template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors = Field::vectors>
 void AddToEdge(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const PanelPlace &b,
                DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
@@ -326,7 +326,7 @@ void AddToEdge(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, 
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].storePart(c + r * cStride, width);
 }
-// Without registers that are loaded in part, a full tile is computed aside.
+// Without partial loads of registers, a full tile is computed in a temporary.
 template <class Field, class How, std::ptrdiff_t Rows>
 void AddAside(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const PanelPlace &b,
               DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
@@ -343,7 +343,7 @@ void AddAside(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, c
             c[r * cStride + j] = aside[r * whole + j];
 }
 
-// `width` doubles of each of the rows.
+// Adds `width` doubles of each row.
 template <class Field, class How, std::ptrdiff_t Rows>
 QX_INLINE void AddToRows(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
                          const PanelPlace &b, DBL *c, std::ptrdiff_t cStride,
@@ -413,13 +413,14 @@ void AddSmallAs(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename F
         AddSmall<Field, Taken<Sign::scaled, Conjugated>>(m, n, k, factor, a, b, c, cStride);
 }
 
-// The height of the next sliver: that of a tile, or at the lower edge half of it, or what is left.
+// The height of the next sliver: that of a tile, or, at the lower edge, half of it or the number of
+// remaining rows.
 template <class Field>
 std::ptrdiff_t SliverHeight(std::ptrdiff_t rows) {
     return rows >= Field::tileRows ? Field::tileRows : rows >= 4 ? 4 : rows;
 }
 
-// The slivers of the first rows and terms of a, each with one term after the other.
+// The slivers of the first rows and terms of a, each term by term.
 template <class Field>
 void PackSlivers(const typename Field::Operand &a, std::ptrdiff_t rows, std::ptrdiff_t k, Sign sign,
                  typename Field::Factor factor, DBL *to) {
@@ -458,7 +459,7 @@ QX_INLINE void ForEachSliver(std::ptrdiff_t rows, const Add &add) {
     }
 }
 
-// All rows of a block of slivers with one panel.
+// Adds the products of all slivers of a block with one panel.
 template <class Field>
 void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const PanelPlace &b,
               DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
@@ -499,8 +500,8 @@ void AddLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
     }
 }
 
-// Without any copy: a real product whose operands fit in the second cache, b with its rows in one
-// piece.
+// Without any copy: a real product whose operands fit in the second cache, where the rows of b are
+// contiguous.
 template <class How>
 void AddInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const RealOperand &a,
                 const RealOperand &b, DBL *c, std::ptrdiff_t cStride) {
@@ -526,7 +527,7 @@ bool AddIfInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k,
     return true;
 }
 
-// Whether the product is large, and has been added. Not without memory.
+// Adds the product if it is large and there is memory; returns whether it was added.
 template <class Field>
 bool AddIfLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Field::Factor factor,
                 const typename Field::Operand &a, const typename Field::Operand &b,
@@ -543,7 +544,7 @@ bool AddIfLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename F
 
 } // namespace
 
-// Small products gain nothing by eight lanes.
+// Small products gain nothing from eight lanes.
 #ifdef QX_HAS_EIGHT_LANES
 namespace narrower = avx2;
 #else

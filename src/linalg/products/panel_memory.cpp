@@ -13,7 +13,7 @@ constexpr int mostBlocks = sizeof(void *) == 8 ? 64 : 16;
 
 struct Slot {
     std::atomic<bool> isTaken = false;
-    // Of whoever has taken the slot.
+    // Belongs to the product that has taken the slot.
     void *block = nullptr;
 };
 

@@ -7,12 +7,13 @@
 
 namespace qx {
 
-// Where a product packs its operands: pages of the system, not of the heap, borrowed for one
-// product. Blocks are kept for the next one, of any thread, and given back with the module; there
-// are as many as products have ever run at the same time, at most 64 (16 with 32-bit addresses).
+// Memory into which a product packs its operands: pages from the system, not from the heap,
+// borrowed for one product. Blocks are kept for the next product, in any thread, and released when
+// the module is unloaded. Their number is the largest number of products that have run at the same
+// time, at most 64 (16 with 32-bit addresses).
 class PanelMemory {
 public:
-    // In doubles; physical memory is taken as it is touched.
+    // In doubles; physical memory is allocated as it is touched.
     static constexpr std::ptrdiff_t size = 640 << 10;
 
     PanelMemory();
@@ -20,7 +21,7 @@ public:
     PanelMemory(const PanelMemory &) = delete;
     PanelMemory &operator=(const PanelMemory &) = delete;
 
-    // At the start of a page, or null where there is none.
+    // Begins at a page boundary; null if there is no memory.
     DBL *data() const;
 
 private:

@@ -102,7 +102,7 @@ void ProductWithConjugate(const ConstComplexMatrix &a, const ConstComplexMatrix 
                       {b.data(), 1, b.stride(), true}, c.data(), c.stride());
 }
 
-// Four rows at a time: four sums that do not wait for each other.
+// Four rows at a time, so that four sums are independent of each other.
 template <ElementType E>
 void MatrixVectorProduct(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y) {
     QX_EXPECTS(a.cols() == x.size() && a.rows() == y.size());

@@ -6,7 +6,7 @@
 
 namespace qx {
 
-// c = a b, in the order of arithmetic of AddProduct; where a has no columns, c is NaN.
+// c = a b, in the order of arithmetic of AddProduct; if a has no columns, c is NaN.
 template <ElementType E>
 void MatrixProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
                    const MatrixView<E> &c);
@@ -22,7 +22,7 @@ void AddProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b, const 
 template <ElementType E>
 void SubtractProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
                      const MatrixView<E> &c);
-// c = a b in this order; without terms 0.
+// c = a b in this order; 0 if there are no terms.
 template <ElementType E>
 void OrderedProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
                     const MatrixView<E> &c);
@@ -31,8 +31,8 @@ void OrderedProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
 void ProductWithConjugate(const ConstComplexMatrix &a, const ConstComplexMatrix &b,
                           const ComplexMatrix &c);
 
-// y = a x: one sum per row, its terms added in ascending order. A matrix without columns writes
-// nothing.
+// y = a x: one sum per row, its terms added in ascending order. Nothing is written if a has no
+// columns.
 template <ElementType E>
 void MatrixVectorProduct(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y);
 

@@ -16,8 +16,8 @@ double LargestModulus(ConstVectorView<E> x) {
     return largest;
 }
 
-// Whether all pairs agree within the limit, the element beyond the diagonal being compared as it is
-// or conjugated.
+// Whether all pairs agree within the limit, where the element above the diagonal is compared as it
+// is or conjugated.
 template <ElementType E>
 bool PairsAgree(const ConstMatrixView<E> &a, double limit, bool hermitian) {
     for (int32_t i = 0; i < a.rows(); ++i)
@@ -43,13 +43,13 @@ bool IsExactlyHermitian(const ConstMatrixView<E> &a) {
     return true;
 }
 
-// The state of the elimination: the block from `first` on is what is left.
+// The state of the elimination: the block from `first` on remains.
 template <ElementType E>
 class Elimination {
 public:
     explicit Elimination(const MatrixView<E> &a) : a_(a), n_(a.rows()) {}
 
-    // The index of the largest diagonal element that is left, or -1 where one is below the limit.
+    // The index of the largest remaining diagonal element, or -1 if one is below the limit.
     int32_t largestDiagonal(int32_t first, double lowest) const {
         int32_t largest = first;
         for (int32_t i = first; i < n_; ++i) {

@@ -7,11 +7,25 @@
 
 namespace qx {
 
-// Estimates from below the 1-norm of a matrix of order n of which only the products with vectors
-// are known: multiply(x) replaces x by A x, multiplyAdjoint(x) by A^H x, and neither can fail. Four
-// or five products of each kind at most; usually exact, seldom below a third (N. J. Higham,
-// "FORTRAN codes for estimating the one-norm of a real or complex matrix, with applications to
-// condition estimation", 1988). x is memory for n elements. Infinite where a product is not finite.
+// The largest sum of moduli of a column.
+template <ElementType E>
+double OneNorm(const ConstMatrixView<E> &a) {
+    double largest = 0.0;
+    for (int32_t j = 0; j < a.cols(); ++j) {
+        double sum = 0.0;
+        for (int32_t i = 0; i < a.rows(); ++i)
+            sum += Modulus(a(i, j));
+        largest = std::max(largest, sum);
+    }
+    return largest;
+}
+
+// Estimates from below the 1-norm of a matrix of order n that is known only by its products with
+// vectors: multiply(x) replaces x by A x, multiplyAdjoint(x) by A^H x, and neither can fail. At
+// most four or five products of each kind are formed; the estimate is usually exact and seldom
+// below a third (N. J. Higham, "FORTRAN codes for estimating the one-norm of a real or complex
+// matrix, with applications to condition estimation", 1988). x is memory for n elements. The
+// estimate is infinite if a product is not finite.
 template <ElementType E, class Multiply, class MultiplyAdjoint>
 double EstimateOneNorm(VectorView<E> x, Multiply multiply, MultiplyAdjoint multiplyAdjoint) {
     const auto n = static_cast<int32_t>(x.size());
@@ -49,7 +63,7 @@ double EstimateOneNorm(VectorView<E> x, Multiply multiply, MultiplyAdjoint multi
             break;
         estimate = sum;
     }
-    // A vector that the iteration above cannot be fooled by.
+    // A vector that guards against matrices which defeat the iteration above.
     for (int32_t i = 0; i < n; ++i)
         x[i] = ScalarOf<E>::Of((i % 2 == 0 ? 1.0 : -1.0) * (1.0 + double(i) / (n - 1)));
     multiply(x);

@@ -3,6 +3,7 @@
 #include "linalg/factorisations/cholesky.h"
 #include "linalg/factorisations/range.h"
 #include "linalg/factorisations/svd.h"
+#include "linalg/properties/norm_estimate.h"
 #include "linalg/systems/lu.h"
 
 #include <algorithm>
@@ -61,7 +62,7 @@ ErrorCode DeterminantByCholesky(const ConstMatrixView<E> &a, ElementOf<E> *det) 
     return 0;
 }
 
-// The largest sum of moduli of a row, or of a column.
+// The largest sum of moduli of a row.
 template <ElementType E>
 double LargestRowSum(const ConstMatrixView<E> &a) {
     const std::ptrdiff_t rows = a.rows(), cols = a.cols();
@@ -76,19 +77,6 @@ double LargestRowSum(const ConstMatrixView<E> &a) {
     return largest;
 }
 template <ElementType E>
-double LargestColumnSum(const ConstMatrixView<E> &a) {
-    const std::ptrdiff_t rows = a.rows(), cols = a.cols();
-    const ConstVectorView<E> elements = a.elements();
-    double largest = 0.0;
-    for (std::ptrdiff_t j = 0; j < cols; ++j) {
-        double sum = 0.0;
-        for (std::ptrdiff_t i = 0; i < rows; ++i)
-            sum += Modulus(elements[i * cols + j]);
-        largest = sum > largest ? sum : largest;
-    }
-    return largest;
-}
-template <ElementType E>
 double Frobenius(const ConstMatrixView<E> &a) {
     double sum = 0.0;
     for (const ElementOf<E> &element : a.elements())
@@ -96,7 +84,7 @@ double Frobenius(const ConstMatrixView<E> &a) {
     return std::sqrt(sum);
 }
 
-// Of finite elements.
+// The singular values of a matrix of finite elements.
 template <ElementType E>
 struct Values {
     ErrorCode find(const ConstMatrixView<E> &a, SVDScaling scaling = SVDScaling::LargeNorms) {
@@ -170,7 +158,7 @@ ErrorCode MatrixNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm
     case twoNorm:
         return LargestSingularValue<E>(a, norm);
     case oneNorm:
-        *norm = LargestColumnSum<E>(a);
+        *norm = OneNorm<E>(a);
         return 0;
     case frobeniusNorm:
         *norm = Frobenius<E>(a);
@@ -231,7 +219,7 @@ ErrorCode ScaledNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm
             return failed;
         *norm = values.largest();
     } else {
-        *norm = normType == oneNorm         ? LargestColumnSum<E>(scaled.matrix)
+        *norm = normType == oneNorm         ? OneNorm<E>(scaled.matrix)
                 : normType == frobeniusNorm ? Frobenius<E>(scaled.matrix)
                                             : LargestRowSum<E>(scaled.matrix);
     }

@@ -6,7 +6,7 @@ namespace qx {
 
 namespace {
 
-// Fills a matrix with what at(i, j) gives.
+// Sets each element to at(i, j).
 template <ElementType E, class At>
 void FillEach(const MatrixView<E> &out, At at) {
     for (int32_t i = 0; i < out.rows(); ++i)

@@ -8,7 +8,7 @@ namespace {
 
 constexpr double infinity = std::numeric_limits<double>::infinity();
 
-// NaN where one of the moduli is.
+// NaN if one of the moduli is NaN.
 template <ElementType E>
 double Extreme(ConstVectorView<E> x, bool largest) {
     double extreme = Modulus(x[0]);

@@ -6,10 +6,10 @@
 
 namespace qx::test {
 
-// What matrices of recipes hold where noise will not do: element (i, j), or element i of a packed
-// one. Imaginary parts are noise below 1.
+// Contents of the matrices in recipes for which noise does not serve: element (i, j), or element i
+// of a packed matrix. Imaginary parts are noise below 1.
 
-// Its diagonal outweighs all else.
+// Diagonally dominant.
 struct PositiveDefinite {
     int32_t n;
     double operator()(int32_t i, int32_t j) const { return i == j ? 3.0 * n : 1.0 / (1.0 + i + j); }
@@ -25,7 +25,7 @@ struct PositivePacked {
         return PositiveDefinite{n}(column + index, column);
     }
 };
-// Rows and columns of very different size.
+// Rows and columns of very different magnitude.
 struct Graded {
     double operator()(int32_t i, int32_t j) const {
         return std::ldexp(1.0 + (3 * i + j) % 5, 4 * (i % 7) - 5 * (j % 6));

@@ -9,7 +9,7 @@ constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 
 const std::vector<int32_t> sizes = {1, 2, 3, 7, 20};
-// The last one is iterated upon in blocks.
+// The last size uses the blocked iteration.
 const std::vector<int32_t> schurSizes = {1, 2, 3, 7, 20, 81};
 
 template <ElementType Code, class Export>
@@ -59,7 +59,7 @@ std::vector<Recipe> EigenproblemRecipes() {
                                                     c.out2D<CDB>(1), c.err());
                  },
                  None, sizes});
-        // Up to an order that is solved by blocks.
+        // The sizes include an order that is solved by blocks.
         recipes.push_back({"EigenValueVector2026_head" + variant,
                            [output](Call &c) {
                                return EigenValueVector2026_head(
@@ -77,7 +77,7 @@ std::vector<Recipe> EigenproblemRecipes() {
                                                         c.out<CDB>(0), c.out2D<CDB>(1), c.err());
                  },
                  None,
-                 type == 0 ? std::vector<int32_t>{1, 7, 161} : std::vector<int32_t>{1, 3, 7}});
+                 type == 0 ? std::vector<int32_t>{1, 7, 161} : std::vector<int32_t>{1, 3, 7, 65}});
         recipes.push_back({"SymEvectorEvalue_head" + variant,
                            [output](Call &c) {
                                return SymEvectorEvalue_head(c.inOut2D<DBL>(0, c.n, c.n),
@@ -85,6 +85,14 @@ std::vector<Recipe> EigenproblemRecipes() {
                                                             c.err());
                            },
                            None, sizes});
+        recipes.push_back({"SymEvectorEvalue2026_head" + variant,
+                           [output](Call &c) {
+                               return SymEvectorEvalue2026_head(c.inOut2D<DBL>(0, c.n, c.n),
+                                                                c.byReference(output),
+                                                                c.out<DBL>(0), c.err());
+                           },
+                           None,
+                           {1, 7, 65, 161}});
     }
     return recipes;
 }

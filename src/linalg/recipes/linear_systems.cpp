@@ -34,7 +34,7 @@ Recipe SolveSet(const std::string &name, Export solve) {
             },
             None, sizes};
 }
-// Factors whose first row stands in each step's pivot row.
+// Solves with given factors; in each step the pivot row is row 0.
 template <ElementType E, class Export>
 Recipe SolveWithFactors(const std::string &name, Export solve) {
     return {name,
@@ -122,7 +122,7 @@ Recipe SolveTriangle(const std::string &name, int32_t triangle, Export solve) {
             None,
             {1, 2, 3, 8, 17}};
 }
-// Two diagonals above the main one, which stands in row 2, and one below it.
+// Two diagonals above the main one, which is in row 2, and one below it.
 double Banded(int32_t i, int32_t j) { return i == 2 ? 9.0 + j : 1.0 / (2 + i + j); }
 template <ElementType E, class Export>
 Recipe Band(const std::string &name, Export solve) {
@@ -154,7 +154,7 @@ Recipe Tridiagonal(const std::string &name, int32_t transposed, Export solve, Ri
             {3, 4, 17, 40}};
 }
 
-// An export with a number given.
+// An export with its last argument, a number, fixed.
 template <class Export, class Number>
 auto WithLast(Export solve, Number number) {
     return [=](auto a, auto b, auto x) { return solve(a, b, x, number); };

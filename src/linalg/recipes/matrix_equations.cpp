@@ -8,7 +8,7 @@ namespace {
 constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 
-// The last one is halved several times by the substitution.
+// The substitution halves the last size several times.
 const std::vector<int32_t> sizes = {1, 2, 3, 7, 33};
 
 template <ElementType Code, class Export>

@@ -179,7 +179,7 @@ std::vector<Recipe> FactorisationRecipes() {
             recipes.push_back(QR<CDB>("CxQRDecH", pivoting, selector, CxQRDecH));
             for (Recipe blocked : {QR<DBL>("QRDec2026H", pivoting, selector, QRDec2026H),
                                    QR<CDB>("CxQRDec2026H", pivoting, selector, CxQRDec2026H)}) {
-                blocked.sizes = {1, 3, 161}; // up to an order that is factored by blocks
+                blocked.sizes = {1, 3, 161}; // the last order is factored by blocks
                 recipes.push_back(blocked);
             }
         }

@@ -39,7 +39,7 @@ Recipe Exponential2026(const char *name, Export function) {
             [function](Call &c) { return function(c.in2D<Code>(0, c.n, c.n), c.out2D<Code>(0)); },
             None, sizes};
 }
-// Random matrices have negative and complex eigenvalues, definite ones have a real function.
+// Random matrices have negative and complex eigenvalues, definite ones have real functions.
 template <ElementType Code, class Export>
 void AddComplexFunctions(std::vector<Recipe> *recipes, const std::string &name, Export function) {
     recipes->push_back(

@@ -9,10 +9,10 @@ constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 
 const std::vector<int32_t> sizes = {1, 2, 3, 8, 9, 17, 60};
-// The last one is multiplied in blocks.
+// The last size is multiplied in blocks.
 const std::vector<int32_t> productSizes = {1, 2, 3, 8, 9, 17, 60, 130};
 
-// One export with an operand in three shapes: n by n+1 by n+2.
+// One product of an n by n+1 with an n+1 by n+2 matrix.
 template <ElementType E, class Export>
 Recipe Product(const std::string &name, Export product) {
     return {name,
@@ -42,7 +42,7 @@ Recipe VectorTimesMatrix(const std::string &name, Export product) {
             TakesEmptyInput | HostStatusInResult, productSizes};
 }
 
-// The same export with the flag given.
+// The same export with the flag fixed.
 template <class Export>
 auto With(int32_t alignedCopy, Export product) {
     return [=](auto x, auto y, auto out, ErrorCode *err) {

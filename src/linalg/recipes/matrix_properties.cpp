@@ -12,7 +12,7 @@ constexpr auto CDB = ElementType::CDB;
 
 const std::vector<int32_t> sizes = {1, 2, 3, 8, 20};
 
-// The same in both elements: real and symmetric, so Hermitian.
+// The same for both element types: real and symmetric, hence Hermitian.
 template <ElementType E>
 auto Definite(int32_t n) {
     return [n](int32_t i, int32_t j) {
@@ -24,7 +24,7 @@ auto Definite(int32_t n) {
     };
 }
 
-// A number of the exports' own element.
+// A number of the export's element type.
 template <ElementType E>
 auto Scalar(Call &c, int number) {
     if constexpr (E == CDB)
@@ -43,7 +43,7 @@ Recipe Determinant(const std::string &name, int32_t type, Export determinant) {
             },
             None, sizes};
 }
-// The rank is -1 after a failure, so it is no plain integer output.
+// The rank is -1 after a failure, so it is not a plain integer output.
 template <ElementType E, class Export>
 Recipe Rank(const std::string &name, Export rank) {
     return {name,

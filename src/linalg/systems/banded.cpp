@@ -7,8 +7,8 @@ namespace qx {
 
 namespace {
 
-// LAPACK's storage has `lower` rows more at the top, for what the row exchanges fill in, and is
-// column after column: one of our rows for each of its columns.
+// LAPACK's storage has `lower` more rows at the top, for the fill-in of row exchanges, and is
+// stored column by column: each of its columns is one of our rows.
 template <ElementType E>
 void FillStorage(const ConstMatrixView<E> &band, int32_t lower, const MatrixView<E> &storage) {
     for (int32_t j = 0; j < storage.rows(); ++j) {
@@ -19,9 +19,9 @@ void FillStorage(const ConstMatrixView<E> &band, int32_t lower, const MatrixView
     }
 }
 
-// Where LAPACK may read and write a tridiagonal matrix.
+// Memory in which LAPACK may read and write a tridiagonal matrix.
 struct AlignedDiagonals : Diagonals<true> {
-    // With room for right sides of so many columns, transposed.
+    // Includes memory for that many columns of right sides, transposed.
     ErrorCode take(int32_t n, int32_t columns) {
         return memory.take(Aligned(Sized(lower, n - 1)), Aligned(Sized(main, n)),
                            Aligned(Sized(upper, n - 1)), Aligned(Sized(upper2, n - 2)),

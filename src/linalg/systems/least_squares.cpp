@@ -14,7 +14,8 @@ namespace {
 
 constexpr auto Real = ElementType::DBL;
 
-// a = U diag(s) V^H for a of m by n, in memory of whoever uses it: u is m by k, v is n by k.
+// a = U diag(s) V^H for a of m by n, in memory that the user of the struct provides: u is m by k, v
+// is n by k.
 template <ElementType E>
 struct Decomposition {
     MatrixView<E> u, v;
@@ -58,7 +59,8 @@ struct OwnDecomposition : Decomposition<E> {
     MatrixView<E> adjoint; // of U
 };
 
-// The decomposition in the memory that is shown to the user, the rest of which becomes 0.
+// Decomposes a in the work memory that the export returns to its caller; the rest of that memory
+// becomes 0.
 ErrorCode DecomposeIn(RealVector work, const ConstRealMatrix &a, ConstRealVector b,
                       Decomposition<Real> &svd) {
     if (!AllFinite<Real>(a) || !AllFinite<Real>(b))
@@ -71,7 +73,7 @@ ErrorCode DecomposeIn(RealVector work, const ConstRealMatrix &a, ConstRealVector
     return SVDecompose<Real>(a, svd.u, svd.s, svd.v);
 }
 
-// x += V scale(U^T r), with memory for k elements. An empty scale leaves the sums alone.
+// x += V scale(U^T r); w is memory for k elements. With an empty scale the sums are not scaled.
 void AddSolution(const Decomposition<Real> &svd, ConstRealVector scale, ConstRealVector r,
                  RealVector w, RealVector x) {
     for (int32_t i = 0; i < svd.u.cols(); ++i) {
@@ -151,7 +153,7 @@ ErrorCode SolveBySVDRefined(RealVector work, const ConstRealMatrix &a, ConstReal
     Decomposition<Real> svd;
     if (const ErrorCode failed = DecomposeIn(work, a, b, svd))
         return failed;
-    // kept: no factor max(m, n) here, and a tolerance of 0 stays.
+    // kept: no factor max(m, n) here, and a tolerance of 0 is used as it is.
     const double cut = (tolerance < 0.0 ? epsilon : tolerance) * svd.s[0];
     ErrorCode status = 0;
     for (DBL &s : svd.s) {
@@ -161,8 +163,9 @@ ErrorCode SolveBySVDRefined(RealVector work, const ConstRealMatrix &a, ConstReal
     }
     const std::ptrdiff_t k = svd.s.size();
     const RealVector rest = work.part(work.size() - m, m), sums = work.part(work.size() - m - k, k);
-    // A step depends on x alone. Once x has come back to an earlier one, whole turns of the cycle
-    // are left out: a step usually changes nothing any more after a few, and the count may be any.
+    // A step depends only on x. Once x returns to an earlier value, whole periods of the cycle are
+    // skipped: after a few steps x usually no longer changes, and the number of refinements has no
+    // limit.
     constexpr int32_t alwaysDone = 16;
     Scratch<Real> earlier;
     if (refinements > alwaysDone)

@@ -12,9 +12,9 @@ namespace qx {
 
 namespace {
 
-// The factorisation halves the columns until they are few, so that nearly all terms are subtracted
-// in products of blocks (S. Toledo, "Locality of reference in LU decomposition with partial
-// pivoting", 1997). Those of one element are subtracted in ascending order all the same.
+// The factorisation halves the columns until only a few are left, so that nearly all terms are
+// subtracted in products of blocks (S. Toledo, "Locality of reference in LU decomposition with
+// partial pivoting", 1997). The terms of one element are still subtracted in ascending order.
 constexpr int32_t fewColumns = 16;
 constexpr int32_t fewRows = 4;
 
@@ -40,8 +40,8 @@ public:
 private:
     T *row(int32_t i) const { return a_.row(i); }
 
-    // The columns from `first` to `end`, from which the terms of the columns left of them have been
-    // subtracted.
+    // Factors the columns from `first` to `end`, from which the terms of the columns left of them
+    // have been subtracted.
     void factorColumns(int32_t first, int32_t end) {
         if (end - first <= fewColumns) {
             for (int32_t k = first; k < end; ++k)
@@ -54,8 +54,8 @@ private:
         factorColumns(middle, end);
     }
 
-    // Column k, whose terms have all been subtracted: pivot, division, and the terms of column k in
-    // the columns right of it up to `end`.
+    // Processes column k, whose terms have all been subtracted: finds the pivot, divides, and
+    // subtracts the terms of column k from the columns right of it up to `end`.
     void eliminate(int32_t k, int32_t end) {
         const int32_t p = pivotRow(k);
         if (p < 0)
@@ -77,7 +77,7 @@ private:
                                             end - k - 1, row(k + 1) + k, row(k) + k + 1);
     }
 
-    // Not less than the modulus, in a few operations.
+    // An upper bound of the modulus, in a few operations.
     static double boundOfModulus(double x) { return std::fabs(x); }
     static double boundOfModulus(const CDB &x) {
         return (std::fabs(x.re) + std::fabs(x.im)) * (1.0 + 0x1p-40);
@@ -109,13 +109,13 @@ private:
     }
 
     // Subtracts the terms of the columns from `first` to `middle`, which are done, from the columns
-    // up to `end`: first in their own rows, which need each other, then in all rows below.
+    // up to `end`: first in their own rows, which depend on each other, then in all rows below.
     void updateRight(int32_t first, int32_t middle, int32_t end) {
         const int32_t cols = end - middle;
         updateRows(first, middle, middle, cols);
         subtractTerms(first, middle, m_, middle, cols);
     }
-    // From rows `middle` to `end`, in `cols` columns from `col` on.
+    // Subtracts them from rows `middle` to `end`, in `cols` columns from `col` on.
     void subtractTerms(int32_t first, int32_t middle, int32_t end, int32_t col, int32_t cols) {
         SubtractProduct<E>(a_.block(middle, first, end - middle, middle - first),
                            a_.block(first, col, middle - first, cols),
@@ -175,7 +175,7 @@ struct FactoredCopy {
     IndexVector pivots;
 };
 
-// All columns of the unit matrix are solved for at once.
+// Solves for all columns of the identity matrix at once.
 template <ElementType E>
 ErrorCode Invert(const ConstMatrixView<E> &lu, ConstIndexVector pivots, const MatrixView<E> &out) {
     SetIdentity<E>(out);
@@ -210,18 +210,6 @@ ErrorCode ReciprocalCondition(double norm, const ConstMatrixView<E> &lu, ConstIn
         [&](VectorView<E> v) { SolveAdjoint<E>(lu, pivots, v); });
     *reciprocal = 1.0 / norm / inverseNorm;
     return 0;
-}
-
-template <ElementType E>
-double OneNorm(const ConstMatrixView<E> &a) {
-    double largest = 0.0;
-    for (int32_t j = 0; j < a.cols(); ++j) {
-        double sum = 0.0;
-        for (int32_t i = 0; i < a.rows(); ++i)
-            sum += Modulus(a(i, j));
-        largest = std::max(largest, sum);
-    }
-    return largest;
 }
 
 } // namespace

@@ -9,9 +9,9 @@
 
 namespace qx {
 
-// What a triangular solve reads.
+// The factors that a triangular solve reads.
 enum class Factors {
-    lu,          // square, row after row: unit lower triangle, then the upper one
+    lu,          // square, row by row: unit lower triangle, then the upper one
     lowerPacked, // see Triangle (linalg/matrix.h)
     upperPacked,
     cholesky // the packed lower triangle, then its conjugate transpose
@@ -19,14 +19,14 @@ enum class Factors {
 
 // Solves in place for all right sides, the columns of x, which has no gaps between its rows. The
 // order of arithmetic is that of a single right side:
-//   lu           a sum of products in ascending order, subtracted from the element, for each row
-//   packed ones  each unknown's multiple is subtracted from all later elements at once
+//   lu      for each row, the sum of the products in ascending order is subtracted from the element
+//   packed  the multiples of each unknown are subtracted from all later elements when it is known
 // No pivot is tested. ErrOutOfMemory, for more than one right side.
 template <ElementType E>
 ErrorCode Substitute(Factors factors, ConstVectorView<E> a, const MatrixView<E> &x);
 
-// The same with memory for the strips of columns that pass through the substitution together: n
-// times `stripWidth` doubles, or none for a single right side.
+// The same with memory for the strips of columns that are substituted together: n times
+// `stripWidth` doubles, or none for a single right side.
 inline constexpr int32_t stripWidth = 32;
 QX_BY_WIDTH_TO_8(void, SubstituteStrips,
                  (Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,

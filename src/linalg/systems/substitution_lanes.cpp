@@ -7,7 +7,7 @@ namespace qx::QX_WIDTH {
 namespace {
 
 // One row of a strip of right sides, in registers: `Vectors` vectors of columns. In a strip of
-// complex columns the real parts stand first and the imaginary parts after them, so that no
+// complex columns the real parts come first and the imaginary parts after them, so that no
 // operation needs a shuffle.
 template <class L, int Vectors>
 struct RealRow {
@@ -170,7 +170,7 @@ private:
     }
 
     // Divides unknown j by its pivot and subtracts it from the unknowns first to end - 1, whose
-    // coefficients stand in one piece.
+    // coefficients are contiguous.
     void eliminate(std::ptrdiff_t j, const T &pivot, std::ptrdiff_t first, std::ptrdiff_t end,
                    const T *coefficients) {
         Row x = Row::load(at(j));

@@ -5,10 +5,10 @@
 
 namespace qx {
 
-// Solves with a packed triangle, lower or upper, in place of x, which has its order as rows and no
-// gaps between them.
+// Solves with a packed triangle, lower or upper; the solution replaces x, whose number of rows is
+// the order of the triangle and which has no gaps between its rows.
 //
-// ErrNonFiniteInput; ErrSingularMatrix where the modulus of a diagonal element is not above the
+// ErrNonFiniteInput; ErrSingularMatrix if the modulus of a diagonal element is not above the
 // machine epsilon times the largest modulus of the triangle; ErrOutOfMemory.
 template <ElementType E>
 ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, const MatrixView<E> &x);

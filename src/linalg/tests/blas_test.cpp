@@ -14,12 +14,10 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::ElementType;
 using qx::operator*, qx::operator-;
-using qx::test::Complexes;
-using qx::test::Reals;
 
 typedef std::complex<long double> Exact;
 
@@ -46,8 +44,8 @@ std::vector<CDB> Random(std::size_t count, int seed) {
     return Complexes(static_cast<int>(count), seed);
 }
 
-// Elements of a matrix or vector in a block of just the size that BLAS may touch, so that the
-// address sanitizer sees what goes beyond; it starts off the alignment of vectors.
+// Elements of a matrix or vector in a block of exactly the size that BLAS may access, so that the
+// address sanitizer detects accesses beyond it; its start is not aligned for vectors.
 template <class T>
 class Block {
 public:
@@ -96,6 +94,9 @@ struct Routines<double> {
     static constexpr auto trmm = dtrmm_;
     static constexpr auto trsm = dtrsm_;
     static constexpr auto axpy = daxpy_;
+    static constexpr auto hemv = dsymv_;
+    static constexpr auto her2k = dsyr2k_;
+    static constexpr char adjoint = 'T';
 };
 template <>
 struct Routines<CDB> {
@@ -104,6 +105,9 @@ struct Routines<CDB> {
     static constexpr auto trmm = ztrmm_;
     static constexpr auto trsm = ztrsm_;
     static constexpr auto axpy = zaxpy_;
+    static constexpr auto hemv = zhemv_;
+    static constexpr auto her2k = zher2k_;
+    static constexpr char adjoint = 'C';
 };
 
 template <class T>
@@ -128,7 +132,7 @@ void ExpectProduct(char transA, char transB, int m, int n, int k, T alpha, T bet
     Block<T> b(plainB ? k : n, plainB ? n : k, (plainB ? k : n) + 1, 2);
     Block<T> c(m, n, m + 2, 3), before = Block<T>(m, n, m + 2, 3);
     const int32_t lda = a.leading(), ldb = b.leading(), ldc = c.leading();
-    // Unread where beta is 0.
+    // c is not read if beta is 0.
     const bool isRead = std::abs(Of(beta)) != 0;
     for (int j = 0; j < n && !isRead; ++j)
         for (int i = 0; i < m; ++i)
@@ -148,7 +152,7 @@ void ExpectProduct(char transA, char transB, int m, int n, int k, T alpha, T bet
             const long double error = std::abs(Of(c.at(i, j)) - sum);
             ASSERT_TRUE(error <= (k + 4) * eps * size) << i << " " << j;
         }
-    // Between the columns nothing is written.
+    // Nothing is written between the columns.
     const auto now = c.all(), then = before.all();
     for (int j = 0; m > 0 && j + 1 < n; ++j)
         for (int i = m; i < ldc; ++i)
@@ -171,7 +175,7 @@ TYPED_TEST(Blas, ProductsAreThoseOfTheDefinition) {
                     if (transA == transB)
                         ExpectProduct<T>(transA, transB, 41, 22, 73, alpha, beta);
                 }
-            // Either side of the blocks of rows, of terms and of small products.
+            // Sizes on both sides of the blocks of rows, of terms and of small products.
             ExpectProduct<T>(transA, transB, 97, 13, 65, one, one);
             ExpectProduct<T>(transA, transB, 31, 11, 257, minus, one);
         }
@@ -179,7 +183,8 @@ TYPED_TEST(Blas, ProductsAreThoseOfTheDefinition) {
     ExpectProduct<T>('N', 'N', 2051, 9, 70, one, none);
 }
 
-// Each element's sum has one order, however the product is cut: compared with the plain loop.
+// The sum of each element has a fixed order, however the product is blocked; compared with the
+// plain loop.
 TYPED_TEST(Blas, ProductsKeepTheOrderOfTheirTerms) {
     typedef TypeParam T;
     for (const int n : {5, 64, 131, 300}) {
@@ -200,7 +205,7 @@ TYPED_TEST(Blas, ProductsKeepTheOrderOfTheirTerms) {
     }
 }
 
-// Where there are no pages, the operands are not packed; the bits are the same.
+// If no pages can be allocated, the operands are not packed; the bits are the same.
 TEST(Products, WithoutPagesGiveTheSameBits) {
     const int n = 150;
     const auto a = Reals(n * n, 1);
@@ -231,8 +236,12 @@ void ExpectMatrixVector(char trans, int m, int n, int incx, int incy, T alpha, T
     Routines<T>::gemv(&trans, &m, &n, &alpha, a.data(), &lda, x.data(), &incx, &beta, y.data(),
                       &incy, 1);
     const auto at = [](int i, int count, int step) { return step > 0 ? i : count - 1 - i; };
-    if (m == 0 || n == 0)
+    if (m == 0 || n == 0) { // y is not even multiplied by beta
+        for (int i = 0; i < to; ++i)
+            EXPECT_TRUE(isRead ? Of(y.at(0, i)) == Of(before.at(0, i))
+                               : std::isnan(Of(y.at(0, i)).real()));
         return;
+    }
     for (int i = 0; i < to; ++i) {
         Exact sum = isRead ? Of(beta) * Of(before.at(0, at(i, to, incy))) : Exact(0);
         long double size = std::abs(sum);
@@ -261,8 +270,7 @@ TYPED_TEST(Blas, MatrixTimesVectorIsThatOfTheDefinition) {
         }
 }
 
-// op(a) x = alpha b or x op(a) = alpha b, where trsm finds x and trmm, with alpha on the other side,
-// b.
+// op(a) x = alpha b or x op(a) = alpha b: trsm finds x, and trmm, with alpha on the other side, b.
 template <class T>
 void ExpectTriangular(char side, char uplo, char trans, char diag, int m, int n, T alpha,
                       bool solve) {
@@ -271,7 +279,7 @@ void ExpectTriangular(char side, char uplo, char trans, char diag, int m, int n,
     const int order = side == 'L' ? m : n;
     Block<T> a(order, order, order + 2, 1), b(m, n, m + 1, 2), before(m, n, m + 1, 2);
     const int32_t lda = a.leading(), ldb = b.leading();
-    // What is not to be read is NaN; what is, well conditioned.
+    // Elements that must not be read are NaN; the others make a well-conditioned matrix.
     for (int j = 0; j < order; ++j)
         for (int i = 0; i < order; ++i) {
             const bool isStored = uplo == 'U' ? i < j : i > j;
@@ -323,7 +331,105 @@ TYPED_TEST(Blas, TrianglesMultiplyAndSolve) {
                     }
 }
 
-// By the integers, for which every order gives the same.
+bool IsIn(char uplo, int i, int j) { return uplo == 'U' ? i <= j : i >= j; }
+
+// A full Hermitian matrix, in which the elements that BLAS must not read are set to NaN.
+template <class T>
+std::vector<Exact> HermitianOf(Block<T> &a, char uplo, int n) {
+    std::vector<Exact> whole(n * n);
+    for (int j = 0; j < n; ++j)
+        for (int i = 0; i < n; ++i)
+            if (IsIn(uplo, i, j)) {
+                whole[i + j * n] = i == j ? Exact(Of(a.at(i, i)).real()) : Of(a.at(i, j));
+                whole[j + i * n] = std::conj(whole[i + j * n]);
+            } else
+                a.set(i, j, Number<T>(NAN, NAN));
+    for (int i = 0; i < n; ++i)
+        a.set(i, i, Number<T>(static_cast<double>(whole[i + i * n].real()), NAN));
+    return whole;
+}
+
+TYPED_TEST(Blas, HermitianMatricesMultiplyVectors) {
+    typedef TypeParam T;
+    const T alpha = Number<T>(0.7, -1.3);
+    for (const char uplo : {'U', 'L'})
+        for (const int n : {0, 1, 7, 64, 65, 200})
+            for (const int stepX : {1, -2})
+                for (const int stepY : {1, 3})
+                    for (const double beta : {0.0, 1.0, 0.5}) {
+                        SCOPED_TRACE(uplo + Sizes({n, stepX, stepY}));
+                        Block<T> a(n, n, n + 1, 4), x(n, 1, n, 5), y(n, 1, n, 6);
+                        const std::vector<Exact> whole = HermitianOf(a, uplo, n);
+                        std::vector<T> from(n * 2 + 1), to(n * 3 + 1, Number<T>(NAN, NAN));
+                        for (int i = 0; i < n; ++i) {
+                            from[stepX > 0 ? i : (n - 1 - i) * 2] = x.at(i, 0);
+                            if (beta != 0.0)
+                                to[i * stepY] = y.at(i, 0);
+                        }
+                        const int32_t lda = n + 1;
+                        const T factor = Number<T>(beta, 0);
+                        Routines<T>::hemv(&uplo, &n, &alpha, a.data(), &lda, from.data(), &stepX,
+                                          &factor, to.data(), &stepY, 1);
+                        for (int i = 0; i < n; ++i) {
+                            Exact sum = static_cast<long double>(beta) * Of(y.at(i, 0));
+                            long double size = std::abs(sum);
+                            for (int j = 0; j < n; ++j) {
+                                const Exact term = Of(alpha) * whole[i + j * n] * Of(x.at(j, 0));
+                                sum += term;
+                                size += std::abs(term);
+                            }
+                            ASSERT_TRUE(std::abs(Of(to[i * stepY]) - sum) <= (n + 8) * eps * size)
+                                << i;
+                        }
+                    }
+}
+
+TYPED_TEST(Blas, UpdatesOfRankTwoChangeOneTriangle) {
+    typedef TypeParam T;
+    const T alpha = Number<T>(0.7, -1.3);
+    for (const char uplo : {'U', 'L'})
+        for (const char trans : {'N', Routines<T>::adjoint})
+            for (const int n : {0, 1, 7, 64, 65, 150})
+                for (const int k : {0, 1, 33})
+                    for (const double beta : {0.0, 1.0, 0.5}) {
+                        SCOPED_TRACE((std::string{uplo, trans} + Sizes({n, k})));
+                        const bool plain = trans == 'N';
+                        const int rows = plain ? n : k, cols = plain ? k : n;
+                        Block<T> a(rows, cols, rows + 2, 7), b(rows, cols, rows + 1, 8);
+                        Block<T> c(n, n, n + 3, 9);
+                        const std::vector<Exact> before = HermitianOf(c, uplo, n);
+                        for (int i = 0; i < n; ++i)
+                            c.set(i, i,
+                                  Number<T>(static_cast<double>(before[i + i * n].real()), 0));
+                        const int32_t lda = a.leading(), ldb = b.leading(), ldc = c.leading();
+                        const DBL factor = beta;
+                        Routines<T>::her2k(&uplo, &trans, &n, &k, &alpha, a.data(), &lda, b.data(),
+                                           &ldb, &factor, c.data(), &ldc, 1, 1);
+                        for (int j = 0; j < n; ++j)
+                            for (int i = 0; i < n; ++i) {
+                                if (!IsIn(uplo, i, j)) {
+                                    ASSERT_TRUE(std::isnan(Of(c.at(i, j)).real())) << i << " " << j;
+                                    continue;
+                                }
+                                Exact sum = static_cast<long double>(beta) * before[i + j * n];
+                                long double size = std::abs(sum);
+                                for (int p = 0; p < k; ++p) {
+                                    const Exact left = Of(alpha) * Operated(a, trans, i, p) *
+                                                       std::conj(Operated(b, trans, j, p));
+                                    const Exact right = std::conj(Of(alpha)) *
+                                                        Operated(b, trans, i, p) *
+                                                        std::conj(Operated(a, trans, j, p));
+                                    sum += left + right;
+                                    size += std::abs(left) + std::abs(right);
+                                }
+                                ASSERT_TRUE(std::abs(Of(c.at(i, j)) - sum) <=
+                                            (2 * k + 8) * eps * size)
+                                    << i << " " << j;
+                            }
+                    }
+}
+
+// With integers, for which every order of summation gives the same result.
 TEST(Blas, OuterProductsAndRotations) {
     for (const int stepX : {1, 2, -2})
         for (const int stepY : {1, 3, -1})
@@ -396,3 +502,4 @@ TYPED_TEST(Blas, MultiplesOfVectorsAreAdded) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -10,8 +10,8 @@
 
 namespace qx::test {
 
-// Matrices in long double, against which what the library gives is held. Real ones are complex ones
-// without imaginary parts.
+// Matrices in long double, with which results of the library are compared. Real matrices are
+// complex ones without imaginary parts.
 class Exact {
 public:
     typedef std::complex<long double> Number;

@@ -8,21 +8,8 @@
 #include <cmath>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDB2DArray;
-using qx::test::CDBArray;
-using qx::test::ComplexMatrix;
-using qx::test::Contents;
-using qx::test::DBL2DArray;
-using qx::test::DBLArray;
-using qx::test::Deviation;
-using qx::test::Exact;
-using qx::test::FromUnitary;
-using qx::test::Matrix;
-using qx::test::MatrixKinds;
-using qx::test::RealMatrix;
-using qx::test::Vector;
 
 template <class T>
 std::vector<T> Noisy(int m, int n, int seed);
@@ -81,7 +68,7 @@ void ExpectPencil(int n, int32_t order, Export qz) {
         last = key;
     }
 }
-TEST(GeneralisedSchur, GivesBothMatricesBackInOrderWithEigenvectors) {
+TEST(GeneralisedSchur, ReconstructsBothMatricesInOrderWithEigenvectors) {
     for (const int n : {1, 2, 5, 16})
         for (const int32_t order : {0, 1, 2, 3, 4}) {
             SCOPED_TRACE(testing::Message() << "n " << n << ", order " << order);
@@ -90,8 +77,8 @@ TEST(GeneralisedSchur, GivesBothMatricesBackInOrderWithEigenvectors) {
         }
 }
 
-// A Schur form of NaN is no eigenvalue problem any more.
-TEST(GeneralisedSchur, OverflowIsACodeOfItsOwn) {
+// A Schur form that contains NaN has no eigenvalues.
+TEST(GeneralisedSchur, OverflowHasItsOwnCode) {
     std::vector<CDB> elements = Noisy<CDB>(20, 20, 0), others = Noisy<CDB>(20, 20, 1);
     for (CDB &z : others)
         z = {z.re < 0 ? -1.7e308 : 1.7e308, z.im < 0 ? -1.7e308 : 1.7e308};
@@ -120,7 +107,7 @@ TEST(GeneralisedSchur, RevisionsAgree) {
     EXPECT_EQ(b.values(), d.values());
 }
 
-TEST(GeneralisedEigen, KnowsInfiniteAndUndeterminedValues) {
+TEST(GeneralisedEigen, ReportsInfiniteAndUndeterminedValues) {
     const DBL2DArray a(3, 3, {6, 0, 0, 0, 5, 0, 0, 0, 0}), b(3, 3, {2, 0, 0, 0, 0, 0, 0, 0, 0});
     CDBArray values;
     CDB2DArray vectors;
@@ -177,3 +164,4 @@ TEST(GeneralisedSingularValues, MakeBothMatricesDiagonalOverOneTriangle) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -8,7 +8,7 @@
 
 namespace qx::test {
 
-// A host matrix made from plain elements, or of zeros, that can be copied.
+// A copyable host matrix made from plain elements or zeros.
 template <ElementType Code>
 class HostMatrix : public Array2D<Code> {
     typedef Array2D<Code> Base;

@@ -10,18 +10,15 @@
 #include <thread>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::Complexes;
-using qx::test::Reals;
-using qx::test::View;
 
 typedef std::complex<long double> Exact;
 
 Exact Of(CDB z) { return {z.re, z.im}; }
 
-// The largest difference from the definition, summed downward in long double, over the largest sum
-// of moduli.
+// The largest difference from the definition (summed in descending order in long double), divided
+// by the largest sum of moduli.
 template <class T>
 double ErrorOfProduct(const std::vector<T> &a, const std::vector<T> &b, const std::vector<T> &c,
                       int m, int k, int n) {
@@ -73,7 +70,7 @@ TEST(Lapack, BandAndTridiagonalDriversSolve) {
     }
 }
 
-TEST(Products, ThreadsAtOnceGetTheBitsOfOneAlone) {
+TEST(Products, ConcurrentThreadsGetTheBitsOfOneAlone) {
     const int n = 150;
     const auto a = Reals(n * n, 1), b = Reals(n * n, 2);
     std::vector<double> expected(n * n);
@@ -92,3 +89,4 @@ TEST(Products, ThreadsAtOnceGetTheBitsOfOneAlone) {
 }
 
 } // namespace
+} // namespace qx::test

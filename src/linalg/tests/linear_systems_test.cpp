@@ -14,21 +14,11 @@
 #include <limits>
 #include <thread>
 
+namespace qx::test {
 namespace {
 
-using qx::ElementType;
 using qx::operator*;
 using qx::operator+=;
-using qx::test::BackwardError;
-using qx::test::Complexes;
-using qx::test::Deviation;
-using qx::test::elementIn;
-using qx::test::Exact;
-using qx::test::ExpectLeastSquares;
-using qx::test::ExpectPseudoInverse;
-using qx::test::Reals;
-using qx::test::Scaled;
-using qx::test::View;
 
 typedef qx::test::Array1D<ElementType::DBL> DBLVector;
 typedef qx::test::Array1D<ElementType::CDB> CDBVector;
@@ -39,7 +29,7 @@ typedef qx::test::CDB2DArray CDBMatrix;
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
 
-// Every regular kind of matrix, and orders on both sides of the panels and strips.
+// Every nonsingular kind of matrix, and orders on both sides of the panels and strips.
 TEST(LU, SolvesAndInvertsBackwardStably) {
     for (const auto &kind : qx::test::MatrixKinds())
         for (const int n : {1, 2, 5, 31, 33, 64, 97}) {
@@ -65,7 +55,7 @@ TEST(LU, SolvesAndInvertsBackwardStably) {
         }
 }
 
-// All right sides at once, as the inverse is made, and one by one: the same bits.
+// Solving for all right-hand sides together, as for the inverse, or one by one gives the same bits.
 template <class T>
 void ExpectStripsLikeSingles(const std::vector<T> &a, int n) {
     constexpr ElementType E = elementIn<std::vector<T>>;
@@ -94,8 +84,8 @@ TEST(LU, AnInverseHasTheBitsOfItsColumns) {
 
 constexpr auto Decompose = &qx::LUDecompose<ElementType::DBL>;
 
-// The order of arithmetic is the plain one whatever the panels do: with a row of numbers that
-// swallow each other the last bits tell it.
+// The order of operations is that of the unblocked algorithm, whatever the panels do. The last bits
+// show it in sums whose terms absorb each other.
 TEST(LU, SubtractsTermsInAscendingOrder) {
     const int n = 70;
     std::vector<double> a(n * n, 0.0);
@@ -112,7 +102,7 @@ TEST(LU, SubtractsTermsInAscendingOrder) {
     EXPECT_EQ(a[n * n - 1], 0.0);
 }
 
-TEST(LU, TellsSingularityAndGoesOn) {
+TEST(LU, ReportsSingularityAndGoesOn) {
     std::vector<double> a = {0, 0, 2, 0, 0, 3, 0, 5, 1};
     std::vector<int32_t> pivots(3);
     int32_t parity = 7;
@@ -120,7 +110,7 @@ TEST(LU, TellsSingularityAndGoesOn) {
     EXPECT_EQ(pivots, (std::vector<int32_t>{0, 2, 2}));
     EXPECT_EQ(parity, 1);
     pivots.resize(2);
-    // Ties keep the earlier row, and NaN is never a pivot.
+    // In a tie the earlier row is the pivot, and NaN is never a pivot.
     std::vector<double> ties = {-1, 2, 1, 3};
     Decompose(View(ties, 2, 2), View(pivots), &parity);
     EXPECT_EQ(pivots[0], 0);
@@ -146,7 +136,8 @@ double OneNorm(const Exact &a) {
     return static_cast<double>(largest);
 }
 
-// Two right sides; the estimate is held against the norm of the inverse where that has digits.
+// Two right-hand sides; the estimate is compared with the norm of the inverse where that is
+// accurate.
 template <class Elements>
 void ExpectSolvedSet(const Elements &a, int n, const Elements &b) {
     constexpr ElementType E = elementIn<Elements>;
@@ -171,7 +162,7 @@ void ExpectSolvedSet(const Elements &a, int n, const Elements &b) {
         EXPECT_GE(reciprocal, exact * (1 - 1e-5));
         EXPECT_LE(reciprocal, exact * 3);
     }
-    // The digits do not depend on the size; each column has its own.
+    // The accuracy does not depend on the scale; each column has its own scale.
     if (OneNorm(Exact(n, n, a.data())) < 0x1p60) {
         Elements bits = Scaled(b, 300);
         for (int i = 0; i < n; ++i)
@@ -256,7 +247,7 @@ TEST(LeastSquares, SatisfyTheNormalEquations) {
     }
 }
 
-// A well-conditioned system in units in which its numbers are tiny or huge.
+// A well-conditioned system scaled so that its numbers are tiny or huge.
 TEST(LeastSquares, OfTheRevisionsKeepTheirDigitsAtAnyNorm) {
     for (const auto &[m, n] : {std::pair(7, 3), {3, 7}, {40, 40}, {1, 1}})
         for (const int power : {-1000, -60, -33, 0, 900}) {
@@ -285,7 +276,7 @@ TEST(LeastSquares, OfTheRevisionsKeepTheirDigitsAtAnyNorm) {
                       0);
             EXPECT_EQ(zcolumn[n - 1].im, zx.values()[n - 1].im);
         }
-    // The tolerance is relative, and one of 0 leaves nothing out that is not 0.
+    // The tolerance is relative, and a tolerance of 0 discards only zeros.
     const DBLMatrix a(2, 2, {1e-200, 0, 0, 1e-218});
     const DBLVector b({1, 1});
     DBLVector x(0);
@@ -295,8 +286,8 @@ TEST(LeastSquares, OfTheRevisionsKeepTheirDigitsAtAnyNorm) {
     EXPECT_DOUBLE_EQ(x[1], 1e218);
 }
 
-// x + y = 2, twice: of all solutions (1, 1) is the shortest.
-TEST(LeastSquares, TellALackOfRankOrDoNot) {
+// x + y = 2, twice: the minimum-norm solution is (1, 1).
+TEST(LeastSquares, ReportALackOfRankOrDoNot) {
     ErrorCode err = 1;
     DBLMatrix a(2, 2, {1, 1, 1, 1}), sides(2, 1, {2, 2}), solutions(0, 0);
     DBLVector b({2, 2}), x(0), work(0);
@@ -319,7 +310,7 @@ TEST(LeastSquares, TellALackOfRankOrDoNot) {
     EXPECT_EQ(x[0], 0.0);
 }
 
-// The cut of the plain method is max(m, n) times the tolerance, that of the refined one is not.
+// The plain method cuts at max(m, n) times the tolerance, the refined one at the tolerance.
 TEST(LeastSquares, CutSingularValuesByTheirTolerance) {
     DBLMatrix a(2, 2, {1, 0, 0, 0.15});
     DBLVector b({1, 0.15}), x(0), work(0);
@@ -332,7 +323,7 @@ TEST(LeastSquares, CutSingularValuesByTheirTolerance) {
     EXPECT_EQ(x[1], 0.0);
 }
 
-// Hilbert's matrix of order 5 has the condition number 5e5: one refinement is worth some digits.
+// Hilbert's matrix of order 5 has the condition number 5e5: one refinement gains some digits.
 TEST(LeastSquares, RefinementReducesTheResidual) {
     const int n = 5;
     std::vector<double> a, b(n, 0.0);
@@ -351,8 +342,8 @@ TEST(LeastSquares, RefinementReducesTheResidual) {
     EXPECT_LT(BackwardError(a, n, b, thrice), 0.5);
 }
 
-// Any number of refinements ends soon, with the solution that so many steps give.
-TEST(LeastSquares, RefinementsWithoutEndEnd) {
+// A huge number of refinements ends early, with the solution that all steps would give.
+TEST(LeastSquares, EndlessRefinementsTerminate) {
     const int n = 4;
     for (const double scale : {1.0, 1e300}) {
         std::vector<double> a, b(n, 1.0), work(qx::LeastSquaresWork(n, n) + 2 * n);
@@ -396,7 +387,7 @@ TEST(Cholesky, SolvesFromEitherTriangle) {
         SCOPED_TRACE(n);
         const auto a = PositiveDefinite(n);
         const auto b = Complexes(3 * n, 4);
-        // The other triangle holds something else, and is not read.
+        // The other triangle holds other numbers and is not read.
         for (const int useUpper : {0, 1}) {
             auto half = a;
             for (int i = 0; i < n; ++i)
@@ -418,7 +409,7 @@ TEST(Cholesky, SolvesFromEitherTriangle) {
     EXPECT_EQ(err, ErrNotSquare);
 }
 
-// No elements are the triangle of order 0.
+// An empty array is the triangle of order 0.
 TEST(Packed, EmptyTrianglesAreEmptyAndFitNoRightSide) {
     for (const int n : {0, 3}) {
         const ErrorCode expected = n == 0 ? ErrEmptyInput : ErrSizeMismatch;
@@ -441,7 +432,7 @@ void ExpectTriangularSolutions(int n, int triangle, std::vector<T> a, const std:
                                Export solve) {
     const Matrix B(n, 3, b), X(0, 0);
     for (int i = 0; i < n; ++i) {
-        reinterpret_cast<double &>(a[i * n + i]) -= 4.0; // a negative diagonal is no failure
+        reinterpret_cast<double &>(a[i * n + i]) -= 4.0; // a negative diagonal is not a failure
         for (int j = 0; j < n; ++j)
             if (triangle == 0 ? j > i : j < i)
                 reinterpret_cast<double &>(a[i * n + j]) = nan; // never read
@@ -495,7 +486,7 @@ TEST(Banded, SolvesLikeTheFullMatrix) {
     EXPECT_EQ(BandEqsDriH(zero.handle(), ones.handle(), 0, 0), ErrSingularMatrix);
 }
 
-// As many diagonals as the order has are allowed, and one more is not, though all might hold
+// As many diagonals as the order are allowed, and one more is refused, although all could hold
 // elements.
 TEST(Banded, HasNoMoreDiagonalsThanItsOrder) {
     const DBLMatrix band(3, 3, {9, 2, 2, 5, 5, 5, 1, 1, 9}), wide(3, 2, {9, 2, 5, 5, 1, 9});
@@ -538,7 +529,7 @@ TEST(Tridiagonal, FactorsSolveForMatrixAndTranspose) {
     EXPECT_EQ(
         TriDiagLU_head(one.handle(), two.handle(), other.handle(), out.handle(), none.handle()),
         ErrFewerThanThree);
-    // A pivot that points elsewhere would make the solver read outside of b.
+    // An invalid pivot index would make the solver read outside b.
     pivots.data()[n - 1] = n + 1;
     DBLVector x(n);
     EXPECT_EQ(TriDiagEqsByLU_head(0, l.handle(), d.handle(), u.handle(), u2.handle(),
@@ -549,8 +540,8 @@ TEST(Tridiagonal, FactorsSolveForMatrixAndTranspose) {
               WarnSingular);
 }
 
-// Eight systems at once, by our own elimination and by LAPACK, end with the bits of one after
-// another.
+// Eight systems solved in eight threads, by our own elimination and by LAPACK, give the bits of
+// systems solved one after the other.
 TEST(LinearSystems, OfDifferentThreadsHaveTheBitsOfOne) {
     constexpr int threads = 8, n = 120, diagonals = 7, columns = 3;
     struct Solutions {
@@ -587,3 +578,4 @@ TEST(LinearSystems, OfDifferentThreadsHaveTheBitsOfOne) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -28,12 +28,12 @@ inline std::vector<CDB> Complexes(int count, uint64_t seed) {
     return x;
 }
 
-// Views of vectors' elements, for inner routines.
+// Views of the elements of vectors, for internal routines.
 inline qx::RealMatrix View(std::vector<double> &a, int m, int n) { return {a.data(), m, n}; }
 inline qx::ComplexMatrix View(std::vector<CDB> &a, int m, int n) { return {a.data(), m, n}; }
 inline ConstRealMatrix View(const std::vector<double> &a, int m, int n) { return {a.data(), m, n}; }
 inline ConstComplexMatrix View(const std::vector<CDB> &a, int m, int n) { return {a.data(), m, n}; }
-// The code of what a vector holds.
+// The element type of a vector.
 template <class Vector>
 constexpr ElementType elementIn = ElementType::DBL;
 template <>
@@ -99,7 +99,7 @@ inline std::vector<double> RealMatrix(const MatrixKind &kind, int m, int n) {
             a.push_back(kind.element(i, j, m, n, noise));
     return a;
 }
-// The same with a phase on each element.
+// The same with each element multiplied by a phase.
 inline std::vector<CDB> ComplexMatrix(const MatrixKind &kind, int m, int n) {
     Noise noise(static_cast<uint64_t>(m * 1000 + n)), phase(7);
     std::vector<CDB> a;

@@ -11,20 +11,8 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDB2DArray;
-using qx::test::Complexes;
-using qx::test::ComplexMatrix;
-using qx::test::Contents;
-using qx::test::DBL2DArray;
-using qx::test::Exact;
-using qx::test::Matrix;
-using qx::test::MatrixKind;
-using qx::test::MatrixKinds;
-using qx::test::RealMatrix;
-using qx::test::Reals;
-using qx::test::ResidualRatio;
 
 typedef std::vector<double> Elements;
 
@@ -43,8 +31,7 @@ ErrorCode Lyapunov(const Array &a, const Array &q, int32_t equation, Array &x) {
         return CxLyapunov2011_head(a.handle(), q.handle(), equation, x.handle());
 }
 
-// Solves all equations; those that are singular as stated are left out. Returns how many were
-// solved.
+// Solves all equations, except those that are reported as singular. Returns the number solved.
 template <class Array>
 int ExpectSmallResiduals(const Array &a, const Array &b, const Array &c) {
     int solved = 0;
@@ -131,7 +118,7 @@ TEST(MatrixEquations, LeaveSmallResidualsAtOrderTwoHundred) {
                                    Matrix(n, n, Reals(n * n, 3))),
               5);
 }
-// Elements of 2^-400 to 1, where the values far down the diagonal are below the norm's eps.
+// Elements from 2^-400 to 1; the eigenvalues far down the diagonal are below eps times the norm.
 TEST(MatrixEquations, TakeStronglyGradedMatrices) {
     const int n = 200;
     DBL2DArray a = Matrix(n, n, Reals(n * n, 1)), x;
@@ -143,8 +130,7 @@ TEST(MatrixEquations, TakeStronglyGradedMatrices) {
     EXPECT_LT(ResidualRatio(Contents(a), Contents(b), Contents(c), 0, Contents(x)), 10);
 }
 
-// a and b with integer eigenvalues that keep apart, and an x of integers, so that c has no
-// rounding.
+// a and b have well-separated integer eigenvalues, and x consists of integers, so that c is exact.
 TEST(MatrixEquations, FindAKnownSolution) {
     const DBL2DArray a(3, 3, {4, 1, 0, -2, 5, 1, 1, 0, 6}), b(2, 2, {2, 3, -1, 1});
     const DBL2DArray x(3, 2, {3, -7, 2, 5, -1, 4});
@@ -209,7 +195,7 @@ TEST(LyapunovEquation, KeepsTheSymmetryOfTheRightSide) {
                     EXPECT_EQ(y[i * n + j].re, y[j * n + i].re);
                     EXPECT_EQ(y[i * n + j].im, -y[j * n + i].im);
                 }
-            if (n > 1) { // any other right side is not made symmetric
+            if (n > 1) { // any other right-hand side is not symmetrised
                 q.data()[1] += 1.0;
                 ASSERT_EQ(Lyapunov(a, q, equation, x), 0);
                 EXPECT_NE(x[1], x[n]);
@@ -238,14 +224,14 @@ TEST(MatrixEquations, AreSingularAtTheStatedDistance) {
     const DBL2DArray b(1, 1, {0.0}), c(2, 1, {1.0, 1.0});
     EXPECT_EQ(Sylvester(DBL2DArray(2, 2, {0x1p-40, 0, 0, 0x1p13}), b, c, 0, x), ErrSingularMatrix);
     EXPECT_EQ(Sylvester(DBL2DArray(2, 2, {0x1p-40, 0, 0, 0x1p11}), b, c, 0, x), 0);
-    // The values are i and -i, whose sum is 0 in spite of a regular matrix.
+    // The eigenvalues are i and -i, whose sum is 0 although the matrix is nonsingular.
     const DBL2DArray turn(2, 2, {0, 1, -1, 0});
     for (int32_t equation = 0; equation < 2; ++equation)
         EXPECT_EQ(Lyapunov(turn, turn, equation, x), ErrSingularMatrix);
     EXPECT_EQ(x.rows(), 0);
 }
 
-// Powers of two pass through without a change of digits, however large.
+// Scaling by powers of two changes no digits, however large they are.
 TEST(MatrixEquations, ScaleWithTheirMatrices) {
     const int m = 12, n = 9;
     const DBL2DArray a = Matrix(m, m, Reals(m * m, 1)), b = Matrix(n, n, Reals(n * n, 2)),
@@ -269,7 +255,7 @@ TEST(MatrixEquations, ScaleWithTheirMatrices) {
 }
 
 // Each element of x is the one below it times -2^30, from 2^-970 to 2^800.
-TEST(MatrixEquations, FollowGrowthThatPassesTheRangeOfADouble) {
+TEST(MatrixEquations, FollowGrowthBeyondTheRangeOfADouble) {
     const int n = 60;
     DBL2DArray a(n, n), c(n, 1), x;
     const DBL2DArray b(1, 1, {0.0});
@@ -309,3 +295,4 @@ TEST(MatrixEquations, RefuseInTheStatedOrder) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -14,28 +14,9 @@
 #include <tuple>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::CDB2DArray;
-using qx::test::ComplexMatrix;
-using qx::test::Contents;
-using qx::test::DBL2DArray;
-using qx::test::DBLArray;
-using qx::test::Deviation;
-using qx::test::elementIn;
-using qx::test::Exact;
-using qx::test::FromUnitary;
-using qx::test::I32_2DArray;
-using qx::test::I32Array;
-using qx::test::Matrix;
-using qx::test::MatrixKind;
-using qx::test::MatrixKinds;
-using qx::test::RealMatrix;
-using qx::test::Scaled;
-using qx::test::Vector;
-using qx::test::View;
-
-constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
 
 const std::vector<std::pair<int, int>> shapes = {{1, 1}, {1, 5}, {5, 1},   {2, 2},
@@ -52,7 +33,7 @@ void ForEveryMatrix(Check check) {
         }
 }
 
-TEST(SingularValueDecomposition, GivesTheMatrixBackFromUnitaryFactors) {
+TEST(SingularValueDecomposition, ReconstructsTheMatrixFromUnitaryFactors) {
     ForEveryMatrix([](const auto &a, int m, int n) {
         typedef std::decay_t<decltype(a)> Elements;
         constexpr qx::ElementType E = elementIn<Elements>;
@@ -79,9 +60,9 @@ TEST(SingularValueDecomposition, GivesTheMatrixBackFromUnitaryFactors) {
     });
 }
 
-TEST(SingularValueDecomposition, TakesWhatLiesBelowEpsilonForZero) {
-    // Whatever the norm: this matrix has the value 3e-17, but no rotation is made, and the length
-    // of the first column remains.
+TEST(SingularValueDecomposition, TreatsValuesBelowEpsilonAsZero) {
+    // Regardless of the norm: this matrix has the singular value 3e-17, but no rotation is made,
+    // and the result is the length of the first column.
     const std::vector<double> a = {1e-17, 2e-17, 2e-17, 1e-17};
     std::vector<double> s(2);
     ASSERT_EQ(qx::SingularValues<qx::ElementType::DBL>(View(a, 2, 2), View(s)), 0);
@@ -113,7 +94,8 @@ TEST(SingularValueDecomposition, OfTheRevisionHasTheSameDigitsAtAnyNorm) {
         EXPECT_LT(
             Deviation(U * Exact::Diagonal(std::min(m, n), s.data()) * V.adjoint(), Contents(given)),
             4.0);
-        // Down to where the smallest elements of the kinds are still normal numbers.
+        // Down to a scale at which the smallest elements of these matrices are still normal
+        // numbers.
         const double largest = static_cast<double>(Contents(given).norm());
         for (const int power : {-900, -60, 20, 900}) {
             if (!(std::ldexp(largest, power) < 0x1p1020) || largest > 0x1p60 * (power < 0))
@@ -129,7 +111,7 @@ TEST(SingularValueDecomposition, OfTheRevisionHasTheSameDigitsAtAnyNorm) {
     });
 }
 
-TEST(QRDecomposition, GivesTheMatrixBackFromAUnitaryAndATriangularFactor) {
+TEST(QRDecomposition, ReconstructsTheMatrixFromAUnitaryAndATriangularFactor) {
     ForEveryMatrix([](const auto &a, int m, int n) {
         typedef std::decay_t<decltype(a)> Elements;
         constexpr qx::ElementType E = elementIn<Elements>;
@@ -217,7 +199,7 @@ TEST(QRDecomposition, BlocksFactorLargeMatrices) {
                 auto real = RealMatrix(Kind("random"), m, n);
                 ExpectBlockedQR(real, m, n, form, pivoting);
                 ExpectBlockedQR(ComplexMatrix(Kind("random"), m, n), m, n, form, pivoting);
-                for (const double size : {0x1p-1015, 0x1p1016}) { // products leave the range
+                for (const double size : {0x1p-1015, 0x1p1016}) { // products overflow or underflow
                     auto scaled = real;
                     for (double &element : scaled)
                         element *= size;
@@ -283,7 +265,7 @@ void ExpectLU(const Elements &elements, int m, int n, Export lu) {
         for (int j = 0; j < std::min(i, k); ++j)
             EXPECT_LE(std::abs(L(i, j)), 1.0L);
 }
-TEST(LU, GivesThePermutedMatrixBack) {
+TEST(LU, ReconstructsThePermutedMatrix) {
     for (const char *kind : {"random", "graded", "Hilbert", "Frank"})
         for (const auto &[m, n] : shapes) {
             SCOPED_TRACE(testing::Message() << m << " by " << n << ", " << kind);
@@ -365,7 +347,7 @@ void ExpectCholesky(const std::vector<T> &b, int n, Packed cholesky, Packed inve
         for (int j = 0; j <= i; ++j)
             EXPECT_EQ(triangle(i, j), inverseMatrix(i, j));
 }
-// Every element has one order of arithmetic, in blocks or without.
+// The order of operations of every element is the same with and without blocks.
 template <class T, class Packed>
 void ExpectLeadingBlocks(const std::vector<T> &b, int n, Packed cholesky) {
     const PositiveDefinite<T> matrix(b, n);
@@ -391,7 +373,7 @@ TEST(Cholesky, OfALeadingBlockIsTheLeadingBlock) {
     ExpectLeadingBlocks(ComplexMatrix(Kind("random"), 130, 130), 130, CxCholesky_head);
 }
 TEST(Cholesky, FactorsAndInverts) {
-    for (const int n : {1, 2, 5, 30, 70}) {
+    for (const int n : {1, 2, 5, 30, 120}) {
         ExpectCholesky(RealMatrix(Kind("random"), n, n), n, Cholesky_head, Cholesky_InvMatrix_head,
                        FullCholesky_head, InvMatrixChoDri_head);
         ExpectCholesky(ComplexMatrix(Kind("random"), n, n), n, CxCholesky_head,
@@ -404,23 +386,23 @@ TEST(Cholesky, RefusesWhatIsNotPositiveDefinite) {
          {std::vector<double>{1.0, 2.0, 1.0},
           {0.0, 0.0, 1.0},
           {nan, 0.0, 1.0},
-          {1.0, 0.0, 1e-17}}) { // the last one is definite, but counts as singular
+          {1.0, 0.0, 1e-17}}) { // the last matrix is definite, but counts as singular
         const DBLArray a(packed);
         Cholesky_head(a.handle(), &err);
         EXPECT_EQ(err, ErrNotPositiveDefinite);
         EXPECT_EQ(a.size(), 0);
     }
-    // The factor is (1, 0; 2e7, 0.25): the last diagonal element is small beside the one left of
-    // it.
+    // The factor is (1, 0; 2e7, 0.25): the last diagonal element is small compared with its left
+    // neighbour.
     const DBLArray leaning(std::vector<double>{1.0, 2e7, 4e14 + 0.0625});
     Cholesky_head(leaning.handle(), &err);
     EXPECT_EQ(err, ErrNotPositiveDefinite);
     const DBLArray scaled(std::vector<double>{1.0, 0.0, 1e-15});
     Cholesky_head(scaled.handle(), &err);
     EXPECT_EQ(err, 0);
-    std::vector<double> late(45 * 46 / 2, 0.0); // of a matrix that is factored in blocks
-    for (int k = 0, at = 0; k < 45; at += 45 - k++)
-        late[static_cast<std::size_t>(at)] = k < 40 ? 1.0 : -1.0;
+    std::vector<double> late(145 * 146 / 2, 0.0); // a matrix that is factored in blocks
+    for (int k = 0, at = 0; k < 145; at += 145 - k++)
+        late[static_cast<std::size_t>(at)] = k < 140 ? 1.0 : -1.0;
     const DBLArray lateFailure(late);
     Cholesky_head(lateFailure.handle(), &err);
     EXPECT_EQ(err, ErrNotPositiveDefinite);
@@ -557,7 +539,7 @@ void ExpectBalancedReduction(Array a, Reduce reduce, Balance balance, Back back)
         EXPECT_LT(Deviation(Q * H * Q.adjoint(), balanced), 4.0);
         EXPECT_LT(FromUnitary(Q), 8.0);
         EXPECT_EQ(H.below(-1), 0.0);
-        // The columns of D P, by which the original matrix is similar to the balanced one.
+        // The columns of D P, which transforms the original matrix to the balanced one.
         std::vector<typename Array::Value> unit(n * n);
         for (int i = 0; i < n; ++i)
             PositiveDefinite<typename Array::Value>::set(unit[i * n + i], 1.0L);
@@ -577,8 +559,8 @@ void ExpectBalancedReduction(Array a, Reduce reduce, Balance balance, Back back)
         }
     }
 }
-TEST(Balancing, IsAnExactSimilarityThatReductionAndBackTransformationUnderstand) {
-    // Row 2 and column 4 have nothing but their diagonal element, and the rest is badly scaled.
+TEST(Balancing, IsAnExactSimilarityForReductionAndBackTransformation) {
+    // Row 2 and column 4 are zero except on the diagonal, and the rest is badly scaled.
     const int n = 7;
     std::vector<double> a = RealMatrix(Kind("random"), n, n);
     std::vector<CDB> z = ComplexMatrix(Kind("random"), n, n);
@@ -612,9 +594,18 @@ TEST(Balancing, ChecksItsRangeAndEndsOnHugeElements) {
     }
 }
 
-// Sums whose multiples overflow, and elements that are rounded when they are scaled.
-// Before and after the block, and at both ends of the rows.
-TEST(Balancing, RefusesExchangesWithNoRow) {
+// A column is halved while its sum is at least twice that of its row: from 8 and 1 to 2 and 4.
+TEST(Balancing, ScalesDownToLessThanTwiceTheRow) {
+    const DBL2DArray a(2, 2, {1.0, 1.0, 8.0, 1.0});
+    DBLArray scale;
+    int32_t low, high;
+    EXPECT_EQ(MatrixBalance_head(a.handle(), 2, &low, &high, scale.handle()), 0);
+    EXPECT_EQ(scale.values(), (std::vector<double>{0.25, 1.0}));
+    EXPECT_EQ(a.values(), (std::vector<double>{1.0, 4.0, 2.0, 1.0}));
+}
+
+// Row indices before and after the block, and beyond both ends of the rows.
+TEST(Balancing, RefusesExchangesWithMissingRows) {
     for (const double row : {0.0, 4.0, 1e300, nan})
         for (const int at : {0, 2}) {
             DBLArray scale({1.0, 2.0, 3.0});
@@ -625,7 +616,8 @@ TEST(Balancing, RefusesExchangesWithNoRow) {
         }
 }
 
-TEST(Balancing, EndsAtBothEndsOfTheExponents) {
+// Sums whose multiples overflow, and elements that scaling would round.
+TEST(Balancing, TerminatesAtBothEndsOfTheExponentRange) {
     DBLArray scale;
     int32_t low, high;
     const DBL2DArray huge(2, 2, {1.0, 1e308, 0.46e308, 1.0});
@@ -647,3 +639,4 @@ TEST(Balancing, EndsAtBothEndsOfTheExponents) {
 }
 
 } // namespace
+} // namespace qx::test

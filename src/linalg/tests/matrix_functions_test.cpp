@@ -16,21 +16,8 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDB2DArray;
-using qx::test::ComplexMatrix;
-using qx::test::Contents;
-using qx::test::DBL2DArray;
-using qx::test::Deviation;
-using qx::test::Exact;
-using qx::test::ExpectPseudoInverse;
-using qx::test::Matrix;
-using qx::test::MatrixKinds;
-using qx::test::RealMatrix;
-using qx::test::RelativeDeviation;
-using qx::test::Scaled;
-using qx::test::TestData;
 
 struct Case {
     std::string name;
@@ -84,7 +71,7 @@ TEST(MatrixFunctions, AgreeWithSixtyDigits) {
         EXPECT_LT(RelativeDeviation(Contents(log), Exact(c.n, c.n, c.log.data())), 1e-8);
         CDB2DArray revision;
         EXPECT_EQ(CxMatrixExp2026_head(CDB2DArray(c.n, c.n, c.a).handle(), revision.handle()), 0);
-        // Rounding errors times the condition number, which grows with the norm.
+        // Rounding errors are multiplied by the condition number, which grows with the norm.
         const double condition = static_cast<double>(Exact(c.n, c.n, c.a.data()).norm()) + 10;
         EXPECT_LT(RelativeDeviation(Contents(revision), Exact(c.n, c.n, c.exp.data())),
                   1e-15 * condition);
@@ -115,7 +102,7 @@ TEST(MatrixFunctions, AgreeWithSixtyDigits) {
     }
 }
 
-// Elements divided by 2^exponent, so that their squares neither overflow nor vanish.
+// Elements divided by 2^exponent, so that their squares neither overflow nor underflow.
 Exact AwayFromEnds(int n, const std::vector<CDB> &elements) {
     int exponent = 0;
     double largest = 0.0;
@@ -158,8 +145,8 @@ TEST(MatrixFunctions, OfTheRevisionsAgreeWithReferences) {
     }
 }
 
-// By halves, and with every degree and number of roots: the root squared and the exponential of the
-// logarithm give a back.
+// The square of the root and the exponential of the logarithm give a again. Covers the recursive
+// halves and every degree and number of square roots.
 template <class Elements, class Log, class Root>
 void ExpectInverted(const Elements &elements, int n, Log log, Root root) {
     const auto a = Matrix(n, n, elements);
@@ -185,7 +172,7 @@ TEST(MatrixFunctions, OfTheRevisionsAreInvertedAtHigherOrders) {
             }
             ExpectInverted(a, n, MatrixLn2026_head, MatrixSqrt2026_head);
             ExpectInverted(z, n, CxMatrixLn2026_head, CxMatrixSqrt2026_head);
-            // Definite: all eigenvalues are real, and so is all arithmetic.
+            // Positive definite: all eigenvalues are real, and only real arithmetic is used.
             for (int i = 0; i < n; ++i)
                 for (int j = 0; j <= i; ++j)
                     a[i * n + j] = a[j * n + i] += i == j ? n : 0.0;
@@ -211,12 +198,13 @@ TEST(MatrixFunctions, OfTheRevisionsOnTheCutAndWithoutRoot) {
         EXPECT_EQ(out[3].im, 2.0);
         EXPECT_DOUBLE_EQ(out[1].im, -beside / 3);
     }
-    // Nothing is on the cut that is below it in a triangle.
+    // In a triangular matrix, an eigenvalue slightly below the cut is not on it.
     EXPECT_EQ(CxMatrixLn2026_head(CDB2DArray(2, 2, {{-1, -1e-30}, {1, 0}, {0, 0}, {2, 0}}).handle(),
                                   out.handle()),
               0);
     EXPECT_EQ(out[0].im, -pi);
-    // Two zeros with 1 between them have no root, and with nothing between them one.
+    // With 1 between two zero eigenvalues there is no square root; with 0 between them there is
+    // one.
     for (const double between : {0.0, 1.0}) {
         const DBL2DArray a(3, 3, {4, 0, 2, 0, 0, between, 0, 0, 0});
         EXPECT_EQ(MatrixSqrt2026_head(a.handle(), out.handle()),
@@ -224,13 +212,13 @@ TEST(MatrixFunctions, OfTheRevisionsOnTheCutAndWithoutRoot) {
         EXPECT_EQ(out.rows(), between == 0.0 ? 3 : 0);
         EXPECT_EQ(MatrixLn2026_head(a.handle(), out.handle()), ErrDegenerateValue);
     }
-    // Of rank 1, with rounding errors for the other eigenvalues.
+    // Rank 1, with rounding errors as the other eigenvalues.
     for (const int n : {2, 7, 20}) {
         const std::vector<double> ones(n * n, 1.0), expected(n * n, 1.0 / std::sqrt(n));
         EXPECT_EQ(MatrixSqrt2026_head(DBL2DArray(n, n, ones).handle(), out.handle()), 0);
         EXPECT_LT(RelativeDeviation(Contents(out), Exact(n, n, expected.data())), 1e-7) << n;
     }
-    // Nearly so: eigenvalues +-1e-8.
+    // Nearly singular: eigenvalues +-1e-8.
     EXPECT_EQ(
         MatrixSqrt2026_head(DBL2DArray(2, 2, {1e-18, 1, 1e-18, 1e-18}).handle(), out.handle()),
         WarnLowAccuracy);
@@ -250,8 +238,8 @@ TEST(MatrixExponential, TakesADiagonalElementByElement) {
     EXPECT_NEAR(z[0].re, std::cos(3.0), 1e-16);
     EXPECT_NEAR(z[0].im, std::sin(3.0), 1e-16);
 }
-// 2^1024, by which such matrices are divided, is no number.
-// exp of (x, y; 0, z) has y (exp(x) - exp(z)) / (x - z) beside its diagonal, whatever the size of y.
+// exp of (x, y; 0, z) has y (exp(x) - exp(z)) / (x - z) above its diagonal, however large y is.
+// Such matrices would be divided by up to 2^1024, which is out of range.
 TEST(MatrixExponential, OfTheRevisionLosesNothingToOneLargeElement) {
     for (const double large : {1.0, 1e6, 1e100, 1e290, 1e308}) {
         SCOPED_TRACE(large);
@@ -267,7 +255,7 @@ TEST(MatrixExponential, OfTheRevisionLosesNothingToOneLargeElement) {
                   0);
         EXPECT_EQ(out.values(), (std::vector<double>{1, large, large / 2, 0, 1, 1, 0, 0, 1}));
     }
-    // The rotation by 2^k times an angle, and elements below any rounding.
+    // Rotations by large and small angles, and elements that vanish in rounding.
     DBL2DArray out;
     for (const double angle : {1e-300, 1e-3, 0.5, 2.0, 100.0, 1e6}) {
         EXPECT_EQ(
@@ -280,7 +268,8 @@ TEST(MatrixExponential, OfTheRevisionLosesNothingToOneLargeElement) {
     EXPECT_EQ(out.values(), std::vector<double>(4, 0.0));
 }
 
-// As far as the result has numbers: by a similarity with a diagonal matrix these are matrices next to 1.
+// Elements of any size for which the result is representable; similarity with a diagonal matrix
+// transforms these matrices to elements near 1.
 TEST(MatrixExponential, OfTheRevisionTakesElementsOfAnySize) {
     const auto expectExponential = [](const std::vector<double> &a,
                                       const std::vector<double> &expected) {
@@ -326,9 +315,10 @@ TEST(MatrixExponential, OfTheRevisionTakesElementsOfAnySize) {
     }
 }
 
-// The sixth power is 0, but on the way to the eighth, products overflow that would cancel: the estimate
-// of its norm is infinite, and no count of squarings. The sanitizers see it converted.
-TEST(MatrixExponential, OfTheRevisionEndsWherePowersCancel) {
+// The sixth power is 0, but in computing the eighth, products overflow that would cancel: the
+// estimate of its norm is infinite and gives no number of squarings. Sanitizers detect the invalid
+// conversion.
+TEST(MatrixExponential, OfTheRevisionTerminatesWherePowersCancel) {
     std::vector<double> a(64);
     for (int i = 0; i < 8; ++i) {
         a[8 * i] = -0x1p140;
@@ -368,7 +358,7 @@ TEST(MatrixExponential, OfTheLargestNormsIsInfiniteOrZero) {
     EXPECT_EQ(err, ErrNonFiniteInput);
 }
 TEST(MatrixExponential, ChoosesTheDegreeByItsBound) {
-    // The bound of each degree, from its definition with factorials.
+    // The bound for each degree, from its definition with factorials.
     const auto bound = [](int q) {
         const long double e = std::exp2(3.0L - 2 * q) * std::tgamma(q + 1.0L) *
                               std::tgamma(q + 1.0L) /
@@ -419,7 +409,7 @@ TEST(MatrixSquareRoot, OfNegativeAndVanishingEigenvalues) {
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(3, 3).handle(), root.handle()), WarnLowAccuracy);
     EXPECT_EQ(root.rows(), 3);
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(2, 2, {0, 1, 0, 0}).handle(), root.handle()), WarnLowAccuracy)
-        << "it has no root";
+        << "it has no square root";
     EXPECT_EQ(root.rows(), 2);
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(0, 2).handle(), root.handle()), ErrNotSquare);
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(0, 0).handle(), root.handle()), ErrEmptyInput);
@@ -427,7 +417,7 @@ TEST(MatrixSquareRoot, OfNegativeAndVanishingEigenvalues) {
 
 TEST(MatrixSquareRoot, AtTheEndOfTheRange) {
     ErrorCode err;
-    // The modulus of the eigenvalues overflows, their parts do not.
+    // The modulus of the eigenvalues overflows, but their parts do not.
     const double re = 1.6e308, im = 1.7e308;
     const DBL2DArray rotation(2, 2, {re, im, -im, re}), a(2, 2, {im, re, re, im});
     MatrixSqrt_head(rotation.handle(), &err);
@@ -452,7 +442,7 @@ TEST(MatrixPower, IsRepeatedMultiplication) {
         }
     }
 }
-TEST(MatrixPower, OfANegativeExponentIsOneOfThePseudoInverse) {
+TEST(MatrixPower, OfANegativeExponentIsAPowerOfThePseudoInverse) {
     const DBL2DArray singular(2, 2, {2.0, 2.0, 2.0, 2.0}), extreme(1, 1, {1.0});
     EXPECT_EQ(MatrixPower_head(singular.handle(), -2), 0);
     for (int i = 0; i < 4; ++i)
@@ -479,7 +469,7 @@ void ExpectPowers(const Elements &elements, int n, int scale, Export raise) {
         expected = expected * one;
     }
 }
-TEST(MatrixPower, OfTheRevisionIsOneOfTheInverseAtAnySize) {
+TEST(MatrixPower, OfTheRevisionIsAPowerOfTheInverseAtAnySize) {
     for (const int n : {1, 3, 12})
         for (const int scale : {-150, 0, 150}) {
             const auto &kind = MatrixKinds()[0];
@@ -558,3 +548,4 @@ TEST(PseudoInverse, CutsAtAnAbsoluteTolerance) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -9,20 +9,10 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
 
-using qx::test::CDB2DArray;
-using qx::test::CDBArray;
-using qx::test::ComplexMatrix;
-using qx::test::Contents;
-using qx::test::DBL2DArray;
-using qx::test::DBLArray;
-using qx::test::Deviation;
-using qx::test::Exact;
-using qx::test::Matrix;
-using qx::test::RealMatrix;
-
-// Either side of what is summed by hand and what goes through BLAS, and of its panels.
+// Sizes on both sides of the threshold between plain sums and BLAS, and of the panels of BLAS.
 const int shapes[][3] = {{1, 1, 1},    {2, 3, 4},    {8, 8, 8},    {9, 8, 8},
                          {5, 1, 7},    {1, 40, 1},   {13, 17, 11}, {64, 64, 64},
                          {3, 130, 70}, {130, 65, 3}, {40, 300, 3}};
@@ -36,7 +26,7 @@ Exact Column(const Array &x) {
     return Exact(x.size(), 1, x.data());
 }
 
-// The three products of one element type, each in its plain form and with and without copies.
+// The three products of one element type, each in its plain form, without and with a copy.
 template <class Array, class Matrices, class Plain, class Copying, class Times, class TimesCopying,
           class From, class FromCopying>
 void ExpectProducts(const Matrices &matrixOf, Plain product, Copying productCopying, Times times,
@@ -78,7 +68,7 @@ TEST(MatrixProducts, AgreeWithTheDefinitionInEveryShape) {
                              CxVectxAAligned_head);
 }
 
-// 1e16 swallows a 1 that comes after it, but not one that comes after its own negative.
+// 1e16 absorbs a 1 that is added to it, but not one that is added after -1e16 has cancelled it.
 TEST(MatrixProducts, OfFewTermsAreSummedInAscendingOrder) {
     const DBL2DArray row(1, 4, {1e16, 1, -1e16, 1}), ones(4, 1, {1, 1, 1, 1});
     const DBLArray x(row.values()), y(ones.values());
@@ -118,7 +108,7 @@ TEST(MatrixProducts, OfOperandsWithoutElementsOrThatDoNotFit) {
     AxVect_head(twoByThree.handle(), two.handle(), y.handle(), &err);
     EXPECT_EQ(err, ErrInnerDimensionMismatch);
     AxVect_head(threeByNone.handle(), three.handle(), y.handle(), &err);
-    EXPECT_EQ(err, 0) << "what is empty is told before what does not fit";
+    EXPECT_EQ(err, 0) << "an empty operand is checked before mismatched sizes";
     vectxA_head(three.handle(), twoByThree.handle(), y.handle(), &err);
     EXPECT_EQ(err, ErrInnerDimensionMismatch);
     vectxA_head(three.handle(), threeByNone.handle(), y.handle(), &err);
@@ -127,3 +117,4 @@ TEST(MatrixProducts, OfOperandsWithoutElementsOrThatDoNotFit) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -66,9 +66,9 @@ TEST(Determinant, GoesByTheType) {
     const DBLMatrix a(3, 3, {0, 2, 0, 3, 0, 0, 0, 0, 5});
     EXPECT_DOUBLE_EQ(Determinant(a, 0), -30.0); // one exchange
     EXPECT_EQ(Determinant(a, 2), 0.0);          // the diagonal alone
-    // What is not positive definite has another determinant than 0 (here -30).
+    // A matrix that is not positive definite may have a nonzero determinant (here -30).
     EXPECT_TRUE(std::isnan(Determinant(a, 1, ErrNotPositiveDefinite)));
-    // Order 2 by the formula whatever the type says, even where no factorisation would do.
+    // Order 2 uses the formula for any type, even where the factorisation would fail.
     for (const int type : {0, 1, 2, 3})
         EXPECT_EQ(Determinant(DBLMatrix(2, 2, {1, 2, 3, 4}), type), -2.0);
     EXPECT_EQ(Determinant(DBLMatrix(3, 3, {1, 2, 3, 2, 4, 6, 1, 0, 1}), 0), 0.0);
@@ -136,7 +136,7 @@ TEST(Rank, CountsSingularValuesAboveTheTolerance) {
     EXPECT_EQ(Rank(DBLMatrix(1, 1, {nan}), -1.0, ErrNonFiniteInput), -1);
 }
 
-TEST(Revisions, OfNormConditionAndRankHoldFromEndToEndOfTheRange) {
+TEST(Revisions, OfNormConditionAndRankHoldOverTheWholeRange) {
     // Singular values 2, 1, and 1e-3 of the largest number.
     for (const double size : {1e-300, 1e-160, 1e-17, 1.0, 1e155, 8e307}) {
         SCOPED_TRACE(size);
@@ -281,7 +281,8 @@ TEST(Definiteness, OfSmallMatrices) {
     CxCheckPosdef_head(z.handle(), &answer, &err);
     EXPECT_EQ(answer, 1);
 
-    // Diagonals that tell nothing: the second pivot is negative, or 0 beside what is not.
+    // The diagonal alone does not decide: the second pivot is negative, or 0 with nonzero elements
+    // in its row.
     EXPECT_EQ(TestSemi(DBLMatrix(2, 2, {1, 2, 2, 1})).answer, 0);
     EXPECT_EQ(TestSemi(DBLMatrix(2, 2, {0, 1, 1, 0})).answer, 0);
     EXPECT_EQ(TestSemi(DBLMatrix(3, 3, {1, 1, 1, 1, 1, 2, 1, 2, 1})).answer, 0);
@@ -292,8 +293,8 @@ TEST(Definiteness, OfSmallMatrices) {
     EXPECT_EQ(TestSemi(DBLMatrix(2, 2, {1, 0.5, 0.25, 1}), 0.25).answer, 1);
 }
 
-// b b^T has the rank of b, and the elimination finds it; less a little of the identity it is not
-// semi-definite any more.
+// b b^T has the rank of b, which the elimination finds; after subtracting a small multiple of the
+// identity it is no longer semi-definite.
 TEST(Definiteness, FindsTheRankOfAGramMatrix) {
     for (const int n : {1, 3, 10, 25})
         for (const int rank : {1, 2, n}) {
@@ -319,7 +320,7 @@ TEST(Definiteness, FindsTheRankOfAGramMatrix) {
         }
 }
 
-// (t - 1)(t - 2)(t - 3) of a full matrix; and of a companion matrix with a conjugate pair.
+// (t - 1)(t - 2)(t - 3) for a full matrix; also a companion matrix with a conjugate pair.
 TEST(CharacteristicPolynomial, OfKnownMatrices) {
     const DBLVector polynomial(0);
     ErrorCode err;

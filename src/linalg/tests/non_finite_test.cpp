@@ -13,8 +13,8 @@
 namespace qx::test {
 namespace {
 
-// Every export that refuses numbers which are not finite, by each of its routes and in each of its
-// inputs: the numbers stand first, in the middle and last.
+// Every export that refuses non-finite numbers, through each of its code paths and in each of its
+// inputs. The numbers are put in the first, a middle and the last place.
 
 enum Reads : unsigned {
     Everything = 0,
@@ -256,8 +256,8 @@ std::vector<Refuser<E>> Factorisations() {
     return all;
 }
 
-// A and B of the problems of two matrices, and of equations; the one that is not tried is the unit
-// matrix.
+// A and B of generalised problems and of matrix equations; the matrix that is not tested is the
+// identity.
 template <ElementType E>
 HostMatrix<E> Unit(int n) {
     HostMatrix<E> unit(n, n);
@@ -429,7 +429,7 @@ std::vector<Refuser<E>> Properties() {
     return all;
 }
 
-// What only one of the twins is, or has in another form.
+// Exports that exist only for real matrices, or whose complex twin has another form.
 std::vector<Refuser<ElementType::DBL>> RealOnly() {
     typedef DBL2DArray M;
     std::vector<Refuser<ElementType::DBL>> all = {
@@ -507,7 +507,7 @@ std::vector<Refuser<ElementType::CDB>> ComplexOnly() {
     return all;
 }
 
-// Which matrices are tried: full ones with a dominant diagonal, and a diagonal one.
+// The matrices that are tried: full ones with a dominant diagonal, and a diagonal one.
 struct Shape {
     int rows, cols;
     bool isDiagonal;
@@ -578,7 +578,7 @@ void ExpectRefusals(const std::vector<Refuser<E>> &refusers) {
         }
 }
 
-TEST(NonFinite, NumbersAreRefusedWhereverTheyStand) {
+TEST(NonFinite, NumbersAreRefusedWhereverTheyAre) {
     ExpectRefusals(Systems<ElementType::DBL>());
     ExpectRefusals(Systems<ElementType::CDB>());
     ExpectRefusals(Factorisations<ElementType::DBL>());

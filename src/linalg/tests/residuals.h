@@ -13,7 +13,7 @@
 
 namespace qx::test {
 
-// How well results satisfy what defines them, computed in long double.
+// How well results satisfy their defining equations, computed in long double.
 
 // |a - b| / |b|
 inline double RelativeDeviation(const Exact &a, const Exact &b) {
@@ -25,7 +25,7 @@ inline double Deviation(const Exact &a, const Exact &b) {
     const long double size = b.norm(), difference = (a - b).norm();
     return static_cast<double>((size == 0 ? difference : difference / size) / unit);
 }
-// How far the columns are from orthonormal, in the same unit.
+// The deviation of the columns from orthonormality, in the same unit.
 inline double FromUnitary(const Exact &q) {
     const long double difference = (q.adjoint() * q - Exact::Identity(q.cols())).norm();
     return static_cast<double>(difference / (std::max(q.rows(), q.cols()) * 0x1p-52L));
@@ -61,9 +61,9 @@ inline void ExpectPseudoInverse(const Exact &a, const Exact &x) {
     EXPECT_LT((x * a - (x * a).adjoint()).norm(), 8 * unit);
 }
 
-// |a v - w v| is within 4 n eps |a| |v| for every column v of v, and v has unit length. Balancing
-// makes that true of the balanced matrix, so it is held against that; where the scales of rows and
-// columns lie far apart the two differ.
+// Checks that |a v - w v| is within 4 n eps |a| |v| for every column of v, and that the columns
+// have unit length. Because of balancing, the bound holds for the balanced matrix, which differs
+// from a if the scales of rows and columns are far apart.
 template <class Elements>
 void ExpectEigenpairs(const Elements &a, int n, const std::vector<CDB> &w,
                       const std::vector<CDB> &v) {

@@ -69,7 +69,7 @@ TEST(PackedStorage, ExpandsAndPacksEachTriangle) {
         Matrix_to_Compact_head(out.handle(), &triangle, back.handle(), &err);
         EXPECT_EQ(back.values(), packed.values());
     }
-    // Another triangle changes nothing, with success.
+    // An unknown triangle changes nothing and is not a failure.
     const DBLMatrix out(1, 1, {7});
     const PackedTriangle other = {packed.handle(), 3};
     Compact_to_Matrix_head(&other, out.handle(), &err);
@@ -83,7 +83,7 @@ TEST(PackedStorage, ExpandsAndPacksEachTriangle) {
     EXPECT_EQ(zout.at(0, 1).im, 3.0); // not conjugated
 }
 
-TEST(InitialMatrix, IsZeroOrNothing) {
+TEST(InitialMatrix, IsZeroOrEmpty) {
     const DBLMatrix out(1, 1, {7});
     EXPECT_EQ(InitialMatrixH(2, 2, out.handle()), 0);
     EXPECT_EQ(out.values(), Values(4, 0.0));
@@ -92,7 +92,7 @@ TEST(InitialMatrix, IsZeroOrNothing) {
     EXPECT_EQ(out.rows(), 0);
 }
 
-// The eigenvalues come back, from a matrix that is not diagonal.
+// The matrix has the given eigenvalues and is not diagonal.
 TEST(MatrixFromEigenvalues, HasThem) {
     ErrorCode err;
     const DBLVector values({3, -1, 0.5, 2});

@@ -11,7 +11,7 @@
 #include <limits>
 #include <vector>
 
-// The functions over lanes against the scalar ones, to the bit.
+// Compares the functions over lanes with the scalar ones, to the bit.
 
 namespace {
 
@@ -20,7 +20,7 @@ typedef std::vector<double> Numbers;
 constexpr double pi = 3.141592653589793;
 constexpr double inf = std::numeric_limits<double>::infinity();
 
-// Random bits, of which every exponent is as likely, and numbers in the range of usual angles.
+// Random bit patterns, with all exponents equally likely, and numbers in the range of usual angles.
 class Arguments {
 public:
     explicit Arguments(uint64_t seed) : state_(seed) {}
@@ -33,7 +33,7 @@ public:
     }
     double anything() { return std::bit_cast<double>(bits()); }
     double upTo(double largest) { return largest * (static_cast<double>(bits()) * 0x1p-63 - 1); }
-    // Near k quarter turns, by a relative 2^-60 to 1.
+    // Near k quarter turns, with relative distances from 2^-60 to 1.
     double nearQuarter() {
         const double offset = std::ldexp(upTo(1), -static_cast<int>(bits() % 60));
         return std::round(upTo(std::ldexp(1.0, static_cast<int>(bits() % 22)))) * (pi / 4) *
@@ -80,7 +80,7 @@ void Compare(const Numbers &x, const Numbers &y) {
     ExpectSame(one, x, y, Hypotenuse, "hypot");
 }
 
-// QX_ELEMENTARY_CASES in the environment asks for more.
+// The environment variable QX_ELEMENTARY_CASES requests more.
 int64_t Cases() {
     const char *const asked = std::getenv("QX_ELEMENTARY_CASES");
     return asked != nullptr ? std::atoll(asked) : 100000;
@@ -97,7 +97,8 @@ TEST(Elementary, HaveTheBitsOfTheScalarFunctions) {
                        : kind == 1 ? arguments.upTo(10)
                        : kind == 2 ? arguments.upTo(2e6)
                                    : arguments.nearQuarter();
-                // For two arguments: any, of like size, on either side of an octant's edge.
+                // For two arguments: any values, similar magnitudes, or both sides of the edge of
+                // an octant.
                 y[i] = kind == 0   ? arguments.anything()
                        : kind == 1 ? arguments.upTo(10)
                        : kind == 2
@@ -110,8 +111,8 @@ TEST(Elementary, HaveTheBitsOfTheScalarFunctions) {
         }
 }
 
-// Each in each place of a group, so that one argument spoils no other.
-TEST(Elementary, HaveThemOfSpecialArgumentsToo) {
+// Each special argument in each place of a group, so that effects on its neighbours are detected.
+TEST(Elementary, HaveTheBitsForSpecialArguments) {
     const Numbers special = {0.0,     -0.0,    1,        -1,       inf,      -inf,   NAN,
                              5e-324,  1e-310,  0x1p-27,  0x1p-26,  0x1p26,   0x1p27, 1e22,
                              1e308,   pi / 4,  pi / 2,   pi,       -pi,      2 * pi, 0x1.921fbp20,
@@ -127,7 +128,7 @@ TEST(Elementary, HaveThemOfSpecialArgumentsToo) {
                 qx::SinesAndCosines(inPlace.data(), static_cast<int32_t>(n), inPlace.data(),
                                     y.data());
                 ExpectSame(inPlace, x, x, Sine, "sin in place");
-                ExpectSame(y, x, x, Cosine, "cos beside it");
+                ExpectSame(y, x, x, Cosine, "cos computed with it");
             }
 }
 

@@ -8,13 +8,13 @@ import random
 
 import mpmath as mp
 
-mp.mp.prec = 2400  # the whole exponent range may cancel in a reduction
+mp.mp.prec = 2400  # argument reduction may cancel over the whole exponent range
 random.seed(20261)
 HERE = pathlib.Path(__file__).parent
 
 
 def spread(low, high, count):
-    """Random arguments with uniform exponents, both signs where low is negative."""
+    """Random arguments with uniform exponents, of both signs if low is negative."""
     signs = [1, -1] if low < 0 else [1]
     low = abs(low)
     return [random.choice(signs) * math.exp(random.uniform(math.log(low), math.log(high)))
@@ -34,7 +34,7 @@ TURNS = [1e10, 1e22, 1e300, 6381956970095103.0 * 2.0**797, 2.0**1023, 355.0, 710
 for multiple in (1, 2, 3, 4, 5, 10, 101, 2**20, 2**20 + 1, 10**8, 10**15):
     TURNS += near(float(multiple * mp.pi / 2), 1)
 TINY = [5e-324, -1e-310, 2.0**-1022, 1e-300, -1e-20, 2.0**-28, 2.0**-27, 1e-8]
-# Largest errors that a local search found.
+# Arguments with the largest errors that a local search found.
 WORST = {
     "sin": ["-0x1.a191253366ca7p-1", "-0x1.3402b100c0ad3p+627"],
     "cos": ["0x1.2ca0ee5ba85fep+278", "-0x1.efbc97d79f95p+1"],

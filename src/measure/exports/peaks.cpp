@@ -12,7 +12,7 @@ namespace {
 
 Outcome Runs(In<DBL1D> x, const double *threshold, const int32_t *width, Out<I32_1D> indices,
              OutI32 count) {
-    // kept: an array as long as the width has no room for a run.
+    // kept: an array as long as the width is refused, although it has room for a run.
     if (const ErrorCode bad = FirstFailed({{*width < 1 || x.size() <= *width, ErrWidthOutOfRange}}))
         return bad;
     if (const Outcome bad = indices.resize(x.size() / *width + 1))
@@ -24,7 +24,8 @@ Outcome Runs(In<DBL1D> x, const double *threshold, const int32_t *width, Out<I32
     return 0;
 }
 
-// The caller's request: its last arrays are outputs of the call, and its first one may be changed.
+// The caller's request: its last arrays are outputs of the call, and its first array may be
+// modified.
 class InOutRequest {
 public:
     InOutRequest(PeakDRequest *request)
@@ -38,14 +39,7 @@ public:
         for (InOut<DBL1D> *array : {&locations_, &amplitudes_, &derivatives_})
             if (const Outcome bad = array->resize(found.size()))
                 return bad;
-        DBL *const locations = locations_.data();
-        DBL *const amplitudes = amplitudes_.data();
-        DBL *const derivatives = derivatives_.data();
-        for (int32_t i = 0; i < found.size(); ++i) {
-            locations[i] = found[i].location;
-            amplitudes[i] = found[i].amplitude;
-            derivatives[i] = found[i].derivative;
-        }
+        found.copyTo(locations_.data(), amplitudes_.data(), derivatives_.data());
         request_->count = found.size();
         return 0;
     }
@@ -66,7 +60,7 @@ private:
     InOut<DBL1D> locations_, amplitudes_, derivatives_;
 };
 
-// The state of a stream: the caller's record, and the array that holds its numbers.
+// The state of a stream: the caller's record, and the array that stores its numbers.
 class InOutStream {
 public:
     struct Words {
@@ -75,8 +69,9 @@ public:
     };
     InOutStream(Words words) : words_(words) {}
 
-    // The state for windows of w samples, with its pointers into the buffer as it stands now. A
-    // first block of n samples has at least a window of them: the buffer grows for no other.
+    // The state for windows of w samples, with its pointers into the buffer where that lies now. A
+    // first block of n samples must contain at least one window; otherwise the buffer is not
+    // resized.
     Outcome open(int32_t w, bool isFirst, int32_t n, PeakDState *&state) {
         state = words_.state;
         const int64_t length = PeakBufferLength(w);
@@ -84,7 +79,7 @@ public:
             *state = {};
             state->width = w;
             if (words_.buffer == nullptr)
-                return 0; // which the step refuses
+                return 0; // the step then refuses it
             if (length > std::numeric_limits<int32_t>::max())
                 return ErrOutOfMemory;
             if (n < w)
@@ -117,7 +112,7 @@ private:
     Words words_;
 };
 
-// What is scanned: the request's own data, or a copy of the source.
+// The samples that are scanned: the request's own data, or a copy of the source.
 class ScanData {
 public:
     ErrorCode copyOf(DBL1D source) {
@@ -130,7 +125,7 @@ public:
         std::memcpy(copy_.data(), samples.data(), static_cast<std::size_t>(size_) * sizeof(DBL));
         return 0;
     }
-    // Whose block stays where it is as long as the step runs.
+    // The block of `array` stays in place while the step runs.
     void showOf(const Spoiled<DBL1D> &array) {
         shown_ = array.data();
         size_ = array.size();

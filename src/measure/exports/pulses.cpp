@@ -8,7 +8,7 @@
 namespace qx {
 namespace {
 
-// Measured numbers, handed over together; a failure leaves 0.
+// Measured numbers that are returned together; a failure sets them to 0.
 template <std::size_t N>
 class OutMeasured {
 public:
@@ -39,7 +39,7 @@ private:
 template <class... Address>
 OutMeasured(Address *...) -> OutMeasured<sizeof...(Address)>;
 
-// In the order in which the exports have them.
+// In the order of the exports' arguments.
 void SetLevels(const OutMeasured<3> &levels, const ReferenceLevels &ref) {
     levels.set(ref.low, ref.mid, ref.high);
 }

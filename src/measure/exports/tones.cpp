@@ -25,7 +25,7 @@ bool AllFinite(const In<DBL1D> &y) {
 
 enum ToneOrder : int32_t { FallingAmplitude = 0, RisingFrequency = 1 };
 
-// The places of the tones in their order; equal ones stay as they were found.
+// The indices of the tones in order; equal ones stay in the order in which they were found.
 void Sort(const ToneSearch &search, ToneOrder order, I32 *places) {
     const auto isBefore = [&](int32_t a, int32_t b) {
         return order == RisingFrequency ? search[a].frequency < search[b].frequency
@@ -109,7 +109,7 @@ Outcome SingleTone(In<DBL1D> y, double dt, double centre, double halfWidth, OutD
     return 0;
 }
 
-// Where a frequency is seen, in cycles per sample.
+// The frequency at which a tone appears after aliasing, in cycles per sample.
 double Seen(double frequency, double dt) { return std::fabs(PartOfTurn(frequency, dt)); }
 
 Outcome Harmonics(In<DBL1D> y, double dt, double fundamental, int32_t highest, double fullScale,

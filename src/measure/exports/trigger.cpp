@@ -9,7 +9,7 @@
 namespace qx {
 namespace {
 
-// A failure leaves -1 in it.
+// A failure sets it to -1.
 class OutIndex {
 public:
     OutIndex(int32_t *address) : address_(address) {}

@@ -8,14 +8,14 @@ namespace {
 constexpr auto DBL = ElementType::DBL;
 constexpr auto I32 = ElementType::I32;
 
-// What a state tells beside its arrays.
+// The members of a state that are not arrays.
 struct StreamNumbers {
     int32_t width, position, historyCount, tailCount, slopeSign, count;
 };
 
 double FlatAround1(int32_t i) { return 1.0 + (i % 7 - 3) * 1e-9; }
 
-// One call that begins a stream and, with `calls` of 2, another one that ends it.
+// One call that begins a stream and, if `calls` is 2, a second call that ends it.
 struct Stream {
     int32_t width, polarity, mode;
     int calls;

@@ -7,7 +7,7 @@ namespace {
 
 constexpr auto DBL = ElementType::DBL;
 
-// Trapezoids of 20 samples that ring a little, in a rising and a falling order.
+// Trapezoids of 20 samples with a little ringing, rising or falling first.
 double Pulses(int32_t i) {
     constexpr double shape[] = {0, 0.01, 0, -0.02, 0.25, 0.75, 1.25, 0.9, 1.0, 1.02,
                                 1, 0.99, 1, 1,     0.7,  0.2,  -0.1, 0,   0,   0.01};
@@ -20,7 +20,7 @@ DBL1D Waveform(Call &c, int number = 0) { return c.in<DBL>(number, c.n + usualSi
 
 ReferenceLevels *Percent(Call &c, int number) {
     auto *levels = c.record<ReferenceLevels>(number);
-    // Field by field: a whole record would bring bytes of no meaning between its fields.
+    // Field by field: a copy of the whole record would include meaningless padding bytes.
     levels->high = 90;
     levels->mid = 50;
     levels->low = 10;
@@ -34,7 +34,7 @@ HistogramOptions *Bins(Call &c, int number, uint32_t method) {
     return options;
 }
 
-// Measured numbers are 0 after a failure, which the tests of the family look at.
+// Measured numbers are 0 after a failure; the tests of the family check this.
 double *Number(Call &c, int number) { return c.record<double>(10 + number); }
 
 void **Slot(Call &c) { return c.slot(0); }

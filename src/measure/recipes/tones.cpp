@@ -7,8 +7,8 @@ namespace {
 
 constexpr auto DBL = ElementType::DBL;
 
-// Periods of 16 and of 10 samples with harmonics: exact values, none of them of an elementary
-// function.
+// Periods of 16 and of 10 samples with harmonics. The values are exact; none comes from an
+// elementary function.
 double Waves(int32_t i) {
     constexpr double slow[] = {0, 3, 5, 7, 8, 7, 6, 3, 0, -3, -5, -7, -8, -7, -6, -3};
     constexpr double fast[] = {0, 6, 9, 9, 5, 0, -5, -9, -9, -6};

@@ -11,12 +11,12 @@ std::vector<Recipe> TriggerRecipes() {
     std::vector<Recipe> recipes;
     for (int32_t slope = 0; slope < 3; ++slope) {
         const std::string variant = ": slope " + std::to_string(slope);
-        // -1 and not 0 is what a failure leaves in the index.
+        // A failure leaves -1 and not 0 in the index.
         recipes.push_back({"Triggerh" + variant, [=](Call &c) {
                                return Triggerh(c.in<DBL>(0), 0.25, slope, c.n / 3,
                                                c.record<int32_t>(0), c.scalar(0));
                            }});
-        // All triggers of a block, of which the last call tells the last.
+        // All triggers of a block; the last call reports the last one.
         recipes.push_back({"Triggerh_86" + variant, [=](Call &c) {
                                const DBL1D y = c.in<DBL>(0);
                                auto *state = c.record<TriggerState>(0);

@@ -16,11 +16,8 @@
 #include <numbers>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::HeapProbe;
-using qx::test::Noise;
 
 const double nan = std::numeric_limits<double>::quiet_NaN();
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -33,8 +30,8 @@ Samples Sampled(int32_t n, const std::function<double(double)> &f) {
     return y;
 }
 
-// 0 and 1 with straight edges: up from `begin` in `rise`, `high` long, down in `fall`, every
-// `period`.
+// Pulses from 0 to 1 with straight edges: they rise from `begin` on for `rise` samples, stay at 1
+// for `high`, fall for `fall`, and repeat every `period`.
 struct Trapezoids {
     double begin, rise, high, fall, period;
     double operator()(double t) const {
@@ -47,7 +44,7 @@ struct Trapezoids {
     }
 };
 
-// What the exports hand over, filled with rubbish that a failure must clear.
+// Scalar outputs of the exports, filled with rubbish that a failure must clear.
 struct Numbers {
     double values[11] = {9, 9, 9, 9, 9, 9, 9, 9, 9, 9, 9};
     double *operator()(int i) { return &values[i]; }
@@ -146,7 +143,7 @@ private:
     bool isIDP_;
 };
 
-// Two states of the given counts at -1 and 3, the rest spread between them.
+// Two states at -1 and 3 with the given numbers of samples, and the rest spread between them.
 Samples TwoStates(int32_t low, int32_t high, int32_t between) {
     Samples y(static_cast<std::size_t>(low), -1.0);
     y.insert(y.end(), static_cast<std::size_t>(high), 3.0);
@@ -159,7 +156,7 @@ TEST(StateLevels, AreThoseOfTheFullestBinsOrTheExtremes) {
     for (const bool isIDP : {false, true}) {
         Node node(isIDP);
         const Samples y = TwoStates(30, 20, 50);
-        // The outer bins, whose centres stand half a bin inside.
+        // The states are the outer bins, whose centres are half a bin inside.
         for (const int32_t bins : {10, 64, 400}) {
             const Levels levels = node.levels(y, QXLevelsByHistogram, bins);
             EXPECT_EQ(levels.status, 0);
@@ -172,21 +169,21 @@ TEST(StateLevels, AreThoseOfTheFullestBinsOrTheExtremes) {
         EXPECT_EQ(peaks.high, 3);
         EXPECT_EQ(peaks.amplitude, 4);
     }
-    // An overshoot does not move a state, and one sample in the wrong half does not make one.
+    // An overshoot does not shift a state, and one sample in the wrong half does not create one.
     Samples ringing = TwoStates(50, 50, 0);
     ringing[50] = 4;
     ringing[51] = 2;
     const Levels levels = Node().levels(ringing, QXLevelsByHistogram, 100);
     EXPECT_NEAR(levels.low, -1, 0.03);
     EXPECT_NEAR(levels.high, 3, 0.03);
-    // Of bins that are equally full the outermost has it.
+    // Among equally full bins, the outermost one is the state.
     const Levels even =
         Node().levels(Sampled(100, [](double i) { return i; }), QXLevelsByHistogram, 10);
     EXPECT_NEAR(even.low, 4.95, 1e-12);
     EXPECT_NEAR(even.high, 94.05, 1e-12);
 }
 
-TEST(StateLevels, TheAutomaticMethodLooksAtTheShareOfAState) {
+TEST(StateLevels, TheAutomaticMethodDependsOnTheShareOfAState) {
     Node node;
     const Samples thin = TwoStates(2, 3, 95); // the outer bins hold 4% and 5%
     EXPECT_EQ(node.levels(thin, QXLevelsByHistogram, 50).status, WarnMeasurePartial);
@@ -195,8 +192,8 @@ TEST(StateLevels, TheAutomaticMethodLooksAtTheShareOfAState) {
     const Samples high = TwoStates(2, 40, 95);
     for (const int32_t limit : {0, 1}) {
         const Levels levels = node.levels(high, QXLevelsAutomatic, 50, limit);
-        EXPECT_EQ(levels.low, -1) << "no state, so the minimum";
-        EXPECT_NEAR(levels.high, limit == 0 ? 3 - 0.04 : 3, 1e-12) << "one of them is not enough";
+        EXPECT_EQ(levels.low, -1) << "no low state, so the minimum";
+        EXPECT_NEAR(levels.high, limit == 0 ? 3 - 0.04 : 3, 1e-12) << "one state is not enough";
     }
     const Samples both = TwoStates(30, 40, 95);
     for (const int32_t limit : {0, 1}) {
@@ -205,7 +202,7 @@ TEST(StateLevels, TheAutomaticMethodLooksAtTheShareOfAState) {
     }
 }
 
-TEST(StateLevels, RefuseWhatHasNone) {
+TEST(StateLevels, RefuseWaveformsWithoutStates) {
     Node node;
     const Samples flat(20, 2.5);
     EXPECT_EQ(node.levels(flat, QXLevelsByHistogram, 10).status, ErrMeasureNotPositive);
@@ -251,7 +248,7 @@ TEST(Slots, BelongToTheHostOrToTheNode) {
         int32_t allocations;
         {
             const HeapProbe probe;
-            Node same; // takes the word over for one call
+            Node same; // takes over the word for one call
             same.word = node.word;
             const DBLArray array(y);
             Numbers r;
@@ -261,16 +258,17 @@ TEST(Slots, BelongToTheHostOrToTheNode) {
             allocations = probe.allocations();
         }
         if (HeapProbe::works()) {
-            EXPECT_LE(allocations, 4) << "of the array alone";
+            EXPECT_LE(allocations, 4) << "for the array alone";
         }
         EXPECT_EQ(node.levels(y, 0, 20).status, 0);
-        EXPECT_EQ(qx::test::RegisteredSweeps(), before + 1) << "the old block is withdrawn";
+        EXPECT_EQ(qx::test::RegisteredSweeps(), before + 1)
+            << "the sweep of the old block is unregistered";
         qx::test::Host().sweepStatus = 5;
         EXPECT_EQ(node.levels(y, 0, 30).status, ErrOutOfMemory);
         EXPECT_EQ(node.word, nullptr);
         qx::test::ResetHost();
         EXPECT_EQ(node.levels(y, 0, 30).status, 0);
-        qx::test::RunSweeps(); // the host discards the node, and the word with it
+        qx::test::RunSweeps(); // the host discards the node and its word
         node.word = nullptr;
     }
     {
@@ -282,7 +280,7 @@ TEST(Slots, BelongToTheHostOrToTheNode) {
         Node slot;
         EXPECT_EQ(slot.levels(y, 0, 10).status, 0);
         void *wrong = slot.word;
-        EXPECT_EQ(MeasurementUnreserveProc(&wrong), ErrInternal) << "that is swept by the host";
+        EXPECT_EQ(MeasurementUnreserveProc(&wrong), ErrInternal) << "a word that the host sweeps";
         EXPECT_EQ(wrong, slot.word);
         qx::test::RunSweepOf(std::exchange(slot.word, nullptr));
         EXPECT_EQ(qx::test::RegisteredSweeps(), 0);
@@ -296,7 +294,7 @@ TEST(Slots, BelongToTheHostOrToTheNode) {
     measurements_destroy();
 }
 
-// The first events by looking at each sample.
+// The first events, found by checking each sample.
 TEST(Search, FindsTheFirstOfEveryKind) {
     Noise noise(5);
     for (int round = 0; round < 400; ++round) {
@@ -344,17 +342,17 @@ TEST(Crossings, CountOncePerExcursion) {
     };
     EXPECT_EQ(crossings({-2, 2, -2, 2}, 0, 1), (Samples{0.5, -1.5, 2.5}));
     EXPECT_EQ(crossings({-2, 2, -2, 2}, 0, 1, 2), (Samples{0.5, -1.5}));
-    // What stays within the band does not arm.
+    // Values that stay within the band do not arm.
     EXPECT_EQ(crossings({-2, 0.5, -0.5, 0.5, 2, -0.5, 3}, 0, 1), (Samples{0.8, -4.8}));
     EXPECT_EQ(crossings({0.5, -0.5, 0.5}, 0, 1), Samples());
     EXPECT_EQ(crossings({-2, 0, 0, 0, 2, -2}, 0, 1), (Samples{1, -4.5}));
     EXPECT_EQ(crossings({}, 0, 1), Samples());
     EXPECT_EQ(crossings({3}, 0, 1), Samples());
-    // Where distances are so small that their product is no number any more.
+    // Distances so small that their product underflows.
     EXPECT_EQ(crossings({1e-200, 2e-200, 1e-200, -1e-200}, 0, 0), (Samples{-2.5}));
-    // A gap hides a crossing, and the next one has the same direction.
+    // A gap hides a crossing, so the next crossing has the same direction.
     EXPECT_EQ(crossings({2, -2, nan, 2, -2}, 0, 1), (Samples{-0.5, -3.5}));
-    // Long level stretches.
+    // Long constant stretches.
     Samples y(1000, -3);
     y[500] = 5;
     EXPECT_EQ(crossings(y, 0, 1), (Samples{499.375, -500.625}));
@@ -400,16 +398,16 @@ TEST(Pulses, AtTheEndOfTheRecordMayBePartial) {
     EXPECT_EQ(pulse.period, 0);
     EXPECT_EQ(pulse.dutyCycle, 0);
     EXPECT_EQ(node.pulse(y, 0, 1, 1).status, ErrMeasureSearchShort) << "its end is missing";
-    // Two edges of one direction, with a gap between them, are no pulse.
+    // Two edges of the same direction, with a gap between them, are not a pulse.
     node.ref = {1, 0, -1, 0};
     EXPECT_EQ(node.pulse({-2, 2, nan, -2, 2}, 1, 1, 1).status, ErrMeasureSearchShort);
     node.ref = {90, 50, 10, 1};
-    // With it a whole period is none either.
+    // A whole period with the gap does not count either.
     const Samples more = Sampled(150, Trapezoids{10, 4, 21, 10, 50});
     EXPECT_NEAR(node.pulse(more, 1, 1, 0).period, 50, 1e-9);
     EXPECT_EQ(node.pulse(more, 1, 1, 1).period, 0);
 
-    // PulseMeas is of whole periods.
+    // PulseMeas measures whole periods only.
     const DBLArray array(more);
     Numbers r;
     EXPECT_EQ(PulseMeas(array.handle(), 0, 1, 1, 1, &node.ref, &node.hist, &node.word, r(0), r(1),
@@ -426,7 +424,7 @@ TEST(Pulses, ReferencesMayBeAbsolute) {
     EXPECT_EQ(pulse.status, 0);
     EXPECT_NEAR(pulse.duration, 3 + 21 + 7.5, 1e-12);
     EXPECT_EQ(pulse.midRef, 0.25);
-    // No histogram, so a flat waveform is not refused for its levels.
+    // Absolute references need no histogram, so a flat waveform is not refused for its levels.
     EXPECT_EQ(node.pulse(Samples(50, 1.0), 1, 1).status, ErrMeasureSearchShort);
     node.ref.low = 0.3;
     EXPECT_EQ(node.pulse(y, 1, 1).status, ErrMeasureRangeReversed);
@@ -438,7 +436,7 @@ TEST(Pulses, ReferencesMayBeAbsolute) {
     EXPECT_EQ(node.pulse(y, 2, 1).status, ErrInvalidSelector);
     EXPECT_EQ(node.pulse(y, 1, 1, 0, 2).status, ErrInvalidSelector);
     EXPECT_EQ(node.pulse(y, 1, std::numeric_limits<int32_t>::max()).status, ErrMeasureOutOfMemory);
-    { // of crossings that there cannot be no memory is taken
+    { // no memory is allocated for crossings that cannot exist
         const HeapProbe probe(0, 1 << 16);
         EXPECT_EQ(node.pulse(y, 1, 1000000).status, ErrMeasureSearchShort);
     }
@@ -452,8 +450,7 @@ TEST(Pulses, ReferencesMayBeAbsolute) {
     EXPECT_TRUE(r.areZero(7));
 }
 
-// The waveform of every test in two states with noise: the measured errors follow the noise.
-// Memory follows the samples and not the number asked for.
+// Memory is proportional to the number of samples, not to the requested pulse.
 TEST(Pulses, AreSearchedInAListNoLongerThanTheWaveform) {
     if (!HeapProbe::works())
         GTEST_SKIP();
@@ -468,7 +465,8 @@ TEST(Pulses, AreSearchedInAListNoLongerThanTheWaveform) {
     EXPECT_EQ(node.pulse(y, 1, 1, 1).status, 0);
 }
 
-TEST(Pulses, StandNoise) {
+// The bounds follow the measured errors, which depend on the noise.
+TEST(Pulses, TolerateNoise) {
     Noise noise(11);
     Samples y = Sampled(3000, Trapezoids{40, 20, 80, 20, 200});
     for (double &value : y)
@@ -514,7 +512,7 @@ TEST(Transitions, OfRingingStepsHaveKnownOvershoots) {
                 const double over =
                     100 * std::exp(-std::numbers::pi * damping / std::sqrt(1 - damping * damping));
                 EXPECT_NEAR(isTurned ? edge.postUnder : edge.postOver, over, 0.4);
-                // The first trough, unless the region ends before it.
+                // The opposite excursion is the first trough, unless the region ends before it.
                 if (limit == 0) {
                     EXPECT_NEAR(isTurned ? edge.postOver : edge.postUnder, over * over / 100, 0.4);
                 }
@@ -552,7 +550,7 @@ TEST(Transitions, OfTrapezoidsAreKnown) {
     }
 }
 
-TEST(Transitions, MayStandAlone) {
+TEST(Transitions, MayBeAlone) {
     Samples up = Sampled(100, [](double i) { return i < 40 ? 0.0 : 1.0; });
     up[10] = -0.25;
     up[20] = 0.5; // below the high reference
@@ -572,14 +570,14 @@ TEST(Transitions, MayStandAlone) {
     EXPECT_EQ(node.transition(up, 1, 2).status, ErrMeasureTooFewPoints);
     EXPECT_EQ(node.transition(up, 0, 1).status, ErrMeasureTooFewPoints);
 
-    // The first entry has the other direction, and there is none behind the second.
+    // The first transition has the other direction, and none follows the second.
     Samples dip = up;
     for (int i = 0; i < 8; ++i)
         dip[static_cast<std::size_t>(i)] = 1.0;
     const auto second = node.transition(dip, 1, 1);
     EXPECT_EQ(second.status, 0);
     EXPECT_NEAR(second.start, 39.1, 0.01);
-    EXPECT_EQ(second.preUnder, 0) << "half the way back the region ends";
+    EXPECT_EQ(second.preUnder, 0) << "the region ends halfway back to the first transition";
     EXPECT_NEAR(second.postOver, 50, 0.3);
     const auto first = node.transition(dip, 0, 1);
     EXPECT_EQ(first.status, 0);
@@ -587,7 +585,7 @@ TEST(Transitions, MayStandAlone) {
     EXPECT_NEAR(first.postOver, 50, 0.3);
 }
 
-TEST(Transitions, RefuseWhatHasNone) {
+TEST(Transitions, RefuseWaveformsWithoutTransitions) {
     Node node;
     const Samples y = Sampled(100, Trapezoids{10, 4, 21, 10, 60});
     EXPECT_EQ(node.transition({}, 5, 0).status, ErrMeasureBadCount);
@@ -609,8 +607,9 @@ TEST(Transitions, RefuseWhatHasNone) {
         EXPECT_EQ(node.transition(y, 1, 1000000).status, ErrMeasureTooFewPoints);
     }
     node.hist = {QXLevelsByHistogram, 1};
-    EXPECT_EQ(node.transition(y, 1, 1).status, ErrMeasureNotPositive) << "one bin has both states";
-    // Peaks that hardly anybody reaches.
+    EXPECT_EQ(node.transition(y, 1, 1).status, ErrMeasureNotPositive)
+        << "one bin holds both states";
+    // Extremes that hardly any samples reach.
     node.hist = {QXLevelsByPeaks, 40};
     Samples spikes = Sampled(400, [](double i) { return i < 200 ? 0.3 : 0.7; });
     spikes[3] = 0;
@@ -651,9 +650,11 @@ TEST(Cycles, OfASineHaveItsMeanAndRMS) {
     const Samples y = Sampled(100, [](double i) { return std::sin(i); });
     node.ref = {0.5, 0, -0.5, 0};
     node.t0 = 1e300;
-    EXPECT_EQ(node.cycle(y, 1).status, ErrMeasureNotFound) << "times that tell no samples apart";
+    EXPECT_EQ(node.cycle(y, 1).status, ErrMeasureNotFound)
+        << "a start time too large to distinguish the samples";
     node.t0 = 1e16;
-    EXPECT_GE(node.cycle(y, 5).status, ErrMeasureNotFound) << "nor leaves the waveform";
+    EXPECT_GE(node.cycle(y, 5).status, ErrMeasureNotFound)
+        << "the search stays within the waveform";
 }
 
 struct FirstPulse {
@@ -676,7 +677,7 @@ TEST(PulseParameters, OfATrapezoidAreKnown) {
     Samples y = Sampled(200, Trapezoids{20.25, 10, 60, 20, 200});
     y[15] = -0.1;
     y[40] = 1.15;
-    // Of 101 bins over 1.25, each state stands in one.
+    // Each state is in one of 101 bins over 1.25.
     const double bin = 1.25 / 101;
     const FirstPulse up = FirstPulseOf(y);
     EXPECT_EQ(up.err, 0);
@@ -690,7 +691,7 @@ TEST(PulseParameters, OfATrapezoidAreKnown) {
     EXPECT_NEAR(up.riseTime, 8, 10 * bin);
     EXPECT_NEAR(up.fallTime, 16, 20 * bin);
     EXPECT_NEAR(up.slewRate, 0.1, 0.1 * bin);
-    // The crossings are those of the straight edges at the levels found.
+    // The crossings are those of the straight edges with the measured levels.
     EXPECT_NEAR(up.delay, 20.25 + 10 * (up.base + 0.5 * up.amplitude), 1e-9);
     EXPECT_NEAR(up.riseTime, 8 * up.amplitude, 1e-9);
     EXPECT_NEAR(up.fallTime, 16 * up.amplitude, 1e-9);
@@ -709,7 +710,7 @@ TEST(PulseParameters, OfATrapezoidAreKnown) {
     EXPECT_NEAR(down.overshoot, 0.1, bin / 2);
 }
 
-TEST(PulseParameters, TakesWhatHoldsNoPulse) {
+TEST(PulseParameters, AcceptsWaveformsWithoutAPulse) {
     const FirstPulse flat = FirstPulseOf(Samples(30, 4.5));
     EXPECT_EQ(flat.err, 0);
     EXPECT_EQ(flat.top, 4.5);
@@ -718,18 +719,19 @@ TEST(PulseParameters, TakesWhatHoldsNoPulse) {
                                flat.width, flat.riseTime, flat.fallTime})
         EXPECT_EQ(value, 0);
     EXPECT_EQ(flat.slewRate, 1e30);
-    // A step that does not come down again.
+    // A step that does not fall again.
     const FirstPulse step = FirstPulseOf(Sampled(100, [](double i) { return i < 40 ? 0. : 1.; }));
     EXPECT_NEAR(step.delay, 39.5, 0.01);
     EXPECT_NEAR(step.width, 99 - 39.5, 0.01);
     EXPECT_NEAR(step.riseTime, 0.8, 0.01);
-    EXPECT_EQ(step.fallTime, 1) << "from the last sample on";
+    EXPECT_EQ(step.fallTime, 1) << "counted from the last sample on";
     EXPECT_EQ(FirstPulseOf({}).err, ErrEmptyInput);
     EXPECT_EQ(FirstPulseOf({2}).amplitude, 0);
     EXPECT_EQ(FirstPulseOf(Samples(5, nan)).err, 0);
     EXPECT_EQ(FirstPulseOf({nan, 0, 1, nan, 1, 0, nan}).err, 0);
-    // Begins at half its height: nothing lies below.
+    // Begins at half its height, with no sample below.
     EXPECT_EQ(FirstPulseOf({1, 2, 2, 0, 0}).err, 0);
 }
 
 } // namespace
+} // namespace qx::test

@@ -48,14 +48,14 @@ Samples Sampled(const Tones &tones, int32_t n, double dt = 1, double offset = 0)
 void AddNoise(Samples &y, double sigma, uint64_t seed) {
     Noise noise(seed);
     for (double &value : y) {
-        double sum = 0; // of twelve uniform numbers: of variance 4 over [-1, 1)
+        double sum = 0; // of twelve uniform numbers in [-1, 1), with variance 4
         for (int k = 0; k < 12; ++k)
             sum += noise.symmetric();
         value += sigma / 2 * sum;
     }
 }
 
-// The greatest relative error; infinite where the numbers of tones differ.
+// The largest relative error; infinite if the numbers of tones differ.
 double Error(const Tones &found, const Tones &expected) {
     if (found.size() != expected.size())
         return inf;
@@ -133,7 +133,7 @@ TEST(MultipleTones, HalfABinApartAreExactWithoutNoise) {
         double bin = 1 + 30 * noise.positive();
         for (int k = 0; k < count; ++k) {
             tones.push_back(RandomTone(noise, bin, n));
-            // Every third record has a pair at the limit.
+            // Every third record has a pair at the minimum separation.
             bin += apart + (trial % 3 == 0 && k % 2 == 0 ? 0 : 2 + 10 * noise.positive());
         }
         const Multiple found = Measure(Sampled(tones, n, 1, noise.symmetric()), count);
@@ -160,7 +160,7 @@ TEST(MultipleTones, AreFoundInShortRecordsAndAtAnyScale) {
     }
 }
 
-TEST(MultipleTones, EndWhereNothingButRoundingOrNoiseIsLeft) {
+TEST(MultipleTones, EndWhenOnlyRoundingOrNoiseIsLeft) {
     Tones tones = {{0.05, 1, 0.5}, {0.11, 1e-3, 2}, {0.31, 3e-12, -1}};
     EXPECT_EQ(Measure(Sampled({tones[0], tones[1]}, 4096), 10).tones.size(), 2u);
     const Tones weak = Measure(Sampled(tones, 4096), 10).tones;
@@ -181,7 +181,7 @@ TEST(MultipleTones, EndWhereNothingButRoundingOrNoiseIsLeft) {
     EXPECT_LE(falseTones, 1u);
 }
 
-TEST(MultipleTones, ComeInTheOrderAskedForAndAreTheLeastSquares) {
+TEST(MultipleTones, ComeInTheRequestedOrderAndMinimiseTheResidual) {
     const Tones tones = {{0.11, 0.5, 1}, {0.2, 2, -1}, {0.33, 1, 0.5}};
     Samples y = Sampled(tones, 200, 1, -1);
     AddNoise(y, 0.1, 5);
@@ -191,7 +191,7 @@ TEST(MultipleTones, ComeInTheOrderAskedForAndAreTheLeastSquares) {
     EXPECT_LT(Error(falling.tones, {rising.tones[1], rising.tones[2], rising.tones[0]}), 1e-15);
     EXPECT_EQ(rising.residualRms, falling.residualRms);
 
-    // No tone nearby leaves less, whatever the constant.
+    // No nearby tone gives a smaller residual, for any constant.
     const auto leaves = [&](const Tones &changed) {
         const Samples model = Sampled(changed, 200);
         double mean = 0, squares = 0;
@@ -211,9 +211,10 @@ TEST(MultipleTones, ComeInTheOrderAskedForAndAreTheLeastSquares) {
             }
 }
 
-// Fits to a record that is no sum of tones do not settle, and each further tone moves the others.
-// Without bounds of their steps and of what is fitted together this takes minutes.
-TEST(MultipleTones, OfAnImpulseTakeTheTimeOfSamplesAndTones) {
+// Fits to a record that is not a sum of tones do not converge, and each additional tone shifts the
+// others. Without limits on the steps and on the number of tones fitted together this takes
+// minutes.
+TEST(MultipleTones, OfAnImpulseTakeTimeProportionalToSamplesAndTones) {
     constexpr int32_t n = 1000;
     Samples y(n);
     for (int32_t t = 0; t < n; ++t)
@@ -229,7 +230,7 @@ TEST(MultipleTones, OfAnImpulseTakeTheTimeOfSamplesAndTones) {
 TEST(SingleTone, IsTheLargestOfItsBand) {
     const Tones tones = {{50, 10, 0.5}, {120, 1, -2}, {340, 0.5, 3}};
     const Samples y = Sampled(tones, 1500, 1e-3, 7);
-    // The largest of all is disturbed by the others, which fits of all avoid.
+    // The largest tone is disturbed by the others; fitting all tones together would avoid that.
     const Single largest = MeasureOne(y, 0, 0, 1e-3);
     EXPECT_EQ(largest.code, 0);
     EXPECT_LT(Error({largest.tone}, {tones[0]}), 1e-3);
@@ -246,7 +247,7 @@ TEST(SingleTone, IsTheLargestOfItsBand) {
     EXPECT_LT(Error({MeasureOne(y, 1e308, 1.7e308, 1e-3).tone}, {tones[0]}), 1e-3);
     EXPECT_EQ(Analyse(y, 3, 1e308, 0, 1e3).code, ErrMeasureNotFound);
 
-    // Behind more larger tones than are fitted along.
+    // More larger tones than can be fitted together.
     Tones many;
     for (int k = 1; k <= 40; ++k)
         many.push_back({0.01 * k, 1.0 + k, 0.3 * k});
@@ -254,7 +255,7 @@ TEST(SingleTone, IsTheLargestOfItsBand) {
     EXPECT_LT(Error({MeasureOne(Sampled(many, 4000), 0.46, 0.01).tone}, {many[40]}), 5e-2);
 }
 
-TEST(Harmonics, AreSeenWhereTheyFold) {
+TEST(Harmonics, AreMeasuredAtTheirAliases) {
     constexpr double dt = 1e-3;
     Tones tones = {{91.3, 2, 0.4}, {2 * 91.3, 0.02, 1}, {3 * 91.3, 0.01, -2}};
     for (int h = 4; h <= 9; ++h)
@@ -266,7 +267,7 @@ TEST(Harmonics, AreSeenWhereTheyFold) {
     for (int h = 1; h <= 9; ++h) {
         const Tone &tone = tones[static_cast<std::size_t>(h - 1)];
         const Tone &seen = a.harmonics[static_cast<std::size_t>(h - 1)];
-        // Beyond half the sampling rate the wave turns the other way.
+        // Above half the sampling rate the phase of the alias runs backwards.
         const double folded = tone.frequency > 500 ? 1000 - tone.frequency : tone.frequency;
         const double phase = tone.frequency > 500 ? -tone.phase : tone.phase;
         EXPECT_LT(Error({seen}, {{folded, tone.amplitude, phase}}), 1e-9) << h;
@@ -281,18 +282,18 @@ TEST(Harmonics, AreSeenWhereTheyFold) {
     EXPECT_NEAR(a.enob, (a.sinad + 20 * std::log10(2.0) - 1.7609) / 6.0206, 1e-12);
     EXPECT_GT(a.snr, 250);
 
-    // The same by a fundamental above the sampling rate, which folds to the same places.
+    // A fundamental above the sampling rate aliases to the same frequencies.
     const Analysis above = Analyse(y, 9, 1091.3, 4, dt);
     ASSERT_EQ(above.code, 0);
     EXPECT_EQ(Error(above.harmonics, a.harmonics), 0);
-    // Told of a weaker tone, it takes that, which the stronger one disturbs.
+    // If a weaker tone is given, that tone is measured, disturbed by the stronger one.
     EXPECT_NEAR(Analyse(y, 2, 182, 0, dt).harmonics[0].frequency, 2 * 91.3, 0.1);
     EXPECT_EQ(Analyse(y, 2, 45, 0, dt).code, ErrMeasureNotFound);
 }
 
-TEST(Harmonics, ThatCannotBeToldAreNaNAndStillCount) {
-    // At an eighth of the sampling rate: 3 and 5 fall together, 4 on half of it, 7 on the
-    // fundamental, 8 on 0.
+TEST(Harmonics, ThatCannotBeSeparatedAreNaNAndStillCount) {
+    // With the fundamental at an eighth of the sampling rate, harmonics 3 and 5 coincide, 4 is at
+    // half the sampling rate, 7 at the fundamental and 8 at 0.
     Samples y = Sampled({{0.125, 1, 0}, {0.25, 0.1, 1}, {0.375, 0.03, 1}}, 800);
     for (std::size_t t = 0; t < y.size(); ++t)
         y[t] += t % 2 == 0 ? 0.04 : -0.04;
@@ -309,7 +310,7 @@ TEST(Harmonics, ThatCannotBeToldAreNaNAndStillCount) {
     };
     EXPECT_EQ(areTold(4), (std::vector<int>{1, 2, 3}));
     EXPECT_EQ(areTold(5), (std::vector<int>{1, 2}));
-    EXPECT_EQ(areTold(8), (std::vector<int>{1})); // the sixth falls on the second
+    EXPECT_EQ(areTold(8), (std::vector<int>{1})); // the sixth coincides with the second
     const Analysis a = Analyse(y, 8);
     const double squares = 0.01 + 0.0009 + 2 * 0.0016;
     EXPECT_NEAR(a.thd, std::sqrt(squares), 1e-9);

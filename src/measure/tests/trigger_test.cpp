@@ -64,8 +64,8 @@ Hits InBlocks(const Samples &y, const Settings &settings, const std::vector<int3
     return hits;
 }
 
-// By the definition: for each sample outside holdoffs, whether an arming sample stands before it
-// that no trigger has used up.
+// By definition: checks for each sample outside holdoffs whether it is preceded by an arming sample
+// that no trigger has used.
 std::vector<int64_t> ByDefinition(const Samples &y, const Settings &s) {
     std::vector<int64_t> found;
     const auto isHeldOff = [&](std::size_t i) {
@@ -129,17 +129,18 @@ TEST(Trigger, BlocksOfAnySizeGiveWhatTheDefinitionGives) {
     EXPECT_GT(all, 10000u);
 }
 
-TEST(Trigger, PlacesBetweenTheSamplesAroundTheLevel) {
+TEST(Trigger, InterpolatesBetweenTheSamplesAroundTheLevel) {
     const Settings rising = {1.0, 0.0, 0, 0};
     EXPECT_EQ(InBlocks({0, 4, 0.5, 1, 1}, rising, {5}), (Hits{{1, 0.25}, {3, 3}}));
-    // Across a seam, between the last sample of the one block and the first of the next.
+    // Across a block boundary, between the last sample of one block and the first of the next.
     EXPECT_EQ(InBlocks({0, 4}, rising, {1}), (Hits{{1, 0.25}}));
-    // The difference of the samples overflows, and the position does not.
+    // The difference of the samples overflows, but the position does not.
     EXPECT_EQ(InBlocks({-1e308, 1e308}, {0.0, 0.0, 0, 0}, {2}), (Hits{{1, 0.5}}));
-    // Armed, then past the level within a holdoff: it triggers behind that, at the sample itself.
+    // Armed, then above the level within a holdoff: it triggers after the holdoff, at the sample
+    // itself.
     EXPECT_EQ(InBlocks({0, 2, 0, 2, 3, 3}, {1.0, 0.0, 2, 2}, {6}), (Hits{{1, 0.5}}));
     EXPECT_EQ(InBlocks({0, 2, 0, 0, 0, 3}, {1.0, 0.0, 2, 2}, {6}), (Hits{{1, 0.5}, {4, 4}}));
-    // A sample at the level triggers and does not arm, and a jitter within the band counts once.
+    // A sample at the level triggers but does not arm, and jitter within the band triggers once.
     EXPECT_EQ(InBlocks({0, 1, 0.9, 1.1, 0.9, 1.1, 0, 1}, {1.0, 0.25, 0, 0}, {8}),
               (Hits{{1, 1}, {7, 7}}));
 
@@ -147,7 +148,7 @@ TEST(Trigger, PlacesBetweenTheSamplesAroundTheLevel) {
     int32_t index = 7;
     double position = 7;
     EXPECT_EQ(Triggerh(y.handle(), 1.0, 0, 2, &index, &position), 0);
-    EXPECT_EQ(index, 4); // what stands before the start does not arm
+    EXPECT_EQ(index, 4); // samples before the start do not arm
     EXPECT_EQ(position, 3.25);
     EXPECT_EQ(Triggerh(y.handle(), 1.0, 0, 5, &index, &position), 0);
     EXPECT_EQ(index, -1);
@@ -183,7 +184,7 @@ TEST(Trigger, FailuresComeInOrderAndLeaveTheState) {
     EXPECT_EQ(fails(y, 1, 0, 0, 0, 0), ErrNonFiniteInput);
     EXPECT_EQ(fails(DBLArray{-inf, -inf, 2}, 1, 0, 0, 0, 0), ErrNonFiniteInput);
 
-    // Samples behind the one that triggers are not looked at.
+    // Samples after the triggering one are not examined.
     int32_t index;
     double position;
     EXPECT_EQ(Triggerh(y.handle(), 1.0, 0, 0, &index, &position), 0);

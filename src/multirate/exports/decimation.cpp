@@ -39,7 +39,7 @@ Outcome DecimateContinuous(InOut<Array> x, int32_t factor, bool average, int32_t
                         : PickFromStream<code>(x.data(), n, factor, start));
 }
 
-// State of a stream: sized and cleared by a reset, else it must have its size.
+// The state of a stream: resized and cleared by a reset; otherwise it must have the right size.
 Outcome PrepareState(InOut<DBL1D> &state, int64_t size, bool reset) {
     if (size > std::numeric_limits<int32_t>::max())
         return ErrOutOfMemory;
@@ -51,7 +51,7 @@ Outcome PrepareState(InOut<DBL1D> &state, int64_t size, bool reset) {
     return 0;
 }
 
-// The output's resize; unlike that of the state its refusal is told as a code by all.
+// Resizes the output. Unlike that of the state, its refusal is returned as a code by all exports.
 ErrorCode ResizeOutput(Out<DBL1D> &y, int64_t size) {
     if (size > std::numeric_limits<int32_t>::max())
         return ErrOutOfMemory;
@@ -95,7 +95,7 @@ Outcome Interpolator(In<DBL1D> x, Out<DBL1D> y, double gain, int32_t L, In<DBL1D
                                                   y.data());
 }
 
-// kept: a gain is asked for and never applied; a caller scales the taps.
+// kept: the gain is an argument but is never applied; a caller scales the taps.
 Outcome Decimator(In<DBL1D> x, Out<DBL1D> y, double, int32_t M, In<DBL1D> h, InOut<DBL1D> state,
                   bool reset, int32_t firstPhase, int32_t *delay) {
     if (const ErrorCode bad = CheckFIR(h, M))
@@ -172,7 +172,7 @@ Outcome CICInterpolator(In<DBL1D> x, Out<DBL1D> y, InOut<DBL1D> state, int32_t s
     return n > 0 ? 0 : WarnMultirateEmpty;
 }
 
-// The array keeps its size, and what stands behind the outputs in it is of no use.
+// The array keeps its size; its elements after the outputs are unspecified.
 template <class Array>
 ErrorCode DecimatedMovingAverage(InOut<Array> x, int32_t factor,
                                  typename HandleTraits<Array>::T *sum, int32_t *count, bool reset,
@@ -198,7 +198,7 @@ ErrorCode CascadedMovingAverage(InOut<Array> x, int32_t stages, int32_t width, I
                buffers.cols() == std::max(0, width);
     };
     if (reset || !fits() || *position < 0 || *position > width) {
-        // kept: not the host's status counts, but what it left.
+        // kept: the size after the call decides, not the host's status.
         (void)sums.resize(stages);
         (void)buffers.resize(stages, std::max(0, width));
         if (!fits())
@@ -225,7 +225,7 @@ ErrorCode ReModulator(In<DBL1D> x, double frequency, double sampleRate, double *
                       Out<CDB1D> y) {
     if (x.isEmpty())
         return 0;
-    // kept: not the host's status counts, but what it left.
+    // kept: the size after the call decides, not the host's status.
     (void)y.resize(x.size());
     if (y.size() != x.size())
         return ErrOutOfMemory;

@@ -30,7 +30,7 @@ struct MultirateRequest {
     }
 };
 
-// Checks, and where a reset is in force the delay and phase that a stream begins with.
+// Checks the arguments and, on a reset, sets the delay and the phase with which a stream begins.
 ErrorCode CheckMultirateArgs(const MultirateRequest &request, int32_t taps, int32_t *delayLeft,
                              int32_t *phase) {
     const int32_t order = taps - 1;

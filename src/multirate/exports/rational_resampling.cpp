@@ -6,7 +6,7 @@
 namespace qx {
 namespace {
 
-// One channel in arrays, or channels in the rows of matrices.
+// One channel in arrays, or several channels in the rows of matrices.
 template <class Array>
 int32_t Channels(const Array &array) {
     if constexpr (requires { array.rows(); })
@@ -58,7 +58,7 @@ struct Rational {
 private:
     static Outcome prepareState(InOut<Array> &state, int32_t channels, int32_t taps, int32_t L,
                                 bool reset, int32_t *stateCount) {
-        // kept: an empty matrix of states begins a stream, too, but leaves the count.
+        // kept: an empty matrix of states also begins a stream, but leaves the count.
         if (reset || (isMultichannel && state.isEmpty())) {
             const int32_t capacity = taps < 1 ? 0 : (taps - 1) / L + 1;
             if (const Outcome bad = Resize(state, channels, capacity))

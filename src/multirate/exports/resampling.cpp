@@ -102,7 +102,7 @@ Outcome Constant(In<Array> x, InOutState<State> state, ConstantDesign design, in
 
     if (const ErrorCode bad =
             ResampleConstant(design.filter(state->mode), core, state->ratio, antiAlias != 0,
-                             x.data(), n, y.data(), y.size(), outCount.address()))
+                             x.view(), y.view(), outCount.address()))
         return bad;
     ClearSamples<code>(y.data() + *outCount.address(), y.size() - *outCount.address());
     state->historyCount = core.historyCount;
@@ -114,14 +114,14 @@ Outcome Constant(In<Array> x, InOutState<State> state, ConstantDesign design, in
     return 0;
 }
 
-// The outputs take the places of the times that they stand at.
+// The outputs replace the times at which they are computed.
 template <class Array>
 ErrorCode Variable(In<Array> x, InOut<Array> t, DesignForTimes design, double *lastTime,
                    OutI32 outCount, OutI32 consumed) {
     constexpr ElementType code = HandleTraits<Array>::code;
-    return ResampleAtTimes<code, code>(design.filter(design->mode), design->antiAlias != 0,
-                                       x.data(), x.size(), 1, t.data(), t.size(), lastTime,
-                                       outCount.address(), consumed.address(), t.data(), 0);
+    return ResampleAtTimes<code, code>(
+        design.filter(design->mode), design->antiAlias != 0, {x.data(), 1, x.size()}, t.view(),
+        lastTime, {t.data(), 1, t.size()}, outCount.address(), consumed.address());
 }
 
 template <class Matrix>
@@ -134,8 +134,8 @@ Outcome VariableOfChannels(In<Matrix> x, Out<Matrix> y, InOut<DBL1D> t, DesignFo
     if (const ErrorCode failed = results.allocate(int64_t{channels} * m))
         return failed;
     if (const ErrorCode failed = ResampleAtTimes<code, ElementType::DBL>(
-            design.filter(design->mode), design->antiAlias != 0, x.data(), x.cols(), channels,
-            t.data(), m, lastTime, outCount.address(), consumed.address(), results.data(), m))
+            design.filter(design->mode), design->antiAlias != 0, x.view(), t.view(), lastTime,
+            {results.data(), channels, m}, outCount.address(), consumed.address()))
         return failed;
     const int32_t served = *outCount.address();
     if (const Outcome bad = y.resize(channels, served))

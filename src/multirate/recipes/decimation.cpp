@@ -9,7 +9,7 @@ constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 typedef std::vector<Recipe> Recipes;
 
-// Numbers of a stream, which a failure leaves alone.
+// Numbers of a stream, which a failure leaves unchanged.
 template <class T>
 T *Number(Call &c, int number, T value) {
     T *kept = c.record<T>(number);
@@ -82,7 +82,7 @@ Recipes DecimationRecipes() {
          [](Call &c) { return CxDecimate_H(c.inOut<CDB>(0, c.n + 2), 3, 0); }},
         {"CxDecimate_H: mean",
          [](Call &c) { return CxDecimate_H(c.inOut<CDB>(0, c.n + 2), 3, 1); }},
-        // With a state that fits; what a reset resizes has a test by hand.
+        // With a state of the right size; the resizing by a reset is tested by hand.
         {"InterpolatedFIRH",
          [](Call &c) {
              c.mayBeEmpty(0);

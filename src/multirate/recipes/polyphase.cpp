@@ -7,7 +7,7 @@ namespace {
 
 typedef std::vector<Recipe> Recipes;
 
-// All modes, each at the beginning of a stream and in the middle of one.
+// All modes, each at the beginning and in the middle of a stream.
 template <ElementType Code, ElementType Taps, class Function>
 void Add(Recipes &recipes, const std::string &name, Function *function) {
     static const uint8_t no = 0, yes = 1;

@@ -14,7 +14,7 @@ double Bell(int32_t i) {
 }
 double Ascending(int32_t i) { return i * 0.625 + i % 3 * 0.125; }
 
-// What a state tells beside its arrays.
+// The members of a state that are not arrays.
 struct StateNumbers {
     double tapScale, ratio, fraction;
     int32_t historyCount, leftTaps, rightTaps, mode;

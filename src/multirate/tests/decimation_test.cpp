@@ -32,7 +32,8 @@ std::vector<double> WholeNumbers(int32_t n, uint64_t seed) {
     return values;
 }
 
-// Puts a signal through `filter` in random blocks; filter takes a block and appends to the output.
+// Passes a signal through `filter` in random blocks; filter takes a block and appends to the
+// output.
 template <class Filter>
 std::vector<double> InBlocks(const std::vector<double> &x, uint64_t seed, const Filter &filter) {
     std::vector<double> y;
@@ -77,7 +78,7 @@ TEST(Decimation, OfABlockPicksOrAverages) {
     }
 }
 
-TEST(Decimation, OfAStreamIsThatOfOneBlockAfterTheStart) {
+TEST(Decimation, OfAStreamEqualsThatOfOneBlock) {
     const std::vector<double> x = NoiseValues(1000, 1);
     for (const bool average : {false, true})
         for (const int32_t factor : {1, 2, 7, 64})
@@ -88,7 +89,7 @@ TEST(Decimation, OfAStreamIsThatOfOneBlockAfterTheStart) {
                 const uint8_t mean = average;
                 DecimateCIN(rest.handle(), &factor, &mean, &err);
                 std::vector<double> expected = rest.values();
-                if (!average && (1000 - skip) % factor != 0) // a pick needs no whole group
+                if (!average && (1000 - skip) % factor != 0) // picking needs no complete group
                     expected.push_back(x[static_cast<std::size_t>(1000 - (1000 - skip) % factor)]);
 
                 int32_t start = skip, reset = 1, partialCount = 8, zStart = skip;
@@ -115,7 +116,7 @@ TEST(Decimation, OfAStreamIsThatOfOneBlockAfterTheStart) {
                 EXPECT_EQ(y, expected);
                 EXPECT_EQ(imaginary, expected);
             }
-    // Numbers of a caller who lost count stay without harm.
+    // Invalid numbers from the caller do no harm.
     Array1D<DBL> x5(5);
     int32_t start = 100, partialCount = 50;
     double partialSum = 0;
@@ -149,7 +150,7 @@ struct FIRStream {
         reset = 0;
         return y.values();
     }
-    // The outputs by the definition, delayed ones included.
+    // The outputs by definition, including delayed ones.
     Signal expected(const std::vector<double> &x) const {
         Signal taps, signal(x.begin(), x.end()), y;
         for (int32_t k = 0; k < h.size(); ++k) {
@@ -228,7 +229,7 @@ TEST(Decimation, FIRStreamsCheckTheirArguments) {
                                                             c.h, state.handle(), 0, &delay)
                                          : DecimatorFIRH(x.handle(), y.handle(), 1, c.factor, c.h,
                                                          state.handle(), 0, 0, &delay);
-            // A spacing that makes the state larger than an array can be.
+            // A spacing that makes the state larger than any array.
             const bool tooLarge = kind == 0 && c.factor == INT32_MAX;
             EXPECT_EQ(status, tooLarge ? ErrOutOfMemory : c.code);
             EXPECT_EQ(y.size() + state.size(), 0);
@@ -237,7 +238,7 @@ TEST(Decimation, FIRStreamsCheckTheirArguments) {
     }
 }
 
-// Only the state's refusal is told in the host's own words, and that not by all.
+// Only a refused resize of the state returns the host's own status, and not from every export.
 TEST(Decimation, ARefusedStateComesBackAsTheHostsStatus) {
     const Array1D<DBL> x(5), h(4);
     for (const int32_t failAt : {1, 2}) {
@@ -277,7 +278,7 @@ struct CICStream {
         reset = 0;
         return y.values();
     }
-    // The cascade's impulse response by the definition, at the high rate.
+    // The impulse response of the cascade by definition, at the high rate.
     Signal response() const {
         const auto width = static_cast<std::size_t>(factor * differentialDelay);
         Signal average(width), h{1};
@@ -356,7 +357,7 @@ TEST(Decimation, CICFiltersCheckTheirArguments) {
                       c.code);
             EXPECT_EQ(y.size() + state.size(), 0);
         }
-    // What stands for the phase in a state that is none.
+    // Invalid phases in the state.
     for (const double phase : {-7.0, 1e300, std::nan("")}) {
         Array1D<DBL> y(2), state{0, 0, 0, phase};
         int32_t delay = 0;
@@ -402,7 +403,7 @@ TEST(Decimation, GroupsOfAStreamAreSummed) {
                   expected);
         EXPECT_EQ(imaginary, expected);
     }
-    // A count that no group can have is taken as its rest.
+    // An impossible count is reduced modulo the group size.
     for (const int32_t wrong : {7, -1}) {
         Array1D<DBL> b{1, 2, 4, 8, 16};
         double sum = 100;
@@ -414,8 +415,8 @@ TEST(Decimation, GroupsOfAStreamAreSummed) {
     }
 }
 
-// Long blocks of many stages are a wavefront; sample by sample they are not. Values and rings are the
-// same to the bit.
+// Long blocks of many stages are computed as a wavefront, single samples are not. Values and ring
+// buffers agree to the bit.
 TEST(Decimation, CascadesOfMovingSumsAreTheSameSampleBySample) {
     constexpr int32_t n = 700;
     const std::vector<double> x = NoiseValues(n, 12);
@@ -482,7 +483,7 @@ TEST(Decimation, CascadedMovingSumsSizeTheirOwnState) {
     Array1D<DBL> y(3), state(9);
     DBLMatrix buffers(9, 9);
     int32_t position = 5;
-    // Nothing to do: not even the state is looked at.
+    // If there is nothing to do, not even the state is read.
     EXPECT_EQ(
         ReCascadedMovingAverageH(y.handle(), 2, 1, state.handle(), buffers.handle(), &position, 0),
         0);
@@ -490,7 +491,7 @@ TEST(Decimation, CascadedMovingSumsSizeTheirOwnState) {
         ReCascadedMovingAverageH(y.handle(), 0, 4, state.handle(), buffers.handle(), &position, 1),
         0);
     EXPECT_EQ(position + state.size() + buffers.cols(), 23);
-    // A refused resize counts only if it leaves the state too small.
+    // A refused resize matters only if it leaves the state too small.
     Array1D<DBL> right(2);
     DBLMatrix rightBuffers(2, 4);
     ResetHost(1, 4711);
@@ -546,7 +547,7 @@ TEST(Decimation, ModulatorsShiftAStreamInFrequency) {
     EXPECT_TRUE(SameBits(Get(y), Get(r)));
     EXPECT_EQ(ReComplexModulatorH(none.handle(), 1, 10, &phase, y.handle()), 0);
     EXPECT_EQ(y.size(), 3);
-    // No rate, or one too small for the ratio, ends the stream without a code.
+    // A sampling rate of 0, or one too small for the ratio, ends the stream without a code.
     for (const double frequency : {0.0, 1.0, 1e300}) {
         phase = 0;
         const double rate = frequency > 1 ? 1e-300 : 0.0;

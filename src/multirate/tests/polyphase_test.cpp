@@ -33,7 +33,7 @@ enum Mode { SameRate, Interpolate, Decimate, Rational };
 struct Setting {
     int32_t mode, L, M, taps;
     bool removeDelay;
-    // The mode's part of L and M.
+    // The factors that the mode uses of L and M.
     int32_t up() const { return mode == Interpolate || mode == Rational ? L : 1; }
     int32_t down() const { return mode == Decimate || mode == Rational ? M : 1; }
 };
@@ -52,7 +52,7 @@ const Setting settings[] = {
     {Rational, 1, 90, 31, true},
 };
 
-// A stream of one export with all that its caller keeps.
+// A stream of one export with all state that its caller keeps.
 template <ElementType Code>
 class Stream {
 public:
@@ -138,12 +138,12 @@ TYPED_TEST(Polyphase, BlocksOfAnySizeGiveTheBitsOfOne) {
         if (setting.mode == Decimate || setting.mode == Rational) {
             EXPECT_EQ(stream.phase, whole.phase);
         }
-        // What the caller keeps is the same, too, so that the streams stay together.
+        // The caller's state is the same as well, so that the streams remain identical.
         EXPECT_TRUE(SameBits(Get(stream.state), Get(whole.state)));
     }
 }
 
-// A block that is worked off in several pieces, with short and with long windows.
+// A block that is processed in several pieces, with short and with long windows.
 TEST(Polyphase, LongBlocksGiveTheSameBits) {
     for (const Setting &setting :
          {Setting{SameRate, 1, 1, 5000, false}, Setting{Interpolate, 2, 1, 31, true},
@@ -164,7 +164,7 @@ TEST(Polyphase, IsTheSumOfSciPysUpfirdn) {
     ASSERT_EQ(cases.size(), 6U);
     for (const SciPyCase &c : cases) {
         const auto taps = static_cast<int32_t>(c.h.size());
-        // Every mode that can do it; upfirdn goes on behind the end of the input.
+        // Every mode that supports it; upfirdn continues past the end of the input.
         for (int32_t mode = 0; mode < 4; ++mode) {
             const Setting setting{mode, c.up, c.down, taps, false};
             if (setting.up() != c.up || setting.down() != c.down)
@@ -197,7 +197,7 @@ TEST(Polyphase, AnEmptyStateBeginsAStreamAndAnEmptyBlockChangesNothing) {
     }
 }
 
-TEST(Polyphase, ALongDelayOutlastsTheFirstBlocks) {
+TEST(Polyphase, ALongDelayMaySpanSeveralBlocks) {
     const Setting setting{Interpolate, 4, 1, 101, true};
     Stream<DBL> stream(setting, NoiseSignal(101, 5, false), 1);
     EXPECT_TRUE(stream.filter(NoiseSignal(7, 6, false)).empty());

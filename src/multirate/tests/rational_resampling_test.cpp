@@ -28,7 +28,8 @@ const Setting settings[] = {
     {160, 147, 321, 0},
     {147, 160, 301, 3},
     {6, 4, 25, 2},
-    // Few taps on a wide grid: outputs between the samples that meet none, steps over whole blocks.
+    // Few taps on a wide grid: outputs whose windows contain no sample, and steps over whole
+    // blocks.
     {7, 2, 3, 0},
     {9, 40, 5, 13},
     {5, 61, 1, 0},
@@ -36,7 +37,7 @@ const Setting settings[] = {
     {4, 3, 1, 1},
 };
 
-// y by the definition, for outputs whose window ends within the input.
+// y by definition, for outputs whose window ends within the input.
 Signal Resampled(const Signal &x, const Setting &s, const Signal &h) {
     const int32_t half = (s.taps - 1) / 2;
     const int64_t end = static_cast<int64_t>(x.size()) * s.L;
@@ -86,7 +87,8 @@ void IsTheDefinitionInBlocksOfAnySize() {
     for (const Setting &setting : settings) {
         SCOPED_TRACE(setting);
         const Signal x = NoiseSignal(1500, 1, Code == CDB);
-        const Signal h = NoiseSignal(setting.taps, 2, false); // not symmetric: the order shows
+        const Signal h =
+            NoiseSignal(setting.taps, 2, false); // not symmetric, so that the order of taps matters
         const Signal expected = Resampled(x, setting, h);
         Stream<Code> whole(setting, h);
         const Signal y = whole.resample(x);
@@ -126,7 +128,7 @@ TEST(RationalResampling, IsSciPysResamplePoly) {
         SCOPED_TRACE(setting);
         Stream<DBL> stream(setting, c.h);
         Signal y = stream.resample(c.x);
-        // SciPy's outputs go on to the end, with zeros behind it.
+        // SciPy's outputs continue to the end, with zeros after it.
         Append(y, stream.resample(Signal(40)));
         ASSERT_GE(y.size(), c.y.size());
         for (std::size_t m = 0; m < c.y.size(); ++m)
@@ -142,7 +144,7 @@ TEST(RationalResampling, ChannelsAreStreamsThatShareTheirPositions) {
     Stream<CDB> alone[2] = {{setting, h}, {setting, h}};
     CDBMatrix state, y;
     int32_t offset = setting.offset, stateCount = 0;
-    // The empty state begins the stream; the last block has no output.
+    // The empty state starts the stream; the last block has no output.
     for (const int32_t n : {40, 7, 0, 31, 1}) {
         const Signal rows[2] = {NoiseSignal(n, 4, true), NoiseSignal(n, 5, true)};
         CDBMatrix x(2, n);
@@ -172,7 +174,7 @@ TEST(RationalResampling, ChannelsAreStreamsThatShareTheirPositions) {
     EXPECT_EQ(wrongState.rows(), 0);
 }
 
-TEST(RationalResampling, ABlockWithoutOutputIsKeptWholeOrMovesTheStreamOn) {
+TEST(RationalResampling, ABlockWithoutOutputIsKeptOrSkipped) {
     Stream<DBL> stream({2, 1, 41, 0}, NoiseSignal(41, 1, false));
     EXPECT_TRUE(stream.resample(NoiseSignal(4, 2, false)).empty());
     EXPECT_EQ(stream.stateCount, 4);
@@ -185,7 +187,7 @@ TEST(RationalResampling, ABlockWithoutOutputIsKeptWholeOrMovesTheStreamOn) {
     EXPECT_TRUE(ahead.resample(NoiseSignal(100, 2, false)).empty());
     EXPECT_EQ(ahead.stateCount, 0);
     EXPECT_EQ(ahead.offset, 100);
-    // Of these 50 the window of position 100 meets samples 40 to 60.
+    // The window of position 100 covers samples 40 to 60 of these 50.
     EXPECT_TRUE(ahead.resample(NoiseSignal(50, 2, false)).empty());
     EXPECT_EQ(ahead.stateCount, 10);
     EXPECT_EQ(ahead.offset, 20);
@@ -201,11 +203,11 @@ TEST(RationalResampling, ChecksComeInOrder) {
         {0, 1, 1, 0, -1, 4, ErrNegativeSetting},
         {0, 1, 1, 0, 0, 4, ErrNotStrictlyPositive},
         {1, 0, 1, 0, 0, 4, ErrNotStrictlyPositive},
-        {1 << 28, 1, 1, 0, 0, 4, ErrOverflow}, // 10 samples have 4 bits
+        {1 << 28, 1, 1, 0, 0, 4, ErrOverflow}, // 10 samples need 4 bits
         {1 << 26, 1 << 30, 1, 0, 0, 4, ErrBadTapCount},
         {1, 1, 1, 0, 0, 0, ErrBadTapCount},
         {1, 1, 0, 0, 6, 3, ErrOverflow},  // more than the state of 5 holds
-        {1, 1, 0, 0, 5, 31, ErrOverflow}, // nor has it room for the rest
+        {1, 1, 0, 0, 5, 31, ErrOverflow}, // no room for the remaining samples
     };
     for (const Case &c : cases) {
         SCOPED_TRACE(c.code);

@@ -28,7 +28,7 @@ struct Kernel {
     long double step(long double ratio) const {
         return oversample / std::min<long double>(std::max(ratio, 1.0L), oversample);
     }
-    // The table between its entries; 0 outside.
+    // The table at q, by the nearest entry or interpolated; 0 outside.
     long double at(long double q, bool nearest) const {
         if (q < 0 || q > proto.size() - 1)
             return 0;
@@ -46,7 +46,7 @@ struct Kernel {
             sum += x[k] * at(centre() + s * (static_cast<long double>(k) - time), nearest);
         return sum * s;
     }
-    // Whether n samples reach as far as an output's window.
+    // Whether n samples cover the window of an output.
     bool isServed(long double time, long double ratio, std::size_t n) const {
         const long double s = step(ratio), whole = std::floor(time);
         return std::floor((centre() + s * (time - whole)) / s) + whole <=
@@ -152,14 +152,14 @@ TEST(Resampling, ConstantIsTheDefinitionInBlocksOfAnySize) {
     ConstantIsTheDefinitionInBlocksOfAnySize<CDB>();
 }
 
-TEST(Resampling, AKernelOfOneLetsTheSamplesThrough) {
+TEST(Resampling, AUnitKernelReturnsTheSamples) {
     Kernel kernel(1, 2);
     Set(kernel.proto, Signal{0, 0, 1, 0, 0});
     const Signal x = NoiseSignal(50, 2, false);
     ConstantStream<DBL> stream(kernel, 1, 0, 0, true);
     EXPECT_TRUE(SameBits(stream.resample(x), Part(x, 0, 48)));
-    EXPECT_EQ(stream.size, 50); // room for all, zeros behind the outputs
-    // Too short a block for the next output is kept.
+    EXPECT_EQ(stream.size, 50); // sized for all outputs, with zeros after those computed
+    // A block too short for the next output is kept.
     const int32_t held = stream.state.historyCount;
     EXPECT_TRUE(stream.resample({}).empty());
     EXPECT_EQ(stream.state.historyCount, held);
@@ -177,7 +177,7 @@ TEST(Resampling, AfterANegativeStartTheSecondOutputFollowsTheRatioLessOne) {
     EXPECT_LE(std::abs(y[9] - kernel.output(x, 9 * 0.75L - 1, 1)), 1.6e-16L);
 }
 
-TEST(Resampling, WhatDoesNotFitEndsTheStreamWithACode) {
+TEST(Resampling, InvalidArgumentsEndTheStreamWithACode) {
     const Kernel kernel(20, 6);
     typedef ConstantStream<DBL> Stream;
     struct Case {
@@ -207,7 +207,7 @@ TEST(Resampling, WhatDoesNotFitEndsTheStreamWithACode) {
     }
 }
 
-// Times that go along irregularly, whole multiples of 1/64.
+// Irregularly spaced ascending times, multiples of 1/64.
 std::vector<double> Times(int32_t m, double rate, uint64_t seed) {
     Noise noise(seed);
     std::vector<double> times;
@@ -225,7 +225,7 @@ TEST(Resampling, OutputsAtAListOfTimesAreTheDefinition) {
     Array1D<CDB> samples(300);
     Set(samples, x);
     for (const uint8_t antiAlias : {0, 1})
-        // With a stretched kernel the nearest entry may be a matter of rounding.
+        // With a stretched kernel, the nearest entry may depend on rounding.
         for (const int32_t mode : {0, 1 - antiAlias}) {
             SCOPED_TRACE(mode + 10 * antiAlias);
             const std::vector<double> times = Times(400, 2.5, 6);
@@ -246,7 +246,8 @@ TEST(Resampling, OutputsAtAListOfTimesAreTheDefinition) {
                 EXPECT_LE(std::abs(Get(t)[i] - expected), 1.6e-14L) << i;
                 previous = times[i];
             }
-            // The first time that is beyond the data ends the run and stands rebased.
+            // The first time beyond the data ends the call and is stored relative to the next
+            // block.
             const double gap = antiAlias ? times[served] - previous : 1;
             EXPECT_FALSE(kernel.isServed(times[served], gap, 300));
             EXPECT_EQ(+t.data()[served].re, times[served] - consumed);
@@ -260,13 +261,13 @@ TEST(Resampling, OutputsAtAListOfTimesAreTheDefinition) {
         }
 }
 
-TEST(Resampling, AListOfTimesJoinsAcrossBlocksAndChannels) {
+TEST(Resampling, AListOfTimesContinuesAcrossBlocksAndChannels) {
     const Kernel kernel(16, 4);
     const VariableDesign design{0, 1, kernel.proto.handle(), 16};
     const std::vector<double> times = Times(500, 1.5, 7);
     const Signal rows[2] = {NoiseSignal(380, 8, false), NoiseSignal(380, 9, false)};
 
-    // One call for each channel alone.
+    // A separate call for each channel.
     std::vector<double> expected[2];
     for (int c = 0; c < 2; ++c) {
         Array1D<DBL> x(380), t(times);
@@ -279,7 +280,7 @@ TEST(Resampling, AListOfTimesJoinsAcrossBlocksAndChannels) {
         expected[c].assign(t.data(), t.data() + outCount);
     }
 
-    // Both channels, of which ever more samples come in and used ones go.
+    // Both channels, with samples arriving gradually and used ones dropped.
     std::vector<double> joined[2], left = times;
     double lastTime = 0;
     int32_t first = 0;
@@ -319,7 +320,7 @@ TEST(Resampling, TimesThatCannotBeServedAreHarmless) {
         int32_t consumed;
     };
     const Case cases[] = {
-        {-50, &design, 0, 0}, // all before the samples: an output of zeros
+        {-50, &design, 0, 0}, // all times before the samples: an output of zeros
         {1e15, &design, 0, INT32_MAX - 4},
         {std::nan(""), &design, ErrBufferOverrun, 0},
         {INFINITY, &design, ErrBufferOverrun, 0},

@@ -13,7 +13,7 @@
 
 namespace qx::test {
 
-// Signals as the tests hold them, whatever the element of the export.
+// The signals of the tests, whatever the element type of the export.
 typedef std::vector<std::complex<long double>> Signal;
 
 template <ElementType Code>
@@ -44,7 +44,7 @@ Signal Get(const Array1D<Code> &array) {
     return signal;
 }
 
-// Noise that single precision holds exactly.
+// Noise that single precision represents exactly.
 inline Signal NoiseSignal(int32_t n, uint64_t seed, bool complex) {
     Noise noise(seed);
     Signal signal;
@@ -75,7 +75,7 @@ inline std::vector<int32_t> RandomBlocks(int32_t n, uint64_t seed) {
     return blocks;
 }
 
-// What make_scipy_rates.py has written for a function of scipy.signal.
+// A case that make_scipy_rates.py wrote for a function of scipy.signal.
 struct SciPyCase {
     int32_t up, down;
     Signal x, h, y;
@@ -102,7 +102,7 @@ inline std::complex<long double> At(const Signal &u, int64_t i) {
     return i >= 0 && i < static_cast<int64_t>(u.size()) ? u[static_cast<std::size_t>(i)] : 0;
 }
 
-// By the definition: L - 1 zeros after each sample, then the whole convolution with h.
+// By definition: L - 1 zeros after each sample, then the full convolution with h.
 inline Signal StuffedAndFiltered(const Signal &x, int32_t L, const Signal &h) {
     Signal stuffed(x.size() * static_cast<std::size_t>(L));
     for (std::size_t i = 0; i < x.size(); ++i)
@@ -115,7 +115,7 @@ inline Signal StuffedAndFiltered(const Signal &x, int32_t L, const Signal &h) {
     return y;
 }
 
-// What rounding may do to a sum with these taps over samples below sqrt(2).
+// A bound on the rounding error of a sum with these taps over samples below sqrt(2).
 inline long double SumBound(const Signal &h, long double scale, long double epsilon) {
     long double sum = 0;
     for (const auto &tap : h)

@@ -92,8 +92,8 @@ Outcome Multiply(In<Handle> p, In<Handle> q, Out<Handle> r) {
     return OverflowIn(r);
 }
 
-// The quotient, and the remainder in front of `work`. The divisor has n >= 1 coefficients without
-// zeros at the top.
+// Computes the quotient, and the remainder at the front of `work`. The divisor has n >= 1
+// coefficients without zeros at the top.
 template <class Handle>
 Outcome DivideInto(const In<Handle> &p, const In<Handle> &q, int32_t n, Out<Handle> &quotient,
                    Scratch<HandleTraits<Handle>::code> &work) {
@@ -143,7 +143,7 @@ CDB Widened(const CDB &z) { return z; }
 void Narrow(CDB value, DBL *out) { *out = value.re; }
 void Narrow(CDB value, CDB *out) { *out = value; }
 
-// p over its last coefficient, which becomes exactly 1.
+// p divided by its last coefficient, which becomes exactly 1.
 template <class Handle>
 Outcome GiveMonic(const CDB *p, int32_t n, Out<Handle> &monic) {
     if (const Outcome bad = monic.resize(n))
@@ -175,10 +175,10 @@ public:
     const CDB *q() const { return block_.data() + m_; }
     int32_t m() const { return m_; }
     int32_t n() const { return n_; }
-    // How often x divides both.
+    // The number of times that x divides both.
     int32_t zeros() const { return zeros_; }
     ErrorCode findDivisor(double tolerance, NearestDivisor &divisor) const {
-        return divisor.find(p() + zeros_, m_ - zeros_, q() + zeros_, n_ - zeros_, tolerance);
+        return divisor.find({p() + zeros_, m_ - zeros_}, {q() + zeros_, n_ - zeros_}, tolerance);
     }
 
 private:
@@ -230,7 +230,7 @@ Outcome CommonMultipleOf(In<DBL1D> p, In<DBL1D> q, double tolerance, Out<DBL1D> 
     NearestDivisor divisor;
     if (const ErrorCode failed = operands.findDivisor(ToleranceOr(tolerance), divisor))
         return failed;
-    // Both factors monic, so that the product is.
+    // Both factors are made monic, so that the product is monic.
     const int32_t degree = divisor.cofactorDegree();
     const CDB *const cofactor = divisor.cofactorOfQ();
     RealVector monic, other;

@@ -61,7 +61,7 @@ Outcome CopyOut(VectorView<E> roots, int32_t count, Out<Handle> &out) {
     return 0;
 }
 
-// kept: a failure empties the coefficients, too.
+// kept: a failure also empties the coefficients.
 template <class Handle>
 Outcome RootsWithMultiplicities(InOut<Handle> coef, int32_t refine, double tolerance,
                                 Out<CDB1D> refined, Out<CDB1D> simple, Out<I32_1D> multiplicities) {

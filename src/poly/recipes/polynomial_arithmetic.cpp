@@ -25,7 +25,7 @@ double Multiple(int32_t k, int32_t degree, double shift) {
     return k <= degree ? a[static_cast<std::size_t>(k)] : 0.0;
 }
 
-// The exports of both kinds in one record.
+// The exports of both element types in one record.
 template <ElementType E>
 struct Exports {
     std::string prefix;

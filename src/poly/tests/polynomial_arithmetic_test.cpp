@@ -42,7 +42,7 @@ Complexes Values(const CDBArray &array) {
 }
 Numbers Values(const DBLArray &array) { return array.values(); }
 
-// Calls an export of two arrays that gives one; its code is in `status`.
+// Calls an export that takes two arrays and returns one; its code is in `status`.
 ErrorCode status = 0;
 template <class Export, class List>
 List Combine(Export function, const List &p, const List &q) {
@@ -62,7 +62,7 @@ Division<List> Divided(Export divide, const List &p, const List &q) {
     return {Values(quotient), Values(remainder)};
 }
 
-// Of factors x - root, with errors of long double.
+// The product of factors x - root, in long double.
 std::vector<Long> Product(const Complexes &roots) {
     std::vector<Long> a = {1};
     for (const Complex &root : roots) {
@@ -99,7 +99,7 @@ Complexes Paired(const Numbers &re, const Numbers &im) {
     return result;
 }
 
-// The largest difference relative to the largest coefficient; infinite for other lengths.
+// The largest difference relative to the largest coefficient; infinite if the lengths differ.
 template <class List, class Reference>
 double Difference(const List &found, const Reference &expected) {
     if (found.size() != expected.size())
@@ -124,7 +124,7 @@ TEST(PolynomialSums, AreAsLongAsTheLongerAndKeepZeros) {
 }
 
 TEST(PolynomialProducts, AddTheirTermsByAscendingIndexOfTheFirst) {
-    // 1e16 - 1e16 + 1 is 1 in this order and 0 in the other.
+    // 1e16 - 1e16 + 1 is 1 in this order and 0 in the reverse order.
     const Numbers p = {1e16, -1e16, 1}, ones(9, 1.0);
     EXPECT_EQ(Combine(MultiplyPolyH, p, ones)[2], 1.0);
     EXPECT_EQ(Combine(MultiplyPolyH, Numbers{1, 1, 1}, p)[2], 0.0);
@@ -168,7 +168,7 @@ TEST(PolynomialDivision, OfIntegersByMonicOnesIsExact) {
     }
 }
 
-TEST(PolynomialDivision, GoesByDegreesWithoutZerosAtTheTop) {
+TEST(PolynomialDivision, IgnoresZeroLeadingCoefficients) {
     auto result = Divided(DividePolyH, Numbers{1, 2, 0, 0}, Numbers{1, 1, 1, 0});
     EXPECT_EQ(result.quotient, Numbers{0});
     EXPECT_EQ(result.remainder, (Numbers{1, 2}));
@@ -214,7 +214,7 @@ struct Common {
 };
 const std::vector<Common> commonFactors = {
     {{1, 2}, {3}, {4, 5}, 1e-13},
-    {{1, 1, 1}, {2, 2}, {1, 3}, 1e-13}, // multiple, and more often in q
+    {{1, 1, 1}, {2, 2}, {1, 3}, 1e-13}, // multiple, with higher multiplicity in q
     {{}, {1, 2}, {3}, 4e-15},
     {{1, 2, 3}, {}, {}, 1e-14},                // q is p
     {{0.5}, {1, 2, 3, 4, 5, 6, 7}, {}, 1e-14}, // q divides p
@@ -267,7 +267,8 @@ TEST(CommonDivisors, OfComplexPolynomialsReachTheNearestPair) {
         for (Complex &a : monic)
             a /= u.back();
         EXPECT_LE(Difference(CommonDivisor(p, q, 1e-10).gcd, monic), 1e-13);
-        // Moved by 1e-8: a divisor for a larger tolerance alone, no farther than the move.
+        // Perturbed by 1e-8: there is a divisor only for a larger tolerance, at no greater distance
+        // than the perturbation.
         for (Complexes *const moved : {&p, &q}) {
             const Complexes change = complexNoise(static_cast<int>(moved->size()));
             const double factor = 1e-8 * norm(*moved) / norm(change);
@@ -290,7 +291,8 @@ TEST(CommonDivisors, WithZeroAndConstants) {
     EXPECT_EQ(CommonMultiple({0, 0, 2}, {0, 2}), (Numbers{0, 0, 1}));
 }
 
-// Near a multiple root of integer coefficients the value is a power of an exact difference.
+// Near a multiple root of a polynomial with integer coefficients, the value is a power of an exact
+// difference.
 TEST(PolyEv, IsAsAccurateAsInTwiceThePrecision) {
     Noise noise(4);
     for (const int degree : {1, 2, 5, 8, 12}) {
@@ -335,7 +337,7 @@ TEST(PolyEv, TakesAnyPoint) {
     EXPECT_EQ(status, 0);
     EXPECT_TRUE(std::isnan(y[0]));
     EXPECT_EQ(Numbers(y.begin() + 1, y.end()), (Numbers{inf, inf, 1}));
-    // The compensation overflows, the value does not.
+    // The compensation overflows, but the value does not.
     EXPECT_EQ(Combine(PolyEv, Numbers{1, 0.5}, Numbers{1.5e308}), Numbers{0.75e308});
     EXPECT_EQ(Combine(CxPolyEv, Complexes{1, 0.5}, Complexes{{1.5e308, -1e300}}),
               (Complexes{{0.75e308, -0.5e300}}));
@@ -357,8 +359,8 @@ std::vector<Complex> OfMatrix(Export function, const Array &p, const Matrix &a, 
     return values;
 }
 
-// An upper triangular matrix of 2 by 2 with eigenvalue l twice has p(l) on its diagonal and p'(l)
-// beside it; with integers to the bit.
+// For an upper triangular 2 by 2 matrix with a double eigenvalue l, the result has p(l) on its
+// diagonal and p'(l) above it; with integers to the bit.
 TEST(EvPoly2D, HasTheValuesOfElementsOrOfTheMatrix) {
     for (int degree = 0; degree <= 40; ++degree) {
         Numbers p(degree + 1, 1.0);
@@ -414,7 +416,7 @@ TEST(Derivatives, AreWithinAnUlpAtEveryOrder) {
     }
     EXPECT_EQ(Derived(PolyDerivativeH, p, 60), Numbers{0});
     EXPECT_EQ(Derived(CxPolyDerivativeH, Complexes{1, 2, {3, 1}}, 1), (Complexes{2, {6, 2}}));
-    // 300! does not fit, 300! 1e-320 does not, 150! 1e-320 does.
+    // 300! and 300! 1e-320 overflow, 150! 1e-320 does not.
     Numbers top(301, 0.0);
     top[300] = 1;
     Derived(PolyDerivativeH, top, 300);
@@ -442,7 +444,7 @@ TEST(IntegralsAndCompositions, FollowTheirDefinition) {
     EXPECT_EQ(Combine(PolyComposeH, Numbers{1, 2, 3}, Numbers{2}), Numbers{17});
     EXPECT_EQ(Combine(CxPolyComposeH, Complexes{0, 0, 1}, Complexes{{0, 1}, 1}),
               (Complexes{-1, {0, 2}, 1}));
-    // Lengths of 65536 each make one beyond 2^31.
+    // Two lengths of 65536 give one beyond 2^31.
     Combine(PolyComposeH, Numbers(65536, 1.0), Numbers(65536, 1.0));
     EXPECT_EQ(status, ErrLengthTooLarge);
 }
@@ -460,7 +462,8 @@ Complexes CxFromRoots(const Complexes &roots) {
 }
 
 TEST(PolynomialsFromRoots, KeepTheirDigitsAtHighDegrees) {
-    // Roots of 1, once and thrice: multiplied as they come, errors grow to 1e-5 and beyond.
+    // Roots of unity, simple and triple; multiplying them in the given order would let errors grow
+    // to 1e-5 and beyond.
     for (const int times : {1, 3}) {
         Complexes roots;
         for (int i = 0; i < 64 * times; ++i)
@@ -491,11 +494,11 @@ TEST(PolynomialsFromRoots, KeepTheirDigitsAtHighDegrees) {
 }
 
 TEST(PolynomialsFromRoots, PairConjugatesWithinTheirTolerance) {
-    // The mean of both is used, and a root near its own conjugate is real.
+    // The mean of a pair is used, and a root near its own conjugate becomes real.
     EXPECT_LE(Difference(FromRoots({{1, 1 + 4e-11}, {2, 1e-11}, {1, -1 + 4e-11}}),
                          RealProduct({{1, 1}, {1, -1}, 2})),
               1e-15);
-    // Two pairs nearly alike, in any order.
+    // Two nearly equal pairs, in any order.
     const Complexes close = {{1, 1}, {1 + 1e-11, -1}, {1, -1}, {1 + 1e-11, 1}};
     EXPECT_LE(Difference(FromRoots(close), RealProduct(close)), 1e-15);
     for (const Complexes &roots : std::vector<Complexes>{
@@ -519,12 +522,13 @@ Fractions Split(const Numbers &numerator, const Numbers &denominator, double tol
     return {polynomial.values(), Values(poles), Values(residues)};
 }
 
-// The sum of the fractions against the quotient at points off the poles, relative to its terms.
+// The difference between the sum of the fractions and the quotient at points off the poles,
+// relative to the terms.
 double LargestError(const Fractions &found, const Numbers &numerator, const Numbers &denominator) {
     Noise noise(6);
     long double worst = 0;
     for (int i = 0; i < 20; ++i) {
-        const long double re = 4 * noise.symmetric(); // evaluated in this order
+        const long double re = 4 * noise.symmetric(); // fixes the order of evaluation
         const Long x(re, 4 * noise.symmetric());
         Long sum = ValueAt(Widened(found.polynomial), x);
         long double size = std::abs(sum);
@@ -545,7 +549,7 @@ TEST(PartialFractions, AddUpToTheQuotientWithPolesOfAnyMultiplicity) {
     const std::vector<Complexes> denominators = {
         {-1, -2},
         {1, 1},
-        {0.1, 0.1, 0, 0, 0}, // a double root of the quadratic that is left without the zeros
+        {0.1, 0.1, 0, 0, 0}, // a double root of the quadratic that remains after removing the zeros
         {{1, 2}, {1, -2}},
         {1, 1, 1, 2, 2, 3},
         {{0, 1}, {0, 1}, {0, -1}, {0, -1}, -1},
@@ -563,7 +567,8 @@ TEST(PartialFractions, AddUpToTheQuotientWithPolesOfAnyMultiplicity) {
             ASSERT_EQ(found.poles.size(), roots.size());
             EXPECT_LE(LargestError(found, numerator, denominator), 2e-13);
             for (std::size_t i = 0; i < roots.size(); ++i) {
-                // Together, as often as expected, near, and with an exact conjugate.
+                // Equal poles are adjacent, have the expected multiplicity and accuracy, and an
+                // exact conjugate.
                 const auto first =
                     std::find(found.poles.begin(), found.poles.end(), found.poles[i]);
                 const auto times = std::count(first, found.poles.end(), found.poles[i]);
@@ -588,7 +593,8 @@ TEST(PartialFractions, WithoutPolesOrWithSmallNumbers) {
     EXPECT_EQ(Split({1, 2}, {4, 0}).polynomial, (Numbers{0.25, 0.5}));
     EXPECT_TRUE(Split({1, 2}, {4}).poles.empty());
     EXPECT_EQ(Split({0}, {-1, 1}).residues, Complexes{0});
-    // The product of the distances from one pole is 1e-330, that of coefficient and residue is not.
+    // The product of the distances from one pole is 1e-330 and underflows; that of coefficient and
+    // residue does not.
     Numbers denominator = RealProduct({1e-110, 2e-110, 3e-110, 1});
     const Fractions small = Split({1e-220}, denominator);
     ASSERT_EQ(status, 0);
@@ -597,7 +603,7 @@ TEST(PartialFractions, WithoutPolesOrWithSmallNumbers) {
             EXPECT_NEAR(small.residues[i].real() / 1e-220, 1, 1e-12);
         }
     }
-    // Apart by more than the tolerance, or by less.
+    // Poles separated by more than the tolerance, or by less.
     const Numbers close = RealProduct({1, 1 + 1e-4, -2});
     EXPECT_NE(Split({1}, close).poles[1], Split({1}, close).poles[2]);
     EXPECT_EQ(Split({1}, close, 1e-6).poles[1], Split({1}, close, 1e-6).poles[2]);

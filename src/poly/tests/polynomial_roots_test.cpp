@@ -16,11 +16,9 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::I32Array;
 typedef std::complex<double> Complex;
 typedef std::vector<Complex> Complexes;
 
@@ -40,7 +38,7 @@ Complexes Values(const CDBArray &array) {
     return result;
 }
 
-// Ascending coefficients of the product of all (x - root).
+// The ascending coefficients of the product of all (x - root).
 Complexes Product(const Complexes &roots) {
     typedef std::complex<long double> Long;
     std::vector<Long> a = {1};
@@ -91,7 +89,7 @@ std::vector<Case> ReadCases() {
     return cases;
 }
 
-// The largest error over the roots, each taken from its nearest one of those found, relative to the
+// The largest error of the roots, each compared with the nearest computed root, relative to the
 // root and in units of its condition number times n epsilon.
 double WorstError(const Case &example, Complexes found) {
     double worst = 0;
@@ -122,13 +120,13 @@ TEST(CxPolyRoots, ErrorsAreThoseOfTheCondition) {
     for (const Case &example : cases) {
         const CDBArray array = ToHost(example.coefficients);
         ASSERT_EQ(FindAll(array, 100), 0) << example.name;
-        // Deflation by roots from the middle of these costs two digits.
+        // Deflation by roots from the middle of these sets costs two digits.
         const bool isHard = example.name == "Chebyshev-30" || example.name == "Legendre-30";
         EXPECT_LT(WorstError(example, Values(array)), isHard ? 160 : 2) << example.name;
     }
 }
 
-TEST(CxPolyRoots, ZerosAtBothEndsAreNoPartOfTheSearch) {
+TEST(CxPolyRoots, ZeroCoefficientsAtBothEndsAreRemovedFirst) {
     const auto roots = [](const Complexes &coefficients) {
         const CDBArray array = ToHost(coefficients);
         EXPECT_EQ(FindAll(array, 10), 0);
@@ -141,7 +139,7 @@ TEST(CxPolyRoots, ZerosAtBothEndsAreNoPartOfTheSearch) {
     EXPECT_EQ(roots({0, {0, 2}, 1, 0}), (Complexes{0, {0, -2}}));
 }
 
-// The quadratic formula without cancellation: a root near 0 keeps its digits.
+// The quadratic formula avoids cancellation, so a root near 0 keeps its digits.
 TEST(CxPolyRoots, QuadraticsKeepTheSmallRoot) {
     const CDBArray array = ToHost({1e-3, 1e9, 1});
     ASSERT_EQ(FindAll(array, 10), 0);
@@ -149,14 +147,14 @@ TEST(CxPolyRoots, QuadraticsKeepTheSmallRoot) {
     EXPECT_NEAR(array[1].re * 1e12, -1, 1e-15);
 }
 
-TEST(CxPolyRoots, MultipleRootsEndToo) {
+TEST(CxPolyRoots, MultipleRootsConvergeToo) {
     for (const int multiplicity : {2, 3, 5}) {
         Complexes roots;
         for (const Complex &root : {Complex(0.7, 0.1), Complex(-1.3), Complex(0.2, -1)})
             roots.insert(roots.end(), multiplicity, root);
         const CDBArray array = ToHost(Product(roots));
         ASSERT_EQ(FindAll(array, 100), 0);
-        // A root of multiplicity k moves by the k-th root of a change.
+        // A perturbation moves a root of multiplicity k by the k-th root of its size.
         for (const Complex &found : Values(array)) {
             double distance = HUGE_VAL;
             for (const Complex &root : roots)
@@ -180,7 +178,7 @@ TEST(CxPolyRoots, Failures) {
     EXPECT_EQ(code({1, {0, nan}, 1}), ErrBadCoefficients);
     EXPECT_EQ(code({1, 1, HUGE_VAL, 1}), ErrNonFiniteFunction);
     EXPECT_EQ(code({1, 2, 3, 4, 5}, -1), ErrIterationLimit);
-    // So flat around 0 that no direction leads down.
+    // The polynomial is so flat around 0 that no direction decreases it.
     Complexes flat(44);
     flat[0] = -1;
     flat[43] = 1;
@@ -195,7 +193,7 @@ ErrorCode AllRoots(const Complexes &coefficients, Complexes &roots, std::vector<
     radii = around.values();
     return status;
 }
-// Of the real parts alone.
+// Uses the real parts alone.
 ErrorCode AllRealRoots(const Complexes &coefficients, Complexes &roots,
                        std::vector<double> &radii) {
     std::vector<double> real;
@@ -233,8 +231,9 @@ bool AreRealOrPairs(const Complexes &roots) {
     return true;
 }
 
-// Condition numbers go up to 5e13 here: twice the digits leave the rounding of the result.
-TEST(PolyRoots2026, FindsTheRootsOfTheCoefficientsAsTheyAre) {
+// Condition numbers are up to 5e13 here; with twice the working precision only the rounding of the
+// result remains.
+TEST(PolyRoots2026, FindsTheExactRootsOfTheGivenCoefficients) {
     for (const Case &example : ReadCases()) {
         SCOPED_TRACE(example.name);
         Complexes roots;
@@ -258,13 +257,14 @@ TEST(PolyRoots2026, FindsTheRootsOfTheCoefficientsAsTheyAre) {
     }
 }
 
-TEST(PolyRoots2026, LeavesResidualsOfRoundingErrorsFromEndToEndOfTheRange) {
+TEST(PolyRoots2026, LeavesResidualsOfRoundingErrorsOverTheWholeRange) {
     qx::test::Noise noise(26);
     const auto phased = [&](double modulus) {
         return std::polar(modulus, 3.2 * noise.symmetric());
     };
     for (int round = 0; round < 300; ++round) {
-        // Long ones with coefficients near 1; short ones with any, whose powers long double holds.
+        // High degrees with coefficients near 1; low degrees with any coefficients whose powers
+        // long double can represent.
         const int kind = round % 3, degree = 1 + (kind == 0 ? round % 200 : round % 23);
         Complexes a;
         for (int i = 0; i <= degree; ++i)
@@ -286,12 +286,12 @@ TEST(PolyRoots2026, LeavesResidualsOfRoundingErrorsFromEndToEndOfTheRange) {
     }
 }
 
-TEST(PolyRoots2026, OfMultipleRootsAreAsNearAsTheDigitsOfTheCoefficientsSay) {
+TEST(PolyRoots2026, OfMultipleRootsAreAsAccurateAsTheCoefficientsAllow) {
     const struct {
         Complexes roots;
         double error;
     } cases[] = {{{1, 1, 1, 2, 3}, 1e-8},
-                 // A root of multiplicity 12, whose cluster is made conjugate.
+                 // A root of multiplicity 12, whose cluster is made symmetric under conjugation.
                  {{2, 2, 2, -2, -2, -2, -2, -2, -2, -2, -2, -2, -2, -2, -2, 0, 0, 0, 3, 3, 3}, 0.2},
                  {{Complex(1, 1), Complex(1, -1), Complex(1, 1), Complex(1, -1)}, 1e-12}};
     for (const auto &[expected, error] : cases) {
@@ -319,7 +319,7 @@ TEST(PolyRoots2026, EndsOfTheCoefficientsAndFailures) {
     EXPECT_EQ(radii[1], 0.0);
     ASSERT_EQ(AllRealRoots({1e300, 0, 1e-300}, roots, radii), 0);
     EXPECT_NEAR(roots[0].imag() * 1e-300, 1.0, 1e-15);
-    // Flat around 0, where the elder is stuck.
+    // Flat around 0, where the elder does not converge.
     Complexes flat(44);
     flat[0] = -1;
     flat[43] = 1;
@@ -360,10 +360,10 @@ TEST(PolyRootsNtBst, NewtonImprovesEachRealGuess) {
         EXPECT_NEAR(roots[i].real(), expected[i], 1e-14);
         EXPECT_EQ(roots[i].imag(), 0.0);
     }
-    EXPECT_EQ(roots[3], Complex(1)) << "a root stays as it is";
-    // A double root is reached as far as the residual tells.
+    EXPECT_EQ(roots[3], Complex(1)) << "a root is not changed";
+    // A double root is found to the accuracy that the residual allows.
     EXPECT_NEAR(Polish({1, -2, 1}, {1.5}, {})[0].real(), 1, 1e-7);
-    // Without a real root the point of the smallest residual stands.
+    // Without a real root the result is the point of the smallest residual.
     EXPECT_LT(std::abs(Polish({1, 0, 1}, {0.5}, {}, 30)[0]), 0.5);
     EXPECT_EQ(Polish({6, -7, 0, 1}, {0.8}, {}, 0)[0], Complex(0.8));
     EXPECT_NE(Polish({6, -7, 0, 1}, {0.8}, {}, 2)[0], Complex(0.8));
@@ -397,10 +397,10 @@ TEST(PolyRootsNtBst, GuessesMayStayAsTheyAre) {
     EXPECT_EQ(Polish({2, 3, 1}, {}, guesses), guesses) << "fewer than four coefficients";
     EXPECT_EQ(Polish({6, -7, 0, 1}, {}, {{9, 9}}), (Complexes{{9, 9}})) << "no partner";
     EXPECT_TRUE(Polish({6, -7, 0, 1}, {}, {}).empty());
-    // A first change of a tenth or more is not believed.
+    // A first change of a tenth or more is rejected.
     EXPECT_EQ(Polish({6, -7, 0, 1}, {}, {{1.8, 0}, {1.2, 0}}).size(), 2U);
     EXPECT_EQ(Polish({6, -7, 0, 1}, {}, {{4, 0}, {3, 0}}), (Complexes{4, 3}));
-    // Without iterations the pair is taken for a factor all the same.
+    // Without iterations, the pair is still treated as a factor.
     const Complexes pair = Polish({6, -7, 0, 1}, {}, {{3, 0}, {5, 0}}, 0);
     EXPECT_EQ(pair, (Complexes{5, 3}));
 }
@@ -418,7 +418,7 @@ TEST(PolyRootsNtBst, EmptyAndNullArrays) {
     EXPECT_EQ(roots.size(), 0);
     EXPECT_EQ(run(coef, real.handle(), nullptr, roots.handle()), 0);
     EXPECT_EQ(roots.size(), 1);
-    // The guesses in place.
+    // The guesses are replaced in place.
     EXPECT_EQ(run(coef, real.handle(), guesses.handle(), guesses.handle()), 0);
     ASSERT_EQ(guesses.size(), 3);
     EXPECT_NEAR(guesses[1].re, 2, 1e-14);
@@ -439,10 +439,10 @@ Structure FindStructure(const Complexes &coefficients, Refine refine = Refined,
     EXPECT_EQ(CxMultPolyRoots_head(coef.handle(), refine, tolerance, refined.handle(),
                                    simple.handle(), multiplicities.handle()),
               0);
-    EXPECT_EQ(Values(coef), coefficients) << "the coefficients stay";
+    EXPECT_EQ(Values(coef), coefficients) << "the coefficients are unchanged";
     return {Values(refined), Values(simple), multiplicities.values()};
 }
-// By the real export where the coefficients are real.
+// Uses the real export if the coefficients are real.
 Structure FindRealStructure(const Complexes &coefficients, Refine refine = Refined) {
     std::vector<double> real;
     for (const Complex &a : coefficients)
@@ -467,7 +467,7 @@ Complexes Expanded(const std::vector<Multiple> &roots) {
     return Product(all);
 }
 
-// By rising multiplicity, then by falling modulus, as the refined roots come.
+// By ascending multiplicity, then by descending modulus, the order of the refined roots.
 std::vector<Multiple> Sorted(std::vector<Multiple> roots) {
     std::stable_sort(roots.begin(), roots.end(), [](const Multiple &a, const Multiple &b) {
         return a.times != b.times ? a.times < b.times : std::abs(a.root) > std::abs(b.root);
@@ -486,7 +486,7 @@ double LargestError(const Complexes &found, const std::vector<Multiple> &expecte
     return worst;
 }
 
-// The first three leave no digit to methods that know no multiplicity.
+// For the first three, methods that ignore multiplicity give no correct digit.
 const std::vector<std::vector<Multiple>> structures = {
     {{1, 20}, {2, 15}, {3, 10}, {4, 5}},
     {{{1, -0.01}, 20}, {{1, 0.01}, 20}, {-2, 3}},
@@ -499,7 +499,7 @@ const std::vector<std::vector<Multiple>> structures = {
     {{3, 1}, {2, 1}, {-1, 1}},
 };
 
-TEST(MultPolyRoots, StructuresAreRecoveredAndRootsAreAsAccurateAsSimpleOnes) {
+TEST(MultPolyRoots, StructuresAreFoundAndRootsAreAsAccurateAsSimpleOnes) {
     for (const std::vector<Multiple> &example : structures) {
         const Complexes coefficients = Expanded(example);
         const Structure found = FindStructure(coefficients);
@@ -530,11 +530,10 @@ TEST(MultPolyRoots, SimpleRootsAreAsAccurateAsTheirCondition) {
     for (const Case &example : ReadCases()) {
         const Structure found = FindStructure(example.coefficients);
         if (example.name == "clustered-0.001") {
-            EXPECT_EQ(found.refined.size(), 5U) << "within the tolerance two roots are one";
+            EXPECT_EQ(found.refined.size(), 5U) << "two roots within the tolerance count as one";
             continue;
         }
-        // Eigenvalues are accurate relative to the largest one, which is 1e30 times the others
-        // here.
+        // Eigenvalues are accurate relative to the largest, which here is 1e30 times the others.
         if (example.name == "small")
             continue;
         EXPECT_LT(WorstError(example, found.refined), 1.7) << example.name;
@@ -561,7 +560,7 @@ TEST(MultPolyRoots, RootsOfRealPolynomialsAreRealOrPaired) {
     }
 }
 
-TEST(MultPolyRoots, TheToleranceTellsWhatIsMultiple) {
+TEST(MultPolyRoots, TheToleranceDecidesWhatIsMultiple) {
     Complexes coefficients = Expanded({{1, 3}, {-2, 2}, {{0, 1}, 1}});
     double sign = 1;
     for (Complex &a : coefficients)
@@ -573,7 +572,8 @@ TEST(MultPolyRoots, TheToleranceTellsWhatIsMultiple) {
     EXPECT_LT(LargestError(loose.refined, {{1, 3}, {-2, 2}, {{0, 1}, 1}}), 1e-6);
 }
 
-// With a tolerance of 1 nearly everything is a structure, and none holds: eigenvalues stand in.
+// With a tolerance of 1 nearly every structure is a candidate, but none is confirmed: the result
+// consists of the eigenvalues.
 TEST(MultPolyRoots, WithoutAStructureTheRootsAreEigenvalues) {
     const Complexes coefficients = {{-4, 1},   {3, 0.5}, {0, -2},  {1, 1},
                                     {-0.5, 0}, {2, -1},  {0.25, 3}};
@@ -626,3 +626,4 @@ TEST(MultPolyRoots, FailuresEmptyTheCoefficientsToo) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -32,7 +32,7 @@ Outcome Gaussian(Out<DBL1D> x, int32_t n, double sigma, int32_t seed, RandomStat
         return bad;
     if (seed > 0) {
         RandomSeed(seed, *state);
-        spare->hasSpare = 0; // member by member: what lies between them stays
+        spare->hasSpare = 0; // member by member: the bytes between them are left unchanged
         spare->spare = 0.0;
     }
     GaussianNoise(x.view(), sigma, *state, *spare);
@@ -48,7 +48,7 @@ Outcome Periodic(int32_t n, double amplitude, int32_t seed, Out<DBL1D> x, Random
     return PeriodicNoise(x.view(), amplitude, *state);
 }
 
-// The frame of those whose parameters are checked ahead of the count.
+// The frame of the exports whose parameters are checked before the count.
 template <class Array, class Generate>
 Outcome Checked(Array &x, int32_t n, bool parametersAreGood, int32_t seed, RandomState *state,
                 const Generate &generate) {
@@ -70,7 +70,7 @@ Outcome Poisson(Out<DBL1D> x, int32_t n, double mean, int32_t seed, RandomState 
     return Checked(x, n, !(mean < 0.0), seed, state, [&] { PoissonNoise(x.view(), mean, *state); });
 }
 
-// A probability that is NaN would never be accepted.
+// With a NaN probability nothing would ever be accepted.
 Outcome Binomial(Out<U32_1D> x, int32_t n, int32_t trials, double p, int32_t seed,
                  RandomState *state, BinomialCache *cache) {
     return Checked(x, n, trials >= 0 && p >= 0.0 && p <= 1.0, seed, state,
@@ -85,7 +85,7 @@ struct Start {
 
 constexpr double mostPosition = 0x1p53;
 
-// `fill` takes the place.
+// `fill` is called with the place.
 template <class Fill>
 Outcome Counted(Out<DBL1D> &x, int32_t n, const Start &start, NoiseKind kind,
                 bool parametersAreGood, const Fill &fill) {

@@ -8,8 +8,8 @@
 namespace qx {
 namespace {
 
-// The frame of all with an error out-parameter: n samples that `generate(samples)` makes, after
-// a check of its own where the samples are not made for a wrong argument.
+// The frame of all with an error out-parameter: n samples that `generate(samples)` computes. With
+// `badArgument` the array is not resized.
 template <class Generate>
 Outcome Samples(Out<DBL1D> &x, int32_t n, ErrorCode badArgument, const Generate &generate) {
     if (const Outcome bad = FirstFailed({{n < 1, ErrEmptyInput}, {badArgument != 0, badArgument}}))
@@ -53,7 +53,7 @@ Outcome SquarePattern(Out<DBL1D> x, int32_t n, double amp, double duty, double c
                    [&](RealVector y) { return GenSquarePattern(amp, duty, cycles, y); });
 }
 
-// An excludeEnd other than 0 and 1 counts as 1 throughout.
+// An excludeEnd other than 0 and 1 counts as 1 everywhere.
 ErrorCode CheckRamp(int32_t n, double start, double end, int32_t excludeEnd, int32_t scale) {
     const bool isPoint = n == 1 && start == end;
     return FirstFailed({{excludeEnd != 0 && n < 1, ErrCountNotPositive},
@@ -74,10 +74,10 @@ Outcome Ramp(Out<DBL1D> x, int32_t n, double start, double end, int32_t excludeE
     return GenRamp(start, end, excludeEnd, x.view(), scale);
 }
 
-// The samples of a caller that gives no array; none where n is negative.
+// The samples of a caller that passes no array; none if n is negative.
 RealVector Given(DBL *y, int32_t n) { return {y, std::max(n, 0)}; }
 
-// The times of a pulse are its array's content or, if that is empty, n uniform ones.
+// The times of a pulse are the content of its array or, if that is empty, n uniform times.
 template <class Generate>
 ErrorCode Pulse(DBL1D x, int32_t n, double dt, double delay, const Generate &generate) {
     const auto body = [&](InOut<DBL1D> samples) -> Outcome {

@@ -114,7 +114,7 @@ std::vector<Recipe> RampRecipes() {
     };
 }
 
-// Each pulse at uniform times and at times of the caller's.
+// Each pulse at uniform times and at times of the caller.
 template <class Export>
 void AddPulse(std::vector<Recipe> &recipes, const std::string &name, const Export &call) {
     recipes.push_back({name + ": uniform times",

@@ -59,7 +59,8 @@ Samples Binomial(int32_t n, int32_t trials, double p, int32_t seed, RandomState 
     return Samples(values.begin(), values.end());
 }
 
-// The three sequences are one: H. Zeisel, "Remark ASR 61: A remark on algorithm AS 183", 1986.
+// The three sequences are equivalent to one: H. Zeisel, "Remark ASR 61: A remark on algorithm AS
+// 183", 1986.
 class OneSequence {
 public:
     explicit OneSequence(const RandomState &s)
@@ -67,7 +68,7 @@ public:
               int64_t{s.s3} * 30269 * 30307) %
              modulus) {}
     long double next() {
-        int64_t product = 0; // by 15 bits of the factor at a time
+        int64_t product = 0; // multiplies by 15 bits of the factor at a time
         for (const int64_t digit : {15418, 14459, 29746})
             product = ((product << 15) + digit * x_) % modulus;
         x_ = product;
@@ -130,8 +131,8 @@ TEST(UniformNumbers, SeedsMakeStreamsThatDependOnEachOther) {
         EXPECT_EQ(numbers(k * 47333376)[1], -0.5);
 }
 
-// What is drawn in blocks is what is drawn singly, also from states that wrap in the first product
-// and stay negative, lie beyond the moduli or are 0 in part.
+// Numbers drawn in blocks equal those drawn singly, also from states that overflow in the first
+// product and stay negative, exceed the moduli or are partly 0.
 TEST(UniformNumbers, BlocksAndSkipsAreTheSingleNumbers) {
     constexpr int32_t least = std::numeric_limits<int32_t>::min();
     for (const RandomState &from :
@@ -157,8 +158,8 @@ TEST(UniformNumbers, BlocksAndSkipsAreTheSingleNumbers) {
         }
 }
 
-// Every noise: the same seed the same samples, other seeds others, and calls of any size without a
-// seed join to one stream.
+// For every noise, the same seed gives the same samples, other seeds give others, and calls of any
+// size without a seed continue one stream.
 TEST(Noises, StreamsRestartByASeedAndJoinWithoutOne) {
     GaussSpare spare = {};
     BinomialCache cache = {};
@@ -203,18 +204,18 @@ TEST(Noises, GaussKeepsItsSpareUnscaled) {
     GaussSpare spare = {1, 1.5};
     EXPECT_EQ(Gaussian(1, -1, state, spare, 3.0), Samples{4.5});
     EXPECT_EQ(spare.hasSpare, 0);
-    EXPECT_EQ(state.s1, start.s1) << "a spare costs no number";
+    EXPECT_EQ(state.s1, start.s1) << "a spare uses no random number";
     Gaussian(1, -1, state, spare, 1.0);
     EXPECT_EQ(spare.hasSpare, 1);
     const double kept = spare.spare;
     EXPECT_EQ(Gaussian(1, -1, state, spare, -2.0), Samples{-2.0 * kept});
     Gaussian(1, -1, state, spare, 1.0);
     Gaussian(2, 5, state, spare, 1.0);
-    EXPECT_EQ(spare.hasSpare, 0) << "a seed forgets the spare";
+    EXPECT_EQ(spare.hasSpare, 0) << "a seed discards the spare";
 }
 
-// A point of the unit disc, its radius by the Rayleigh transform: the pair as the polar method has
-// it, from the same numbers, in long double.
+// A point of the unit disc with its radius transformed to a Rayleigh distribution: the pair of the
+// polar method, from the same numbers, in long double.
 TEST(Noises, GaussIsThePolarMethod) {
     RandomState state = start;
     GaussSpare spare = {};
@@ -232,7 +233,7 @@ TEST(Noises, GaussIsThePolarMethod) {
     }
 }
 
-// Whatever a caller left in the cache.
+// Holds for any content of the cache.
 TEST(Noises, BinomialStaysWithinTheTrials) {
     RandomState state = start;
     BinomialCache cache = {0.3, 0.7, 0.0, 0.0, 1000.0, 1e4, 100};
@@ -240,9 +241,9 @@ TEST(Noises, BinomialStaysWithinTheTrials) {
         ASSERT_LE(value, 100.0);
 }
 
-// The rejections as they are told, from the numbers of the one sequence in long double: they decide
-// which numbers are used, so a factor that is off by little leaves the stream.
-TEST(Noises, RejectionsUseTheNumbersAsTold) {
+// The documented rejections, from the numbers of the single sequence, in long double. They decide
+// which numbers are used, so a slightly wrong factor desynchronises the stream.
+TEST(Noises, RejectionsUseTheNumbersAsDocumented) {
     typedef long double Long;
     const auto tangent = [](OneSequence &u) {
         return std::tan(std::numbers::pi_v<long double> * u.next());
@@ -305,7 +306,7 @@ TEST(Noises, RejectionsUseTheNumbersAsTold) {
     }
 }
 
-// Kolmogorov and Smirnov's statistic; above 1.95 with a probability of 0.001.
+// The Kolmogorov-Smirnov statistic, which exceeds 1.95 with a probability of 0.001.
 double Discrepancy(Samples x, const std::function<double(double)> &distribution) {
     std::sort(x.begin(), x.end());
     const auto n = static_cast<double>(x.size());
@@ -318,8 +319,8 @@ double Discrepancy(Samples x, const std::function<double(double)> &distribution)
     return worst * std::sqrt(n);
 }
 
-// Standard deviations by which Pearson's statistic exceeds its mean, over counts that are expected
-// at least 20 times; 0 where all samples are what they must be.
+// The number of standard deviations by which Pearson's statistic exceeds its mean. Consecutive
+// values are grouped to expected counts of at least 20.
 double ExcessOfChiSquare(const Samples &x, int32_t values,
                          const std::function<double(int32_t)> &probability) {
     std::vector<double> counts(static_cast<std::size_t>(values), 0.0);
@@ -353,7 +354,7 @@ TEST(Distributions, OfContinuousNoisesAtAMillionSamples) {
     EXPECT_LT(Discrepancy(Gaussian(million, 3, state, spare, 2.0),
                           [](double x) { return std::erfc(-x / std::sqrt(8.0)) / 2.0; }),
               1.95);
-    // Fewer than `order` events of rate 1 up to x.
+    // The complement is the probability of fewer than `order` events of rate 1 up to x.
     for (const int32_t order : {1, 3, 5, 6, 20})
         EXPECT_LT(Discrepancy(Gamma(million, order, 9, state),
                               [=](double x) {
@@ -397,7 +398,7 @@ TEST(Distributions, OfCountingNoisesAtAMillionSamples) {
                                     }),
                   4.0)
             << c.trials << " trials of " << c.p;
-    // Less than one success in many trials: Poisson events by definition.
+    // Less than one expected success in many trials: Poisson events by definition.
     for (const Case &c : {Case{30, 0.03}, {30, 0.98}})
         EXPECT_LT(ExcessOfChiSquare(Binomial(million, c.trials, c.p, 5, state, cache), c.trials + 1,
                                     [=](int32_t k) {
@@ -414,7 +415,7 @@ TEST(Distributions, OfCountingNoisesAtAMillionSamples) {
     }
 }
 
-// What the cache holds from other arguments must not be used.
+// The content of the cache for other arguments must not be used.
 TEST(Noises, BinomialRefreshesItsCache) {
     RandomState state = start;
     BinomialCache shared = {};
@@ -425,7 +426,7 @@ TEST(Noises, BinomialRefreshesItsCache) {
     }
     EXPECT_EQ(shared.nOld, 90);
     EXPECT_EQ(shared.pOld, 1.0 - 0.7);
-    // One that was not kept as it was: the number of trials stands in it twice.
+    // An altered cache is detected, because it holds the number of trials twice.
     BinomialCache fresh = {};
     const Samples x = Binomial(100, 100, 0.3, 8, state, fresh);
     BinomialCache strange = fresh;
@@ -433,7 +434,7 @@ TEST(Noises, BinomialRefreshesItsCache) {
     EXPECT_EQ(Binomial(100, 100, 0.3, 8, state, strange), x);
 }
 
-// The transform by its definition: every harmonic has the amplitude and the angle drawn for it.
+// By the definition of the transform, every harmonic has the amplitude and the angle drawn for it.
 TEST(Noises, PeriodNoiseHasAFlatSpectrumOfIntegerAngles) {
     for (const int32_t n : {1, 2, 3, 4, 16, 45, 101}) {
         const double amplitude = 0.75;
@@ -463,8 +464,9 @@ TEST(Noises, PeriodNoiseHasAFlatSpectrumOfIntegerAngles) {
     }
 }
 
-// Numbers that are all 0 meet no disc: the noises that would draw for ever give zeros.
-TEST(Noises, AStillStateEnds) {
+// Random numbers that are all 0 never fall into the unit disc; noises that would draw endlessly
+// return zeros.
+TEST(Noises, AConstantStateTerminates) {
     RandomState still = {0, 30307, 0};
     GaussSpare spare = {1, 2.0};
     BinomialCache cache = {};
@@ -507,7 +509,7 @@ TEST(Noises, CodesComeInTheirOrder) {
                   ErrInvalidSelector);
         EXPECT_EQ(counts.size(), 0);
     }
-    EXPECT_EQ(state.s1, start.s1) << "a failure draws nothing and seeds nothing";
+    EXPECT_EQ(state.s1, start.s1) << "a failure neither draws nor seeds";
 }
 
 // The noise of 2026.
@@ -518,7 +520,7 @@ Samples Of(const std::function<ErrorCode(DBL1D)> &call) {
     return x.values();
 }
 
-// Each call as a function of the number of values and of the place.
+// Each call as a function of the number of values and the position.
 typedef std::function<Samples(int32_t n, int32_t key, int32_t stream, double position)> Source;
 const std::vector<std::pair<const char *, Source>> sources = {
     {"white",
@@ -543,8 +545,8 @@ const std::vector<std::pair<const char *, Source>> sources = {
      }},
 };
 
-// The known answers of the publication, and what a generic text of the definition gives, which has
-// NumPy's bits in its form of 64-bit words (make_philox.py).
+// The known answers of the publication, and those of a generic implementation of the definition,
+// whose form with 64-bit words gives NumPy's bits (make_philox.py).
 TEST(CounterNoise, HasTheKnownBlocks) {
     const qx::NoiseBlock zeros = qx::PhiloxBlock({0, 0, 0, qx::NoiseKind{0}}, 0, 0);
     EXPECT_EQ(zeros.a, 0xe169c58d6627e8d5);
@@ -567,15 +569,18 @@ TEST(CounterNoise, HasTheKnownBlocks) {
         EXPECT_EQ(one.a >> 32, static_cast<uint64_t>(v[4])) << row.text;
         EXPECT_EQ(one.b & 0xffffffff, static_cast<uint64_t>(row.value)) << row.text;
         uint64_t a[8], b[8];
-        qx::PhiloxBlocks(place, 7, a, b);
-        for (uint64_t i = 0; i < 7; ++i) {
-            EXPECT_EQ(a[i], qx::PhiloxBlock(place, i, 0).a) << row.text;
-            EXPECT_EQ(b[i], qx::PhiloxBlock(place, i, 0).b) << row.text;
+        for (const uint32_t attempt : {0U, 0xfffffffeU}) {
+            qx::PhiloxBlocks(place, attempt, 7, a, b);
+            for (uint64_t i = 0; i < 7; ++i) {
+                EXPECT_EQ(a[i], qx::PhiloxBlock(place, i, attempt).a) << row.text;
+                EXPECT_EQ(b[i], qx::PhiloxBlock(place, i, attempt).b) << row.text;
+            }
         }
     }
 }
 
-// Any place at once: parts, also single values, are those of one piece, past 2^32 as well.
+// Any position can be computed directly: parts, including single values, equal those of one piece,
+// also past 2^32.
 TEST(CounterNoise, IsTheSameInParts) {
     for (const auto &[name, source] : sources)
         for (const double at : {0.0, 4294967000.0, 0x1p53 - 1000}) {
@@ -592,8 +597,8 @@ TEST(CounterNoise, IsTheSameInParts) {
         }
 }
 
-// The greatest distance of the distribution of the values from the exact one, times the root of their
-// number: above 1.95 for 1 of 1000 good generators.
+// The largest distance of the distribution of the values from the exact one, times the square root
+// of their number; exceeds 1.95 for 1 of 1000 good generators.
 double KolmogorovSmirnov(Samples x, const std::function<double(double)> &cdf) {
     std::sort(x.begin(), x.end());
     const double n = static_cast<double>(x.size());
@@ -622,7 +627,7 @@ TEST(CounterNoise, FollowsItsContinuousDistributions) {
                 << shape << " " << key;
         }
     }
-    // Quantiles: each sample has the uniform number of its block, tails included.
+    // Quantiles: each sample corresponds to the uniform number of its block, including the tails.
     double worst = 0;
     const Samples z = Of([](DBL1D x) { return Gauss2026(x, n, 1.0, 3, 4, 0.0); });
     const qx::NoisePlace place = {3, 4, 0, qx::NoiseKind::Gaussian};
@@ -646,8 +651,8 @@ TEST(CounterNoise, FollowsItsContinuousDistributions) {
         }
 }
 
-// Chi-square over the numbers with an expectation of 20 or more, of which the rest is one: as a
-// standard normal number (E. B. Wilson and M. M. Hilferty, 1931).
+// Chi-square over the values with an expected count of at least 20, and all others as one class,
+// transformed to a standard normal variate (E. B. Wilson and M. M. Hilferty, 1931).
 double ChiSquare(const Samples &x, const std::function<double(double)> &lnProbability, double from,
                  double to) {
     const double n = static_cast<double>(x.size());
@@ -701,8 +706,8 @@ TEST(CounterNoise, FollowsItsDiscreteDistributions) {
     EXPECT_EQ(Of([](DBL1D x) { return Poisson2026(x, 3, 0.0, 9, 2, 0.0); }), Samples(3, 0.0));
 }
 
-// At large means the distribution is normal up to the skewness, which shifts it by 1 / (6 sigma); mean
-// and variance stay exact where the elder's deviation is 10 % too large.
+// At large means the distribution is normal except for the skewness, which shifts it by 1 / (6
+// sigma). Mean and variance are exact, where the elder's standard deviation is 10 % too large.
 TEST(CounterNoise, IsExactAtLargeMeans) {
     constexpr int32_t n = 400000;
     const auto standard = [](Samples x, double mean, double deviation) {
@@ -728,8 +733,8 @@ TEST(CounterNoise, IsExactAtLargeMeans) {
     }
 }
 
-// First values of 10^5 streams, and of as many keys: no correlation with their neighbours, their
-// distance of 2^k, or their number.
+// The first values of 10^5 streams, and of as many keys, are uniformly distributed and not
+// correlated with those at distances 2^k and 3 2^(k-1).
 TEST(CounterNoise, HasIndependentStreams) {
     constexpr int32_t n = 100000;
     for (const bool byKey : {false, true}) {
@@ -741,7 +746,7 @@ TEST(CounterNoise, HasIndependentStreams) {
             double sum = 0;
             for (std::size_t i = static_cast<std::size_t>(distance); i < first.size(); ++i)
                 sum += first[i] * first[i - static_cast<std::size_t>(distance)];
-            return sum / (4.0 / 3) / std::sqrt(n - distance); // of deviation 1
+            return sum / (4.0 / 3) / std::sqrt(n - distance); // with standard deviation 1
         };
         for (int32_t distance = 1; distance < n / 2; distance *= 2) {
             EXPECT_LT(std::fabs(correlation(distance)), 4) << distance;
@@ -751,7 +756,7 @@ TEST(CounterNoise, HasIndependentStreams) {
     }
 }
 
-TEST(CounterNoise, RefusesWhatItCannotMake) {
+TEST(CounterNoise, RefusesInvalidArguments) {
     DBLArray x;
     const double most = 0x1p53, nan = std::numeric_limits<double>::quiet_NaN();
     for (const double position : {-1.0, 0.5, most - 2, most, nan, -nan})

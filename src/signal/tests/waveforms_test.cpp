@@ -77,7 +77,7 @@ Long Reduced(Long phase) {
     return rest < 0 ? rest + 360 : rest;
 }
 
-// Phases stay away from the jumps, where a last bit decides.
+// The phases avoid the jumps, where the last bit would decide.
 TEST(Waves, FollowTheirPhase) {
     for (const Wave &wave : Waves())
         for (const double f : {0.0123456, -0.0123456, 0.4001, 2.25, -7.12, 0.0})
@@ -102,8 +102,8 @@ TEST(Waves, FollowTheirPhase) {
             }
 }
 
-// Blocks of any size give the wave of one block. Apart from the rounding of the phase in between,
-// which the tables magnify.
+// Blocks of any size give the wave of one block, except for the rounding of the phase between
+// blocks, which the tables magnify.
 TEST(Waves, BlocksJoinWithoutASeam) {
     for (const Wave &wave : Waves()) {
         SCOPED_TRACE(wave.name);
@@ -123,7 +123,8 @@ TEST(Waves, BlocksJoinWithoutASeam) {
     }
 }
 
-// A turn in 64 or 160 samples: phases are exact, and vectors lie across the jumps and on them.
+// Periods of 64 or 160 samples: phases are exact, and vectors extend across the jumps or begin at
+// them.
 TEST(Waves, SlowOnesJumpAtTheExactSample) {
     const double half = 50.0;
     for (const int32_t period : {64, 160})
@@ -149,8 +150,8 @@ TEST(Waves, SlowOnesJumpAtTheExactSample) {
         }
 }
 
-// fmod is exact: phases on whole degrees give exact places, far beyond where the lanes' remainder
-// would do.
+// fmod is exact: phases in whole degrees give exact positions, far beyond the range in which the
+// remainder of the lanes would suffice.
 TEST(Waves, PhasesAreReducedExactly) {
     for (const double turns : {0.0, 1.0, -1.0, 1e6, -3e9, 1e15, -1e15, 0x1p60}) {
         DBLArray x;
@@ -172,7 +173,7 @@ TEST(Waves, PhasesAreReducedExactly) {
     double phase = 180.0;
     Call(SawtoothWaveCIN, x, 1, 0.0, phase);
     EXPECT_EQ(x[0], -amp);
-    // Both roads to a phase: the wave of a frequency that only the exact one can take.
+    // Both ways of reducing a phase, with a phase that only the exact way can reduce.
     for (int32_t i = 0; i < 40; ++i) {
         double slow = i * 10.0 + 360.0 * 0x1p45;
         double fast = i * 10.0;
@@ -184,7 +185,7 @@ TEST(Waves, PhasesAreReducedExactly) {
 }
 
 TEST(Waves, SineIsClipped) {
-    // At a multiple of a quarter turn the recurrence still meets the peak: never beyond it.
+    // At multiples of a quarter turn the recurrence reaches the peak but never exceeds it.
     DBLArray x;
     double phase = 90.0;
     Call(SineWaveCIN, x, 100000, 0.0001, phase);
@@ -303,7 +304,7 @@ TEST(Patterns, SquareRoundsItsPeriodAndItsDuty) {
     EXPECT_EQ(qx::GenSquarePattern(1.0, 50.0, 2.5, {y, 2}), ErrWaveParameterRange);
 }
 
-TEST(Patterns, PulsesStandWhereTheyAreAsked) {
+TEST(Patterns, PulsesAreAtTheRequestedPositions) {
     EXPECT_EQ(Pattern(0, PulsePtrn, 5, 2.0, 1, 3), (Samples{0, 2, 2, 2, 0}));
     EXPECT_EQ(Pattern(0, PulsePtrn, 3, 2.0, 3, 0), (Samples{0, 0, 0}));
     EXPECT_EQ(Pattern(0, ImpulsePtrn, 3, 2.0, 2), (Samples{0, 0, 2}));
@@ -335,9 +336,9 @@ TEST(Ramps, IncludeOrExcludeTheEnd) {
     EXPECT_EQ(Pattern(0, RampPtrn, 1, 2.0, 2.0), Samples{2.0});
     Pattern(ErrFewerThanTwo, RampPtrn, 1, 2.0, 3.0);
     Pattern(ErrEmptyInput, RampPtrn, 0, 2.0, 2.0);
-    EXPECT_EQ(Pattern(0, RampPtrn, 4, 0.1, 0.7)[3], 0.7) << "the end to the bit";
+    EXPECT_EQ(Pattern(0, RampPtrn, 4, 0.1, 0.7)[3], 0.7) << "the end is exact to the bit";
     DBLArray x;
-    for (const int32_t excludeEnd : {1, -1, 2}) { // any other than 0
+    for (const int32_t excludeEnd : {1, -1, 2}) { // any nonzero value
         EXPECT_EQ(RampPtrn80(x.handle(), 4, 1.0, 3.0, excludeEnd), 0);
         EXPECT_EQ(x.values(), (Samples{1, 1.5, 2, 2.5}));
     }
@@ -365,7 +366,7 @@ TEST(Ramps, IncludeOrExcludeTheEnd) {
     }
 }
 
-// Pulses: each at uniform times, and at the same times as the caller's own.
+// Pulses: each at uniform times, and at the same times passed by the caller.
 typedef std::function<ErrorCode(DBLArray &x, int32_t n)> Pulse;
 
 Samples AtUniformTimes(const Pulse &pulse, int32_t n) {
@@ -427,7 +428,7 @@ TEST(Pulses, MonopulseIsADerivativeOfPeakAmp) {
     EXPECT_NEAR(x[5] / amp, slope(0.4) / slope(peak), 1e-7);
 }
 
-TEST(Pulses, TrianglesBeginAtZeroOrStandAroundIt) {
+TEST(Pulses, TrianglesBeginAtZeroOrAreCentredOnIt) {
     const auto triangle = [](double skew, double width = 1.0) {
         return [=](DBLArray &x, int32_t n) {
             return AperiodTriangleH(x.handle(), n, 2.0, 0.25, 0.25, width, skew);
@@ -440,7 +441,7 @@ TEST(Pulses, TrianglesBeginAtZeroOrStandAroundIt) {
     EXPECT_EQ(AtTimes(triangle(0.5), {-0.6, -0.25, 0.0, 0.25, 0.6}), (Samples{0, 1, 2, 1, 0}));
 }
 
-// sin(N t/2) / (N sin(t/2)) is a mean of cosines, which has no singular places.
+// sin(N t/2) / (N sin(t/2)) is a mean of cosines, which has no singularities.
 TEST(Pulses, PeriodicSincIsAMeanOfCosines) {
     for (const int32_t order : {1, 2, 5, 6}) {
         Samples times;
@@ -499,8 +500,8 @@ TEST(Pulses, CodesComeInTheirOrder) {
     }
 }
 
-// A constant input shifts the phase, or the frequency, of a sine; the turns in the accumulator
-// must not be seen, whatever its state, and blocks go on where the last one ended.
+// A constant input shifts the phase, or the frequency, of a sine. Whole turns in the accumulator
+// must have no effect, whatever its state, and blocks continue where the last one ended.
 TEST(Modulators, ModulateASine) {
     const double step = 1e-3;
     const double fc = 61.0;
@@ -536,7 +537,8 @@ TEST(Modulators, KeepTheirOddities) {
     double phase = 0.0;
     double peak = 1.0;
     double out;
-    // Two pi over the step is 2 pi: two steps of half a turn stay below it and two turns are added.
+    // 2 pi / dt is 2 pi: the first step stays below it, so a turn is added; the second exceeds it,
+    // so a turn is subtracted.
     EXPECT_EQ(PhasMod(2, 1.0, &out, 0.25, y, &peak, &phase), 0);
     EXPECT_EQ(peak, 1.0) << "1.9 and 1 have the same whole part";
     EXPECT_NEAR(phase, 2.5 * std::numbers::pi - 2 * std::numbers::pi + 0.5 * std::numbers::pi,

@@ -7,7 +7,7 @@
 
 namespace {
 
-constexpr int32_t kComplete = 1; // of the selectors
+constexpr int32_t kComplete = 1; // value of the selectors
 
 void SetIfAsked(DBL *target, double value) {
     if (target != nullptr)

@@ -11,7 +11,7 @@
 
 namespace {
 
-constexpr int32_t kComplete = 1; // of the selectors
+constexpr int32_t kComplete = 1; // value of the selectors
 
 } // namespace
 

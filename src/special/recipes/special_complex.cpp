@@ -8,7 +8,7 @@ namespace {
 typedef ErrorCode (*Bessel)(double, const ::CDB *, int32_t, ::CDB *);
 typedef ErrorCode (*Airy)(const ::CDB *, int32_t, ::CDB *);
 
-// Orders and arguments that reach each method and each quadrant as the size grows.
+// Orders and arguments that cover each method and each quadrant as the size grows.
 Recipe OfOrder(const char *name, Bessel function) {
     return {name, [function](Call &c) {
                 const double x = 1 + c.n % 23;

@@ -4,7 +4,7 @@
 #include "special/rational.h"
 
 // Made by tools/approximations/airy.py. Each set: the centre, then numerator and
-// denominator in ascending powers of the distance from the centre. The comment tells
+// denominator in ascending powers of the distance from the centre. The comment gives
 // the degrees, the interval, and the largest relative error measured there, first with
 // exact coefficients, then with these doubles.
 

@@ -4,7 +4,7 @@
 #include "special/rational.h"
 
 // Made by tools/approximations/integrals.py. Each set: the coefficients of the Chebyshev
-// polynomials T_k(t / 2), k = 0, 1, ..., the first one doubled. The comment tells the
+// polynomials T_k(t / 2), k = 0, 1, ..., the first one doubled. The comment gives the
 // function, t, the interval, and the largest relative error measured there, first with
 // exact coefficients, then with these doubles.
 

@@ -20,15 +20,15 @@
 #include <thread>
 #include <vector>
 
-// What the tests of the special functions share: exports behind one shape, tables of references,
-// and calls with any bits.
+// Shared by the tests of the special functions: exports with a common signature, tables of
+// references, and calls with arbitrary bits.
 
 namespace qx::test {
 
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kInfinity = std::numeric_limits<double>::infinity();
 
-typedef std::array<double, 4> Arguments; // those beyond the export's own are ignored
+typedef std::array<double, 4> Arguments; // surplus arguments are ignored
 
 inline std::string Text(const Arguments &arguments) {
     std::ostringstream text;
@@ -42,7 +42,7 @@ inline std::string Text(const Arguments &arguments) {
 typedef std::function<void(const Arguments &, double *)> Export;
 typedef std::map<std::string, Export> ExportMap;
 
-// An int32 from any double, as the fuzz tests make them.
+// Converts any double to an int32, for arguments from the fuzz tests.
 inline int32_t Whole(double x) {
     if (!(std::fabs(x) < 2147483647.0))
         return x > 0 ? std::numeric_limits<int32_t>::max() : std::numeric_limits<int32_t>::min();
@@ -56,8 +56,8 @@ inline double Value(const ExportMap &exports, const std::string &name, const Arg
     return out[output];
 }
 
-// The lines of a data file, NAME ARGUMENT ... OUTPUT VALUE BOUND with an absolute bound, against
-// the exports; returns how many there were.
+// Compares the lines of a data file, NAME ARGUMENT ... OUTPUT VALUE BOUND with an absolute bound,
+// with the exports; returns the number of lines.
 inline int ExpectAgreement(const ExportMap &exports, const std::string &path) {
     std::ifstream file(path);
     std::string line;
@@ -86,7 +86,7 @@ inline int ExpectAgreement(const ExportMap &exports, const std::string &path) {
     return count;
 }
 
-// A rule of the domain or a limit: NaN expects any NaN, other values themselves.
+// A rule of the domain or a limit: NaN expects any NaN, other values must be equal.
 struct Rule {
     const char *name;
     Arguments arguments;
@@ -102,8 +102,8 @@ inline void ExpectRule(const ExportMap &exports, const Rule &rule) {
         EXPECT_EQ(ours, rule.expected) << rule.name << ' ' << Text(a);
 }
 
-// Arguments of every kind: random bit patterns, and numbers of ordinary size, which reach more of
-// the methods.
+// Arguments of every kind: random bit patterns, and numbers of ordinary magnitude, which reach more
+// of the methods.
 class Bits {
 public:
     double next() {
@@ -123,7 +123,7 @@ private:
     uint64_t state_ = 20240607;
 };
 
-// Ends a process in which one step lasts for half a minute, and names it.
+// Ends the process if one step takes half a minute, and names the step.
 class Watchdog {
 public:
     Watchdog() : thread_([this] { watch(); }) {}
@@ -163,8 +163,8 @@ private:
     std::thread thread_;
 };
 
-// Every call comes back, whatever its arguments. `calls` in all, of which each export gets its
-// part; QX_FUZZ gives the number for each export instead.
+// Checks that calls return for any arguments. Makes `calls` calls in all, an equal share for each
+// export; QX_FUZZ sets the number for each export instead.
 inline void ExpectSoon(const ExportMap &exports, int calls) {
 #if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
     constexpr int slower = 20;
@@ -188,11 +188,12 @@ inline void ExpectSoon(const ExportMap &exports, int calls) {
     }
 }
 
-// A threshold between two methods: the values on both its sides lie within the relative tolerance.
+// A threshold between two methods: the values on both sides must agree within the relative
+// tolerance.
 struct Seam {
     const char *name;
     Arguments arguments;
-    int which; // of the arguments is at the threshold
+    int which; // index of the argument at the threshold
     double tolerance;
 };
 

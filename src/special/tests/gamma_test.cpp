@@ -20,15 +20,15 @@ const double nan = std::numeric_limits<double>::quiet_NaN();
 
 TEST(GammaFamily, AgreesWithMultiplePrecision) {
     typedef std::vector<double> Arguments;
-    // The bound is relative to the value and allows for what the stated method costs: the
-    // exponential of a large logarithm in the incomplete functions, and the power in Stirling's
-    // formula.
+    // The bound is relative to the value and allows for the errors of the method: the exponential
+    // of a large logarithm in the incomplete functions, and the power in Stirling's formula.
     struct Function {
         std::function<double(const Arguments &)> value;
         std::function<double(const Arguments &, double)> bound;
     };
     const auto incomplete = [](const Arguments &a, double value) {
-        // The front factor is exp(a ln x - x - ln Gamma(a)); near the middle 1 minus it remains.
+        // The leading factor is exp(a ln x - x - ln Gamma(a)). Near the middle one function is 1
+        // minus the other, hence the absolute term.
         return 4e-16 * (20 + a[0] * (2 + std::fabs(std::log(a[1])))) * std::fabs(value) + 1e-15;
     };
     const std::map<std::string, Function> functions{
@@ -37,7 +37,7 @@ TEST(GammaFamily, AgreesWithMultiplePrecision) {
           [](const Arguments &, double v) { return 2.7e-15 * std::fabs(v); }}},
         {"lngamma",
          {[](const Arguments &a) { return qx::LnGammaFunction(a[0]); },
-          // Absolute near the zeros at 1 and 2.
+          // The bound is absolute near the zeros at 1 and 2.
           [](const Arguments &, double v) { return 2e-15 * (std::fabs(v) + 1); }}},
         {"gammap",
          {[](const Arguments &a) { return qx::IncompleteGammaP(a[0], a[1]); }, incomplete}},
@@ -81,8 +81,8 @@ TEST(GammaFamily, LimitsAndFaultsOfTheDomain) {
     EXPECT_EQ(qx::IncompleteGammaP(2.0, inf), 1.0);
     EXPECT_EQ(qx::IncompleteGammaQ(2.0, inf), 0.0);
     EXPECT_EQ(qx::IncompleteGammaP(inf, 1.0), inf);
-    EXPECT_EQ(qx::IncompleteGammaP(inf, 0.0), 0.0) << "goes on past the infinite a";
-    EXPECT_EQ(qx::IncompleteGammaQ(inf, 0.0), inf) << "does not";
+    EXPECT_EQ(qx::IncompleteGammaP(inf, 0.0), 0.0) << "does not stop at the infinite a";
+    EXPECT_EQ(qx::IncompleteGammaQ(inf, 0.0), inf) << "stops at the infinite a";
     EXPECT_EQ(qx::IncompleteGammaQ(0.5, 1e200), 0.0);
     for (const auto &[a, x] : {std::pair{nan, 1.0},
                                {1.0, nan},
@@ -109,7 +109,8 @@ TEST(GammaFamily, LimitsAndFaultsOfTheDomain) {
         EXPECT_TRUE(std::isnan(qx::IncompleteBeta(a, b, x))) << a << " " << b << " " << x;
 }
 
-// Any bit pattern comes back; what has no bound on its loop is left out (see gamma.h).
+// Calls with any bit pattern return; functions without a bound on their loop are left out (see
+// gamma.h).
 TEST(GammaFamily, TakesAnyBitPattern) {
     std::mt19937_64 random(7);
     const auto any = [&] { return std::bit_cast<double>(random()); };

@@ -44,7 +44,7 @@ TEST(IncompleteBeta, EndsAreExact) {
     EXPECT_EQ(qx::IncompleteBeta(1.0, 1.0, Share(1.0, 3.0)).lower, 0.25);
 }
 
-// In each tail down to the smallest, with the error of the point itself allowed for.
+// In each tail, down to the smallest probability; the bound allows for the error of the argument.
 TEST(IncompleteBeta, InverseReturnsToTheTail) {
     for (const double a : {0.5, 1.0, 2.5, 10.5, 100.0, 1e4, 5e5})
         for (const double b : {0.5, 1.0, 5.0, 30.0, 1e3, 1e6})

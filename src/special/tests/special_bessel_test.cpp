@@ -8,11 +8,8 @@
 #include <cmath>
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::test::kInfinity;
-using qx::test::kNaN;
-using qx::test::Whole;
 
 typedef const qx::test::Arguments &In;
 
@@ -96,8 +93,8 @@ TEST(SpecialBessel, KeepsTheRulesOfDomainsAndLimits) {
     EXPECT_EQ(Value("Airy", 104, 0, 3), largest);
 }
 
-// Next to the ends of the range a value is finite or infinite as it is in truth, with its sign;
-// references from mpmath.
+// Near the ends of the range, a value is finite or infinite exactly where the true value is, with
+// the right sign; references from mpmath.
 TEST(SpecialBessel, OverflowsWhereTheValueDoes) {
     EXPECT_NEAR(Value("Struve", 2.9e-8, -34.69) / 4.1428455173572960447e+300, 1.0, 1e-12);
     EXPECT_EQ(Value("BesselYr", 10.3, 1e-100), -kInfinity);
@@ -148,3 +145,4 @@ TEST(SpecialBessel, LeavesNoStepAtAThreshold) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -11,11 +11,9 @@
 #include <cmath>
 #include <limits>
 
+namespace qx::test {
 namespace {
 
-using qx::kPi;
-using qx::test::kInfinity;
-using qx::test::kNaN;
 using qx::operator+;
 using qx::operator-;
 using qx::operator*;
@@ -40,7 +38,8 @@ constexpr NamedAiry kAiry[] = {{"AiryAi", QX_CxAiryAi},
                                {"AiryBi", QX_CxAiryBi},
                                {"AiryBiP", QX_CxAiryBiP}};
 
-// Order, real and imaginary part, scaled; the outputs are the parts and, third, the code.
+// The arguments are order, real part, imaginary part and scaling; the outputs are the real and the
+// imaginary part and the code.
 const qx::test::ExportMap &Exports() {
     static const qx::test::ExportMap exports = [] {
         qx::test::ExportMap map;
@@ -174,13 +173,14 @@ TEST(SpecialComplex, IsRealWhereItShouldBe) {
             EXPECT_EQ(Call(airy.name, 0, {x, -0.0}).value.im, 0) << airy.name << x;
 }
 
-// I_v K_(v+1) + I_(v+1) K_v = 1 / z and Ai Bi' - Ai' Bi = 1 / pi hold wherever one looks; scaled in
-// the right half-plane, so that nothing leaves the range.
+// I_v K_(v+1) + I_(v+1) K_v = 1 / z and Ai Bi' - Ai' Bi = 1 / pi hold everywhere; the functions are
+// scaled in the right half-plane, so that nothing overflows or underflows.
 TEST(SpecialComplex, KeepsTheWronskians) {
     qx::test::Noise noise(7);
     for (int i = 0; i < 4000; ++i) {
         const double modulus = std::exp2(13 * noise.positive() - 3);
-        // whole, half and other orders to which 1 can be added exactly, a third about the modulus
+        // whole, half and other orders to which 1 can be added exactly, a third of them near the
+        // modulus
         const double any = std::exp2(12 * noise.positive() - 2) + (i % 3 == 0 ? modulus : 0);
         const double order = std::ldexp(std::floor(std::ldexp(any, i % 20)), -(i % 20));
         const double angle = 0.5 * kPi * noise.symmetric();
@@ -213,7 +213,7 @@ TEST(SpecialComplex, KeepsTheWronskians) {
     }
 }
 
-// Half orders are elementary: however large the argument, the exponent keeps its digits.
+// Functions of half orders are elementary; the exponent keeps its digits for arguments of any size.
 TEST(SpecialComplex, KeepsItsDigitsForLargeArguments) {
     for (const double x : {1e3, 123456.5, 4e7, 1e9}) {
         const double amplitude = std::sqrt(2 / (kPi * x));
@@ -229,3 +229,4 @@ TEST(SpecialComplex, KeepsItsDigitsForLargeArguments) {
 TEST(SpecialComplex, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports(), 200000); }
 
 } // namespace
+} // namespace qx::test

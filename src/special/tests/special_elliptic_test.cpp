@@ -48,7 +48,7 @@ TEST(SpecialElliptic, SelectsTheCompleteForms) {
     double complete = 0;
     QX_Elliptic1_85(0.3, 0.5, &complete, 1);
     EXPECT_EQ(complete, Value("Elliptic1", 0.3, kNaN));
-    QX_Elliptic1_85(0.3, 0.5, &complete, 2); // anything but 1
+    QX_Elliptic1_85(0.3, 0.5, &complete, 2); // any value except 1
     EXPECT_EQ(complete, Value("Elliptic1", 0.3, 0.5));
     QX_Elliptic1_2026(1, 0.5, &complete, 1);
     EXPECT_EQ(complete, kInfinity);
@@ -60,13 +60,14 @@ TEST(SpecialElliptic, SelectsTheCompleteForms) {
     double sn = 0;
     QX_EllipticJ(0.5, 0.3, &sn, nullptr, nullptr, nullptr);
     EXPECT_EQ(sn, Value("EllipticJ", 0.5, 0.3));
-    // the amplitude inverts F, also past a quarter period
+    // the amplitude is the inverse of F, also past a quarter period
     EXPECT_NEAR(Value("Elliptic1", 0.3, Value("EllipticJ", 7.5, 0.3, 3)), 7.5, 1e-13);
 }
 
-// Where tan(phi)^2 is 1 / sqrt(1 - m), the integrals are K / 2 and (E + 1 - sqrt(1 - m)) / 2. There the
-// transformation doubles phi to pi / 2, where rounding makes the tangent of either sign or infinite.
-TEST(SpecialElliptic, PassesTheQuarterTurnsOfTheTransformation) {
+// For tan(phi)^2 = 1 / sqrt(1 - m), the integrals are K / 2 and (E + 1 - sqrt(1 - m)) / 2. The
+// transformation then doubles phi to pi / 2, where rounding makes the tangent positive, negative or
+// infinite.
+TEST(SpecialElliptic, IsAccurateWhereTheTransformationReachesQuarterTurns) {
     for (int i = 1; i < 2000; ++i) {
         const double m = i / 2000.0 + 1e-5 * std::sin(i);
         const double root = std::sqrt(1 - m);

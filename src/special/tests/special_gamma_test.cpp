@@ -7,11 +7,8 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
-
-using qx::test::kInfinity;
-using qx::test::kNaN;
-using qx::test::Whole;
 
 typedef const qx::test::Arguments &In;
 
@@ -40,7 +37,8 @@ TEST(SpecialGamma, AgreesWithReferencesOnBothSidesOfEachThreshold) {
     EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("gamma.dat")), 200);
 }
 
-// Where the gammas of the definition leave the range; mpmath at 30 digits.
+// Arguments for which the gamma functions of the definition overflow or underflow; mpmath at 30
+// digits.
 TEST(SpecialGamma, CompleteBetaOfLargeNegativeArguments) {
     const struct {
         double a, b, value;
@@ -102,7 +100,7 @@ TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {
         {"GammaC", {2, kInfinity}, 0},
         {"GammaC", {2, 0}, 1},
         {"GammaC", {-2, 1}, kNaN},
-        {"GammaC", {2, kNaN}, kNaN}, // no selection by NaN here
+        {"GammaC", {2, kNaN}, kNaN}, // NaN does not select a form here
         {"BetaComplete", {kInfinity, 1}, kNaN},
         {"BetaComplete", {1, -kInfinity}, kNaN},
         {"BetaComplete", {kNaN, 1}, kNaN},
@@ -158,12 +156,12 @@ TEST(SpecialGamma, RecurrencesAndReflectionsHold) {
             << x;
         EXPECT_NEAR(Value("Beta", x, 2.5, 0.4) + Value("Beta", 2.5, x, 0.6), 1, 1e-13) << x;
     }
-    for (int n = 1; n <= 33; ++n) // exact products, while 33! / 2^31 has 92 bits less than 53
+    for (int n = 1; n <= 33; ++n) // rounded from 23! on
         EXPECT_NEAR(Value("Fact", n), n * Value("Fact", n - 1), 2.3e-16 * Value("Fact", n)) << n;
 }
 
-// Where adding 1 leaves the shape as it is, the terms of the series fall as slowly as its closeness
-// to x lets them: not at all, or for longer than anyone waits.
+// If adding 1 does not change the shape, the ratio of successive terms of the series is as close to
+// 1 as the shape is to x: the terms never decrease, or far too slowly.
 TEST(SpecialGamma, ReturnsSoonForShapesBeyondTheIntegers) {
     for (const double a : {9007199254740992.0, 3e17, 2.4803007478524029e+65, 1e300})
         for (const double x : {a, a * (1 - 1e-12), a * (1 - 1e-6)}) {
@@ -195,3 +193,4 @@ TEST(SpecialGamma, LeavesNoStepAtAThreshold) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -49,18 +49,18 @@ TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {
         {"Gauss", {1.0000001, -2, 2, 3}, kNaN},
         {"Gauss", {-1.0000001, 1, 2, 3}, kNaN},
         {"Gauss", {1, 1, 2, 3}, kNaN},     // c = a + b
-        {"Gauss", {1, -2, 2, -0.5}, kNaN}, // also where the series ends
+        {"Gauss", {1, -2, 2, -0.5}, kNaN}, // even though the series terminates
         {"Gauss", {0, 1, 2, 3}, 1},
         {"Gauss", {0.5, 0, 2, 3}, 1},
         {"Gauss", {0.5, 1, 0, -2}, 1},
         {"Gauss", {0.5, 1, 2, 0}, kInfinity},
         {"Gauss", {0.5, 1, 2, -3}, kInfinity},
         {"Gauss", {0, 1, 2, -3}, kInfinity},
-        {"Gauss", {0.5, -5, 2, -3}, kInfinity}, // ends behind the pole
-        {"Gauss", {-1, -3, 2, -3}, kInfinity},  // ends at it
+        {"Gauss", {0.5, -5, 2, -3}, kInfinity}, // terminates after the pole
+        {"Gauss", {-1, -3, 2, -3}, kInfinity},  // terminates at the pole
         {"Gauss", {-1, 2, -3, -3}, kInfinity},
         {"Gauss", {0.5, 2, 3, 3}, 4},
-        {"Gauss", {0.5, -3, 2.5, -3}, std::pow(0.5, -2.5)}, // c = a comes before the pole
+        {"Gauss", {0.5, -3, 2.5, -3}, std::pow(0.5, -2.5)}, // c = a takes precedence over the pole
         {"Gauss", {1, 2, -1.5, 1}, 0},                      // c - a is a pole of gamma
         {"Gauss", {0.5, -2, 4, 4}, 0.25},
         {"Gauss_2011", {1.5, 1, 2, 3}, kNaN},
@@ -104,7 +104,7 @@ TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {
         {"Gauss_2026", {0.5, 1, kInfinity, 3}, kNaN},
         {"Gauss_2026", {1.0000001, 1, 2, 3}, kNaN},
         {"Gauss_2026", {1, 1, 2, 3}, kNaN},
-        {"Gauss_2026", {1, -2, 2, -0.5}, -15}, // a sum that ends has its value there
+        {"Gauss_2026", {1, -2, 2, -0.5}, -15}, // a terminating sum has its value there
         {"Gauss_2026", {-1e300, 0, 2, 3}, 1},
         {"Gauss_2026", {-1e300, 0.5, 2, 3}, kNaN}, // beyond 1e280
         {"Gauss_2026", {0.5, 1, 2, -3}, kInfinity},
@@ -122,7 +122,7 @@ TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {
         {"Kummer_2026", {2, -1, -4}, 1.5},
         {"Kummer_2026", {2, 1.5, 1.5}, std::exp(2.0)},
         {"Kummer_2026", {800, -0.5, 2.5}, -kInfinity},
-        {"Kummer_2026", {-1e5, 2e5, 1.5}, kNaN}, // a sum that would take too long
+        {"Kummer_2026", {-1e5, 2e5, 1.5}, kNaN}, // the sum would take too long
         {"Tricomi_2026", {-1, 1, 2}, kNaN},
         {"Tricomi_2026", {1, 1, -kInfinity}, kNaN},
         {"Tricomi_2026", {0, 1, 2}, kInfinity},
@@ -149,7 +149,7 @@ TEST(SpecialHypergeometric, TheVariantsOfGaussDifferOnlyBetweenTheirThresholds) 
 }
 
 TEST(SpecialHypergeometric, ParametersCountAsIntegersWithinTheTolerance) {
-    // With c = -4 only a series that ends by then has a value.
+    // With c = -4, only a series that terminates by then has a value.
     EXPECT_NEAR(Value("Gauss", 0.5, -3 + 1e-11, 2.5, -4), Value("Gauss", 0.5, -3, 2.5, -4), 1e-13);
     EXPECT_EQ(Value("Gauss", 0.5, -3 + 3e-11, 2.5, -4), kInfinity);
     EXPECT_EQ(Value("Gauss", 0.5, 0.5, 2.5, -4 + 1e-11), kInfinity);
@@ -196,8 +196,9 @@ TEST(SpecialHypergeometric, TricomiAtAnIntegerIsTheMeanBesideIt) {
     EXPECT_NE(Value("Tricomi", 1.5, 0.7, 2.00011), beside);
 }
 
-// Each method alone, on arguments where it holds: its value, and an estimate that covers the error.
-TEST(SpecialHypergeometric, MethodsOfKummerKnowTheirError) {
+// Each method on its own, on arguments for which it is valid: its value, and an error estimate that
+// covers the error.
+TEST(SpecialHypergeometric, MethodsOfKummerEstimateTheirError) {
     typedef qx::KummerEstimate (*Method)(double, double, double);
     struct Case {
         Method method;
@@ -212,9 +213,9 @@ TEST(SpecialHypergeometric, MethodsOfKummerKnowTheirError) {
         {qx::KummerSeries, 12.3, -11.3, -3, 75.19962406673630},
         {qx::KummerAsymptotic, 2.3, 1.1, -60, 1.7427123382991406e-5},
         {qx::KummerAsymptotic, -1.6, 0.9, -35, 253.87662577154988},
-        {qx::KummerBessel, 3.22, 2.31, -57.6, -2.4165643535895202e-7}, // cancels ten digits
+        {qx::KummerBessel, 3.22, 2.31, -57.6, -2.4165643535895202e-7}, // ten digits cancel
         {qx::KummerAsymptotic, 0.75, 2.5, 300, 9.758236105587669e125},
-        {qx::KummerAsymptotic, -3, 2, 30, -719}, // where only the smaller part is left
+        {qx::KummerAsymptotic, -3, 2, 30, -719}, // only the smaller part is left
         {qx::KummerAsymptotic, 4.5, 1.5, -30, -1.3064578467782147e-10},
     };
     for (const Case &c : cases) {
@@ -222,15 +223,15 @@ TEST(SpecialHypergeometric, MethodsOfKummerKnowTheirError) {
         EXPECT_LE(std::fabs(estimate.value / c.expected - 1), estimate.error + 1e-13) << c.x;
         EXPECT_LT(estimate.error, qx::kHyperTolerance) << c.x;
     }
-    for (const double a : {2.0, -2.0}) { // the Bessel functions refuse b = 2 a, equal signs
+    for (const double a : {2.0, -2.0}) { // refuses b = 2 a and equal signs
         EXPECT_GT(qx::KummerBessel(a, 2 * a, -a).error, 1e30);
         EXPECT_GT(qx::KummerBessel(a, 2.5 * a, 0.5 * a).error, 1e30);
         EXPECT_GT(qx::KummerBessel(a, 2.5 * a, -a).error, 1e30); // (2 b - 4 a) x < 0
     }
 }
 
-TEST(SpecialHypergeometric, SeriesGoesOnBehindPolesAndEndsAtItsCap) {
-    // Terms fall below 1e-14 before the pole at k = 50 and rise to 1e25 behind it.
+TEST(SpecialHypergeometric, SeriesContinuesPastPolesAndEndsAtItsLimit) {
+    // The terms fall below 1e-14 before the pole at k = 50 and rise to 1e25 after it.
     EXPECT_NEAR(qx::HyperSeries(1.3, 2.2, -50.5, 0.7), -1.133103668314078e25, 1e12);
     EXPECT_TRUE(std::isnan(qx::HyperSeries(1, 1, 1.5, 1 - 1e-9)));
     EXPECT_TRUE(std::isnan(Value("Gauss", -0.9999999, -1e12, 1, 1e12)));
@@ -238,8 +239,9 @@ TEST(SpecialHypergeometric, SeriesGoesOnBehindPolesAndEndsAtItsCap) {
     EXPECT_TRUE(std::isnan(qx::HyperSeries(1, 1, 2, 1.5)));
 }
 
-// Of three neighbours in a at random parameters to 100, against the largest of the three terms.
-TEST(SpecialHypergeometric, RevisionsHoldTheRelationOfNeighbours) {
+// The relation of three contiguous functions in a, at random parameters up to 100; the error is
+// relative to the largest of the three terms.
+TEST(SpecialHypergeometric, RevisionsSatisfyTheContiguousRelation) {
     std::mt19937 generator(1);
     const auto uniform = [&](double low, double high) {
         return low + (high - low) * (generator() / 4294967296.0);
@@ -266,9 +268,9 @@ TEST(SpecialHypergeometric, RevisionsHoldTheRelationOfNeighbours) {
     }
 }
 
-// Legendre's polynomial of degree 200, whose terms reach 1e98, by its recurrence; Laguerre's of degree 150
-// at 200, whose terms reach 2^374, by fractions.
-TEST(SpecialHypergeometric, IntegersKeepWhatHundredsOfDigitsCancel) {
+// The Legendre polynomial of degree 200, whose terms reach 1e98, compared with its recurrence, and
+// the Laguerre polynomial of degree 150 at 200, whose terms reach 2^374, with exact fractions.
+TEST(SpecialHypergeometric, IntegerSumsSurviveTheCancellationOfHundredsOfDigits) {
     EXPECT_EQ(Value("Gauss_2026", 1, -200, 201, 1), 1);
     double before = 1, legendre = 0.25;
     for (int n = 1; n < 200; ++n) {
@@ -279,12 +281,12 @@ TEST(SpecialHypergeometric, IntegersKeepWhatHundredsOfDigitsCancel) {
     EXPECT_NEAR(Value("Gauss_2026", 0.375, -200, 201, 1), legendre, 1e-14);
     EXPECT_NEAR(Value("Kummer_2026", 200, -150, 1) / 8.58892438101663021e41, 1, 1e-15);
     const qx::HyperTerms terms = {{-150, 0}, {1, 0}, {1, 0}, {200, 0}, false};
-    EXPECT_GT(qx::IntegerSum(terms, 374, 128).error, 1); // too few digits are known to be too few
-    EXPECT_TRUE(std::isnan(qx::IntegerSum(terms, 10, 400).error)); // so is a wrong largest term
+    EXPECT_GT(qx::IntegerSum(terms, 374, 128).error, 1);           // too few digits are detected
+    EXPECT_TRUE(std::isnan(qx::IntegerSum(terms, 10, 400).error)); // as is a wrong largest term
 }
 
 TEST(SpecialHypergeometric, ReturnsSoonForAnyArgument) {
-    // Most bit patterns lie outside [-1, 1], so there are forms that fold x into it, and towards 1.
+    // Most bit patterns lie outside [-1, 1], so additional forms map x into it, and close to 1.
     qx::test::ExportMap exports = Exports();
     exports["Gauss"] = [](In a, double *o) { QX_Gauss(std::fmod(a[0], 1.0), a[1], a[2], a[3], o); };
     exports["GaussNear1"] = [](In a, double *o) {

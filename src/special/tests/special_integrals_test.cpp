@@ -7,11 +7,8 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
-
-using qx::test::kInfinity;
-using qx::test::kNaN;
-using qx::test::Whole;
 
 typedef const qx::test::Arguments &In;
 
@@ -124,7 +121,7 @@ TEST(SpecialIntegrals, RecurrencesAndReflectionsHold) {
         EXPECT_NEAR(Value("Erf", -x), -Value("Erf", x), 3e-16) << x; // 1 - (2 - y) below -1
         EXPECT_NEAR(Value("Erf", x) + Value("ErfC", x), 1, 3e-16) << x;
         EXPECT_NEAR(Value("ErfC", x) + Value("ErfC", -x), 2, 5e-16) << x;
-        // E_1 and exp(x) / x stand on the two sides of Shi - Chi
+        // Shi(x) - Chi(x) = E_1(x)
         EXPECT_NEAR(Value("CoshI", x) - Value("SinhI", x), -Value("ExpI", x, 1),
                     1e-14 * (1 + std::fabs(Value("CoshI", x))))
             << x;
@@ -142,7 +139,7 @@ TEST(SpecialIntegrals, LeavesNoStepAtAThreshold) {
     const qx::test::Seam seams[] = {
         {"Erf", {1}, 0, 1e-15},
         {"ErfC", {1}, 0, 2e-15},
-        {"ErfC", {8}, 0, 5e-14}, // the argument's step counts 128 times
+        {"ErfC", {8}, 0, 5e-14}, // the step of the argument is amplified 128 times
         {"ExpI", {1, 1}, 0, 1e-14},
         {"ExpI", {1, 40}, 0, 1e-14},
         {"ExpI2026", {0.4, 1}, 0, 1e-15},
@@ -169,3 +166,4 @@ TEST(SpecialIntegrals, LeavesNoStepAtAThreshold) {
 }
 
 } // namespace
+} // namespace qx::test

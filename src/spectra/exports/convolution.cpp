@@ -9,7 +9,8 @@
 namespace qx {
 namespace {
 
-// The size of a convolution, refused as memory that cannot be had where int32 does not hold it.
+// Resizes to the size of a convolution. A size that does not fit into int32 is refused as out of
+// memory.
 template <class X, class Y, class Output>
 Outcome ResizeToFull(const X &x, const Y &y, Output &out) {
     const int64_t count = int64_t{x.size()} + y.size() - 1;
@@ -48,7 +49,7 @@ Outcome ComplexInto(const In<CDB1D> &x, const In<CDB1D> &y, Out<CDB1D, OnFailure
 
 Outcome ConvolveOrCorrelate(In<CDB1D> x, In<CDB1D> y, Out<CDB1D, OnFailure::Keep> out,
                             int32_t algorithm, int32_t correlate, int32_t normalization) {
-    // kept: only this failure leaves the output alone.
+    // kept: only this failure leaves the output unchanged.
     if (x.isEmpty() || y.isEmpty())
         return ErrEmptyInput;
     const Outcome outcome = ComplexInto(x, y, out, algorithm, correlate, normalization);
@@ -57,7 +58,8 @@ Outcome ConvolveOrCorrelate(In<CDB1D> x, In<CDB1D> y, Out<CDB1D, OnFailure::Keep
     return outcome;
 }
 
-// kept: x is emptied by nothing; a refused resize is no failure, and the size is the new one.
+// kept: no failure empties x; a refused resize is not a failure, and the size is set to the new
+// one.
 Outcome AutoCorrelate(InOut<DBL1D, OnFailure::Keep> x, const DBL1D &handle, int32_t normalization) {
     const int32_t n = x.size();
     if (n < 1)
@@ -71,11 +73,11 @@ Outcome AutoCorrelate(InOut<DBL1D, OnFailure::Keep> x, const DBL1D &handle, int3
     const ConstRealVector series(copy.data(), n);
     const int32_t count = 2 * n - 1;
     if (!x.resize(count).failed()) {
-        // Where the work lacks memory this is what follows the n values.
+        // If there is no memory for the work, these zeros follow the n values.
         Fill(x.data() + n, n - 1, 0.0);
         return CorrelateReal(series, series, ConvolveByTransform, normalization, x.view());
     }
-    // The block still holds n values and no more.
+    // The block still has room for n values only.
     (*handle)->dimSize = count;
     if (const ErrorCode failed = unheld.allocate(count))
         return failed;
@@ -95,7 +97,7 @@ Outcome Deconvolve(InOut<DBL1D> xy, const DBL1D &handle, In<DBL1D> y) {
         return failed;
     if (const ErrorCode failed = DeconvolveReal(xy.view(), y.view(), xy.view().part(0, count)))
         return failed;
-    // kept: the size is set whatever the host says to it.
+    // kept: the size is set whatever the host returns.
     (void)xy.resize(count);
     (*handle)->dimSize = count;
     return 0;

@@ -8,7 +8,7 @@
 namespace qx {
 namespace {
 
-// The number of rows or of columns of a result, beyond int32 perhaps.
+// The number of rows or columns of a result, which may exceed int32.
 int64_t ResultSize(int32_t outputSize, int32_t x, int32_t y) {
     switch (outputSize) {
     case FullSize:
@@ -38,7 +38,7 @@ Outcome EmptiedOnFailure(Output &out, Outcome outcome) {
     return outcome;
 }
 
-// kept: the first checks leave the output as it is; every later failure empties it.
+// kept: the first checks leave the output unchanged; every later failure empties it.
 template <class Handle>
 Outcome Convolve(In<Handle> x, In<Handle> y, Out<Handle, OnFailure::Keep> out, int32_t outputSize,
                  int32_t algorithm) {

@@ -7,11 +7,11 @@
 namespace qx {
 namespace {
 
-// Interleaved values as the bare array that the inner routines take.
+// Interleaved values as the plain array that the inner routines take.
 const DBL *Values(const In<CDB1D> &in) { return &in.data()->re; }
 
-// In all frames here the kept plan only holds the length in the cache: the inner routines take
-// a reference of their own.
+// In all frames here the kept plan only keeps its length in the cache: the inner routines take
+// their own reference.
 
 template <class Keep>
 ErrorCode RealPower(InOut<DBL1D> x, Keep keep) {
@@ -28,7 +28,7 @@ Outcome ComplexPower(In<CDB1D> x, Out<DBL1D> spectrum, Keep keep) {
     const int32_t n = x.size();
     if (x.isEmpty())
         return ErrEmptyInput;
-    // kept: here the plan comes before the resize, the reverse of the cross spectra.
+    // kept: here the plan is acquired before the resize, unlike in the cross spectra.
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
     if (const Outcome bad = spectrum.resize(n))
@@ -45,7 +45,8 @@ ErrorCode RealCross(In<DBL1D> x, In<DBL1D> y, Out<CDB1D> cross, Keep keep) {
     const int32_t n = x.size();
     if (const ErrorCode failed = CheckPair(n, y.size()))
         return failed;
-    // kept: the host's own status counts as a code, and a positive one leaves the output alone.
+    // kept: the host's own status is returned as a code, and a positive one leaves the output
+    // unchanged.
     if (const Outcome bad = cross.resize(n))
         return bad.raw();
     if (const ErrorCode failed = keep.acquire(n))
@@ -59,7 +60,7 @@ Outcome ComplexCross(In<CDB1D> x, In<CDB1D> y, Out<CDB1D> cross, Keep keep) {
     const int32_t n = x.size();
     if (const ErrorCode failed = CheckPair(n, y.size()))
         return failed;
-    // kept: any host status is translated here, in contrast to the real cross spectrum.
+    // kept: any host status is translated here, unlike in the real cross spectrum.
     if (const Outcome bad = cross.resize(n))
         return bad;
     if (const ErrorCode failed = keep.acquire(n))

@@ -9,7 +9,7 @@ namespace {
 constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 
-// No zero in its spectrum: the first value outweighs all others.
+// Has no zero in its spectrum, because the first value outweighs all others.
 double Dominant(int32_t i) { return i == 0 ? 3.0 : 1.0 / (i * i + 1); }
 double LateStart(int32_t i) { return i < 2 ? 0.0 : i == 2 ? 2.0 : 0.0; }
 
@@ -44,7 +44,7 @@ std::vector<Recipe> ConvolutionRecipes() {
                                },
                                heap | HostStatusPassesThrough | MayKeepArrayOnFailure});
     }
-    // Nothing but a failed allocation leaves x as it was; a refused resize is no failure.
+    // Only a failed allocation leaves x as it was; a refused resize is not a failure.
     recipes.push_back({"AutoCorrelation80",
                        [](Call &c) { return AutoCorrelation80(c.spoiled<DBL>(0), 1, c.err()); },
                        UsesHeap | RefusalPasses});

@@ -12,7 +12,7 @@ constexpr auto CDB = ElementType::CDB;
 std::vector<Recipe> MatrixConvolutionRecipes() {
     std::vector<Recipe> recipes;
     for (const int32_t algorithm : {0, 1}) {
-        // The first checks leave the output as it is.
+        // The first checks leave the output unchanged.
         const unsigned quirks = MayKeepArrayOnFailure | (algorithm == 0 ? None : UsesHeap);
         const std::string by = algorithm == 0 ? ": direct" : ": by transforms";
         const std::vector<int32_t> sizes = {1, 2, 3, 8, 30};

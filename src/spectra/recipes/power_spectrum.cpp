@@ -9,7 +9,7 @@ namespace {
 std::vector<Recipe> SpectraRecipes() {
     constexpr auto DBL = ElementType::DBL;
     constexpr auto CDB = ElementType::CDB;
-    // The positive status of a host leaves the output alone.
+    // A positive status of the host leaves the output unchanged.
     constexpr unsigned realCross = HostStatusPassesThrough | MayKeepArrayOnFailure | UsesHeap;
     return {
         {"SpectrumH", [](Call &c) { return SpectrumH(c.inOut<DBL>(0), c.slot(0)); }, UsesHeap},

@@ -10,18 +10,8 @@
 #include <cmath>
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBMatrix;
-using qx::test::DBLMatrix;
-using qx::test::Host;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::SameBits;
-using qx::test::ToLong;
 
 struct Sizes {
     int32_t xRows, xCols, yRows, yCols;
@@ -38,7 +28,7 @@ void Fill(const CDBMatrix &matrix, uint64_t seed) {
         matrix.data()[i] = values[static_cast<std::size_t>(i)];
 }
 
-// The full convolution of x with y or, turned and conjugated, the correlation.
+// The full convolution of x with y, or, with x reversed and conjugated, the correlation.
 template <class Matrix>
 LongSpectrum Full(const Matrix &x, const Matrix &y, bool correlate) {
     const int32_t rows = x.rows() + y.rows() - 1, cols = x.cols() + y.cols() - 1;
@@ -113,7 +103,7 @@ TEST(Convolution2D, EverySizeAndAlgorithmAgreesWithTheDefinition) {
     }
 }
 
-// The sums run over the elements of the smaller matrix, or of y, in their order.
+// The sums run over the elements of the smaller matrix, or of y if the sizes are equal, in order.
 TEST(Convolution2D, DirectSumsKeepTheirOrderToTheBit) {
     for (const double broken : {0.5, std::numeric_limits<double>::infinity(), std::nan("")})
         for (const Sizes &s : {Sizes{12, 70, 3, 5}, Sizes{3, 5, 12, 70}, Sizes{6, 4, 4, 6}}) {
@@ -151,7 +141,7 @@ void CheckInOrder(Convolve convolve, Correlate correlate) {
         const Matrix out(2, 2);
         ResetHost();
         EXPECT_EQ(convolve(a->handle(), b->handle(), out.handle(), outputSize, 7), code);
-        EXPECT_TRUE(Host().reshapes.empty()) << "the output stays as it is";
+        EXPECT_TRUE(Host().reshapes.empty()) << "the output is not changed";
     }
     for (const int32_t outputSize : {0, 1}) {
         const Matrix out(2, 2);
@@ -183,3 +173,4 @@ TEST(Convolution2D, TheComplexValidPartRefusesWideMatrices) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -13,21 +13,8 @@
 #include <cmath>
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::Host;
-using qx::test::Long;
-using qx::test::LongComplex;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
 
 const double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
@@ -62,7 +49,7 @@ Signal InOrder(const Signal &outer, const Signal &inner) {
     return sums;
 }
 
-// NaN equals NaN, whatever its bits.
+// All NaNs are equal, regardless of their bits.
 bool SameValues(const Signal &a, const Signal &b) {
     return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](double x, double y) {
         return (std::isnan(x) && std::isnan(y)) || std::memcmp(&x, &y, sizeof x) == 0;
@@ -88,7 +75,7 @@ Signal CorrelatedDirectly(const Signal &x, const Signal &y) {
 struct Lengths {
     int32_t nx, ny;
 };
-// Around the numbers of sums in registers, of outputs and of taps in a tile.
+// Lengths around the number of sums kept in registers, and of outputs and taps in a tile.
 const Lengths DirectLengths[] = {{1, 1},   {1, 5},    {5, 1},    {3, 3},     {2, 47},   {49, 13},
                                  {64, 64}, {257, 40}, {40, 513}, {700, 701}, {1200, 3}, {3, 1201}};
 
@@ -101,7 +88,7 @@ TEST(Convolution, DirectSumsKeepTheirOrderToTheBit) {
     }
 }
 
-TEST(Convolution, InfinitiesStayWhereTheyBelong) {
+TEST(Convolution, InfinitiesAffectOnlyTheirOutputs) {
     for (const auto &[nx, ny] : {Lengths{300, 40}, Lengths{40, 300}, Lengths{50, 50}})
         for (const double broken : {inf, -inf, nan}) {
             Signal x = RandomSignal(nx, 1), y = RandomSignal(ny, 2);
@@ -112,7 +99,8 @@ TEST(Convolution, InfinitiesStayWhereTheyBelong) {
         }
 }
 
-// The window of the longer sequence is walked upward; x counts as the shorter one of equals.
+// The window of the longer sequence is traversed in ascending order; x counts as the shorter one if
+// the lengths are equal.
 TEST(Convolution, ComplexDirectSumsKeepTheirOrderToTheBit) {
     for (const auto &[nx, ny] : DirectLengths) {
         SCOPED_TRACE(testing::Message() << nx << " " << ny);
@@ -161,7 +149,7 @@ TEST(Convolution, BothAlgorithmsAgreeWithTheDefinition) {
             EXPECT_EQ(CxConvolution(complexZ.handle(), complexW.handle(), complexOut.handle(),
                                     algorithm, 0, 9),
                       0)
-                << "a convolution knows no normalization";
+                << "a convolution has no normalization";
             EXPECT_LT(MaxError(complexOut.values(), complexConvolved), bound);
             EXPECT_EQ(CxConvolution(complexZ.handle(), complexW.handle(), complexOut.handle(),
                                     algorithm, 1, 0),
@@ -224,7 +212,7 @@ TEST(Convolution, TransformLengthsHaveSmallPrimesButNot23) {
     EXPECT_EQ(qx::NextTransformLength(std::numeric_limits<int32_t>::max()), 0);
 }
 
-TEST(Convolution, UnknownSelectorsAreTakenAsEachExportTakesThem) {
+TEST(Convolution, UnknownSelectorsAreHandledDifferentlyByEachExport) {
     const DBLArray x(RandomSignal(4)), y(RandomSignal(3));
     const CDBArray z(RandomComplex(4));
     const int32_t none = 7, direct = 0;
@@ -233,10 +221,10 @@ TEST(Convolution, UnknownSelectorsAreTakenAsEachExportTakesThem) {
     const auto before = out.values();
     EXPECT_EQ(Convolution(x.handle(), y.handle(), out.handle(), &none, &err), 0);
     EXPECT_EQ(err, 0);
-    EXPECT_EQ(out.values(), before) << "silently nothing";
+    EXPECT_EQ(out.values(), before) << "nothing is done, without a code";
     Rxy80(x.handle(), y.handle(), out.handle(), &none, 2, &err);
     EXPECT_EQ(err, 0);
-    EXPECT_EQ(out.values(), (Signal{0.25, 0.5, 0.75, 1.0, 1.25, 1.5})) << "normalized all the same";
+    EXPECT_EQ(out.values(), (Signal{0.25, 0.5, 0.75, 1.0, 1.25, 1.5})) << "still normalized";
     Rxy80(x.handle(), y.handle(), out.handle(), &direct, 3, &err);
     EXPECT_EQ(err, ErrInvalidSelector);
     EXPECT_EQ(out.size(), 0);
@@ -264,7 +252,7 @@ TEST(Convolution, TheFirstFailureOfTheComplexFormLeavesTheOutput) {
     ResetHost();
 }
 
-TEST(AutoCorrelation, GoesOnAfterARefusedResizeInsideItsBlock) {
+TEST(AutoCorrelation, ContinuesAfterARefusedResizeWithinItsBlock) {
     const Signal values = RandomSignal(40);
     const DBLArray whole(values), refused(values), none;
     ErrorCode err = 99;
@@ -285,9 +273,9 @@ TEST(AutoCorrelation, GoesOnAfterARefusedResizeInsideItsBlock) {
     const DBLArray unnormalized(values);
     AutoCorrelation80(unnormalized.handle(), 3, &err);
     EXPECT_EQ(err, ErrInvalidSelector);
-    EXPECT_EQ(unnormalized.size(), 79) << "the result stands";
+    EXPECT_EQ(unnormalized.size(), 79) << "the result is kept";
 
-    // Without memory for the work the values stay, with zeros behind them.
+    // Without work memory the values are unchanged, followed by zeros.
     if (!qx::test::HeapProbe::works())
         return;
     const DBLArray unfinished(values);
@@ -309,7 +297,7 @@ Division Divided(const Signal &xy, const Signal &y) {
     const DBLArray product(xy), divisor(y);
     ErrorCode err = 99;
     const int32_t result = Deconvolution(product.handle(), divisor.handle(), &err);
-    EXPECT_EQ(result, err) << "both tell the code";
+    EXPECT_EQ(result, err) << "both return the code";
     return {err, product.values()};
 }
 
@@ -319,7 +307,7 @@ TEST(Deconvolution, UndoesAConvolution) {
         SCOPED_TRACE(testing::Message() << nq << " " << ny);
         const Signal q = RandomSignal(nq, 1);
         Signal y = RandomSignal(ny, 2);
-        y[0] = 20; // no zero near the unit circle
+        y[0] = 20; // keeps zeros away from the unit circle
         const Division division = Divided(Directly(q, y), y);
         EXPECT_EQ(division.status, 0);
         EXPECT_LT(MaxError(division.quotient, ToLong(q)), 2.7e-15);
@@ -327,12 +315,12 @@ TEST(Deconvolution, UndoesAConvolution) {
 }
 
 TEST(Deconvolution, DividesTheSeriesWhereTheSpectrumIsSingular) {
-    // 1 + z vanishes at half the sampling rate; leading zeros are skipped.
+    // 1 + z is zero at half the sampling rate; leading zeros are skipped.
     for (const Signal &y : {Signal{1, 1}, Signal{0, 0, 2, 2}, Signal{0, 1, 0, 0, -1}}) {
         const Signal q = {3, -1, 4, 1, -5, 9, 2, -6};
         const Division division = Divided(Directly(q, y), y);
         EXPECT_EQ(division.status, 0);
-        EXPECT_EQ(division.quotient, q) << "exact in whole numbers";
+        EXPECT_EQ(division.quotient, q) << "exact for integers";
     }
     const Division decaying = Divided({1e-300, 0, 0, 0, 0, 0, 0, 0}, {1e5, 1e5});
     EXPECT_EQ(decaying.quotient[1], -1e-305);
@@ -340,15 +328,15 @@ TEST(Deconvolution, DividesTheSeriesWhereTheSpectrumIsSingular) {
     EXPECT_EQ(flushed.quotient, Signal(7, 0.0)) << "no denormals";
 }
 
-// The test for a singular spectrum looks at the real part of one frequency and the imaginary part
+// The test for a singular spectrum examines the real part of one frequency and the imaginary part
 // of another.
 TEST(Deconvolution, PairsTheSpectrumInItsOwnWay) {
     const double root = std::sqrt(2.0);
     const Signal impulse = {1, 0, 0, 0, 0, 0, 0, 0};
-    // Re H[1] and Im H[3] vanish: taken for singular, so the series decides.
+    // Re H[1] and Im H[3] are zero: the spectrum counts as singular, so the series is divided.
     const Division bySeries = Divided(impulse, {root, 1, 2 * root, 3});
     EXPECT_EQ(bySeries.quotient[0], 1 / root);
-    // H[1] vanishes wholly and is not seen: the spectra are divided, and the quotient is worthless.
+    // H[1] is zero but not detected: the spectra are divided, and the quotient is wrong.
     const Signal q = {3, -1, 4, 1, -5, 9};
     const Signal y = {1, -root, 1};
     const Division bySpectrum = Divided(Directly(q, y), y);
@@ -362,7 +350,7 @@ TEST(Deconvolution, AnAllZeroDivisorStaysInsideItsBlocks) {
     EXPECT_EQ(Divided(x, Signal(8)).quotient, (Signal{0}));
     EXPECT_EQ(Divided({5}, {0}).quotient, (Signal{0}));
     const Division broken = Divided({1, inf, 3, 4}, {0, 0});
-    EXPECT_TRUE(std::isnan(broken.quotient[0])) << "every sum met the infinity";
+    EXPECT_TRUE(std::isnan(broken.quotient[0])) << "the infinity enters every sum";
     qx::test::CheckBlocks();
 }
 
@@ -382,9 +370,10 @@ TEST(Deconvolution, ChecksComeInOrderAndEmptyTheOutput) {
     ErrorCode err = 99;
     ResetHost(1, 77);
     Deconvolution(product.handle(), divisor.handle(), &err);
-    EXPECT_EQ(err, 0) << "nobody looks at the status of the resize";
+    EXPECT_EQ(err, 0) << "the status of the resize is not checked";
     EXPECT_EQ(product.size(), 3);
     ResetHost();
 }
 
 } // namespace
+} // namespace qx::test

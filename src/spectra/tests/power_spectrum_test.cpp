@@ -9,27 +9,12 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::Dft;
-using qx::test::Host;
-using qx::test::Long;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::Node;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::Reshape;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
 
 constexpr double Rounding = 4e-15;
 
-// conj(X[k]) Y[k] / n^2 by the definition.
+// conj(X[k]) Y[k] / n^2 by definition.
 template <class Values>
 LongSpectrum Cross(const Values &x, const Values &y) {
     const LongSpectrum first = Dft(ToLong(x));
@@ -161,12 +146,12 @@ TEST(Spectra, EachExportTreatsARefusalInItsWay) {
         Node first, second, third;
         ResetHost(1, hostStatus);
         EXPECT_EQ(CxSpectrumH(z.handle(), power.handle(), &first.slot), ErrOutOfMemory);
-        EXPECT_NE(first.slot, nullptr) << "the plan comes before the output";
+        EXPECT_NE(first.slot, nullptr) << "the plan is acquired before the output is resized";
         EXPECT_EQ(power.size(), 0);
 
         ResetHost(1, hostStatus);
         EXPECT_EQ(CrossSpectrumH(x.handle(), x.handle(), cross.handle(), &second.slot), hostStatus);
-        EXPECT_EQ(second.slot, nullptr) << "the plan comes after the output";
+        EXPECT_EQ(second.slot, nullptr) << "the plan is acquired after the output is resized";
         EXPECT_EQ(cross.size(), hostStatus < 0 ? 0 : 2);
 
         ResetHost(1, hostStatus);
@@ -185,9 +170,10 @@ TEST(Spectra, TheSlotFollowsTheLength) {
     ASSERT_EQ(SpectrumH(x.handle(), &node.slot), 0);
     const auto *const cell = static_cast<const qx::PlanCell *>(node.slot);
     EXPECT_EQ(cell->plan->length, 6);
-    EXPECT_EQ(cell->plan->refCount, 1) << "the routine gave its own reference back";
+    EXPECT_EQ(cell->plan->refCount, 1) << "the routine released its own reference";
     ASSERT_EQ(SpectrumH(y.handle(), &node.slot), 0);
     EXPECT_EQ(cell->plan->length, 9);
 }
 
 } // namespace
+} // namespace qx::test

@@ -36,7 +36,7 @@ ErrorCode OneWay(In<DBL1D> y, In<I32_1D> labels, int32_t k, double alpha, OutDBL
     return status;
 }
 
-// A factor as it is given: a negative number of levels says that it is random.
+// A factor as passed by the caller: a negative number of levels means a random factor.
 struct GivenFactor {
     const In<I32_1D> &labels;
     int32_t levels;
@@ -119,7 +119,7 @@ Outcome ThreeFactors(In<DBL1D> y, In<I32_1D> a, In<I32_1D> b, In<I32_1D> c, int3
                      {&columns...});
 }
 
-// With six columns, and with the critical values as the seventh.
+// With six columns, or with the critical values as a seventh.
 typedef Out<DBL1D> Column;
 constexpr auto twoFactors = TwoFactors<Column, Column, Column, Column, Column, Column>;
 constexpr auto twoFactorsCritical =

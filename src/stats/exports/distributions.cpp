@@ -9,7 +9,7 @@
 namespace qx {
 namespace {
 
-// A distribution or an inverse without a parameter, with one, with two.
+// A distribution or an inverse with no parameter, with one, or with two.
 template <auto Function>
 ErrorCode Plain(double at, OutDBL value) {
     return Function(at, value.address());
@@ -23,7 +23,8 @@ ErrorCode WithTwoDegrees(double at, int32_t n, int32_t d, OutDBL value) {
     return Function(at, n, d, value.address());
 }
 
-// The distributions that give any value, and their inverses in either tail: the checks they share.
+// The checks of the distributions that return any of the values, and of their inverses in either
+// tail.
 template <auto Function, class... Degrees>
 ErrorCode Chosen(double at, int32_t what, OutDBL value, Degrees... degrees) {
     if (what < 0 || what > static_cast<int32_t>(DistributionValue::Density))

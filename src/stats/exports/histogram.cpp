@@ -26,7 +26,7 @@ Outcome OverOwnRange(In<DBL1D> x, int32_t bins, Out<I32_1D> counts, Out<DBL1D> c
     return ArrayHistogram(x.view(), range.min, range.max, counts.view(), centres.view());
 }
 
-// The host's records without their padding, in scratch memory. They stand at any byte.
+// Copies the host's records, which start at any byte, without their padding into scratch memory.
 ErrorCode PackIntervals(const In<HistInterval1D> &intervals, ScratchBytes &packed) {
     const auto *records = reinterpret_cast<const char *>(intervals.data());
     if (const ErrorCode failed =

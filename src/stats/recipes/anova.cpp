@@ -11,9 +11,9 @@ constexpr auto I32 = ElementType::I32;
 double ThreeLabels(int32_t i) { return i % 3 - 1; }
 double Counts(int32_t i) { return i * 7 % 11 + 1; }
 
-// Crossed factors, c.n observations per cell: the last factor runs fastest.
+// Crossed factors with c.n observations per cell: the last factor varies fastest.
 struct Crossed {
-    int32_t levels[3]; // 1 for a factor that is not there; negative for a random one
+    int32_t levels[3]; // 1 for an absent factor; negative for a random one
     int32_t size(int factor) const { return levels[factor] < 0 ? -levels[factor] : levels[factor]; }
     int32_t cells() const { return size(0) * size(1) * size(2); }
     int32_t level(int factor, int32_t i) const {
@@ -26,7 +26,7 @@ struct Crossed {
             return 7.0 * level(factor, i) - 10.0; // any labels
         });
     }
-    // Interactions of two factors that are larger than that of three.
+    // Interactions of two factors are larger than that of three.
     DBL1D values(Call &c) const {
         return c.in<DBL>(0, c.n * cells(), [this](int32_t i) {
             const double a = level(0, i) + 1.0;

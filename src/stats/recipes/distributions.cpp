@@ -5,7 +5,7 @@ namespace qx::test {
 
 namespace {
 
-// Probabilities and quantiles that follow the size.
+// Probabilities and quantiles that depend on the size.
 double Probability(const Call &c) { return (c.n % 97 + 0.5) / 97.0; }
 double Point(const Call &c) { return c.n / 16.0 - 3.0; }
 

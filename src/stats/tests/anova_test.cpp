@@ -14,11 +14,8 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::ElementType;
-using qx::test::DBLArray;
-using qx::test::I32Array;
 
 struct Anova {
     double ssBetween, msBetween, f, p, ssError, msError, ssTotal, fCritical;
@@ -36,8 +33,9 @@ Anova AnovaOf(const std::vector<double> &values, const std::vector<int32_t> &lab
     return a;
 }
 
-// The certified values of NIST. The number of digits that a single pass keeps falls with the
-// constant leading digits of the data: one in the first sets, seven in SmLs04, thirteen in SmLs07.
+// The certified values of NIST. The more leading digits the data have in common, the fewer digits a
+// single pass keeps: there is one common digit in the first sets, seven in SmLs04 and thirteen in
+// SmLs07.
 TEST(Anova, ReachesTheDigitsThatASinglePassCanKeep) {
     std::ifstream file(qx::test::TestData("nist_anova.dat"));
     int sets = 0;
@@ -59,14 +57,14 @@ TEST(Anova, ReachesTheDigitsThatASinglePassCanKeep) {
         const Anova a = AnovaOf(y, labels, k, 0.05);
         EXPECT_EQ(a.err, 0);
         ++sets;
-        // What rounding the data themselves to doubles leaves.
+        // The accuracy that remains after rounding the data to doubles.
         const Anova revised = AnovaOf(y, labels, k, 0.05, Anova1Way_head_2026);
         const double kept = name == "SmLs07" ? 1e-2 : name == "SmLs04" ? 1e-9 : 1e-12;
         EXPECT_NEAR(revised.ssBetween / ssBetween, 1.0, kept);
         EXPECT_NEAR(revised.ssError / ssError, 1.0, kept);
         EXPECT_NEAR(revised.f / f, 1.0, kept);
         if (name == "SmLs07") {
-            EXPECT_GT(std::fabs(a.ssError / ssError - 1.0), 1e3) << "no digit is left here";
+            EXPECT_GT(std::fabs(a.ssError / ssError - 1.0), 1e3) << "no correct digit is left";
             continue;
         }
         const double bound = name == "SmLs04" ? 0.3 : 1e-8; // under one digit with a mean of 1e6
@@ -77,8 +75,8 @@ TEST(Anova, ReachesTheDigitsThatASinglePassCanKeep) {
     EXPECT_EQ(sets, 5);
 }
 
-// Integers on a large constant, of which all sums are known exactly: 3, 5 and 4 observations with means
-// 2, 5 and 9.
+// Integers plus a large constant, with exactly known sums: 3, 5 and 4 observations with means 2, 5
+// and 9.
 TEST(Anova, TheRevisionKeepsEveryDigitFarFromZero) {
     const std::vector<double> plain{1, 2, 3, 3, 4, 5, 6, 7, 6, 8, 10, 12};
     const std::vector<int32_t> labels{1, 1, 1, 2, 2, 2, 2, 2, 3, 3, 3, 3};
@@ -118,7 +116,7 @@ TEST(Anova, TheRevisionKeepsEveryDigitFarFromZero) {
                   ErrNaNInData);
 }
 
-// Three fertilisers of a textbook layout, worked by hand: means 5, 9, 10 over 6 plots each.
+// Three fertilisers in a textbook layout, computed by hand: means 5, 9, 10 over 6 plots each.
 TEST(Anova, AWorkedExampleWithLabelsInAnyOrder) {
     const std::vector<double> y{6, 8, 13, 8, 12, 9, 4, 9, 11, 5, 11, 8, 3, 6, 7, 4, 8, 12};
     const std::vector<int32_t> labels{-7, 100, 3, -7, 100, 3, -7, 100, 3,
@@ -145,8 +143,8 @@ TEST(Anova, AWorkedExampleWithLabelsInAnyOrder) {
     EXPECT_EQ(AnovaOf(y, labels, 3, 0.0).fCritical, std::numeric_limits<double>::infinity());
 }
 
-// As many labels as half the data, whose bits lie far apart or side by side: by the number of
-// look-ups of a linear search, 10^12, this would take half an hour.
+// Half as many labels as data, with bits that are far apart or adjacent. A linear search would need
+// 10^12 look-ups and take half an hour.
 TEST(Anova, ManyLevelsTakeTimeInProportionToTheData) {
     constexpr int32_t k = 1 << 20;
     for (const uint32_t step : {1u, 1u << 11 | 1u, 0x9e3779b1u}) {
@@ -161,7 +159,7 @@ TEST(Anova, ManyLevelsTakeTimeInProportionToTheData) {
         }
         const Anova a = AnovaOf(y, labels, k, 0.05);
         EXPECT_EQ(a.err, 0);
-        EXPECT_EQ(a.ssError, 2.0 * k); // each pair is one off its mean
+        EXPECT_EQ(a.ssError, 2.0 * k); // each pair deviates from its mean by one
         EXPECT_NEAR(a.ssBetween, 2.0 * k * 2 / 3, 10);
     }
 }
@@ -219,7 +217,7 @@ struct Table {
     double f(std::size_t source) const { return column[F].at(source); }
 };
 
-// By both revisions, which agree to the bit.
+// Calls both revisions, which must agree to the bit.
 Table TableOf(const Crossed &design, double significance = 0.05) {
     const DBLArray y(design.values());
     const I32Array a(design.labels(0)), b(design.labels(1)), c(design.labels(2));
@@ -294,7 +292,7 @@ double ReadNumber(std::istream &words) {
 }
 
 // Exact tables (make_factorial_anova_data.py): published data, all choices of random factors, one
-// observation per cell, and data in eighths that lie 10^9 away from 0.
+// observation per cell, and multiples of 1/8 at a distance of 10^9 from 0.
 TEST(FactorialAnova, AgreesWithExactTables) {
     const double bounds[] = {2.3e-16, 0.0, 2.3e-16, 2.3e-16, 7e-15, 1.4e-15, 4e-15};
     double worst[Columns] = {};
@@ -345,7 +343,8 @@ TEST(FactorialAnova, AgreesWithExactTables) {
         RecordProperty("worst" + std::to_string(i), testing::PrintToString(worst[i]));
 }
 
-// f belongs to the data up to a constant and a factor, beyond the range of their squares, too.
+// f does not change with an offset and a scale factor of the data, even if their squares overflow
+// or underflow.
 TEST(FactorialAnova, KeepsItsRatiosAtEveryScale) {
     const auto value = [](int32_t a, int32_t b, int32_t c, int32_t k) {
         return a * 3 - b * 2 + a * b * 0.5 + c * (a - 1) * 0.25 +
@@ -389,7 +388,7 @@ TEST(FactorialAnova, EndsOfTheRangeOfSignificance) {
         EXPECT_EQ(TableOf(design, none).err, ErrBadSignificance);
 }
 
-// What is 0 in truth is no rounding error, whatever the fractions.
+// A true 0 is not mistaken for a rounding error, for any fractions.
 TEST(FactorialAnova, RefusesDenominatorsThatVanish) {
     const auto equalInCells = [](int32_t a, int32_t b, int32_t c, int32_t) {
         return 0.1 * a + 0.7 * b * a - 1.3 * c;
@@ -403,7 +402,7 @@ TEST(FactorialAnova, RefusesDenominatorsThatVanish) {
     const auto constant = [](int32_t, int32_t, int32_t, int32_t) { return 0.1; };
     EXPECT_EQ(TableOf(FullFactorial({3, 3}, 2, constant)).err, ErrAnovaDesign);
 
-    // Replicates that differ alike in all cells: the error is there, the interaction is not.
+    // Replicates that differ equally in all cells: there is an error but no interaction.
     const auto noInteraction = [&](int32_t a, int32_t b, int32_t c, int32_t k) {
         return additive(a, b, c, k) + k;
     };
@@ -411,13 +410,13 @@ TEST(FactorialAnova, RefusesDenominatorsThatVanish) {
     EXPECT_EQ(TableOf(FullFactorial({7, 11}, 2, noInteraction)).column[P].at(2), 1.0);
     EXPECT_EQ(TableOf(FullFactorial({-7, 11}, 2, noInteraction)).err, ErrAnovaDesign);
 
-    // MS(AB) + MS(AC) below MS(ABC), a denominator only where B and C are random.
+    // MS(AB) + MS(AC) is below MS(ABC); the difference is a denominator only if B and C are random.
     const auto parity = [](int32_t a, int32_t b, int32_t c, int32_t k) {
         return ((a + b + c) % 2) * 8.0 + k + a;
     };
     EXPECT_EQ(TableOf(FullFactorial({2, -2, -2}, 2, parity)).err, ErrAnovaDesign);
     EXPECT_EQ(TableOf(FullFactorial({2, 2, 2}, 2, parity)).err, 0);
-    // Equal to the bit of all fractions: thirds.
+    // Data with thirds, which are rounded.
     const auto balanced = [](int32_t a, int32_t b, int32_t c, int32_t k) {
         const int32_t signs[] = {1, -2, 1};
         const double u = signs[a], v = signs[b], w = signs[c];
@@ -438,7 +437,7 @@ TEST(FactorialAnova, CodesComeInTheirOrder) {
         Crossed design = FullFactorial({levels.begin(), levels.begin() + factors}, 2, value);
         EXPECT_EQ(TableOf(design).err, 0);
         const int last = factors - 1;
-        // From here on each fault comes before all those that are already there.
+        // From here on, each new fault takes precedence over all earlier ones.
         EXPECT_EQ(TableOf(design, 2.0).err, ErrBadSignificance);
         for (const double bad : {std::nan(""), std::numeric_limits<double>::infinity()}) {
             design.data.back().y = bad;
@@ -474,8 +473,8 @@ TEST(FactorialAnova, CodesComeInTheirOrder) {
               ErrSizeMismatch);
 }
 
-// A denominator that nearly vanishes has next to no degrees of freedom, and no critical value that
-// a double holds.
+// A denominator that is nearly zero has almost no degrees of freedom, and no critical value that a
+// double can represent.
 TEST(FactorialAnova, NearlyNoDegreesOfFreedom) {
     double f = 0.0;
     for (double part = 0.5; part < 0.5625; part += 0x1p-10) {
@@ -549,7 +548,7 @@ TEST(Contingency, FaultsAndEmptyRows) {
     EXPECT_TRUE(std::isnan(emptyRow.chiSquare) && std::isnan(emptyRow.p));
 }
 
-// Two by two with one degree of freedom: p is erfc(sqrt(chiSquare / 2)).
+// For two by two tables, with one degree of freedom, p is erfc(sqrt(chiSquare / 2)).
 TEST(Contingency, TheRevisionKeepsSmallProbabilities) {
     const double eps = std::numeric_limits<double>::epsilon();
     const auto revised = [](const std::vector<int32_t> &cells) {
@@ -576,3 +575,4 @@ TEST(Contingency, TheRevisionKeepsSmallProbabilities) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -30,8 +30,8 @@ std::vector<double> Samples(int n, double offset) {
 
 bool IsTheQuietNaN(double value) { return std::bit_cast<uint64_t>(value) == 0x7FF8000000000000U; }
 
-// The definitions in long double, summed from the end, so that neither order nor precision is
-// that of the code.
+// The definitions in long double, summed from the end, so that both order and precision differ from
+// those of the code.
 struct Reference {
     explicit Reference(const std::vector<double> &x) {
         const auto n = static_cast<long double>(x.size());
@@ -77,7 +77,7 @@ TEST(BasicStatistics, AgreeWithTheDefinitions) {
 }
 
 TEST(BasicStatistics, SumsRunFromTheFirstElement) {
-    // In any other order, or with compensation, these come out differently.
+    // In any other order, or with compensation, these sums differ.
     double value;
     ErrorCode err;
     const DBLArray cancels{1e16, 1.0, -1e16, 1.0};
@@ -89,17 +89,17 @@ TEST(BasicStatistics, SumsRunFromTheFirstElement) {
     const DBLArray squares{0x1p27, 1.0, 1.0};
     RMS_head(squares.handle(), &value, &err);
     EXPECT_EQ(value, std::sqrt((0x1p54) / 3.0));
-    const CDBArray pair{{0x1p27, 0.0}, {1.0, 1.0}}; // the two squares meet first
+    const CDBArray pair{{0x1p27, 0.0}, {1.0, 1.0}}; // the two squares are added first
     CxRMS_head(pair.handle(), &value);
     EXPECT_EQ(value, std::sqrt((0x1p54 + 2.0) / 2.0 + 0.0));
-    // The expanded form of the squared difference, 2^-60, has lost it all.
+    // The expanded form of the squared difference, 2^-60, loses all digits.
     const DBLArray x{1.0 + 0x1p-30};
     const DBLArray y{1.0};
     MSE_head(x.handle(), y.handle(), &value, &err);
     EXPECT_EQ(value, 0.0);
 }
 
-// Powers by squaring: products in a row end one unit higher in the last place.
+// Powers by squaring; repeated multiplication would give one unit more in the last place.
 TEST(BasicStatistics, MomentsTakePowersBySquaring) {
     const double a = 1.0 + 0x1.555p-13;
     const DBLArray x{-3.0 * a, a, a, a}; // the mean is 0 exactly
@@ -125,7 +125,7 @@ TEST(BasicStatistics, OverflowAndNonFiniteValuesPropagate) {
     EXPECT_EQ(value, inf);
     const DBLArray huge{1e200, 1e200};
     RMS_head(huge.handle(), &value, &err);
-    EXPECT_EQ(value, inf) << "nothing guards the squares";
+    EXPECT_EQ(value, inf) << "the squares are not protected from overflow";
     const DBLArray spread{-3.0, 3.0};
     const int32_t highest = std::numeric_limits<int32_t>::max();
     Moment_head(spread.handle(), &highest, &value, &err);

@@ -22,7 +22,8 @@ struct Outcome {
     ErrorCode err;
 };
 
-// The revisions, of any distribution: `parameters` are the degrees, `choice` the value or the tail.
+// Calls the revision for any distribution: `parameters` are the degrees of freedom, `choice`
+// selects the value or the tail.
 double Revised(const std::string &name, const std::vector<double> &arguments, int32_t choice,
                ErrorCode code = 0) {
     Outcome outcome = {7, 7};
@@ -96,7 +97,7 @@ TEST(Distributions, AgreeWithMultiplePrecision) {
 TEST(Distributions, InversesLieWithinTheirToleranceBelow) {
     for (const double p : {0.001, 0.1, 0.5, 0.9, 0.999})
         for (const int32_t dof : {2, 5, 40}) {
-            // The bracket that ends at the answer: p is reached within 1e-4 above it.
+            // The answer is the lower end of a bracket: p is reached within 1e-4 above it.
             const double t = Call(InvTdist_head, p, dof).value;
             EXPECT_LT(Call(TDist_head, t, dof).value, p);
             EXPECT_GE(Call(TDist_head, t + 1e-4, dof).value, p);
@@ -112,7 +113,7 @@ TEST(Distributions, InversesLieWithinTheirToleranceBelow) {
     EXPECT_NE(Call(InvTdist_head, 0.5, 3).value, 0.0);
     EXPECT_NEAR(Call(InvFDist_head, 0.9999999, 1, 1).value, 10000.0, 1e-3) << "saturates";
 
-    // Abramowitz and Stegun promise 4.5e-4 for this approximation.
+    // Abramowitz and Stegun state an error of 4.5e-4 for this approximation.
     for (const auto &[p, x] : {std::pair{0.975, 1.959963985},
                                {0.025, -1.959963985},
                                {0.001, -3.090232306},
@@ -122,7 +123,7 @@ TEST(Distributions, InversesLieWithinTheirToleranceBelow) {
     EXPECT_NE(NormalQuantile(0.5).value, 0.0);
 }
 
-// The answers of a bisection stand on a grid that its bracket and its tolerance set.
+// The results of a bisection are on a grid that its bracket and its tolerance determine.
 TEST(Distributions, InversesKeepTheirBrackets) {
     const auto expectOnGrid = [](double value, double lo, double hi, int halvings) {
         const double steps = (value - lo) / (hi - lo) * std::exp2(halvings);
@@ -175,7 +176,8 @@ TEST(Distributions, EdgesAndCodes) {
     EXPECT_EQ(Call(InvChiSquare_head, 1.0, 1).value, inf);
     EXPECT_EQ(NormalQuantile(0.0).value, -inf);
     EXPECT_EQ(NormalQuantile(1.0).value, inf);
-    // A NaN is no probability outside the range, and the bisections end at their lower ends.
+    // A NaN is not refused as a probability outside the range, and the bisections return their
+    // lower ends.
     EXPECT_TRUE(std::isnan(NormalQuantile(nan).value));
     const auto expectLowerEnd = [](const Outcome &outcome, double lower) {
         EXPECT_EQ(outcome.err, 0);
@@ -218,7 +220,8 @@ TEST(DistributionTails, AgreeWithMultiplePrecision) {
             }
 }
 
-// Back from the tail's value to the argument, where a value's rounding does not count for more.
+// From the tail probability back to the argument, where the rounding of the probability is not
+// amplified.
 TEST(DistributionTails, InversesReturnTheArgument) {
     int checked = 0;
     for (const auto &row : TailRows()) {
@@ -236,7 +239,8 @@ TEST(DistributionTails, InversesReturnTheArgument) {
     EXPECT_GT(checked, 90);
 }
 
-// Degrees 1 and 2 have closed forms without a difference; on both sides of the methods' threshold.
+// Degrees 1 and 2 have closed forms without cancellation; on both sides of the threshold between
+// the methods.
 TEST(DistributionTails, StudentAgreesWithClosedForms) {
     for (double t = 1e-3; t < 1e7; t *= 1.05) {
         const double root = std::sqrt(2 + t * t);
@@ -266,12 +270,13 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
         EXPECT_NEAR(Revised("f", {x / 3.5, 3.5, inf}, 1), limit, 60 * eps * limit)
             << "x / 3.5 is rounded";
     }
-    // Cauchy's distribution, far out: 1 / (pi t), and beyond the range.
+    // The Cauchy distribution far out: 1 / (pi t), also where it underflows.
     EXPECT_NEAR(Revised("t", {1e200, 1.0}, 1), 1e-200 / std::numbers::pi, 4e-200 * eps);
     EXPECT_NEAR(Revised("it", {1e-200, 1.0}, 1), 1e200 / std::numbers::pi, 4e200 * eps);
     EXPECT_EQ(Revised("it", {1e-300, 0.5}, 1), inf);
     EXPECT_EQ(Revised("ichi2", {1e-300, 0.01}, 0), 0);
-    // Few degrees of one or both of Fisher's, against 700 digits (mpmath).
+    // Few degrees of freedom, one or both, of the F distribution, compared with 700 digits
+    // (mpmath).
     const double few[][5] = {{1e-200, 1e-305, 1e-305, 0.5, 0.5},
                              {1e-200, 1e-305, 3.0, 1.0, 5.8164518930589053322e-303},
                              {2.5, 1e-100, 7.0, 1.0, 1.1480387820551947758e-98},
@@ -281,7 +286,8 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
         for (const int32_t upper : {0, 1})
             EXPECT_NEAR(Revised("f", {row[0], row[1], row[2]}, upper) / row[3 + upper], 1.0, 2e-15)
                 << row[1] << " " << row[2];
-    // Hardly any degrees: all but nothing lies beyond the range.
+    // With almost no degrees of freedom, nearly all the probability lies beyond the range of
+    // doubles.
     for (const double degrees : {1e-20, 1e-50, 1.5272285085778469e-158}) {
         EXPECT_EQ(Revised("t", {1e300, degrees}, 1), 0.5);
         EXPECT_EQ(Revised("it", {0.43, degrees}, 1), inf);
@@ -289,7 +295,7 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
     }
     EXPECT_EQ(Revised("chi2", {5e-324, 5e-324}, 0), 1);
     EXPECT_EQ(Revised("ichi2", {0.5, 5e-324}, 0), 0);
-    // The quarter of a large number of degrees at the mean of the distribution.
+    // A large number of degrees of freedom at the mean of the distribution.
     EXPECT_NEAR(Revised("chi2", {1e10, 1e10}, 0),
                 0.5 + 1 / (3 * std::sqrt(std::numbers::pi * 1e10)), 1e-14);
 }

@@ -13,12 +13,8 @@
 #include <numeric>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::Array1D;
-using qx::test::DBLArray;
-using qx::test::HeapProbe;
-using qx::test::I32Array;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
@@ -48,8 +44,8 @@ TEST(Histogram, CountsEverySampleOnce) {
         ASSERT_EQ(h.err, 0);
         ASSERT_EQ(h.counts.size(), static_cast<std::size_t>(bins));
         EXPECT_EQ(std::accumulate(h.counts.begin(), h.counts.end(), 0), 5000);
-        // Against the edges rather than the division: a sample may lie in the neighbouring bin
-        // where it stands on an edge up to rounding.
+        // Compared with the edges rather than by division: a sample that is on an edge up to
+        // rounding may be counted in the neighbouring bin.
         const auto [min, max] = std::minmax_element(x.begin(), x.end());
         const long double width = (static_cast<long double>(*max) - *min) / bins;
         for (int32_t k = 0; k < bins; ++k) {
@@ -75,7 +71,7 @@ TEST(Histogram, CentresAreAccumulated) {
     EXPECT_EQ(centres[9], 0.9499999999999998) << "the drift of nine additions";
 }
 
-// Ranges whose width or whose bins per unit leave the exponents.
+// Ranges whose width or number of bins per unit overflows or underflows.
 TEST(Histogram, CountsAtBothEndsOfTheExponents) {
     constexpr double least = std::numeric_limits<double>::denorm_min();
     constexpr double most = std::numeric_limits<double>::max();
@@ -92,7 +88,8 @@ TEST(Histogram, CountsAtBothEndsOfTheExponents) {
 
 TEST(Histogram, TreatsEdgesConstantsAndNaN) {
     const Histogram edge = HistogramOf({0.0, 1.0, 2.0, 4.0}, 4);
-    // Times the bins per unit: divided by the width of a bin, 0.3 would stand one bin lower.
+    // The sample is multiplied by the bins per unit; divided by the bin width, 0.3 would be one bin
+    // lower.
     EXPECT_EQ(HistogramOf({0.0, 0.3, 1.0}, 10).counts[3], 1);
     EXPECT_EQ(edge.counts, (std::vector<int32_t>{1, 1, 1, 1}));
     const Histogram constant = HistogramOf({3.5, 3.5, 3.5}, 3);
@@ -112,10 +109,10 @@ TEST(Histogram, TreatsEdgesConstantsAndNaN) {
     EXPECT_EQ(qx::ArrayHistogram({x, 0}, 0.0, 1.0, {counts, 2}, {centres, 2}), ErrEmptyInput);
     EXPECT_EQ(qx::ArrayHistogram({x, 8}, 0.0, 1.0, {counts, 2}, {centres, 2}), 0);
     EXPECT_EQ(counts[0], 1);
-    EXPECT_EQ(counts[1], 2) << "what lies outside is dropped";
+    EXPECT_EQ(counts[1], 2) << "samples outside are dropped";
 }
 
-TEST(Histogram, AHostThatRefusesIsHeardTwice) {
+TEST(Histogram, ARefusedResizeIsReported) {
     const DBLArray x{1.0, 2.0};
     const int32_t bins = 4;
     for (const int32_t refused : {1, 2}) {
@@ -188,12 +185,12 @@ TEST(GeneralHistogram, WithoutMemoryTheCountsAreSizedAndEmptied) {
     EXPECT_EQ(summary.outside, 0);
 }
 
-TEST(GeneralHistogram, CountsInOverlappingIntervalsAndTellsWhereTheRestLies) {
+TEST(GeneralHistogram, CountsInOverlappingIntervalsAndOutsideOfThem) {
     const std::vector<HistInterval> intervals{{0.0, 1.0, 0}, {0.5, 2.0, 2}, {3.0, 4.0, 1}};
     const General g = GeneralOf({-1.0, 0.0, 0.75, 1.0, 2.0, 2.5, 3.0, 4.0, 9.0}, intervals);
     EXPECT_EQ(g.err, 0);
     EXPECT_EQ(g.counts, (std::vector<int32_t>{2, 3, 1}));
-    // -1 below; 2.5 and 3.0 in a gap, below the last interval; 9 above it.
+    // -1 lies below all intervals, 2.5 and 3.0 in a gap below the last one, 9 above it.
     EXPECT_EQ(g.summary.outside, 4);
     EXPECT_EQ(g.summary.below, 1);
     EXPECT_EQ(g.summary.above, 1);
@@ -223,3 +220,4 @@ TEST(GeneralHistogram, CountsInOverlappingIntervalsAndTellsWhereTheRestLies) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""Writes data/distributions.dat: the distribution functions at 40 digits (mpmath), rounded to double. A
-line: NAME ARGUMENT ... VALUE, numbers as hex floats."""
+"""Writes data/distributions.dat: the distribution functions at 40 digits (mpmath), rounded to double. Each
+line is NAME ARGUMENT ... VALUE, with numbers as hex floats."""
 
 import random
 from pathlib import Path

@@ -2,10 +2,10 @@
 """Writes data/factorial_anova.dat: analyses of variance with two and three factors, exact by
 fractions, with p and the critical value from 40 digits (mpmath).
 
-The sums of squares are differences of raw ones. The denominator of a source comes from the expected
-mean squares: the linear equations for the combination of mean squares that has each component of
-variance as often as the source has it, without its own. The published figures stand beside the data
-and are compared with what comes out."""
+The sums of squares are differences of raw sums. The denominator of a source follows from the expected mean squares:
+linear equations determine the combination of mean squares that contains each component of variance as often as the
+source does, except the component of the source itself. The published figures are listed with the data and compared
+with the results."""
 
 import random
 from fractions import Fraction
@@ -27,7 +27,7 @@ BATTERIES_PUBLISHED = {"A": (10683.72, 7.91), "B": (39118.72, 28.97), "AB": (961
                        "error": (18230.75, None), "total": (77646.97, None)}
 
 # Breaks of yarn by wool and tension (L. H. C. Tippett, Technological applications of statistics, 1950;
-# the data set warpbreaks of R, with the table of its example).
+# the data set warpbreaks of R, with the table from its example).
 BREAKS = [[[26, 30, 54, 25, 70, 52, 51, 26, 67], [18, 21, 29, 17, 12, 18, 35, 30, 36],
            [36, 21, 24, 18, 10, 43, 28, 15, 26]],
           [[27, 14, 29, 19, 29, 31, 41, 20, 44], [42, 26, 19, 16, 39, 28, 21, 39, 29],
@@ -60,7 +60,7 @@ BOTTLES_PUBLISHED = {"A": (252.750, 178.412), "B": (45.375, 64.059), "C": (22.04
 
 
 def cells_of(nested, factors):
-    """{levels: observations} of lists in lists."""
+    """Converts nested lists to {levels: observations}."""
     if factors == 0:
         return {(): [Fraction(y) for y in nested]}
     return {(i, *rest): values for i, part in enumerate(nested)
@@ -73,7 +73,7 @@ def subsets_of(factors):
 
 
 def solved(rows, right):
-    """The solution of the equations by elimination, which need not be square but must be solvable."""
+    """Solves the equations by elimination; the system need not be square but must be solvable."""
     rows = [[*map(Fraction, row), Fraction(value)] for row, value in zip(rows, right)]
     unknowns, pivots = len(rows[0]) - 1, []
     for column in range(unknowns):
@@ -85,7 +85,7 @@ def solved(rows, right):
         rows.insert(len(pivots), pivot)
         rows = [row if row is pivot else [a - row[column] * b for a, b in zip(row, pivot)] for row in rows]
         pivots.append(column)
-    assert all(row[-1] == 0 for row in rows[len(pivots):]), "no combination serves"
+    assert all(row[-1] == 0 for row in rows[len(pivots):]), "there is no such combination"
     result = [Fraction(0)] * unknowns
     for row, column in zip(rows, pivots):
         result[column] = row[-1]
@@ -93,8 +93,8 @@ def solved(rows, right):
 
 
 def expectations(levels, random_factors, observations, subsets):
-    """Each source's expected mean square: how often it has each component of variance, that of the
-    error last. The parts of fixed effects other than the source's own are 0."""
+    """The expected mean square of each source: the coefficient of each component of variance, that of the error last.
+    The coefficients of fixed effects other than the source itself are 0."""
     rows = []
     for source in subsets:
         row = [prod(levels[i] for i in range(len(levels)) if i not in part) * observations
@@ -200,7 +200,7 @@ def lines_of(name, cells, random_factors, alpha, published=None):
 
 
 def moved(cells):
-    """In eighths, 10^9 away from 0: exact."""
+    """Moved to multiples of 1/8 at a distance of 10^9 from 0, which are exact."""
     return {cell: [10 ** 9 + y / 8 for y in values] for cell, values in cells.items()}
 
 

@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Writes data/distribution_tails.dat: values of distributions in either tail at 50 digits (mpmath), rounded
 to double, by the series of the incomplete gamma and beta functions with positive terms. A line: NAME
-ARGUMENT ... VALUE, numbers as hex floats. NAME is a distribution and what of it: cdf, sf, logcdf, logsf, pdf."""
+ARGUMENT ... VALUE, numbers as hex floats. NAME is a distribution and a function: cdf, sf, logcdf, logsf, pdf."""
 
 import random
 from pathlib import Path
@@ -14,7 +14,7 @@ WORK = 700  # digits that 1 - p needs in the far tail
 
 
 def series(first, ratio):
-    """The sum of terms above 0 from the first on, the next being ratio(k) times as large."""
+    """The sum of positive terms from `first` on; each following term is ratio(k) times the previous one."""
     total, term, k = first, first, 0
     while term > total * mpf(10)**-(mp.dps + 3):
         term *= ratio(k)
@@ -31,7 +31,7 @@ def chi2(x, dof):
 
 
 def beta(a, b, x, y):
-    """I_x(a, b) and its complement, and the derivative in ln(x / y)."""
+    """I_x(a, b), its complement, and the derivative with respect to ln(x / y)."""
     if x > y:
         upper, lower, slope = beta(b, a, y, x)
         return lower, upper, slope

@@ -26,7 +26,7 @@ constexpr double inf = std::numeric_limits<double>::infinity();
 
 typedef std::vector<double> Values;
 
-// Arrays that sorting and selection are known to stumble over.
+// Arrays that are known to be difficult for sorting and selection.
 std::vector<Values> HardArrays(int n) {
     qx::test::Noise noise(static_cast<uint64_t>(n) + 17);
     const auto make = [n](const std::function<double(int)> &value) {
@@ -112,9 +112,9 @@ TEST(Order, NaNsGoToTheFront) {
     qx::test::CheckBlocks();
 }
 
-// Settles the order of the elements as late as it can while the selection scheme runs, so that
+// Decides the order of the elements as late as possible while the selection scheme runs, so that
 // every pivot turns out to be among the smallest (D. McIlroy: A killer adversary for quicksort,
-// 1999). The values that it ends with are the worst data for that scheme.
+// 1999). The final values are the worst case for that scheme.
 class Adversary {
 public:
     explicit Adversary(int n) : values_(static_cast<std::size_t>(n), n), items_(values_.size()) {
@@ -177,8 +177,8 @@ private:
     int64_t comparisons_ = 0;
 };
 
-// A selection that has looked at a few times n elements gives its scheme up and sorts the range
-// that is left, which on the worst data is nearly all of it.
+// A selection that has examined a few times n elements abandons its scheme and sorts the remaining
+// range, which for the worst data is nearly the whole array.
 TEST(Order, NoDataMakeTheWorkQuadratic) {
     constexpr int n = 10000;
     const Adversary adversary(n);
@@ -192,7 +192,7 @@ TEST(Order, NoDataMakeTheWorkQuadratic) {
         std::sort(sorted.begin(), sorted.end());
         EXPECT_EQ(a[n / 2], sorted[n / 2]);
         EXPECT_LE(*std::max_element(a.begin(), a.begin() + n / 2), a[n / 2]);
-        const auto tail = a.end() - n / 3; // of what the first passes leave
+        const auto tail = a.end() - n / 3; // of the range that the first passes leave
         if (x == adversary.values()) {
             EXPECT_TRUE(std::is_sorted(tail, a.end()));
         }
@@ -235,8 +235,8 @@ double MedianByTheLibrary(Values x) {
     return x.size() % 2 != 0 ? *middle : (*std::max_element(x.begin(), middle) + *middle) * 0.5;
 }
 
-TEST(Order, AMedianOfManyStandsWhereSortingPutsIt) {
-    // Long arrays are looked at through a sample, which these mislead.
+TEST(Order, AMedianOfManyEqualsThatOfTheSortedArray) {
+    // The median of long arrays is located by a sample, which these arrays mislead.
     constexpr int n = 300001;
     std::vector<Values> arrays = HardArrays(n);
     Values outliers(n, 1.0);
@@ -256,7 +256,7 @@ TEST(Order, AMedianOfManyStandsWhereSortingPutsIt) {
             values[static_cast<std::size_t>(count - count / 7)] = nan;
             EXPECT_EQ(qx::ArrayMedian({values.data(), count}, &median), ErrNaNInData);
         }
-    // Among so many arrays there are some whose sample just misses the middle, on either side.
+    // With this many arrays, the sample of some narrowly misses the middle, on either side.
     qx::test::Noise noise(11);
     for (int round = 0; round < 10000; ++round) {
         Values x(static_cast<std::size_t>(600 + round % 2));
@@ -325,10 +325,11 @@ TEST(Mode, ExactModesAreTheLongestRuns) {
     EXPECT_EQ(ModesOf({5}, 3), Values());
     EXPECT_EQ(ModesOf({}, 0, ErrEmptyInput), Values());
     EXPECT_EQ(ModesOf({nan, 2, nan, nan, 2, 1}, 0), (Values{2})) << "NaNs form no run";
-    // Equal is what lies within an epsilon of the first of the run.
+    // Values within an epsilon of the first of the run are equal,
     const double next = std::nextafter(1.0, 2.0);
     EXPECT_EQ(ModesOf({next, 1.0, 7.0, 9.0}, 0), (Values{1.0}));
-    // ... and not of its neighbour: four values in a chain make two runs, three make one.
+    // not those within an epsilon of their neighbour: a chain of four values makes two runs, three
+    // make one.
     const double second = std::nextafter(next, 2.0);
     const double third = std::nextafter(second, 2.0);
     EXPECT_EQ(ModesOf({third, second, next, 1.0, 9.0}, 0), (Values{1.0, second}));
@@ -349,7 +350,7 @@ TEST(Mode, BinnedModesAreCentresOfTheFullestBins) {
     EXPECT_EQ(ModesOf({nan, nan}, 3), Values());
 }
 
-// Many bins for few samples are never laid out, and their modes are those of the histogram.
+// Many bins for few samples are never allocated; their modes are those of the histogram.
 TEST(Mode, BinsWithoutSamplesTakeNoMemory) {
     for (const Values &x : HardArrays(40))
         for (const int32_t intervals : {39, 319, 320, 328, 5000}) {

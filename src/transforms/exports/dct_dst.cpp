@@ -8,8 +8,8 @@
 namespace qx {
 namespace {
 
-// What the frames of the cosine and of the sine transform do differently.
-// kept: the orders show in which code a short memory gives, and what is left behind.
+// The differences between the exports of the cosine and of the sine transform.
+// kept: the orders determine which code is reported when memory runs out, and what is left in the output.
 struct Cosine : CosineTransform {
     typedef CosineTransform Routines;
     static constexpr bool planBeforeWork = true;
@@ -83,7 +83,7 @@ Outcome Forward2D(In<DBL2D> in, Out<DBL2D> out, int32_t rows, int32_t cols, Keep
         return ErrEmptyInput;
     rows = rows < 1 ? in.rows() : rows;
     cols = cols < 1 ? in.cols() : cols;
-    if (!out.mayHave(rows, cols)) // before memory is taken for so many values
+    if (!out.mayHave(rows, cols)) // before memory is allocated for so many values
         return ErrOutOfMemory;
     MatrixWindow window;
     if (const ErrorCode failed = window.take(in.view(), rows, cols))

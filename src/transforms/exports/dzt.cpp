@@ -13,7 +13,7 @@ ErrorCode Band(Spoiled<Handle> in, int32_t sections, int32_t subLength, int32_t 
     if (const ErrorCode failed = FirstFailed({{sections < 1, ErrOrderNotPositive},
                                               {size < 1 || subLength < 1, ErrFFTSizeNotPositive}}))
         return failed;
-    // kept: an empty input is no failure here.
+    // kept: an empty input is not an error here.
     if (in.isEmpty()) {
         out.empty();
         return 0;

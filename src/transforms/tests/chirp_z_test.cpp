@@ -26,7 +26,7 @@ using qx::test::ResetHost;
 using qx::test::SameBits;
 using qx::test::ToLong;
 
-// z^p by the polar form in long double.
+// z^p in polar form in long double.
 LongComplex Power(const CDB &z, Long p) {
     const LongComplex value = ToLong(z);
     return std::polar(std::pow(std::abs(value), p), p * std::arg(value));
@@ -94,7 +94,7 @@ TEST(ChirpZ, OnTheWholeCircleItIsTheTransform) {
     }
 }
 
-// The squares of the chirp's indices pass the range of int32.
+// The squares of the chirp's indices exceed int32.
 TEST(ChirpZ, LongSignalsKeepTheirChirp) {
     constexpr int32_t n = 50000;
     const CDB one = {1, 0}, w = OnCircle(-1.0L / (2 * n));
@@ -122,7 +122,7 @@ double ErrorOfInverse(int32_t n, const CDB &a, const CDB &w) {
     return MaxError(out.values(), ToLong(x));
 }
 
-TEST(InverseChirpZ, GivesBackTheSequence) {
+TEST(InverseChirpZ, RecoversTheSequence) {
     const CDB one = {1, 0};
     for (const int32_t n : {1, 2, 3, 10, 64, 100, 301})
         EXPECT_LT(ErrorOfInverse(n, one, OnCircle(-1.0L / n)), 3e-12) << n;
@@ -132,7 +132,7 @@ TEST(InverseChirpZ, GivesBackTheSequence) {
         << "an arc of less than half a turn";
 }
 
-// Products of thousands of differences leave the range of double; what they make up does not.
+// Products of thousands of differences leave the range of double; the result does not.
 TEST(InverseChirpZ, ManyPointsDoNotOverflow) {
     constexpr int32_t n = 5000;
     const CDB one = {1, 0}, w = OnCircle(-1.0L / n);
@@ -148,9 +148,9 @@ TEST(InverseChirpZ, ManyPointsDoNotOverflow) {
     }
 }
 
-// Points 1.05^k 0.8: the sixth is nearest to the circle, so the stretch of four begins at the
+// Points 0.8 1.05^k: the sixth is nearest to the unit circle, so the range of four begins at the
 // fourth.
-TEST(InverseChirpZ, FewerValuesTakeTheStretchNearestToTheCircle) {
+TEST(InverseChirpZ, FewerValuesUseTheRangeNearestToTheCircle) {
     const CDB a = {0, 1.25}, w = {1.05 * std::cos(0.9), 1.05 * std::sin(0.9)};
     const auto whole = RandomComplex(4);
     std::vector<CDB> points;
@@ -163,7 +163,7 @@ TEST(InverseChirpZ, FewerValuesTakeTheStretchNearestToTheCircle) {
     const CDBArray out;
     ASSERT_EQ(InvChirpZT_head(in.handle(), &a, &w, 4, out.handle()), 0);
     EXPECT_LT(MaxError(out.values(), ToLong(whole)), 4.2e-15);
-    // All distances are equal on the circle: the first points are taken.
+    // All distances are equal on the circle, so the first points are used.
     const CDB one = {1, 0}, turn = {0, 1};
     const CDBArray three({{6, 0}, {-2, -2}, {2, 0}});
     ASSERT_EQ(InvChirpZT_head(three.handle(), &one, &turn, 2, out.handle()), 0);

@@ -41,7 +41,7 @@ struct Shape {
     int32_t rows, cols;
 };
 
-// The exports of the cosine and of the sine transform, under one set of names.
+// The exports of the cosine and the sine transform under common names.
 struct Family {
     const char *name;
     ErrorCode (*forward)(DBL1D, DBL1D, int32_t, PlanSlot *);
@@ -150,7 +150,7 @@ LongSpectrum Definition2D(const Family &family, const DBLMatrix &matrix, Shape s
     return result;
 }
 
-// The shapes hold an odd side that needs more work memory than the longer, even one.
+// The shapes include one with an odd side that needs more work memory than the longer, even side.
 TEST(DCTDST, TwoDimensionsByDefinitionCroppedAndPadded) {
     for (const Family &family : Families)
         for (Shape shape : {Shape{1, 1}, {1, 5}, {4, 6}, {9, 10}, {10, 9}, {20, 3}})
@@ -221,7 +221,7 @@ TEST(DCTDST, AgreeWithSciPy) {
     EXPECT_EQ(lines, 18);
 }
 
-TEST(DCTDST, FramesCheckAndQuoteTheHostInTheirOrder) {
+TEST(DCTDST, ChecksAndRefusalsComeInTheirOrder) {
     const DBLArray none, x(RandomSignal(5));
     const DBLMatrix noneMatrix(0, 2), matrix(4, 5);
     Fill(matrix, RandomSignal(20));
@@ -247,14 +247,16 @@ TEST(DCTDST, FramesCheckAndQuoteTheHostInTheirOrder) {
         ResetHost(1, -4242);
         EXPECT_EQ(family.inverse(x.handle(), out.handle(), &node.slot), -4242);
         ResetHost();
-        EXPECT_EQ(node.slot, nullptr) << "in one dimension the output comes before the plan";
+        EXPECT_EQ(node.slot, nullptr)
+            << "in one dimension the output is resized before the plan is acquired";
 
         ResetHost(1, 77);
         EXPECT_EQ(family.forward2D(matrix.handle(), out2.handle(), 0, 0, &node.slot, &node.second),
                   77);
         EXPECT_EQ(Host().reshapes, (std::vector<Reshape>{{10, 2, 20}, {10, 2, 0}}));
         ResetHost();
-        EXPECT_EQ(node.slot != nullptr, isCosine) << "in two only the sine transform has it so";
+        EXPECT_EQ(node.slot != nullptr, isCosine)
+            << "in two dimensions only the cosine transform acquires the plan first";
         if (isCosine) {
             EXPECT_EQ(static_cast<const qx::PlanCell *>(node.slot)->plan->length, 4);
             EXPECT_EQ(static_cast<const qx::PlanCell *>(node.second)->plan->length, 10);
@@ -286,14 +288,14 @@ TEST(DCTDST, OnlyTheInverseCosineTransformIsSilentAboutMissingWorkMemory) {
     }
 }
 
-// Which of the plan and the work block comes first shows in the slot where only one can be had.
+// If only the plan or the work block can be allocated, the slot shows which is allocated first.
 TEST(DCTDST, ThePlanComesBeforeTheWorkOfTheCosineTransformOnly) {
     if (!HeapProbe::works())
         GTEST_SKIP();
     const DBLArray x(RandomSignal(6));
     for (const Family &family : Families) {
-        // A plan of this length with all its tables, so that the cell and the work block are the
-        // only allocations left.
+        // Holds a plan of this length with all its tables, so that only the cell and the work block
+        // remain to be allocated.
         Node warm;
         DBLArray ignored;
         ASSERT_EQ(family.forward(x.handle(), ignored.handle(), 0, &warm.slot), 0);
@@ -312,7 +314,7 @@ TEST(DCTDST, ThePlanComesBeforeTheWorkOfTheCosineTransformOnly) {
     }
 }
 
-// The two directions commute but for rounding; the bits tell which came first.
+// Rows and columns commute up to rounding; the bits show which came first.
 TEST(DCTDST, InverseRunsColumnsFirstForTheCosineAndRowsFirstForTheSine) {
     constexpr int32_t rows = 7, cols = 10;
     const DBLMatrix in(rows, cols);
@@ -386,7 +388,7 @@ TEST(DCTDST, RequestsBeyondMemoryEndInACode) {
             EXPECT_EQ(family.forward2D(matrix.handle(), out2.handle(), 46341, 46341, &node.slot,
                                        &node.second),
                       ErrOutOfMemory);
-            EXPECT_EQ(probe.allocations(), 0) << "values that no output can have";
+            EXPECT_EQ(probe.allocations(), 0) << "no memory for sizes that no output can have";
         }
     }
 }

@@ -36,7 +36,7 @@ struct Band {
     int32_t sections, subLength, start, size;
 };
 
-// The definition, on x cut or padded to the long transform's length.
+// The definition, applied to x cropped or padded to the length of the long transform.
 template <class Values>
 LongSpectrum Expected(const Values &x, const Band &band) {
     const int64_t length = int64_t{band.sections} * band.subLength;
@@ -80,22 +80,22 @@ TEST(BandTransform, GivesBinsOfTheLongTransform) {
         }
 }
 
-// Inputs longer than the transform are folded in place by a walk that begins at index N.
+// Inputs longer than the transform are folded in place by a loop that begins at index N.
 TEST(BandTransform, FoldsLongInputsFromTheSubLengthOn) {
     const Band band{2, 3, 0, 6};
     const DBLArray x{1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14};
     Node node;
     CDBArray out;
     ASSERT_EQ(ReDZTH(x.handle(), 2, 3, 0, 6, out.handle(), &node.slot), 0);
-    // One whole wrap adds 4, 5, 6, 7, 8, 9, of which the first three stand in the fold's own
-    // range and are read before they change; two elements remain: 10 and 11.
+    // One full wrap adds 4, 5, 6, 7, 8, 9; the first three lie in the range that the fold
+    // overwrites and are read before they change. Two elements remain: 10 and 11.
     const Signal folded{1 + 4 + 10, 2 + 5 + 11, 3 + 6, 4 + 7, 5 + 8, 6 + 9};
     const Signal values = x.values();
     EXPECT_EQ(Signal(values.begin(), values.begin() + 6), folded);
     EXPECT_EQ(Signal(values.begin() + 6, values.end()), (Signal{7, 8, 9, 10, 11, 12, 13, 14}));
     EXPECT_LT(MaxError(out.values(), Expected(folded, band)), Rounding);
 
-    // With one section the walk is a plain wrap.
+    // With one section the loop is a plain wrap.
     const Signal longer = RandomSignal(11);
     Signal wrapped(4);
     for (int32_t j = 0; j < 11; ++j)
@@ -111,8 +111,8 @@ TEST(BandTransform, FoldsLongInputsFromTheSubLengthOn) {
     EXPECT_EQ(complex[1].im, before[1].im + before[4].im + before[10].im);
 }
 
-// With one value per sub-sequence and all but one of them zero, the rotation itself comes out; it
-// goes on by multiplication, whose errors add up: 3e-12 in 4000 steps.
+// With one value per sub-sequence, all but one of them zero, the result is the rotation itself. It
+// advances by multiplication, whose errors accumulate: 3e-12 in 4000 steps.
 TEST(BandTransform, TurnsFromTheFirstOutputOn) {
     constexpr int32_t sections = 11, start = -25, size = 4000;
     for (int32_t j = 0; j < sections; ++j) {
@@ -174,7 +174,7 @@ TEST(BandTransform, ChecksComeInOrderAndEmptyInputIsNoFailure) {
     EXPECT_EQ(out.size(), 3);
 }
 
-TEST(BandTransform, AHostThatRefusesIsQuoted) {
+TEST(BandTransform, ARefusalReturnsTheHostsStatus) {
     const DBLArray x(RandomSignal(4));
     for (int32_t hostStatus : {77, -4242}) {
         CDBArray out(2);
@@ -187,7 +187,7 @@ TEST(BandTransform, AHostThatRefusesIsQuoted) {
     }
 }
 
-// Two billion sections of which four have a value: the time follows the data.
+// Two billion sections of which four have a value; the time depends on the data only.
 TEST(BandTransform, SectionsBeyondTheDataCostNothing) {
     const std::vector<double> values{1.5, -2, 0.25, 3};
     const DBLArray x(values);
@@ -210,8 +210,8 @@ TEST(BandTransform, SectionsBeyondTheDataCostNothing) {
     }
 }
 
-// A workspace with room for the sub-sequences but not for their transforms is a failure, not a sum
-// without them.
+// A workspace with room for the sub-sequences but not for their transforms causes a failure, not a
+// sum that omits them.
 TEST(BandTransform, MissingMemoryOfATransformIsReported) {
     WorkspaceStatus status = {};
     ASSERT_EQ(0, InitializeAnalysisWorkspaceH(2048, &status));

@@ -33,7 +33,7 @@ constexpr double Rounding = 4e-15;
 typedef ErrorCode (*InSlot)(DBL1D, PlanSlot *);
 typedef ErrorCode (*InInstance)(DBL1D, InstanceWord *);
 
-// The result of an export and of its twin, which must agree to the bit.
+// The result of an export, which must agree with that of its twin to the bit.
 Signal RunTwins(InSlot plain, InInstance twin, const Signal &x) {
     const DBLArray a(x), b(x);
     Node node;
@@ -124,11 +124,11 @@ TEST(HartleyHilbert, ThePlanStaysInTheNode) {
     ASSERT_EQ(InvFHTH(x.handle(), &node.slot), 0);
     const auto *const cell = static_cast<const qx::PlanCell *>(node.slot);
     EXPECT_EQ(cell->plan->length, 6);
-    EXPECT_EQ(cell->plan->refCount, 1) << "the routines gave their own references back";
+    EXPECT_EQ(cell->plan->refCount, 1) << "the routines released their own references";
 }
 
 // Every other failure empties the array.
-TEST(HartleyHilbert, TheInverseLeavesTheArrayWhereNoPlanCanBeHad) {
+TEST(HartleyHilbert, TheInverseLeavesTheArrayIfNoPlanCanBeMade) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();
     const Signal values = RandomSignal(6);

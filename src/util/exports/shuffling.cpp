@@ -22,8 +22,8 @@ struct NoExchange {
     void operator()(int32_t, int32_t) const {}
 };
 
-// Makes `indices` the numbers 0 to n - 1 and lets `shuffle` exchange pairs of them, and whatever
-// `exchange` exchanges along with them.
+// Sets `indices` to the numbers 0 to n - 1 and lets `shuffle` exchange pairs of them, together with
+// what `exchange` exchanges.
 template <class Exchange, class ShuffleBy>
 Outcome ShuffleNumbers(Out<I32_1D> &indices, int32_t n, const Exchange &exchange,
                        const ShuffleBy &shuffle) {
@@ -62,7 +62,7 @@ Outcome RiffleNumbers(Out<I32_1D> indices, int32_t count, int32_t seed, RandomSt
     return Riffle(indices, count, seed, state, unbiased != 0, NoExchange());
 }
 
-// Where the orders of 2026 take their numbers: that of element i at the position and i.
+// Where the shuffles of 2026 take their random numbers: that of element i is at position + i.
 struct Start {
     int32_t key, stream;
     double position;

@@ -7,7 +7,7 @@ namespace {
 
 constexpr auto DBL = ElementType::DBL;
 
-// A rotation with exact elements, spoilt in the last digits.
+// A rotation with exact elements, perturbed in the last digits.
 DBL2D Direction(Call &c, int number) {
     return c.in2D<DBL>(number, 3, 3, [](int32_t row, int32_t col) {
         static const double exact[] = {0.36, 0.48, -0.8, -0.8, 0.6, 0.0, 0.48, 0.64, 0.6};

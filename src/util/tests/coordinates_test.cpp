@@ -25,8 +25,9 @@ constexpr double eps = std::numeric_limits<double>::epsilon();
 constexpr std::array<const char *, 12> sequences = {"XYX", "XYZ", "XZX", "XZY", "YXY", "YXZ",
                                                     "YZX", "YZY", "ZXY", "ZXZ", "ZYX", "ZYZ"};
 
-// An angle up to 1e6 less its whole turns, with 2 pi in four parts whose products by the turns are
-// exact: the long double sine of some systems reduces by a pi of 66 bits only.
+// Reduces an angle up to 1e6 by its whole turns, with 2 pi in four parts whose products with the
+// number of turns are exact, since the long double sine of some systems reduces with a pi of only
+// 66 bits.
 long double WithoutTurns(double angle) {
     const long double turns = std::round(angle / (2 * pi));
     long double rest = angle - turns * 0x1.921fb544p2L;
@@ -35,7 +36,7 @@ long double WithoutTurns(double angle) {
     return rest - turns * 0x0.01b839a2p-94L;
 }
 
-// The turn of the system about one axis, as the header draws it.
+// The rotation of the coordinate system about one axis, as defined in the header.
 Exact TurnAbout(char axis, double angle) {
     const long double c = std::cos(WithoutTurns(angle));
     const long double s = std::sin(WithoutTurns(angle));
@@ -98,7 +99,7 @@ double Distance(const Numbers &a, const Numbers &b) {
     return largest;
 }
 
-TEST(EulerAngles, GiveTheProductOfThreeTurns) {
+TEST(EulerAngles, GiveTheProductOfThreeRotations) {
     Noise noise(1);
     for (int32_t sequence = 0; sequence < 12; ++sequence)
         for (int i = 0; i < 500; ++i) {
@@ -114,7 +115,7 @@ TEST(EulerAngles, GiveTheProductOfThreeTurns) {
     EXPECT_EQ(direction.values(), Direction({0.1, 0.2, 0.3}, 10));
 }
 
-// Matrix to angles to matrix, and the ranges that the angles keep.
+// Converts a matrix to angles and back, and checks the ranges of the angles.
 void ReturnsToMatrix(const Angles &given, int32_t sequence, double tolerance) {
     const bool isProper = sequences[sequence][0] == sequences[sequence][2];
     const Numbers matrix = Direction(given, sequence);
@@ -127,7 +128,7 @@ void ReturnsToMatrix(const Angles &given, int32_t sequence, double tolerance) {
     EXPECT_LE(angles[1], isProper ? pi : pi / 2) << where;
 }
 
-TEST(EulerAngles, AreFoundAgainNearTheLockAndAtIt) {
+TEST(EulerAngles, AreRecoveredAtAndNearGimbalLock) {
     Noise noise(2);
     for (int32_t sequence = 0; sequence < 12; ++sequence) {
         const bool isProper = sequences[sequence][0] == sequences[sequence][2];
@@ -135,19 +136,19 @@ TEST(EulerAngles, AreFoundAgainNearTheLockAndAtIt) {
             const double first = pi * noise.symmetric();
             const double third = pi * noise.symmetric();
             ReturnsToMatrix({first, pi * noise.symmetric(), third}, sequence, 4 * eps);
-            // From far to below the last digit.
+            // Distances from large to below the last digit.
             const double off = std::ldexp(noise.symmetric(), -i % 60);
             for (const double lock : {isProper ? 0.0 : -pi / 2, isProper ? pi : pi / 2})
                 ReturnsToMatrix({first, lock + off, third}, sequence,
                                 std::fabs(off) > 8 * eps ? 4 * eps : 12 * eps);
         }
-        // At the lock the third angle is 0, and the first holds the whole turn.
+        // At gimbal lock the third angle is 0, and the first holds the whole rotation.
         const double lock = isProper ? 0.0 : pi / 2;
         const Angles angles = AnglesOfMatrix(Direction({0.4, lock, 0.3}, sequence), sequence);
         EXPECT_EQ(angles[2], 0.0) << sequences[sequence];
         EXPECT_NEAR(std::fabs(angles[0] - 0.4), 0.3, 4 * eps) << sequences[sequence];
     }
-    // The angles themselves, away from the lock.
+    // The angles themselves, away from gimbal lock.
     for (const int32_t sequence : {1, 10}) {
         const Angles angles = AnglesOfMatrix(Direction({0.5, -0.7, 2.5}, sequence), sequence);
         EXPECT_LE(Distance(Numbers(angles.begin(), angles.end()), Numbers{0.5, -0.7, 2.5}),
@@ -190,7 +191,7 @@ TEST(DirectionMatrix, IsUsedAsItsNearestRotation) {
     }
 }
 
-// Sizes around the lanes, coordinates of all magnitudes.
+// Sizes around the number of lanes, coordinates of all magnitudes.
 TEST(Rotation, GivesTheNewCoordinatesOfPoints) {
     Noise noise(4);
     for (const int32_t n : {0, 1, 2, 3, 4, 5, 7, 8, 9, 15, 16, 17, 33, 1000})
@@ -228,8 +229,8 @@ TEST(Rotation, GivesTheNewCoordinatesOfPoints) {
         }
 }
 
-// A sum whose first two terms overflow and whose result does not.
-TEST(Rotation, DoesNotOverflowOnTheWay) {
+// A sum whose first two terms overflow although the result does not.
+TEST(Rotation, DoesNotOverflowInIntermediateSums) {
     const double most = std::numeric_limits<double>::max();
     DBLArray x(Numbers{most}), y(Numbers{most}), z(Numbers{-most}), u(1), v(1), w(1);
     const double r = std::sqrt(0.5);
@@ -290,7 +291,7 @@ TEST(Coordinates, AreConvertedByTheirDefinition) {
 }
 
 TEST(Coordinates, KeepToTheirRangesAtEveryEdge) {
-    // Azimuths are above -pi, signed zeros or not; without a direction they are 0.
+    // Azimuths are above -pi, also for signed zeros; without a direction they are 0.
     const Converted edges =
         Convert(0, 1, {-1, -1, -1, -0.0, 0, 0, 1e-320, 3e307},
                 {0.0, -0.0, -1e-300, 0, 0.0, 0, 0, -4e307}, {0, 0, 0, -0.0, -2, 3, 0, 1.2e308});
@@ -304,7 +305,7 @@ TEST(Coordinates, KeepToTheirRangesAtEveryEdge) {
     EXPECT_EQ(edges.first[6], 1e-320);
     EXPECT_EQ(Convert(0, 1, {1.7e308}, {1.7e308}, {1.7e308}).first, (Numbers{inf}));
 
-    // Radii and angles beyond their ranges name points like others.
+    // Radii and angles outside their ranges denote ordinary points.
     const Converted given = {0, {-2, 2, 2, 2}, {0.5, 7.0, -3 * pi, 0.5}, {0.3, 0.3, 0.3, -0.3}};
     const Converted cartesian = Convert(1, 0, given.first, given.second, given.third);
     const Converted cylindrical = Convert(1, 2, given.first, given.second, given.third);
@@ -322,7 +323,7 @@ TEST(Coordinates, KeepToTheirRangesAtEveryEdge) {
     EXPECT_EQ(spherical.second[2], 0.0);
     EXPECT_EQ(spherical.third[2], pi);
 
-    // The same kind: a copy.
+    // Conversion to the same kind is a copy.
     for (int32_t kind = 0; kind < 3; ++kind)
         EXPECT_EQ(Convert(kind, kind, {-2}, {7}, {-0.3}).second, (Numbers{7}));
 }

@@ -75,7 +75,7 @@ Scaled ByMagnitude(const Samples &samples) {
     return result;
 }
 
-// At sizes around the lanes and the blocks, the extremes at every place.
+// Sizes around the number of lanes and the blocks, with the extremes in every place.
 TEST(Scaling, ReachesMinusOneAndOne) {
     for (const int32_t n : {2, 3, 15, 16, 17, 33, 2047, 2048, 2049, 2080, 5000})
         for (const int32_t at : {0, 1, n / 2, n - 1}) {
@@ -208,8 +208,8 @@ TEST(Scaling, EmptyArraysGiveTheirCodes) {
     }
 }
 
-// A phase of large slopes, wrapped in long double: unwrapping gives it back but for whole turns.
-TEST(Unwrapping, GivesTheSmoothPhaseBack) {
+// A phase with large slopes, wrapped in long double; unwrapping recovers it up to whole turns.
+TEST(Unwrapping, RecoversTheSmoothPhase) {
     for (const int32_t mode : {0, 1, 2, 3}) {
         const long double turn = mode < 2 ? 2 * std::numbers::pi_v<long double> : 360;
         for (const double slope : {0.001, 0.11, -0.3, 0.49, -0.49})
@@ -236,8 +236,8 @@ TEST(Unwrapping, GivesTheSmoothPhaseBack) {
     }
 }
 
-// The rule itself, one element after the other: jumps of any size, NaN and infinity included, at
-// any place in the lanes.
+// Compared with the rule itself, applied element by element: jumps of any size, including NaN and
+// infinity, in any lane.
 TEST(Unwrapping, FollowsItsRuleToTheBit) {
     constexpr double turn = 6.283185307179586;
     for (const int32_t n : {1, 2, 3, 8, 31, 500}) {
@@ -258,7 +258,7 @@ TEST(Unwrapping, FollowsItsRuleToTheBit) {
             }
         }
     }
-    // Exactly half a turn goes down, in the lanes as well.
+    // A jump of exactly half a turn goes down, in the lanes as well.
     DBLArray halves(Samples(40, 0.0));
     Samples expected(40, 0.0);
     for (std::size_t i = 20; i < 40; i += 2) {

@@ -11,11 +11,9 @@
 #include <numeric>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::I32Array;
 typedef std::vector<int32_t> Order;
 
 const RandomState start = {11, 222, 3333};
@@ -29,7 +27,7 @@ Order Numbers(int32_t count, int32_t seed, RandomState &state, int32_t unbiased)
     return indices.values();
 }
 
-// What is drawn, number by number, and carried out on a list.
+// The definition of the shuffle, number by number, on a list.
 Order ByTheRule(int32_t count, RandomState &state, bool isUnbiased) {
     Order order(static_cast<std::size_t>(count));
     std::iota(order.begin(), order.end(), 0);
@@ -50,7 +48,7 @@ TEST(Shuffles, FollowTheStream) {
             EXPECT_EQ(Numbers(count, -1, state, isUnbiased),
                       ByTheRule(count, reference, isUnbiased));
             EXPECT_EQ(Numbers(count, 0, state, isUnbiased), ByTheRule(count, reference, isUnbiased))
-                << "a seed of 0 goes on";
+                << "a seed of 0 continues the stream";
             EXPECT_EQ(state.s2, reference.s2);
             qx::RandomSeed(5, reference);
             EXPECT_EQ(Numbers(count, 5, state, isUnbiased),
@@ -61,7 +59,7 @@ TEST(Shuffles, FollowTheStream) {
         }
 }
 
-// Every element type moves as the indices tell, with and without bias.
+// Arrays of every element type move like the indices, with and without bias.
 TEST(Shuffles, ArraysMoveWithTheirIndices) {
     constexpr int32_t n = 300;
     for (const int32_t unbiased : {-1, 0, 1}) {
@@ -96,9 +94,9 @@ TEST(Shuffles, ArraysMoveWithTheirIndices) {
     }
 }
 
-// Of three elements the six orders are equally likely; the biased form makes 27 equally likely
-// draws, of which three orders get 4 and three get 5.
-TEST(Shuffles, OrdersAreAsLikelyAsTold) {
+// The six orders of three elements are equally likely; in the biased form there are 27 equally
+// likely draws, of which three orders get 4 each and three get 5.
+TEST(Shuffles, OrdersAreAsLikelyAsDocumented) {
     constexpr int32_t rounds = 270000;
     for (const bool isUnbiased : {true, false}) {
         RandomState state = start;
@@ -135,8 +133,8 @@ Order CounterNumbers(int32_t count, int32_t key, int32_t stream, double position
     return indices.values();
 }
 
-// All 24 orders of 4 numbers by chi-square with 23 degrees of freedom; the place of number 0 among 300
-// by one with 299.
+// All 24 orders of 4 numbers, by chi-square with 23 degrees of freedom; the position of number 0
+// among 300, by chi-square with 299.
 TEST(CounterShuffles, MakeAllOrdersEquallyLikely) {
     constexpr int32_t draws = 48000;
     std::map<Order, int> orders;
@@ -191,3 +189,4 @@ TEST(CounterShuffles, MoveElementsWithTheirNumbers) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -9,8 +9,8 @@
 namespace qx {
 namespace {
 
-// A window is its inner routine on the caller's array; the real and the complex export are the
-// same over another kind of sample.
+// Each export applies the inner routine of its window to the caller's array; the real and the
+// complex export are one template over the type of sample.
 
 template <class Handle>
 ErrorCode Kaiser(InOut<Handle> x, double beta) {
@@ -87,7 +87,8 @@ ErrorCode Symmetric(InOut<Handle> x, int32_t selector, double param) {
     return ApplySymmetricWindow(selector, x.view(), param);
 }
 
-// kept: a negative size leaves the constants alone; any other failure settles them.
+// kept: a negative size leaves the constants unchanged; any other failure sets them to their values
+// after a failure.
 template <class Handle>
 ErrorCode Scaled(InOut<Handle> x, int32_t selector, double param, WindowConstants *constants) {
     if (x.hasNegativeSize())
@@ -101,7 +102,7 @@ ErrorCode Scaled(InOut<Handle> x, int32_t selector, double param, WindowConstant
 template <class Handle>
 ErrorCode BySelector(InOut<Handle> x, int32_t selector, double param, int32_t scaled,
                      int32_t symmetric) {
-    // The scaled form alone tells a negative size from an empty array.
+    // Only the scaled form distinguishes a negative size from an empty array.
     if (scaled != 0 && symmetric == 0 && x.hasNegativeSize())
         return ErrNegativeDimension;
     return ApplyWindowBySelector(x.view(), selector, param, scaled != 0, symmetric != 0);
@@ -200,7 +201,7 @@ ErrorCode CxAllWinH(CDB1D x, int32_t selector, double param, int32_t scaled, int
     return Returned(qx::BySelector<CDB1D>, x, selector, param, scaled, symmetric);
 }
 
-// The oldest: the code travels in *err.
+// The oldest exports, which return the code in *err.
 
 int32_t Kaiser_Bessel(DBL1D x, const DBL *beta, ErrorCode *err) {
     return InErr(err, qx::Kaiser<DBL1D>, x, *beta);

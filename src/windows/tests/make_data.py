@@ -60,7 +60,7 @@ def chebyshev(order, y):
 
 
 def dolph_chebyshev(length, ratio):
-    """Plain sum over all frequencies, no symmetry used: the window centred on (length - 1) / 2."""
+    """Plain sum over all frequencies, without using symmetry; the window is centred on (length - 1) / 2."""
     order = length - 1
     x0 = cosh(acosh(mpf(ratio)) / order)
     middle = mpf(order) / 2

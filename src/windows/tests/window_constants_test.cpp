@@ -47,7 +47,7 @@ TEST(WindowConstants, AreStoredOrMeasured) {
     EXPECT_EQ(WinConstByNameH(7, 1, 0, &c), 0);
     EXPECT_EQ(c.enbw, 1.5);
     EXPECT_EQ(c.cg, 0.5);
-    // Measured over a long window the shapes come near the figures of the literature.
+    // Measured over a long window, the constants are close to the figures in the literature.
     for (const auto &[selector, enbw] : std::vector<std::pair<int32_t, double>>{{30, 4.0 / 3.0},
                                                                                 {31, 1.45584787},
                                                                                 {32, 1.78574087544},
@@ -56,7 +56,7 @@ TEST(WindowConstants, AreStoredOrMeasured) {
         EXPECT_EQ(WinConstByNameH(100000, selector, 0, &c), 0);
         EXPECT_NEAR(c.enbw, enbw, 5e-9) << selector;
     }
-    // The stored figures stand on their own, but near those of the coefficients.
+    // The stored figures are not computed, but are close to those of the coefficients.
     const std::vector<std::pair<int32_t, Values>> sums{
         {1, {0.5, 0.5}},
         {2, {0.54, 0.46}},

@@ -25,7 +25,7 @@ using qx::test::DBLArray;
 const double nan = std::numeric_limits<double>::quiet_NaN();
 typedef std::vector<double> Values;
 
-// A window export as a function of ones.
+// The window of an export: the result of applying it to ones.
 Values WindowOf(int n, const std::function<ErrorCode(DBL1D)> &apply, ErrorCode expected = 0) {
     const DBLArray x(Values(static_cast<std::size_t>(n), 1.0));
     EXPECT_EQ(apply(x.handle()), expected);
@@ -69,8 +69,8 @@ TEST(Windows, EverySelectorAgreesWithItsFormula) {
         SCOPED_TRACE(std::to_string(row.selector) + " " + row.form + " " +
                      std::to_string(row.param) + " " + std::to_string(row.w.size()));
         const int n = static_cast<int>(row.w.size());
-        // The Bessel series of the Kaiser window stops at terms of 1e-8; the cosines behind
-        // Dolph-Chebyshev come from a recurrence whose error grows with the square of n.
+        // The Bessel series of the Kaiser window stops at terms of 1e-8; the cosines of the
+        // Dolph-Chebyshev window come from a recurrence whose error grows with the square of n.
         const double bound = row.selector == 60 ? 1e-8 : (row.selector == 61 ? 1e-11 : 2e-15);
         const bool isSymmetric = row.form == "symmetric";
         if (isSymmetric && row.selector == 30 && n == 2)
@@ -90,8 +90,8 @@ TEST(Windows, EverySelectorAgreesWithItsFormula) {
     }
 }
 
-// One call per family export against the dispatcher, real and complex.
-TEST(Windows, FamilyExportsAndTheDispatcherAreOne) {
+// Compares one call of each family export with the dispatcher, real and complex.
+TEST(Windows, FamilyExportsAgreeWithTheDispatcher) {
     typedef std::function<ErrorCode(DBL1D)> Real;
     typedef std::function<ErrorCode(CDB1D)> Complex;
     struct Pair {
@@ -159,7 +159,7 @@ TEST(Windows, TheRotationStaysAccurateOverAMillionSamples) {
     EXPECT_LT(worst, 1e-13) << "relative to the peak of 1";
 }
 
-// The rotation with any number of terms, which takes another road than the named windows.
+// The rotation with any number of terms, which uses other code than the named windows.
 TEST(Windows, ManyTermsRotateLikeTheNamedWindows) {
     constexpr int n = 1000000;
     const DBLArray coefs{0.27105140069342415,
@@ -175,8 +175,8 @@ TEST(Windows, ManyTermsRotateLikeTheNamedWindows) {
               WindowOf(n, [](DBL1D x) { return AllCosWinH(x, 8, 0); }));
 }
 
-// The series stops behind the first term of at most 1e-8, and after 25 terms in any case.
-TEST(Windows, TheKaiserSeriesIsCutShortWhereItAlwaysWas) {
+// The series stops after the first term of at most 1e-8, and in any case after 25 terms.
+TEST(Windows, TheKaiserSeriesIsTruncatedAsDocumented) {
     const auto series = [](long double beta, int terms) {
         long double sum = 1, term = 1;
         for (int k = 1; k <= terms; ++k)
@@ -187,11 +187,11 @@ TEST(Windows, TheKaiserSeriesIsCutShortWhereItAlwaysWas) {
         return WindowOf(2, [=](DBL1D x) { return KaiserH(x, beta); })[0];
     };
     EXPECT_NEAR(edge(1.0) * static_cast<double>(series(1, 6)), 1.0, 4e-16);
-    EXPECT_GT(static_cast<double>(series(1, 7) / series(1, 6)) - 1.0, 1e-12) << "it shows";
+    EXPECT_GT(static_cast<double>(series(1, 7) / series(1, 6)) - 1.0, 1e-12) << "visible";
     EXPECT_NEAR(edge(100.0) * static_cast<double>(series(100, 25)), 1.0, 1e-15);
 }
 
-// A step of the formula that leaves the range of double is no failure.
+// Overflow in an intermediate step of the formula is not a failure.
 TEST(Windows, ParametersBeyondTheRangeOfDoubleGiveNaN) {
     const auto isNaN = [](double w) { return std::isnan(w); };
     const auto count = [&](const std::function<ErrorCode(DBL1D)> &apply) {
@@ -214,7 +214,7 @@ TEST(Windows, ParametersBeyondTheRangeOfDoubleGiveNaN) {
     EXPECT_EQ(gauss[7] + gauss[9], 0.0);
 }
 
-TEST(Windows, TapersAndCutsEndWhereTheyShould) {
+TEST(Windows, TapersAndCutsHaveTheirExactEnds) {
     const auto taper = [](int n, double ratio) {
         return WindowOf(n, [=](DBL1D x) { return CosTaperedH(x, ratio); });
     };
@@ -237,7 +237,7 @@ TEST(Windows, TapersAndCutsEndWhereTheyShould) {
     EXPECT_EQ(CxCosTaperedH(z.handle(), 0.5), 0);
     for (int i = 0; i < 12; ++i)
         EXPECT_NEAR(z[i].im, 2.0 * sines[static_cast<std::size_t>(i)], 1e-15);
-    // The complex form takes each phase afresh, the real form adds the steps up.
+    // The complex form computes each phase separately, the real form accumulates the steps.
     constexpr int length = 1000, half = 450;
     const CDBArray fresh(std::vector<CDB>(length, CDB{1.0, 1.0}));
     EXPECT_EQ(CxCosTaperedH(fresh.handle(), 0.9), 0);
@@ -322,7 +322,7 @@ TEST(Windows, SelectorsAreCheckedInEveryForm) {
         EXPECT_EQ(code(selector, 0, 1), cosine || shape ? 0 : ErrInvalidSelector) << selector;
         EXPECT_EQ(code(selector, 1, 1), ErrInvalidSelector);
     }
-    // Defaults stand in for NaN, and for what is negative where that makes no sense.
+    // Defaults replace NaN, and negative numbers where these are meaningless.
     const auto all = [](int32_t selector, double param) {
         return WindowOf(16, [=](DBL1D x) { return AllWinH(x, selector, param, 0, 0); });
     };
@@ -366,7 +366,7 @@ TEST(Windows, AScaledWindowHasACoherentGainOfOne) {
     (*negative.handle())->dimSize = -1;
     constants = {7, 7};
     EXPECT_EQ(ScaledWinH(negative.handle(), 99, 0, &constants), ErrNegativeDimension);
-    EXPECT_EQ(constants.enbw, 7.0) << "the constants are left alone";
+    EXPECT_EQ(constants.enbw, 7.0) << "the constants are not changed";
     EXPECT_EQ(negative.size(), 0);
 }
 

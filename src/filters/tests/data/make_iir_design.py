@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""Gains by SciPy for iir_design_test: family, order, type, fl, fh, ripple, attenuation, frequency, gain
-in decibels, with frequencies in units of the sampling rate, all in the pass band.
+"""Gains computed by SciPy for iir_design_test: family, order, type, fl, fh, ripple, attenuation, frequency, gain
+in decibels. Frequencies are in units of the sampling rate and lie in the pass band.
 
 usage: make_iir_design.py > iir_design.dat
 """
@@ -55,7 +55,7 @@ for family in ["BW", "Chebyshev", "InvChebyshev", "Elliptic", "Bessel"]:
             low, high = np.atleast_1d(band)[0], np.atleast_1d(band)[-1]
             for frequency in pass_band(kind, band):
                 level = gain(z, p, k, frequency)
-                # The edge of an inverse Chebyshev filter is that of its stop band.
+                # The edge of an inverse Chebyshev filter is the edge of its stop band.
                 if level > -6:
                     print(family, order, type_, *(float(v).hex() for v in (
                         low, high, ripple, attenuation, frequency, level)))

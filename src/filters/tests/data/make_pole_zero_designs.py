@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Poles, zeros and gains of IIR filters at 50 digits for iir_design_test, by the reference of
 tools/accuracy/filter_poles.py: family, order, type, fl, fh, ripple, attenuation, what (0 a pole, 1 a zero, 2
-the gain), real part, imaginary part; of conjugates the one above the real axis.
+the gain), real part, imaginary part; of a conjugate pair, the one above the real axis.
 
 usage: make_pole_zero_designs.py > pole_zero_designs.dat
 """
@@ -22,7 +22,7 @@ CASES = ((1, 0, HIGH), (2, 1, WIDE), (3, 0, WIDE), (3, 1, HIGH), (3, 2, WIDE), (
 for name, family in NAMES.items():
     for order, type_, (fl, fh) in CASES:
         zeros, poles, gain = digital(FAMILIES[family](order, RIPPLE, ATTENUATION), order, type_, fl, fh)
-        at_edges = name not in ("InvChebyshev", "Elliptic")  # all zeros are one or two places then
+        at_edges = name not in ("InvChebyshev", "Elliptic")  # then all zeros lie at one or two points
         for what, values in enumerate((poles, zeros[:0] if at_edges else zeros, [gain])):
             for value in map(complex, values):
                 if value.imag > -1e-25:

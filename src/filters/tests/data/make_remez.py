@@ -1,7 +1,7 @@
 #!/usr/bin/python3
-"""Equiripple filters by SciPy for fir_design_test: kind (as of Parks), taps, for each band the desired
-value, its edges and its weight, then the greatest weighted deviation of SciPy's taps over the grid
-of the design. Frequencies in units of the sampling rate. Only what SciPy designs is written.
+"""Equiripple filters by SciPy for fir_design_test: kind (as for Parks), taps, for each band the desired
+value, its edges and its weight, then the largest weighted deviation of SciPy's taps over the grid
+of the design. Frequencies are in units of the sampling rate. Designs that SciPy fails to make are left out.
 
 usage: make_remez.py > remez.dat
 """
@@ -14,14 +14,14 @@ noise = np.random.default_rng(20)
 
 
 def grid(kind, taps, bands):
-    """Sixteen points an extremum, each band to its upper edge."""
+    """The grid: sixteen points per extremum, each band including its upper edge."""
     functions = taps // 2 + (taps % 2 and kind == 0)
     step = 0.5 / (16 * functions)
     points = []
     for b, (desired, low, high, weight) in enumerate(bands):
         f = max(low, step) if b == 0 and kind else low
         part = np.append(np.arange(f, high, step), high)
-        # The last step before the edge gives way to it.
+        # The last point before the edge is replaced by the edge.
         points += [(f, desired, weight) for f in np.delete(part, -2) if len(part) > 1] or [
             (high, desired, weight)]
     zero_at_nyquist = (kind == 0) != (taps % 2 == 1)

@@ -1,10 +1,10 @@
-"""Random bounded least-squares problems and what SciPy's least_squares makes of them.
+"""Random bounded least-squares problems and their solutions by SciPy's least_squares.
 
     make_bounded_fits.py > bounded_fits.dat
 
-A line is: model, n, seed, samples with weights or without (1, 0), the parameters and the noise that
-the samples are made of, guess, lower bounds, upper bounds, then the cost (the mean of w r^2) and
-the parameters of the optimum. The samples follow from the seed, here and in the test: x is
+Each line has: model, n, seed, whether samples have weights (1 or 0), the parameters and the noise level of
+the samples, guess, lower bounds, upper bounds, then the cost (the mean of w r^2) and
+the parameters of the optimum. The samples are generated from the seed, here and in the test: x is
 x0 + (i + u / 2) step, y the model plus noise times v, w is 1 + t / 2, with u, v, t from one stream
 of numbers in [-1, 1).
 """
@@ -52,7 +52,7 @@ def line(x, p):
     return p[0] * x + p[1]
 
 
-# Per model: the function, the range of x, and a maker of true parameters.
+# For each model: the function, the range of x, and a function that draws true parameters.
 MODELS = {
     "exponential": (exponential, (0.0, 4.0),
                     lambda r: [r.choice([-1, 1]) * r.uniform(1, 5), r.choice([-1, 1]) * r.uniform(.2, 1.5),
@@ -94,7 +94,7 @@ def problem(random, model, seed):
     guess = [short(v * random.uniform(0.8, 1.25)) for v in p]
     lower, upper = [], []
     for v in p:
-        # Boxes that hold the parameter, cut it off, or fix it; some sides are open.
+        # Bounds that contain the parameter, exclude it, or fix it; some sides are open.
         centre = v + random.choice([0, 0, 0.3, -0.3]) * abs(v)
         width = abs(v) * random.uniform(0.05, 0.6)
         sides = [short(centre - width), short(centre + width)]
@@ -124,7 +124,7 @@ def optimum(model, n, seed, weighted, p, sigma, guess, lower, upper):
     if not free.any():
         return np.mean(residuals([]) ** 2), full
     inside = np.clip(guess, lower, upper)[free]
-    # A start on a bound would be moved inwards with a warning.
+    # SciPy would move a start on a bound inwards, with a warning.
     best = least_squares(residuals, inside, bounds=(lower[free], upper[free]), x_scale="jac",
                          ftol=1e-15, xtol=1e-15, gtol=1e-15, max_nfev=2000)
     residuals(best.x)

@@ -1,5 +1,5 @@
-"""Writes fit_bounds.dat: quantiles of Student's distribution by mpmath with 40 digits, and what R's
-lm, confint and predict give for data sets that come with R. Needs python3-mpmath and r-base-core.
+"""Writes fit_bounds.dat: quantiles of Student's distribution by mpmath with 40 digits, and the results of R's
+lm, confint and predict for data sets that come with R. Needs python3-mpmath and r-base-core.
 
     /usr/bin/python3 make_fit_bounds.py > fit_bounds.dat
 """

@@ -1,4 +1,4 @@
-"""The linear part of docs/accuracy/fitting.md, from the built module and nist_linear.dat.
+"""Prints the table of linear models of docs/accuracy/fitting.md, from the built module and nist_linear.dat.
 
     QX_LIBRARY_DIR=build/release PYTHONPATH=python make_fitting.py
 """
@@ -31,7 +31,7 @@ def digits(found, exact):
 
 
 def fit(kind, k, y, x, algorithm):
-    """Coefficients, standard deviations, MSE, or None where the method fails."""
+    """Coefficients, standard deviations and sum of squares, or None if the method fails."""
     try:
         matrix = np.vander(x[:, 0], k, increasing=True) if kind == "polynomial" else x
         c, _, covariance, mse = qx.call("GenLSFit80_head", matrix, y, [], algorithm, 1)
@@ -46,7 +46,7 @@ def fit(kind, k, y, x, algorithm):
 
 
 def revised(kind, k, y, x):
-    """The same of GenLSFit2026_head and PolyFit2026_head."""
+    """The same by GenLSFit2026_head and PolyFit2026_head."""
     matrix = np.vander(x[:, 0], k, increasing=True) if kind == "polynomial" else x
     c, _, covariance, mse = qx.call("GenLSFit2026_head", matrix, y, [], -1.0, 1)
     squares = mse * len(y)

@@ -4,7 +4,7 @@
 
 The data are those of https://www.itl.nist.gov/div898/strd/lls/lls.shtml (a work of the United
 States government, free of rights). They are decimal numbers, so the coefficients, their variances
-and the residuals are found in rational arithmetic; the script compares them with the certified
+and the residuals are computed in rational arithmetic; the script compares them with the certified
 values, which have 15 digits. The sets of Wampler are polynomials of degree 5, to which the last
 three add multiples of a vector that is orthogonal to them (R. H. Wampler, "A report on the accuracy
 of some widely used least squares computer programs", 1970).
@@ -111,7 +111,7 @@ SETS = [
 
 
 def solve(matrix, right):
-    """Gauss and Jordan's elimination; the matrix is regular."""
+    """Gauss-Jordan elimination; the matrix is regular."""
     n = len(matrix)
     rows = [row + extra for row, extra in zip(matrix, right)]
     for i in range(n):

@@ -1,10 +1,10 @@
-"""Gathers the nonlinear regression sets of NIST's Statistical Reference Datasets in one table.
+"""Collects the nonlinear regression sets of NIST's Statistical Reference Datasets in one file.
 
     make_nist_nonlinear.py FOLDER > nist_nonlinear.dat
 
-FOLDER holds the 27 files Misra1a.dat ... as NIST gives them at
+FOLDER contains the 27 files Misra1a.dat ... from
 https://www.itl.nist.gov/div898/strd/nls/nls_main.shtml (a work of the United States government,
-free of rights). The figures are copied as they are written there.
+free of rights). The figures are copied as they are printed there.
 """
 
 import re

@@ -1,10 +1,10 @@
 #!/usr/bin/python3
-"""Fits by SciPy's least_squares, each the best of many starts, for the tests.
+"""Fits by SciPy's least_squares for the tests, each the best of many starts.
 
     make_nonlinear_fits.py > nonlinear_fits.dat
 
-Two kinds of problems: models with bounds and losses from one start, and noisy Gaussian peaks and dips
-without any. Samples are rounded to 6 digits, so that the file has what was fitted.
+There are two kinds of problems: models with bounds and losses and a given start, and noisy Gaussian peaks and dips
+without a start. Samples are rounded to 6 digits, so that the file has exactly the samples that were fitted.
 """
 
 import sys
@@ -48,7 +48,7 @@ def write(*lines):
 
 
 def boxes(rng, truth):
-    """Bounds that hold the answer, cut it off or fix a parameter."""
+    """Bounds that contain the answer, exclude it or fix a parameter."""
     count = len(truth)
     lower, upper = np.full(count, -np.inf), np.full(count, np.inf)
     if rng.uniform() < 0.6:
@@ -71,7 +71,7 @@ def bounded(rng, name, loss):
     lower, upper = boxes(rng, truth)
     start = np.clip(rounded(truth * rng.uniform(0.8, 1.25, len(truth))), lower, upper)
     found = best(model, x, y, w, [start, truth], lower, upper, LOSSES[loss], 0.25)
-    if np.any(np.abs(found.x) > 20):  # a valley that goes on to infinity
+    if np.any(np.abs(found.x) > 20):  # a valley that extends to infinity
         return bounded(rng, name, loss)
     return write(("fit", name, loss, n, float(found.cost)), [*start.tolist()], [*lower.tolist()], [*upper.tolist()],
                  [*found.x.tolist()], y.tolist(), w.tolist())

@@ -1,8 +1,8 @@
 #include <cstdint>
 #include <cstdio>
 
-// A host of one function, which says where it was found. QX_FAKE_NAME tells which host this is;
-// QX_FAKE_MARK is the name by which a main program is known as a host.
+// A host with one function, which reports where it was found. QX_FAKE_NAME identifies this host;
+// QX_FAKE_MARK is the name that marks a main program as a host.
 
 #ifdef _WIN32
 #define QX_FAKE_EXPORT extern "C" __declspec(dllexport)

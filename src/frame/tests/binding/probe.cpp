@@ -4,9 +4,9 @@
 #include <cstdio>
 #include <cstring>
 
-// Loads the libraries that are named, hands the one behind "set" to SetQXRTModule, and reserves
-// the workspace, which asks the host to register a sweep. A fatal message goes to the standard
-// error as "caption: text".
+// Loads the named libraries, passes the one after "set" to SetQXRTModule, and reserves the
+// workspace, for which the host must register a sweep. A fatal message is written to standard error
+// as "caption: text".
 int main(int argc, char **argv) {
     PrintFatalMessages();
     for (int i = 1; i < argc; ++i) {

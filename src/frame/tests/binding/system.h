@@ -1,11 +1,11 @@
 #ifndef QX_FRAME_TESTS_BINDING_SYSTEM_H
 #define QX_FRAME_TESTS_BINDING_SYSTEM_H
 
-// What the probe needs of its platform.
+// The platform-dependent functions of the probe.
 
 void *LoadModule(const char *path);
 
-// Where a fatal message is a box on the screen, it is intercepted and printed.
+// Intercepts and prints fatal messages on platforms that show them in a message box.
 void PrintFatalMessages();
 
 #endif

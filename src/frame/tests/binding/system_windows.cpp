@@ -18,22 +18,22 @@ int WINAPI PrintMessageBox(HWND owner, LPCSTR text, LPCSTR caption, UINT style) 
 }
 
 template <class T>
-T *At(unsigned char *image, DWORD offset) {
+T *At(unsigned char *image, ULONG_PTR offset) {
     return reinterpret_cast<T *>(image + offset);
 }
 
-// The word through which the module calls the imported function.
+// The address of the import table entry through which the module calls the function.
 void **ImportSlot(unsigned char *image, const char *function) {
     const auto *dos = At<IMAGE_DOS_HEADER>(image, 0);
-    const auto *headers = At<IMAGE_NT_HEADERS32>(image, static_cast<DWORD>(dos->e_lfanew));
+    const auto *headers = At<IMAGE_NT_HEADERS>(image, static_cast<DWORD>(dos->e_lfanew));
     const DWORD table =
         headers->OptionalHeader.DataDirectory[IMAGE_DIRECTORY_ENTRY_IMPORT].VirtualAddress;
     for (auto *dll = At<IMAGE_IMPORT_DESCRIPTOR>(image, table); dll->Name != 0; ++dll) {
-        const auto *name = At<IMAGE_THUNK_DATA32>(image, dll->OriginalFirstThunk);
+        const auto *name = At<IMAGE_THUNK_DATA>(image, dll->OriginalFirstThunk);
         auto *slot = At<void *>(image, dll->FirstThunk);
         for (; name->u1.AddressOfData != 0; ++name, ++slot) {
             const auto *byName = At<IMAGE_IMPORT_BY_NAME>(image, name->u1.AddressOfData);
-            if ((name->u1.Ordinal & IMAGE_ORDINAL_FLAG32) == 0 &&
+            if ((name->u1.Ordinal & IMAGE_ORDINAL_FLAG) == 0 &&
                 std::strcmp(reinterpret_cast<const char *>(byName->Name), function) == 0)
                 return slot;
         }

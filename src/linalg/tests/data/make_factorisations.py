@@ -1,5 +1,5 @@
 """Writes docs/accuracy/factorisations.md: residuals and orthogonality of factorisations and
-eigenproblems over kinds of matrices, beside LAPACK's (through SciPy) on the same matrices, and the
+eigenproblems over kinds of matrices, next to LAPACK's (through SciPy) for the same matrices, and the
 error of matrix functions against mpmath. Run from the repository's root with the library built:
 QX_LIBRARY_DIR=build/release PYTHONPATH=python /usr/bin/python3 \\
     src/linalg/tests/data/make_factorisations.py"""
@@ -47,7 +47,7 @@ def symmetric_errors(a, w, v):
 
 
 def pair_errors(a, w, v):
-    """The worst |a v - w v| / (|a| |v|), and no orthogonality."""
+    """The largest |a v - w v| / (|a| |v|), without a measure of orthogonality."""
     difference = wide(a) @ wide(v.astype(complex)) - wide(v.astype(complex)) * w
     scale = norm(a) * len(a) * EPSILON
     columns = np.sqrt(np.sum(np.abs(difference)**2, axis=0)) / np.linalg.norm(v, axis=0)
@@ -123,25 +123,26 @@ def main():
     refused = ", ".join(f"{kind} of order {n}" for n, kind in sorted(REFUSED)) or "none"
     text = f"""# Accuracy of factorisations, eigenproblems and matrix functions
 
-Worst errors over the orders {", ".join(map(str, ORDERS))}, in units of n times 2.2e-16, beside
-LAPACK's (through SciPy) on the same matrices: |a - product of the factors| / |a|, then how far the
-unitary factors are from it, |q^H q - 1|; of general eigenproblems the worst |a v - w v| / (|a| |v|).
+Largest errors over the orders {", ".join(map(str, ORDERS))}, in units of n times 2.2e-16, next to
+LAPACK's (through SciPy) for the same matrices: |a - product of the factors| / |a|, then the distance of
+the unitary factors from unitary, |q^H q - 1|; for general eigenproblems, the largest |a v - w v| / (|a| |v|).
 Written by `src/linalg/tests/data/make_factorisations.py`.
 
 {table}
 
-Refused by the general eigenproblem, whose iteration ends after 40 turns for one value: {refused}.
+Refused by the general eigenproblem, whose iteration stops after 40 steps for one value: {refused}.
 
-Where the residual of a general eigenproblem is large, balancing is the reason: it is small for the
-balanced matrix, which is another one where rows and columns differ much in size. LAPACK balances by
-Euclidean norms instead of sums of absolute values, and so leaves Frank's matrix and Vandermonde's alone.
+Where the residual of a general eigenproblem is large, the reason is balancing: the residual is small for the
+balanced matrix, but rows and columns that differ greatly in magnitude make the balanced matrix very different.
+LAPACK balances by Euclidean norms instead of sums of absolute values, and therefore leaves the Frank and
+Vandermonde matrices unchanged.
 
 Relative errors of matrix functions against mpmath with 60 digits (complex exports):
 
 {chr(10).join(functions())}
 
-The exponential stops at the degree that its bound of 1e-8 asks for, and the logarithm is refined
-against that exponential; so both are less accurate than the square root, though exp(log(a)) comes back.
+The exponential uses the degree that its bound of 1e-8 requires, and the logarithm is refined with that
+exponential; both are therefore less accurate than the square root, although exp(log(a)) reproduces a.
 """
     pathlib.Path("docs/accuracy/factorisations.md").write_text(text)
 

@@ -1,5 +1,5 @@
-"""Writes docs/accuracy/linear_systems.md: backward errors of the systems' solvers over kinds of
-matrices, beside LAPACK's (through SciPy) on the same matrices. Run from the repository's root with
+"""Writes docs/accuracy/linear_systems.md: backward errors of the solvers of systems for kinds of
+matrices, next to LAPACK's (through SciPy) for the same matrices. Run from the repository's root with
 the library built: QX_LIBRARY_DIR=build/release PYTHONPATH=python /usr/bin/python3 \\
     src/linalg/tests/data/make_linear_systems.py"""
 
@@ -92,16 +92,16 @@ def main():
         "# Accuracy of linear systems", "",
         "Worst backward errors over the orders " + ", ".join(map(str, ORDERS)) + ", in units of",
         "n times 2.2e-16, of the library and of LAPACK (through SciPy) on the same matrices:",
-        "|b - a x| / (|a| |x|) of the solvers, and of least squares (SVD, dgelsd) what is left of the",
-        "normal equations, |a^T (b - a x)| / (|a| (|a| |x| + |b|)). A solution that overflows and a",
-        "matrix that is refused as singular are left out. Cholesky solves a^T a / |a|^2 + 1/100.",
+        "|b - a x| / (|a| |x|) of the solvers, and the residual of the normal equations,",
+        "|a^T (b - a x)| / (|a| (|a| |x| + |b|)), of least squares (SVD, dgelsd). Solutions that overflow and",
+        "matrices that are refused as singular are left out. The matrix for Cholesky is a^T a / |a|^2 + 1/100.",
         "Written by `src/linalg/tests/data/make_linear_systems.py`.", "",
         "| Matrix | " + " | ".join(names) + " |", "|---" * (len(names) + 1) + "|"]
     for kind, row in table.items():
         lines.append(f"| {kind} | " + " | ".join(worst(row[name]) for name in names) + " |")
     mpmath.mp.dps = 60
-    lines += ["", "Forward errors for Hilbert's matrix, b = a (1, ..., 1), against the exact inverse"
-              " in 60 digits:", "", "| n | condition number | LU | dgesv |", "|---|---|---|---|"]
+    lines += ["", "Forward errors for the Hilbert matrix, b = a (1, ..., 1), against the exact inverse"
+              " with 60 digits:", "", "| n | condition number | LU | dgesv |", "|---|---|---|---|"]
     for n in (2, 4, 6, 8, 10, 12):
         a = 1.0 / (np.indices((n, n)).sum(0) + 1)
         b = a.sum(1)

@@ -29,7 +29,7 @@ def matrices():
 
 
 def similar(values, is_complex=False):
-    """A rounded matrix with about these eigenvalues."""
+    """A matrix with these eigenvalues, up to rounding."""
     n = len(values)
     with mpmath.workdps(60):
         v = mpmath.matrix([[mpmath.mpc(noise(), noise() if is_complex else 0) + (i == j) for j in range(n)]
@@ -60,7 +60,7 @@ def of_eigenvalues(a, function):
 
 
 def defective():
-    """u j u^-1 with whole numbers, where j has the Jordan block (4, 1; 0, 4, 1; 0, 0, 4) and a -9."""
+    """u j u^-1 in integers, where j has the Jordan block (4, 1; 0, 4, 1; 0, 0, 4) and a -9."""
     u = mpmath.matrix([[1, 2, 0, 1], [0, 1, 3, 0], [0, 0, 1, 2], [0, 0, 0, 1]])
     u = u.T * u
     functions = [(mpmath.mpf(4), mpmath.mpf(1), mpmath.mpf(0), mpmath.mpf(-9)),

@@ -1,8 +1,8 @@
 #!/usr/bin/python3
 """Writes scipy_rates.dat: streams at rational rates by scipy.signal.
 
-A line for each case: "upfirdn" or "resample_poly", up, down, the counts of samples, taps and
-outputs, then these three in hexadecimal. upfirdn gives sums without scale; resample_poly is centred
+Each case is a line: "upfirdn" or "resample_poly", up, down, the numbers of samples, taps and
+outputs, then these three arrays in hexadecimal. upfirdn computes unscaled sums; resample_poly is centred
 on the taps and scaled by up.
 """
 

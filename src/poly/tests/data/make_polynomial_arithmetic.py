@@ -1,6 +1,6 @@
-"""Writes docs/accuracy/polynomial_arithmetic.md: errors of the arithmetic of polynomials against
-mpmath with 100 digits, beside those of NumPy and SciPy on the same numbers. Run from the root of
-the repository with the library built:
+"""Writes docs/accuracy/polynomial_arithmetic.md: errors of polynomial arithmetic against mpmath with
+100 digits, next to those of NumPy and SciPy for the same numbers. Run from the root of the
+repository with the library built:
 QX_LIBRARY_DIR=build/release PYTHONPATH=python /usr/bin/python3 \\
     src/poly/tests/data/make_polynomial_arithmetic.py"""
 
@@ -33,9 +33,9 @@ def value(coefficients, x):
 def evaluation():
     yield "## Values"
     yield ""
-    yield ("Points at distances of about 1e-1 to 1e-3 from the multiple root, 400 each; relative "
-           "errors, and those of PolyEv and CxPolyEv in units of eps + gamma(2n)^2 times the "
-           "condition number, eps 2^-53.")
+    yield ("Largest relative errors at 400 points at distances of about 1e-1 to 1e-3 from the multiple "
+           "root; those of PolyEv and CxPolyEv also in units of eps + gamma(2n)^2 times the condition "
+           "number, with eps = 2^-53.")
     yield ""
     yield ("| Polynomial | largest condition | PolyEv or CxPolyEv | in units of the bound "
            "| numpy polyval |")
@@ -70,8 +70,8 @@ def largest_difference(found, true):
 def products_of_roots():
     yield "## Coefficients from roots"
     yield ""
-    yield ("Largest error relative to the largest coefficient, roots as they stand in double; "
-           "NumPy multiplies products of halves of the roots.")
+    yield ("Largest error relative to the largest coefficient, for roots rounded to double. "
+           "NumPy splits the roots into halves and multiplies the products of the halves.")
     yield ""
     yield "| Roots | PolyFromRootsH | CxPolyFromRootsH | numpy polyfromroots |"
     yield "|---|---|---|---|"
@@ -95,9 +95,9 @@ def products_of_roots():
 def common_divisors():
     yield "## Common divisors"
     yield ""
-    yield ("Of 500 pairs each with random factors of degree 1 to 10 (coefficients normally "
-           "distributed), how many divisors have the right degree, and the median and largest error "
-           "of their coefficients relative to the largest. Noise is relative to the 2-norm.")
+    yield ("For 500 pairs each with random factors of degree 1 to 10 (coefficients normally "
+           "distributed): how many divisors have the right degree, and the median and largest error "
+           "of their coefficients relative to the largest coefficient. Noise is relative to the 2-norm.")
     yield ""
     yield ("| Noise | tolerance | right degree | median error | largest error "
            "| largest distance / noise |")
@@ -137,8 +137,8 @@ def sum_of_fractions(part, poles, residues, x):
 def partial_fractions():
     yield "## Partial fractions"
     yield ""
-    yield ("The sum of the fractions against the quotient at 50 points, largest error relative to "
-           "the sum of the moduli of its terms; scipy.signal.residue with its tolerance 1e-3.")
+    yield ("The sum of the fractions is compared with the quotient at 50 points: largest error relative "
+           "to the sum of the moduli of its terms. scipy.signal.residue has its default tolerance, 1e-3.")
     yield ""
     yield "| Denominator | PartialFractionsH | scipy residue |"
     yield "|---|---|---|"

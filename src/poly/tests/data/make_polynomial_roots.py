@@ -1,5 +1,5 @@
 """Writes docs/accuracy/polynomial_roots.md: forward errors of the roots of polynomials against
-mpmath, beside those of numpy.roots (LAPACK's eigenvalues) on the same coefficients, and how often
+mpmath, next to those of numpy.roots (LAPACK's eigenvalues) for the same coefficients, and how often
 multiplicities are recovered. Run from the repository's root with the library built:
 QX_LIBRARY_DIR=build/release PYTHONPATH=python /usr/bin/python3 \\
     src/poly/tests/data/make_polynomial_roots.py"""
@@ -47,7 +47,7 @@ def expanded(structure):
 
 
 def matched_errors(found, roots):
-    """Relative errors, each root with its nearest one of those found and not taken yet."""
+    """Relative errors; each root is matched with the nearest computed root that is not matched yet."""
     found = list(found)
     errors = []
     for root in roots:
@@ -160,7 +160,7 @@ def structure_table():
 
 
 def some_structure(random):
-    """Of degree 3 at least: below that each root counts by itself."""
+    """Of degree 3 at least: below that, roots are not merged."""
     while True:
         roots = random.permutation([-2.0, -1.2, -0.5, 0.4, 1.0, 1.7])[:random.integers(2, 5)]
         structure = {root: int(random.integers(1, 5)) for root in roots}
@@ -196,36 +196,36 @@ def main():
     stuck = ", ".join(map(str, stuck_degrees(150)))
     page = f"""# Accuracy of polynomial roots
 
-Written by `src/poly/tests/data/make_polynomial_roots.py`; numpy.roots takes the eigenvalues of the
-companion matrix by LAPACK.
+Written by `src/poly/tests/data/make_polynomial_roots.py`; numpy.roots computes the eigenvalues of
+the companion matrix with LAPACK.
 
-Largest relative errors of a root against mpmath with 80 digits, for coefficients as they stand in
-double. The condition number of a root says by how much it moves for a relative change of all
-coefficients; no method in double can be held to less than that, and CxPolyRoots2026_head works with
-twice the digits at its end. The last four columns have the errors
-in the same order in units of each root's own condition number times the degree times 2.2e-16.
+Largest relative errors of a root against mpmath with 80 digits, for coefficients rounded to double. The
+condition number of a root says how far it moves for a relative change of all coefficients; no method
+in plain double precision can be expected to do better. CxPolyRoots2026_head ends with steps in twice the
+precision. The last four columns have the errors, in the same order, in units of each root's own condition
+number times the degree times 2.2e-16.
 
 {chr(10).join(simple_table())}
 
-Newton's method with deflation keeps roots of very different size apart, and eigenvalues do not:
+Newton's method with deflation resolves roots of very different magnitude, and the eigenvalues do not:
 "small" has a root at 1 and three around 1e-30. Two digits are lost where deflation begins in the
-middle of many roots on a line. Where clustered roots are one within the tolerance (1e-10),
-MultPolyRoots_head takes them for one.
+middle of many roots on a line. MultPolyRoots_head merges clustered roots that are one multiple root within its
+tolerance (1e-10).
 
 The search of CxPolyRoots_head can get stuck where the polynomial is flat to the last bit, as x^n - 1
-is around 0. It then ends in ErrIterationLimit: of n from 3 to 150 for {stuck}.
+is around 0. It then ends with ErrIterationLimit: of n from 3 to 150, for {stuck}.
 
-Residuals |p(z)| / sum of |a[i]| |z|^i in units of n eps, for normal random coefficients: the worst,
-and of how many polynomials it is above 4 or no roots came out.
+Residuals |p(z)| / sum of |a[i]| |z|^i in units of n eps, for normally distributed coefficients: the largest, and
+the number of polynomials for which it is above 4 or no roots were found.
 
 {chr(10).join(residual_table())}
 
-Multiple roots: the largest relative distance of a root found from the nearest true one.
+Multiple roots: the largest relative distance of a computed root from the nearest true one.
 
 {chr(10).join(structure_table())}
 
 Polynomials with 2 to 4 distinct roots out of -2, -1.2, -0.5, 0.4, 1 and 1.7, of multiplicities 1 to
-4, with noise on their coefficients: how often all multiplicities come out as they are.
+4, with noise on their coefficients: how often all multiplicities are recovered.
 
 {chr(10).join(recovery_table())}
 """

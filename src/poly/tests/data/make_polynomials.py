@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Writes polynomials.dat: polynomials with coefficients in double and their roots to 50 digits
-(mpmath), rounded. A line: NAME DEGREE, the coefficients from the constant term on, and for each root
-its condition number, by how much it changes for a relative change of all coefficients. Numbers are
+(mpmath), rounded. Each line has NAME DEGREE, the coefficients from the constant term on, and each root with
+its condition number, the relative change of the root for a relative change of all coefficients. Numbers are
 hex floats; coefficients and roots have a real and an imaginary part."""
 
 import random

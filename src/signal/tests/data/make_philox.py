@@ -1,6 +1,6 @@
 #!/usr/bin/python3
-"""Blocks of Philox4x32-10 for noise_test, by the definition in whole numbers: key, stream, position, kind, then
-words 1 and 2. The same text with words of 64 bits is held against NumPy's Philox first.
+"""Blocks of Philox4x32-10 for noise_test, by the definition in integers: key, stream, position, kind, then
+words 1 and 2. The same code with words of 64 bits is first compared with NumPy's Philox.
 
 usage: make_philox.py > philox.dat
 """
@@ -27,7 +27,7 @@ for _ in range(100):
     words = [draw.getrandbits(64) for _ in range(6)]
     theirs = np.random.Philox(counter=np.array(words[:4], np.uint64),
                               key=np.array(words[4:], np.uint64)).random_raw(4)
-    ahead = (sum(word << 64 * i for i, word in enumerate(words[:4])) + 1) % 2**256  # NumPy counts first
+    ahead = (sum(word << 64 * i for i, word in enumerate(words[:4])) + 1) % 2**256  # NumPy increments the counter first
     assert philox([ahead >> 64 * i & 2**64 - 1 for i in range(4)], words[4:], 64) == [int(x) for x in theirs]
 
 for _ in range(40):

@@ -1,8 +1,8 @@
 #!/usr/bin/python3
 """Values by mpmath at 40 digits for special_bessel_test: export, arguments, output, value, tolerance.
 
-The tolerance is absolute: so many eps of the value or, where the function oscillates, of its
-modulus. Points stand on both sides of each threshold of a method.
+The tolerance is absolute: a multiple of eps times the value or, where the function oscillates, its
+modulus. Points lie on both sides of each threshold between methods.
 
 usage: make_bessel.py > bessel.dat
 """
@@ -30,7 +30,7 @@ for n, x in [(2, 0.5), (5, 5.5), (30, 28), (30, 33), (150, 20), (150, 149.5), (1
              (107, 0.10170048004340347), (60, 1000.5)]:
     row("BesselJr", [n, x], 0, mpmath.besselj(n, mpf(x)), 5, wave(n, x))
     row("BesselYr", [n, x], 0, mpmath.bessely(n, mpf(x)), 9, wave(n, x))
-for n in (200, 200.5, 1234, 1234.5):  # expansions for large order and their seams
+for n in (200, 200.5, 1234, 1234.5):  # expansions for large order and their boundaries
     for f in [0.2, 0.97, 1.0, 1.1, 3, 40] + list(sides(0.6, 1.7)):
         x = n * f
         row("BesselJr", [n, x], 0, mpmath.besselj(mpf(n), mpf(x)), 4000, wave(n, x))

@@ -14,7 +14,7 @@ for m in [0, 1e-10, 0.3, 0.9, 0.999, 1 - 2.0**-40] + list(sides(0.5)):
         row("Elliptic2", [m, phi], 0, mpmath.ellipe(mpf(phi), mpf(m)), 8)
     row("Elliptic1", [m, mpf("nan")], 0, mpmath.ellipk(mpf(m)), 5)
     row("Elliptic2", [m, mpf("nan")], 0, mpmath.ellipe(mpf(m)), 3)
-for phi in (-1.0, 1e-8, 0.7, 1.5):  # m = 1: a logarithm of what is near 1 for small phi, and a sine
+for phi in (-1.0, 1e-8, 0.7, 1.5):  # m = 1: a logarithm whose argument is near 1 for small phi, and a sine
     row("Elliptic1", [1, phi], 0, mpmath.atanh(mpmath.sin(mpf(phi))), 5, 1)
     row("Elliptic2", [1, phi], 0, mpmath.sin(mpf(phi)), 1)
 for phi in (3.0, -17.3):

@@ -5,7 +5,7 @@ import mpmath
 from mpmath import mpf
 from reference import row, sides
 
-# The zero of the digamma function among the positive numbers, where the error is absolute.
+# The positive zero of the digamma function, near which the error is absolute.
 for x in [1e-300, 1e-9, 0.3, 1.4616321449683623, 1.5, 5.5, 37.25, 1e5, 1e12, 1e300] + list(
         sides(1, 2, 7, 10, 1e9)) + [float(n) for n in range(1, 13)]:
     row("Psi", [x], 0, mpmath.digamma(mpf(x)), 7, 1)
@@ -17,13 +17,13 @@ for a in (1e-300, 1e-9, 0.5, 1.0, 2.5, 10.0, 18.566433578077874, 25.3, 33.5, 100
         value = mpmath.beta(mpf(a), mpf(b))
         row("BetaComplete", [a, b], 0, value, 12)
 for a, b in [(-2.5, 1.25), (-4.8178181157026057, -19.159449570182726), (-0.3, -0.7 + 2.0**-40), (3.2563498815717686, -17.5)]:
-    # beside the poles of gamma(a + b) the rounding of the sum would count a thousandfold
+    # next to the poles of gamma(a + b), the rounding of the sum would be magnified a thousandfold
     row("BetaComplete", [a, b], 0, mpmath.beta(mpf(a), mpf(b)), 16)
 for a, b, x in [(2.0, 3.0, 0.3), (0.5, 0.5, 0.999), (1.0, 7.0, 0.2), (12.5, 4.0, 0.75), (1e-3, 5.0, 1e-6)]:
     row("Beta", [a, b, x], 0, mpmath.betainc(mpf(a), mpf(b), 0, mpf(x), regularized=True), 14, 0.1)
 
 for n in list(range(0, 36)) + [49, 50]:
-    row("Fact", [n], 0, mpmath.factorial(n), 0.5)  # exact where a double is, else rounded correctly
+    row("Fact", [n], 0, mpmath.factorial(n), 0.5)  # exact where a double can be, otherwise correctly rounded
 for n in (51, 60, 100, 142, 143, 160, 166):
     row("Fact", [n], 0, mpmath.factorial(n), 5)
 for n in (2, 3, 10, 31, 32, 33, 170, 998, 999, 1000, 123456, 2**31 - 1):

@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Writes incomplete_beta.dat: both tails of the regularised incomplete beta function at the point
-p / (p + q), and logarithms in twice the precision, at 40 digits (mpmath), rounded to double. A line:
-NAME ARGUMENT ... VALUE, numbers as hex floats."""
+p / (p + q), and logarithms in twice the precision, at 40 digits (mpmath), rounded to double. Each line is
+NAME ARGUMENT ... VALUE, with numbers as hex floats."""
 
 import random
 from pathlib import Path
@@ -17,7 +17,7 @@ def line(name, arguments, value):
 
 
 def below(a, b, x, y):
-    """The part below x by the series of positive terms 2F1(a + b, 1; a + 1; x)."""
+    """The lower tail at x by the series 2F1(a + b, 1; a + 1; x), whose terms are positive."""
     front = exp(a * log(x) + b * log(y) - log(a) - loggamma(a) - loggamma(b) + loggamma(a + b))
     total = term = mpf(1)
     n = 0

@@ -7,7 +7,7 @@ from reference import row, sides
 
 
 def exponential(n, x):
-    """E_n(x). mpmath's own cancels unseen at large n and x (8 digits at 100, 100)."""
+    """E_n(x). mpmath's own function silently loses digits at large n and x (8 digits at 100, 100)."""
     if x <= 1 or n == 0:
         return mpmath.expint(n, x)
     tail = mpf(0)
@@ -29,7 +29,7 @@ for n in (0, 1, 2, 3, 7, 20, 100, 169, 170, 171, 1000, 5000, 5001, 100000):
     for x in [1e-300, 1e-9, 0.01, 0.5, 0.99, 3.0, 20.0, 100.0, 500.0] + list(sides(1)):
         if n == 0 and x < 1e-280:
             continue
-        # exp(-x) of the rounded argument is exact enough; the series cancels a little below 1
+        # exp(-x) of the rounded argument is exact enough; the series loses a few digits to cancellation below 1
         row("ExpI", [x, n], 0, exponential(n, mpf(x)), 12)
 
 for x in ORDINARY + [0.2, 1.3, 3.0, 5.5, 30.0, 400.0, 705.0] + list(sides(0.4, 2, 10)):

@@ -3,8 +3,8 @@
 
 usage: make_special_complex.py > special_complex.dat
 
-A line: NAME ORDER RE IM SCALED OUTPUT VALUE BOUND, output 0 the real and 1 the imaginary part; Airy
-functions have the order 0. mpmath knows no signed zero, so a z below the cut is taken from above it.
+Each line is NAME ORDER RE IM SCALED OUTPUT VALUE BOUND; output 0 is the real part and 1 the imaginary part; Airy
+functions have the order 0. mpmath has no signed zero, so values below the cut are computed above it.
 """
 
 import math
@@ -17,7 +17,7 @@ from reference import EPS
 mp.dps = 60
 CUT = -0.0
 
-# About each threshold of special/modified_complex.h, on both sides of it.
+# Points on both sides of each threshold of special/modified_complex.h.
 POINTS = [
     # power series, Temme's series and Miller's recurrences
     (0, 0.3 + 0.4j), (0, 1e-9 - 1e-9j), (0.3, 1.3 + 0.1j), (0.3, 1.4 + 0.1j), (0.5, 2.1j),
@@ -62,7 +62,7 @@ def pair(order, z):
 
 
 def modulus_of(one, other):
-    """The larger of the two where they are within 100 of each other, as where both oscillate."""
+    """The larger of the two where they are within a factor of 100 of each other, as where both oscillate."""
     larger, smaller = max(abs(one), abs(other)), min(abs(one), abs(other))
     return larger if larger < 100 * smaller else 0
 

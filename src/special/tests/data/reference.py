@@ -1,4 +1,4 @@
-"""What the scripts beside this one share: a line of a data file and points next to thresholds."""
+"""Shared by the scripts in this folder: lines of a data file and points next to thresholds."""
 
 import mpmath
 from mpmath import mp, mpf
@@ -15,9 +15,9 @@ def sides(*thresholds):
 
 
 def row(name, arguments, output, value, tolerance, scale=0):
-    """NAME ARGUMENT ... OUTPUT VALUE BOUND; the bound is absolute: so many eps of the value or,
-    where that is larger, of a scale. It stands at about four times the measured peak. What a
-    double cannot hold is left out."""
+    """Prints NAME ARGUMENT ... OUTPUT VALUE BOUND; the bound is absolute: a multiple of eps times the
+    larger of the value and a scale. It is about four times the measured peak. Values outside the range
+    of doubles are left out."""
     value = mpmath.re(value)
     if value != 0 and not 1e-290 < abs(value) < 1e308:
         return

@@ -2,7 +2,7 @@
 """Writes dct_dst.dat: SciPy's cosine (type II, orthonormal) and sine (type I) transforms.
 
 Each line: kind (dct, dst, dct2, dst2), rows, cols, then rows*cols inputs and as many results.
-SciPy's type I sine transform carries a factor 2 for each dimension, taken out here.
+SciPy's type I sine transform has a factor 2 for each dimension, which is removed here.
 """
 import numpy as np
 import scipy.fft
