@@ -438,13 +438,13 @@ void RealTwiddleKernel(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, 
 }
 
 // `count` neighbouring pairs of columns, a multiple of the lanes, in place; `down` is one past the
-// highest of the mirrored columns.
-template <int P>
+// highest of the mirrored columns. `In` reads them with their twiddles.
+template <int P, class In = PairLanesIn>
 __attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, ptrdiff_t count,
                                              const DBL *lanes) {
     for (ptrdiff_t k = 0; k < count; k += nativeLanes) {
         down -= nativeLanes;
-        SplitTransform<P>::template run<Wide>(PairLanesIn{up, down, leg, lanes},
+        SplitTransform<P>::template run<Wide>(In{up, down, leg, lanes},
                                               PairLanesOut<P>{up, down, leg});
         up += nativeLanes;
         lanes += 2 * nativeLanes * (P - 1);
@@ -544,6 +544,15 @@ void RealLanesEdges(const DBL *in, ptrdiff_t inLeg, DBL *out, ptrdiff_t m) {
     RealEdgeColumns<P>({in, inLeg, out, m}, 1, m);
 }
 
+// Stages of the larger primes have no loops over pairs, and no panels.
+template <int P, class In = PairLanesIn>
+constexpr auto PairsInPanels() -> decltype(LanesPasses::realPairs) {
+    if constexpr (P % 2 == 0)
+        return RealPairLanes<P, In>;
+    else
+        return nullptr;
+}
+
 template <int P>
 constexpr KernelSet MakeKernels() {
     return {RealLeafKernel<P>,
@@ -551,7 +560,8 @@ constexpr KernelSet MakeKernels() {
             ComplexLeafKernel<P>,
             ComplexTwiddleKernel<P>,
             {ComplexLanesLeaf<P>, RealLanesLeaf<P>, ComplexLanesTwiddle<P>, RealLanesTwiddle<P>,
-             RealLanesEdges<P>, nativeLanes, nativeLanes}};
+             RealLanesEdges<P>, ComplexTwiddleColumns<P>, PairsInPanels<P>(),
+             PairsInPanels<P, PairLanesBeforeIn<P>>(), nativeLanes, nativeLanes}};
 }
 
 } // namespace qx::QX_WIDTH
