@@ -252,6 +252,14 @@ void RunPanels(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
     const ptrdiff_t inner = plan.factors[1];
     const ptrdiff_t rows = outer * inner;
     const ptrdiff_t row = plan.length / rows * Path::width;
+    if (plan.factorCount == 3) {
+        Path::leaf(plan.stages[2]->passes, in, out,
+                   {{outer, inner},
+                    {inStride, outer * inStride},
+                    {inner * row, row},
+                    rows * inStride});
+        return Path::panels(plan, out, memory.buffer);
+    }
     Bundle bundle{Path::bundle, inStride, inner * row};
     if (outer < Path::bundle) {
         bundle.fold = outer;

@@ -271,13 +271,15 @@ void MeasureWork(FFTPlan *plan) {
 }
 
 bool HasPanels(const FFTPlan &plan) {
-    constexpr int32_t shortest = 1 << 16;
+    constexpr int32_t shortest = 1 << 11;
     return plan.length >= shortest && (plan.length & (plan.length - 1)) == 0;
 }
 
 int64_t PanelValues(const FFTPlan &plan) { return plan.factors[0] * int64_t{plan.panelBlock}; }
 
 int64_t PanelLeafValues(const FFTPlan &plan) {
+    if (plan.factorCount == 3)
+        return 0;
     const int32_t rows = plan.factors[0] * plan.factors[1];
     const int32_t leaf = plan.length / rows / plan.factors[2];
     return complexBundle * plan.factors[2] * BlockPitch(2 * leaf);
