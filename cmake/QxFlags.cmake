@@ -21,7 +21,11 @@ else()
 endif()
 
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
-    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
+    # With the property QX_LOOSE_STACK, a target keeps the stack aligned to 4 bytes only, as compilers of the
+    # 32-bit platforms may do.
+    set(loose $<BOOL:$<TARGET_PROPERTY:QX_LOOSE_STACK>>)
+    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse $<$<NOT:${loose}>:-mstackrealign>
+        $<${loose}:-mno-stackrealign> $<${loose}:-mpreferred-stack-boundary=2> $<${loose}:-mincoming-stack-boundary=2>)
 endif()
 if(QX_SANITIZE)
     target_compile_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE} -fno-omit-frame-pointer
