@@ -42,7 +42,8 @@ class House(unittest.TestCase):
 
     def test_tests_left_out_under_emulators_exist(self):
         tests = {f"{suite}.{name}" for path in (ROOT / "src").glob("*/tests/*.cpp")
-                 for suite, name in re.findall(r"^(?:TYPED_)?TEST(?:_F|_P)?\((\w+),\s*(\w+)\)", path.read_text("utf-8"), re.MULTILINE)}
+                 for suite, name in re.findall(r"^(?:TYPED_)?TEST(?:_F|_P)?\((\w+),\s*(\w+)\)",
+                                               path.read_text("utf-8"), re.MULTILINE)}
         left_out = (ROOT / "tests/slow_emulated.txt").read_text("utf-8").split("\n")[:-1]
         self.assertEqual(left_out, sorted(set(left_out)))
         for line in left_out:

@@ -95,10 +95,11 @@ class Installed(Using):
 class AsFolder(Using):
     def test_add_subdirectory(self):
         # Every source must have the same options as in this build, so that its objects serve again.
-        kind = re.search("CMAKE_BUILD_TYPE:.*=(.*)", (BUILD / "CMakeCache.txt").read_text("utf-8"))[1]
+        same = re.findall(r"^(CMAKE_BUILD_TYPE|CMAKE_C(?:XX)?_FLAGS\w*):\w+=(.*)",
+                          (BUILD / "CMakeCache.txt").read_text("utf-8"), re.MULTILINE)
         folder = self.folder / "build"
         launcher = ";".join(map(str, ("/usr/bin/python3", CONSUMER / "compiled_before.py", BUILD, folder / "qxanalysis")))
-        self.built(folder, f"-DQX_SOURCE={SOURCE}", f"-DCMAKE_BUILD_TYPE={kind}",
+        self.built(folder, f"-DQX_SOURCE={SOURCE}", *(f"-D{name}={value}" for name, value in same),
                    f"-DCMAKE_C_COMPILER_LAUNCHER={launcher}", f"-DCMAKE_CXX_COMPILER_LAUNCHER={launcher}")
 
 

@@ -1,6 +1,6 @@
 """compiled_before.py BUILD FOLDER COMPILER ARGUMENT...: a compiler launcher that takes the object of a source from
-BUILD. FOLDER stands in for BUILD in the project that compiles. A source that BUILD has compiled with other options is
-an error, which names them; one that BUILD does not know is compiled.
+BUILD. FOLDER stands in for BUILD in the project that compiles. A source that BUILD has not compiled, or with other
+options, is an error, which names them; what does not belong into FOLDER is compiled.
 """
 
 import json
@@ -25,27 +25,26 @@ def options(arguments):
 
 
 def main(build, folder, *command):
-    mine, _ = options([argument.replace(folder, build) for argument in command[1:]])
+    mine, place = options([argument.replace(folder, build) for argument in command[1:]])
+    if not Path(place).absolute().is_relative_to(folder):
+        os.execvp(command[0], command)
     depends = next((command[i + 1] for i, argument in enumerate(command) if argument == "-MF"), None)
-    source = os.path.abspath(command[-1])
-    known = [entry for entry in json.loads(Path(build, "compile_commands.json").read_text("utf-8"))
-             if entry["file"] == source]
+    source = os.path.abspath(command[-1]).replace(folder, build)  # as some sources are generated
     others = []
-    for entry in known:
+    for entry in json.loads(Path(build, "compile_commands.json").read_text("utf-8")):
+        if entry["file"] != source:
+            continue
         words = shlex.split(entry["command"])
         start = next(i for i, word in enumerate(words) if word.startswith("-"))
         theirs, made = options(words[start:])
         if theirs == mine:
-            place = Path(command[command.index("-o") + 1])
             shutil.copyfile(Path(entry["directory"], made), place)
             if depends:
                 Path(depends).write_text(f"{place}: {source}\n", "utf-8")
             return 0
         others.append(sorted(set(theirs) ^ set(mine)) or ["the order of the options"])
-    if known:
-        print(f"{source}: differs from {build} by", *min(others, key=len), file=sys.stderr)
-        return 1
-    os.execvp(command[0], command)
+    print(f"{source}: differs from {build} by", *min(others, key=len, default=["being here"]), file=sys.stderr)
+    return 1
 
 
 if __name__ == "__main__":
