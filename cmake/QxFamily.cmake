@@ -60,7 +60,7 @@ endfunction()
 
 # Targets that have routines of eight lanes (frame/widths.h gives the reason).
 set(QX_EIGHT_LANES FALSE)
-if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|amd64|AMD64)$" AND CMAKE_SIZEOF_VOID_P EQUAL 8 AND NOT WIN32)
+if(QX_AVX2 AND CMAKE_SIZEOF_VOID_P EQUAL 8 AND NOT WIN32)
     set(QX_EIGHT_LANES TRUE)
 endif()
 

@@ -19,6 +19,11 @@ if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64|i[3-6]86)$")
 else()
     set(QX_AVX2 OFF)
 endif()
+# Threads meet in the same places at every width.
+if(QX_SANITIZE MATCHES thread)
+    set(QX_AVX2 OFF)
+    target_compile_definitions(qxflags INTERFACE QX_ONE_WIDTH)
+endif()
 
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
     # With the property QX_LOOSE_STACK, a target keeps the stack aligned to 4 bytes only, as compilers of the
