@@ -359,6 +359,8 @@ TEST(Ramps, IncludeOrExcludeTheEnd) {
                            {1, 1, 2, 0, 2, ErrFewerThanTwo},
                            {3, 1, 2, 0, 2, ErrInvalidSelector},
                            {3, 0, 2, 0, 1, ErrNotStrictlyPositive},
+                           {3, nan, 2, 0, 1, ErrNotStrictlyPositive},
+                           {3, 1, nan, 0, 1, ErrNotStrictlyPositive},
                            {3, 1, -2, 1, 1, ErrNotStrictlyPositive}}) {
         EXPECT_EQ(RampPtrn85(x.handle(), bad.n, bad.start, bad.end, bad.excludeEnd, bad.scale),
                   bad.code);

@@ -314,6 +314,22 @@ TEST(DCTDST, ThePlanComesBeforeTheWorkOfTheCosineTransformOnly) {
     }
 }
 
+// The work memory serves rows and columns, of which either may need more.
+TEST(DCTDST, LongRowsAndLongColumnsHaveEnoughWork) {
+    for (const Family &family : Families)
+        for (const Shape size : {Shape{2, 50001}, {50001, 2}, {1, 20001}, {20001, 1}}) {
+            SCOPED_TRACE(testing::Message() << family.name << " " << size.rows << "x" << size.cols);
+            const DBLMatrix in(size.rows, size.cols);
+            Fill(in, RandomSignal(in.size()));
+            DBLMatrix out, back;
+            Node node;
+            ASSERT_EQ(family.forward2D(in.handle(), out.handle(), 0, 0, &node.slot, &node.second),
+                      0);
+            ASSERT_EQ(family.inverse2D(out.handle(), back.handle(), &node.slot, &node.second), 0);
+            EXPECT_LT(MaxError(back.values(), ToLong(in.values())), 2 * Rounding);
+        }
+}
+
 // Rows and columns commute up to rounding; the bits show which came first.
 TEST(DCTDST, InverseRunsColumnsFirstForTheCosineAndRowsFirstForTheSine) {
     constexpr int32_t rows = 7, cols = 10;
