@@ -147,13 +147,13 @@ namespace {
 // 1 / gamma(x), 1 <= x <= 2.
 Extended ReciprocalGammaOf(Extended x) {
     const Extended h = x - Whole(1.5);
-    constexpr std::size_t pairs = std::size(table::reciprocalGamma);
+    constexpr std::size_t pairs = std::size(table::inverseGamma);
     double tail = 0;
-    for (std::size_t k = std::size(table::reciprocalGammaRest); k-- > 0;)
-        tail = table::reciprocalGammaRest[k] + h.high * tail;
+    for (std::size_t k = std::size(table::inverseGammaRest); k-- > 0;)
+        tail = table::inverseGammaRest[k] + h.high * tail;
     Extended sum = Whole(tail);
     for (std::size_t k = pairs; k-- > 0;)
-        sum = table::reciprocalGamma[k] + h * sum;
+        sum = table::inverseGamma[k] + h * sum;
     return sum;
 }
 

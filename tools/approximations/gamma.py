@@ -24,10 +24,10 @@ def reciprocal(t):
     c = list(lu_solve(system, matrix([f for _, f in points])))
     stored = [as_double(v) + (as_double(v - as_double(v)) if k < PAIRS else 0) for k, v in enumerate(c)]
     worst = max(abs(horner(stored, h) / rgamma(h + mpf(3) / 2) - 1) for h in (mpf(i) / 80 for i in range(-40, 41)))
-    print("reciprocalGamma", mp.nstr(worst, 2))
-    t.pairs("reciprocalGamma", f"1 / gamma(x) on [1, 2] in powers of x - 3/2: {mp.nstr(worst, 2)}, with the coefficients "
+    print("inverseGamma", mp.nstr(worst, 2))
+    t.pairs("inverseGamma", f"1 / gamma(x) on [1, 2] in powers of x - 3/2: {mp.nstr(worst, 2)}, with the coefficients "
             "after these:", c[:PAIRS])
-    t.array("reciprocalGammaRest", c[PAIRS:])
+    t.array("inverseGammaRest", c[PAIRS:])
     t.lines.append("")
 
 

@@ -8,7 +8,7 @@
 namespace qx::table {
 
 // 1 / gamma(x) on [1, 2] in powers of x - 3/2: 7.0e-31, with the coefficients after these:
-inline constexpr Extended reciprocalGamma[] = {
+inline constexpr Extended inverseGamma[] = {
     {0x1.20dd750429b6dp+0, 0x1.1ae3a914fed80p-56},
     {-0x1.514d3d90584b3p-5, -0x1.f217f14a98ef3p-59},
     {-0x1.0da5a671c048ap-1, -0x1.c2fd1a63503b0p-58},
@@ -27,7 +27,7 @@ inline constexpr Extended reciprocalGamma[] = {
     {0x1.25d5da9f3fa36p-26, 0x1.b67a33cd3e61fp-80},
 };
 
-inline constexpr double reciprocalGammaRest[] = {
+inline constexpr double inverseGammaRest[] = {
     -9.313686445239947e-10, -2.6804741033501147e-10, 7.458932233181524e-11,
     -8.012807061102783e-12, -8.382342381620075e-14, 1.6946340753306925e-13,
     -2.7875778332802698e-14, 1.867044488773798e-15, 1.3054183480085262e-16,
