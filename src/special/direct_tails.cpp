@@ -12,7 +12,9 @@ namespace qx {
 
 namespace {
 
-constexpr double kLeastParameter = 0.5, kMostParameter = 5000.0;
+constexpr double kLeastParameter = 0.5;
+constexpr double kMostOfGamma = 200.0,
+                 kMostOfBeta = 25.0;             // beyond, roundings add up to 4 eps and more
 constexpr double kLeast = 1e-280, kMost = 1e280; // range of the factors
 constexpr double kNearEnd = 0.7; // quotient of terms up to which the power series is taken
 constexpr double kNegligible = 1e-18;
@@ -21,8 +23,8 @@ constexpr double kBig = 1e100;
 
 constexpr DirectTails kUnknown = {0.0, false, 0.0, false};
 
-bool IsUsable(double parameter) {
-    return parameter >= kLeastParameter && parameter <= kMostParameter;
+bool IsUsable(double parameter, double most) {
+    return parameter >= kLeastParameter && parameter <= most;
 }
 
 bool IsInRange(double x) { return x > kLeast && x < kMost; }
@@ -176,7 +178,7 @@ double BetaFraction(double b, double c, double z, double levels) {
 
 // x^a exp(-x) / gamma(a) is (x / a)^a exp(a - x) sqrt(a) times StirlingFactor(a).
 DirectTails DirectGammaTails(double a, double x) {
-    if (!IsUsable(a) || !(x > kLeast && x < kMost))
+    if (!IsUsable(a, kMostOfGamma) || !(x > kLeast && x < kMost))
         return kUnknown;
     const Extended quotient = Extended{x, 0.0} / Extended{a, 0.0};
     const Extended lead = ExactSum(a, -x);
@@ -199,7 +201,7 @@ DirectTails DirectGammaTails(double a, double x) {
 // x^a y^b / beta(a, b) is (f g)^a g^b, where f g and g = (a + b) / (a f + b) are the quotients of x and
 // y by those of the mean, times sqrt(a b / (a + b)) and the three factors of Stirling's formula.
 DirectTails DirectBetaTails(double f, double a, double b, bool takesLower) {
-    if (!IsUsable(a) || !IsUsable(b))
+    if (!IsUsable(a, kMostOfBeta) || !IsUsable(b, kMostOfBeta))
         return kUnknown;
     const Extended first = ExactProduct(a, f);
     const Extended sum = ExactSum(a, b);
@@ -226,8 +228,9 @@ DirectTails DirectBetaTails(double f, double a, double b, bool takesLower) {
     double term = 1.0, moment = 0.0; // the sum of k times the term k
     const double lead = slope / (v * (p + left - 1.0)) * (1.0 - at.rest);
     left -= 1.0; // the parameter after the first term
+    const Extended scaled = ExactProduct(p, v);
     for (double k = 1.0; left > 1.0; ++k, left -= 1.0) {
-        term *= left / ((p + left - 1.0) * v);
+        term *= left / (scaled.high + ((left - 1.0) * v + scaled.low)); // (p + left - 1) v
         terms.add(term);
         moment += k * term;
         if (!(term > kNegligible * terms.sum))

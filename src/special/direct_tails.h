@@ -14,7 +14,7 @@ struct DirectTails {
 };
 
 // The regularised incomplete gamma functions and the beta function, whose point is x / y = (a / b) f,
-// for parameters from 1/2 to 5000: the smaller part within 4 eps. Unknown for other parameters and
+// for parameters from 1/2 to 200 and to 25: the smaller part within 4 eps. Unknown for other parameters and
 // where a factor is out of range.
 //
 // All sums are of positive terms, in double precision. The part below x of the gamma function is

@@ -238,12 +238,22 @@ double Solve(double start, double p, bool isUpper, TailsAt tailsAt) {
     return x;
 }
 
+// A point with one more step, by tails with a smaller error: if a part changes less than its argument,
+// the error of the part is amplified.
+template <class TailsAt>
+double Refined(double x, double p, bool isUpper, TailsAt tailsAt) {
+    const Tails tails = tailsAt(x);
+    const double missing = LogOfShare(p, tails, !isUpper);
+    const double step = missing * (tails.part(!isUpper) / tails.slope.value());
+    return x + x * (isUpper ? -step : step);
+}
+
 // The point by Halley's method for the logarithm of a part as a function of ln x. `bend` returns the
 // derivative of the logarithm of the slope; `scale` is about the inverse of the distribution's width
 // in ln x. A NaN if the tails are unknown or the steps do not settle.
-template <class TailsAt, class Bend>
-double SolveQuickly(double start, double p, bool isUpper, double scale, TailsAt tailsAt,
-                    Bend bend) {
+template <class TailsAt, class Bend, class AccurateAt>
+double SolveQuickly(double start, double p, bool isUpper, double scale, TailsAt tailsAt, Bend bend,
+                    AccurateAt accurateAt) {
     constexpr double longest = 2.0;
     constexpr double close = 4e-6; // after a step of this length, in widths, the next is below eps
     const double direction = isUpper ? -1.0 : 1.0;
@@ -259,7 +269,7 @@ double SolveQuickly(double start, double p, bool isUpper, double scale, TailsAt 
         const double step = std::clamp(turned > 0.5 ? newton / turned : newton, -longest, longest);
         x += x * std::expm1(step);
         if (std::fabs(step) * scale < close)
-            return x;
+            return std::fabs(rate) < 1.2 ? Refined(x, p, isUpper, accurateAt) : x;
     }
     return kNaN;
 }
@@ -306,7 +316,8 @@ double QuickFisherPoint(double p, bool isUpper, double n, double d, double z) {
     const double scale = 1.0 + std::sqrt(0.5 * n * d / (n + d));
     return SolveQuickly(
         start, p, isUpper, scale, [=](double f) { return DirectFisherTails(f, n, d); },
-        [=](double f) { return 0.5 * n * d * (1.0 - f) / (n * f + d); });
+        [=](double f) { return 0.5 * n * d * (1.0 - f) / (n * f + d); },
+        [=](double f) { return FisherTails(f, n, d); });
 }
 
 double QuickChiSquarePoint(double p, bool isUpper, double dof, double start) {
@@ -317,7 +328,8 @@ double QuickChiSquarePoint(double p, bool isUpper, double dof, double start) {
     return SolveQuickly(
         start, p, isUpper, 1.0 + std::sqrt(0.5 * dof),
         [=](double x) { return DirectGammaTails(0.5 * dof, 0.5 * x); },
-        [=](double x) { return 0.5 * (dof - x); });
+        [=](double x) { return 0.5 * (dof - x); },
+        [=](double x) { return ChiSquareTails(x, dof); });
 }
 
 } // namespace
