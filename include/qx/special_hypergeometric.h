@@ -48,8 +48,8 @@ QX_API void QX_Gauss_2011(double x, double a, double b, double c, QX_OUT DBL *va
     two parts cancel, it is the series in x, in x / (x - 1) or with Euler's factor: in double
     precision, in double-double precision, or in integers with as many digits as cancel.
 
-    With |a|, |b|, |c| <= 100, x in [-100, 1): 10^6 tested points gave no NaN and no error above
-    4e-14. A call takes a few microseconds, up to a few milliseconds where hundreds of digits
+    With |a|, |b|, |c| <= 100, x in [-100, 1): 239527 tested points gave no NaN and no error
+    above 3e-14. A call takes a few microseconds, up to a few milliseconds where hundreds of digits
     cancel; a sum that would take longer is a NaN, as is x < -1e280. NaN for a NaN or infinity, x >
     1, or x = 1, c <= a + b, unless a or b terminates the series; +infinity as in QX_Gauss. Source:
     J. W. Pearson, S. Olver and M. A. Porter, Numerical methods for the computation of the confluent
@@ -79,7 +79,7 @@ QX_API void QX_Kummer(double x, double a, double b, QX_OUT DBL *value);
     -x), in double precision if its terms cancel little, in double-double precision, or in integers
     with as many digits as cancel.
 
-    With |a|, |b|, |x| <= 100: 10^6 tested points gave no NaN and no error above 2e-14. A call takes
+    With |a|, |b|, |x| <= 100: 245733 tested points gave no NaN and no error above 2e-14. A call takes
     a few microseconds, up to a few milliseconds where hundreds of digits cancel.
 
     exp(x) for equal a and b; 1 for a = 0 and x = 0; the limits at x = +infinity and -infinity for
@@ -112,7 +112,7 @@ QX_API void QX_Tricomi(double x, double a, double b, QX_OUT DBL *value);
     where U is negligible, in a form without a difference, and upwards in b, in double precision or,
     near a zero, in double-double precision.
 
-    With |a|, |b| <= 100, x in [1e-3, 100]: 10^6 tested points gave no NaN and no error above 8e-13.
+    With |a|, |b| <= 100, x in [1e-3, 100]: 276729 tested points gave no NaN and no error above 5e-13.
     A call takes a few microseconds, up to a few milliseconds.
 
     At x = 0 it is the limit, which is finite for b < 1 or where a is 0, -1, -2, ...; NaN where an
