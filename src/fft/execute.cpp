@@ -352,17 +352,6 @@ void ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStrid
     Recurse(plan, 0, plan.length, data);
 }
 
-bool ExecuteComplexColumns(const FFTPlan &plan, const DBL *in, ptrdiff_t inPitch, DBL *out,
-                           ptrdiff_t outPitch, ptrdiff_t count, DBL *work) {
-    if (plan.whole.complex != nullptr || plan.factorCount < 2 || !LeafHasKernels(plan))
-        return false;
-    for (ptrdiff_t c = 0; c < count; c += complexBundle)
-        RecurseLanes<ComplexLanesPath>(
-            plan, 0, plan.length, in + 2 * c, out + 2 * c * outPitch, 2 * inPitch,
-            {std::min<ptrdiff_t>(complexBundle, count - c), 2, 2 * outPitch}, {work, nullptr});
-    return true;
-}
-
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                             DBL *outIm, int32_t inStride, int32_t outStride, int32_t n, DBL *work) {
     if (n != plan->length)

@@ -430,6 +430,10 @@ def file_of(p):
         texts.append(prime_turns(p))
     texts += [side_by_side(part, p, f"Whole{part}Transform<{p}>(in, out);")
               for part in (["Complex"] if by_half else ["Complex", "Real"])]
+    if p in WHOLE:
+        texts.append(f"template <>\nvoid ComplexAbreast<{p}>(const DBL *in, ptrdiff_t inLeg, DBL *out, "
+                     "ptrdiff_t outLeg, ptrdiff_t columns) {\n"
+                     f"    ComplexAbreastLeaf<{p}>(in, inLeg, out, outLeg, columns);\n}}\n")
     if 2 * p in BY_HALF:
         turns = [part(k, 2 * p) / 2 for k in range(1, (p + 1) // 2) for part in (cos_turn, sin_turn)]
         texts.append(side_by_side("Real", 2 * p,
@@ -459,7 +463,9 @@ def choice_file():
     wholes = []
     for n in sorted({*complex_lengths, *BY_HALF}):
         of_complex = f"ComplexSideBySide<{n}>" if n in complex_lengths else "nullptr"
-        wholes.append(f"    case {n}:\n        return {{{of_complex}, RealSideBySide<{n}>}};")
+        abreast = (f"KernelsFor<{n}>()->lanes.abreastLeaf" if n in RADICES else
+                   f"ComplexAbreast<{n}>" if n in WHOLE else "nullptr")
+        wholes.append(f"    case {n}:\n        return {{{of_complex}, RealSideBySide<{n}>, {abreast}}};")
     return enclosed("The choice of kernels", [
         "const KernelSet *KernelsOf(int32_t radix) {\n    switch (radix) {",
         *kernels, "    default:\n        return nullptr;\n    }\n}\n",
@@ -474,7 +480,10 @@ def passes_file_of(p):
         f"template <>\nvoid TakeWideComplex<{p}>(LanesPasses &passes) {{\n"
         f"    passes.complexLeaf = ComplexLanesLeaf<{p}>;\n"
         f"    passes.complexTwiddle = ComplexLanesTwiddle<{p}>;\n"
-        "    passes.complexLanes = nativeLanes;\n}\n"]
+        "    passes.complexLanes = nativeLanes;\n}\n",
+        f"template <>\nvoid TakeWideAbreast<{p}>(LanesPasses &passes) {{\n"
+        f"    passes.abreastLeaf = ComplexAbreastLeaf<{p}>;\n"
+        f"    passes.abreastTwiddle = ComplexAbreastTwiddle<{p}>;\n}}\n"]
     if p in WIDE_REAL:
         texts += [split_text(p),
                   f"template <>\nvoid TakeWideReal<{p}>(LanesPasses &passes) {{\n"
@@ -494,6 +503,7 @@ def passes_choice_file():
         "LanesPasses PassesOf(int32_t radix, int32_t m) {",
         "    LanesPasses passes = avx2::PassesOf(radix, m);",
         choice("Complex", WIDE, "m % packedColumns == 0"),
+        choice("Abreast", WIDE, "true"),
         choice("Real", WIDE_REAL, "fillsWideRealLanes(m) && m * radix >= 1024"),
         "    return passes;\n}\n"], "kernel_set")
 
