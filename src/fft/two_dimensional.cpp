@@ -72,6 +72,11 @@ private:
     HeapBlock<Code> padded_;
 };
 
+// The columns from first to last, none if last is the lower one.
+struct Opposites {
+    int32_t first, last;
+};
+
 // The output of a forward transform. First it holds the spectra of the rows, at their places in the order of
 // columns.
 class SpectrumMatrix {
@@ -83,57 +88,69 @@ public:
     CDB *row(int32_t r) const { return data_ + int64_t{r} * cols_; }
 
     // Transforms the first `cols` columns, of which the first `used` rows are set; the rest counts as zero.
-    // Calls done(c, count) after each block of columns.
-    template <class Done>
-    ErrorCode transformColumns(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
-                               const Done &done) const {
-        return ColumnsAbreast::suit(plan) ? transformAbreast(plan, used, cols, done)
-                                          : transformOneByOne(plan, used, cols, work, done);
+    ErrorCode transformColumns(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work) const {
+        return transform(plan, used, cols, work, {1, 0});
     }
 
-    // Sets the columns whose frequencies are opposite to those of transformed columns: the conjugates at the
-    // opposite rows. Not for columns that are their own opposites.
-    void setOppositeColumns(int32_t c, int32_t count) const {
-        if (count < 1)
-            return;
-        for (int32_t r = 0; r < rows_; ++r) {
-            const int32_t opposite = 2 * zero_ - r;
-            const int32_t target = opposite < 0        ? opposite + rows_
-                                   : opposite >= rows_ ? opposite - rows_
-                                                       : opposite;
-            ConjugateBackward(&row(r)[c].re, &row(target)[opposites_ - c].re, count);
-        }
+    // The same for the columns of spectra of real rows. Those that are opposite to columns from `first` to
+    // `last` are set, too: the conjugates at the opposite rows.
+    ErrorCode transformHalf(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
+                            const Opposites &opposites) const {
+        return transform(plan, used, cols, work, opposites);
     }
 
 private:
-    template <class Done>
+    ErrorCode transform(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
+                        const Opposites &opposites) const {
+        return ColumnsAbreast::suit(plan) ? transformAbreast(plan, used, cols, opposites)
+                                          : transformOneByOne(plan, used, cols, work, opposites);
+    }
+
+    int32_t rowOf(int32_t frequency) const {
+        return frequency < rows_ - zero_ ? frequency + zero_ : frequency - (rows_ - zero_);
+    }
+
+    // Sets the columns that are opposite to the columns from c on, of which `values` are those of one row
+    // frequency.
+    void setOpposites(int32_t frequency, const CDB *values, int32_t c, int32_t count,
+                      const Opposites &opposites) const {
+        const int32_t from = std::max(c, opposites.first);
+        const int32_t to = std::min(c + count - 1, opposites.last);
+        if (from <= to)
+            ConjugateBackward(
+                &values[from - c].re,
+                &row(rowOf(frequency == 0 ? 0 : rows_ - frequency))[opposites_ - from].re,
+                to - from + 1);
+    }
+
     ErrorCode transformAbreast(const FFTPlan &plan, int32_t used, int32_t cols,
-                               const Done &done) const {
+                               const Opposites &opposites) const {
         ColumnsAbreast abreast;
         if (const ErrorCode failed = abreast.prepare(plan, cols))
             return failed;
         for (int32_t r = used; r < rows_; ++r)
             std::fill_n(row(r), cols, CDB{0, 0});
         const std::ptrdiff_t pitch = 2 * std::ptrdiff_t{cols_};
+        const bool rowsStay = zero_ == 0 && opposites.last < opposites.first;
         for (int32_t c = 0; c < cols; c += abreast.atOnce()) {
             const int32_t count = std::min(abreast.atOnce(), cols - c);
             DBL *const first = &data_[c].re;
-            if (zero_ == 0) {
+            if (rowsStay) {
                 abreast.transform(first, pitch, first, pitch, count);
-            } else {
-                abreast.transform(first, pitch, count);
-                for (int32_t k = 0; k < rows_; ++k)
-                    CopyElements(reinterpret_cast<const CDB *>(abreast.result(k)), count,
-                                 row(k < rows_ - zero_ ? k + zero_ : k - (rows_ - zero_)) + c);
+                continue;
             }
-            done(c, count);
+            abreast.transform(first, pitch, count);
+            for (int32_t k = 0; k < rows_; ++k) {
+                const CDB *const values = reinterpret_cast<const CDB *>(abreast.result(k));
+                CopyElements(values, count, row(rowOf(k)) + c);
+                setOpposites(k, values, c, count, opposites);
+            }
         }
         return 0;
     }
 
-    template <class Done>
     ErrorCode transformOneByOne(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
-                                const Done &done) const {
+                                const Opposites &opposites) const {
         const int64_t pitch = PaddedPitch(rows_);
         ComplexBlock columns;
         ComplexBlock results;
@@ -153,7 +170,8 @@ private:
                                              cols_);
             ScatterColumns<ElementType::CDB>(results.data() + front, pitch, zero_, count,
                                              data_ + c, cols_);
-            done(c, count);
+            for (int32_t k = 0; k < rows_; ++k)
+                setOpposites(k, row(rowOf(k)) + c, c, count, opposites);
         }
         return 0;
     }
@@ -301,7 +319,7 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
             CopyElements(plain, cols - back, row + back);
         }
     }
-    return target.transformColumns(*columnPlan, used, cols, work.data(), [](int32_t, int32_t) {});
+    return target.transformColumns(*columnPlan, used, cols, work.data());
 }
 
 ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const DBL *in,
@@ -330,12 +348,7 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     // Frequency 0 and, if n is even, n/2 are their own opposites.
     const int32_t first = shift != 0 && cols % 2 != 0 ? 0 : 1;
     const int32_t last = shift == 0 && cols % 2 != 0 ? kept - 1 : kept - 2;
-    return target.transformColumns(*columnPlan, used, kept, work.data(),
-                                   [&](int32_t c, int32_t count) {
-                                       const int32_t from = std::max(c, first);
-                                       const int32_t to = std::min(c + count - 1, last);
-                                       target.setOppositeColumns(from, to - from + 1);
-                                   });
+    return target.transformHalf(*columnPlan, used, kept, work.data(), {first, last});
 }
 
 ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
