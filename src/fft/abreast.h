@@ -31,7 +31,9 @@ public:
                    int32_t columns) const;
     // The same with the results in memory of this object, until the next call.
     void transform(const DBL *in, std::ptrdiff_t inPitch, int32_t columns) const;
-    // Row k of these results.
+    // Row k of these results. Rows of one block of blockRows() are `pitch` DBL units apart.
+    int32_t blockRows() const { return m_; }
+    std::ptrdiff_t pitch() const { return rows_.pitch; }
     const DBL *result(int32_t k) const { return blocks_ + k / m_ * rows_.leg + k % m_ * rows_.pitch; }
 
 private:

@@ -110,17 +110,39 @@ private:
         return frequency < rows_ - zero_ ? frequency + zero_ : frequency - (rows_ - zero_);
     }
 
-    // Sets the columns that are opposite to the columns from c on, of which `values` are those of one row
-    // frequency.
-    void setOpposites(int32_t frequency, const CDB *values, int32_t c, int32_t count,
-                      const Opposites &opposites) const {
+    // Rows of results, of neighbouring frequencies that wrap around neither here nor, negated, at the
+    // opposite rows.
+    struct Results {
+        const DBL *first;
+        std::ptrdiff_t pitch;
+        int32_t frequency, rows;
+    };
+
+    // Sets these rows of the columns from c on, and of the columns that are opposite to them.
+    void setRows(const Results &results, int32_t c, int32_t count,
+                 const Opposites &opposites) const {
         const int32_t from = std::max(c, opposites.first);
-        const int32_t to = std::min(c + count - 1, opposites.last);
-        if (from <= to)
-            ConjugateBackward(
-                &values[from - c].re,
-                &row(rowOf(frequency == 0 ? 0 : rows_ - frequency))[opposites_ - from].re,
-                to - from + 1);
+        const int32_t conjugates = std::max(0, std::min(c + count - 1, opposites.last) - from + 1);
+        const int32_t f = results.frequency;
+        const std::ptrdiff_t pitch = 2 * std::ptrdiff_t{cols_};
+        DBL *const opposite = &row(rowOf(f == 0 ? 0 : rows_ - f))->re;
+        SpreadRows({results.first, results.pitch, &row(rowOf(f))[c].re, pitch,
+                    conjugates == 0 ? opposite : opposite + 2 * (opposites_ - from), -pitch,
+                    results.rows, count, conjugates == 0 ? 0 : from - c, conjugates});
+    }
+
+    // Calls set(f, end) for the longest ranges of frequencies that wrap around neither here nor, negated,
+    // at the opposite rows, in blocks of m.
+    template <class Set>
+    void forRanges(int32_t m, const Set &set) const {
+        for (int32_t f = 0; f < rows_;) {
+            int32_t end = std::min(rows_, (f / m + 1) * m);
+            for (const int32_t limit : {1, rows_ - zero_, zero_ + 1})
+                if (f < limit)
+                    end = std::min(end, limit);
+            set(f, end);
+            f = end;
+        }
     }
 
     ErrorCode transformAbreast(const FFTPlan &plan, int32_t used, int32_t cols,
@@ -140,11 +162,9 @@ private:
                 continue;
             }
             abreast.transform(first, pitch, count);
-            for (int32_t k = 0; k < rows_; ++k) {
-                const CDB *const values = reinterpret_cast<const CDB *>(abreast.result(k));
-                CopyElements(values, count, row(rowOf(k)) + c);
-                setOpposites(k, values, c, count, opposites);
-            }
+            forRanges(abreast.blockRows(), [&](int32_t f, int32_t end) {
+                setRows({abreast.result(f), abreast.pitch(), f, end - f}, c, count, opposites);
+            });
         }
         return 0;
     }
@@ -152,11 +172,12 @@ private:
     ErrorCode transformOneByOne(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
                                 const Opposites &opposites) const {
         const int64_t pitch = PaddedPitch(rows_);
-        ComplexBlock columns;
-        ComplexBlock results;
+        ComplexBlock columns, results, turned;
         if (const ErrorCode failed = columns.allocateCleared(ColumnsAtOnce * pitch))
             return failed;
         if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
+            return failed;
+        if (const ErrorCode failed = turned.allocate(ColumnsAtOnce * int64_t{rows_}))
             return failed;
         for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
             const int32_t count = ColumnsInBlock(c, cols);
@@ -165,13 +186,12 @@ private:
                 if (const ErrorCode failed = Forward(&plan, columns.data() + i * pitch,
                                                      results.data() + i * pitch, rows_, work))
                     return failed;
-            const int32_t front = rows_ - zero_;
-            ScatterColumns<ElementType::CDB>(results.data(), pitch, front, count, row(zero_) + c,
-                                             cols_);
-            ScatterColumns<ElementType::CDB>(results.data() + front, pitch, zero_, count,
-                                             data_ + c, cols_);
-            for (int32_t k = 0; k < rows_; ++k)
-                setOpposites(k, row(rowOf(k)) + c, c, count, opposites);
+            ScatterColumns<ElementType::CDB>(results.data(), pitch, rows_, count, turned.data(),
+                                             ColumnsAtOnce);
+            forRanges(rows_, [&](int32_t f, int32_t end) {
+                setRows({&turned[f * ColumnsAtOnce].re, 2 * ColumnsAtOnce, f, end - f}, c, count,
+                        opposites);
+            });
         }
         return 0;
     }
