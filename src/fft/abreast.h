@@ -34,7 +34,9 @@ public:
     // Row k of these results. Rows of one block of blockRows() are `pitch` DBL units apart.
     int32_t blockRows() const { return m_; }
     std::ptrdiff_t pitch() const { return rows_.pitch; }
-    const DBL *result(int32_t k) const { return blocks_ + k / m_ * rows_.leg + k % m_ * rows_.pitch; }
+    const DBL *result(int32_t k) const {
+        return blocks_ + k / m_ * rows_.leg + k % m_ * rows_.pitch;
+    }
 
 private:
     void blocksOf(int32_t level, int32_t n, const DBL *in, std::ptrdiff_t inPitch, DBL *out,

@@ -135,8 +135,8 @@ ErrorCode InverseEight(const FFTPlan *plan, const DBL *spectrum, DBL *out) {
     const Pair sum37 = z3 + z7, turned37 = timesI(z3 - z7);
     const Pair odd02 = sum15 + secondNegated(sum37);
     const Pair odd1 = difference15 - turned37, odd3 = difference15 + turned37;
-    const Pair odd13 = Pair(cosineOfEighth) *
-                       (PairsLow(odd1, odd3) + secondNegated(PairsHigh(odd1, odd3)));
+    const Pair odd13 =
+        Pair(cosineOfEighth) * (PairsLow(odd1, odd3) + secondNegated(PairsHigh(odd1, odd3)));
 
     const Pair odd01 = PairsLow(odd02, odd13), odd23 = secondNegated(PairsHigh(odd02, odd13));
     const Pair eighth(1.0 / 8);

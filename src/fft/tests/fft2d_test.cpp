@@ -128,7 +128,8 @@ std::vector<CDB> OneByOne(Shape size, int32_t used, int32_t shift, const Row &ro
 }
 
 void CheckAgainstOneByOne(Shape size, int32_t used, int32_t shift) {
-    SCOPED_TRACE(testing::Message() << size.rows << "x" << size.cols << " " << used << " " << shift);
+    SCOPED_TRACE(testing::Message()
+                 << size.rows << "x" << size.cols << " " << used << " " << shift);
     const int32_t cols = size.cols;
     const qx::PlanReference rowPlan(cols), columnPlan(size.rows);
     const qx::MatrixRegion region{used, cols, 0, 0, size.rows, cols};
@@ -154,8 +155,7 @@ void CheckAgainstOneByOne(Shape size, int32_t used, int32_t shift) {
         std::vector<double> h(cols);
         qx::FFTRealForward(rowPlan.get(), &real[r * cols], h.data(), 1, 1, cols);
         for (int32_t k = 0; k <= cols / 2; ++k)
-            to[(cols + sign * k) % cols] = {h[k],
-                                            k > 0 && 2 * k < cols ? sign * h[cols - k] : 0};
+            to[(cols + sign * k) % cols] = {h[k], k > 0 && 2 * k < cols ? sign * h[cols - k] : 0};
     });
     const auto at = [&](int32_t r, int32_t f) -> CDB & {
         const int32_t down = shift != 0 ? size.rows / 2 : 0, right = shift != 0 ? cols / 2 : 0;
@@ -172,8 +172,18 @@ void CheckAgainstOneByOne(Shape size, int32_t used, int32_t shift) {
 TEST(TwoDimensional, ColumnsHaveTheBitsOfOneAlone) {
     for (int32_t rows = 1; rows <= 66; ++rows)
         CheckAgainstOneByOne({rows, rows % 5 + 16}, rows, rows % 2);
-    for (const Shape size : {Shape{64, 64}, {60, 17}, {77, 9}, {106, 5}, {1024, 8}, {300, 240},
-                             {640, 18}, {17 * 19, 7}, {41 * 43, 3}, {256, 128}, {480, 1}, {2, 1}})
+    for (const Shape size : {Shape{64, 64},
+                             {60, 17},
+                             {77, 9},
+                             {106, 5},
+                             {1024, 8},
+                             {300, 240},
+                             {640, 18},
+                             {17 * 19, 7},
+                             {41 * 43, 3},
+                             {256, 128},
+                             {480, 1},
+                             {2, 1}})
         for (const int32_t shift : {0, 1}) {
             CheckAgainstOneByOne(size, size.rows, shift);
             CheckAgainstOneByOne(size, size.rows / 2 + 1, shift);
