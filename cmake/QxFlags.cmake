@@ -19,9 +19,18 @@ if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64|i[3-6]86)$")
 else()
     set(QX_AVX2 OFF)
 endif()
+# Threads meet in the same places at every width.
+if(QX_SANITIZE MATCHES thread)
+    set(QX_AVX2 OFF)
+    target_compile_definitions(qxflags INTERFACE QX_ONE_WIDTH)
+endif()
 
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
-    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
+    # With the property QX_LOOSE_STACK, a target keeps the stack aligned to 4 bytes only, as compilers of the
+    # 32-bit platforms may do.
+    set(loose $<BOOL:$<TARGET_PROPERTY:QX_LOOSE_STACK>>)
+    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse $<$<NOT:${loose}>:-mstackrealign>
+        $<${loose}:-mno-stackrealign> $<${loose}:-mpreferred-stack-boundary=2> $<${loose}:-mincoming-stack-boundary=2>)
 endif()
 if(QX_SANITIZE)
     target_compile_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE} -fno-omit-frame-pointer

@@ -40,6 +40,15 @@ class House(unittest.TestCase):
                 self.assertTrue(path.exists(),
                                 f"{path.relative_to(ROOT)} for {exports.relative_to(ROOT)}")
 
+    def test_tests_left_out_under_emulators_exist(self):
+        tests = {f"{suite}.{name}" for path in (ROOT / "src").glob("*/tests/*.cpp")
+                 for suite, name in re.findall(r"^(?:TYPED_)?TEST(?:_F|_P)?\((\w+),\s*(\w+)\)",
+                                               path.read_text("utf-8"), re.MULTILINE)}
+        left_out = (ROOT / "tests/slow_emulated.txt").read_text("utf-8").split("\n")[:-1]
+        self.assertEqual(left_out, sorted(set(left_out)))
+        for line in left_out:
+            self.assertIn(re.sub(r"/\*\.", ".", line), tests, "tests/slow_emulated.txt")
+
 
 if __name__ == "__main__":
     unittest.main()

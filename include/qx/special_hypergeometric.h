@@ -41,14 +41,15 @@ QX_API void QX_Gauss_2011(double x, double a, double b, double c, QX_OUT DBL *va
 /** As QX_Gauss_2011, for all x <= 1 and with a method for each region. A series that terminates
     because of a, b, c - a or c - b is summed. From 0.9 to 1, and below -9 in 1 / (1 - x), both
     parts of the connection (15.8.4 of the Digital library of mathematical functions) are computed
-    with gamma functions and sums in double-double precision; if their exponents differ by an
+    with gamma functions and sums in double-double precision, or from 0.75 on, where moderate
+    parameters allow it, in double precision; if their exponents differ by an
     integer, or by less than 2^-32 from one, the result is linearly interpolated between the values
     at a distance of 2^-32 on both sides, with an error of second order. Elsewhere, and where the
     two parts cancel, it is the series in x, in x / (x - 1) or with Euler's factor: in double
     precision, in double-double precision, or in integers with as many digits as cancel.
 
-    With |a|, |b|, |c| <= 100, x in [-100, 1): 10^6 tested points gave no NaN and no error above
-    4e-14. A call takes a few microseconds, up to a few milliseconds where hundreds of digits
+    With |a|, |b|, |c| <= 100, x in [-100, 1): 239527 tested points gave no NaN and no error
+    above 3e-14. A call takes a few microseconds, up to a few milliseconds where hundreds of digits
     cancel; a sum that would take longer is a NaN, as is x < -1e280. NaN for a NaN or infinity, x >
     1, or x = 1, c <= a + b, unless a or b terminates the series; +infinity as in QX_Gauss. Source:
     J. W. Pearson, S. Olver and M. A. Porter, Numerical methods for the computation of the confluent
@@ -78,7 +79,7 @@ QX_API void QX_Kummer(double x, double a, double b, QX_OUT DBL *value);
     -x), in double precision if its terms cancel little, in double-double precision, or in integers
     with as many digits as cancel.
 
-    With |a|, |b|, |x| <= 100: 10^6 tested points gave no NaN and no error above 2e-14. A call takes
+    With |a|, |b|, |x| <= 100: 245733 tested points gave no NaN and no error above 2e-14. A call takes
     a few microseconds, up to a few milliseconds where hundreds of digits cancel.
 
     exp(x) for equal a and b; 1 for a = 0 and x = 0; the limits at x = +infinity and -infinity for
@@ -101,14 +102,17 @@ QX_API void QX_Kummer_2026(double x, double a, double b, QX_OUT DBL *value);
 QX_API void QX_Tricomi(double x, double a, double b, QX_OUT DBL *value);
 
 /** As QX_Tricomi, with a method for each region: the asymptotic sum where its smallest term is
-    below 9e-15; for x < 0.2, and x < 1 where a < 0, the connection with M, in double-double
+    below 9e-15; for moderate a > 0 in double precision, below 1 the connection with M or, at an
+    integer b, its limit with a logarithm (13.2.9 of the Digital library of mathematical functions),
+    and from 1 to 60 the Wronskian of M and U with a continued fraction for U'/U. Elsewhere for x <
+    0.2, and x < 1 where a < 0, the connection with M, in double-double
     precision where it cancels, and for b close to an integer by linear interpolation between the
     values at a distance of 2^-32 on both sides; for b < 1 the same function of a - b + 1 and 2 - b
     (13.1.29); for a = -n a multiple of M(-n, b, x); otherwise recurrences, downwards in a from
     where U is negligible, in a form without a difference, and upwards in b, in double precision or,
     near a zero, in double-double precision.
 
-    With |a|, |b| <= 100, x in [1e-3, 100]: 10^6 tested points gave no NaN and no error above 8e-13.
+    With |a|, |b| <= 100, x in [1e-3, 100]: 276729 tested points gave no NaN and no error above 5e-13.
     A call takes a few microseconds, up to a few milliseconds.
 
     At x = 0 it is the limit, which is finite for b < 1 or where a is 0, -1, -2, ...; NaN where an

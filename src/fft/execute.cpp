@@ -121,9 +121,8 @@ struct ComplexLanesPath {
     static void panels(const FFTPlan &plan, DBL *out, DBL *panel) {
         ComplexPanels(plan, out, panel);
     }
-    static void leaf(const LanesPasses &passes, const DBL *in, DBL *out,
-                     const LeafColumns &columns) {
-        passes.complexLeaf(in, out, columns);
+    static void leaf(const FFTPlan &plan, const DBL *in, DBL *out, const LeafColumns &columns) {
+        plan.stages[plan.factorCount - 1]->passes.complexLeaf(in, out, columns);
     }
     static void twiddle(const FFTStage &stage, const DBL *in, ptrdiff_t inLeg, DBL *out,
                         int32_t m) {
@@ -141,9 +140,12 @@ struct RealLanesPath {
     static bool gainsByBuffer(int32_t p, int32_t m) { return p > 4 && m % 256 == 0; }
     static constexpr bool buffersRows = false;
     static void panels(const FFTPlan &plan, DBL *out, DBL *panel) { RealPanels(plan, out, panel); }
-    static void leaf(const LanesPasses &passes, const DBL *in, DBL *out,
-                     const LeafColumns &columns) {
-        passes.realLeaf(in, out, columns);
+    static void leaf(const FFTPlan &plan, const DBL *in, DBL *out, const LeafColumns &columns) {
+        const int32_t radix = plan.factors[plan.factorCount - 1];
+        if (columns.count[0] * columns.count[1] <= 2 && gainsByFrequencies(radix))
+            oneByOne(radix, in, out, columns);
+        else
+            plan.stages[plan.factorCount - 1]->passes.realLeaf(in, out, columns);
     }
     static void twiddle(const FFTStage &stage, const DBL *in, ptrdiff_t inLeg, DBL *out,
                         int32_t m) {
@@ -151,6 +153,23 @@ struct RealLanesPath {
     }
     static void primeTwiddle(const PrimeFactor &factor, DBL *out, int32_t m, DBL *work) {
         PrimeRealTwiddle(factor, out, 1, m, work);
+    }
+
+private:
+    // One or two columns leave lanes empty. The transform of a single array fills them with frequencies.
+    static bool gainsByFrequencies(int32_t radix) {
+        return radix >= 17 && radix % 2 != 0 && lanesInUse >= 4;
+    }
+    static void oneByOne(int32_t radix, const DBL *in, DBL *out, const LeafColumns &columns) {
+        const auto transform = WholeOf(radix).real;
+        DBL x[longestWhole];
+        for (ptrdiff_t b = 0; b < columns.count[1]; ++b)
+            for (ptrdiff_t a = 0; a < columns.count[0]; ++a) {
+                const DBL *const column = in + a * columns.inStride[0] + b * columns.inStride[1];
+                for (ptrdiff_t j = 0; j < radix; ++j)
+                    x[j] = column[j * columns.legStride];
+                transform(x, out + a * columns.outStride[0] + b * columns.outStride[1]);
+            }
     }
 };
 
@@ -171,18 +190,17 @@ void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, 
     DBL *const blocks = buffered ? memory.buffer : out;
     const ptrdiff_t nextBlocks = buffered ? p * block : bundle.outStride;
     if (level == plan.factorCount - 2) {
-        const LanesPasses &passes = plan.stages[level + 1]->passes;
         if (bundle.count == 1)
-            Path::leaf(passes, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
+            Path::leaf(plan, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
         else if (buffered || bundle.fold == PTRDIFF_MAX)
-            Path::leaf(passes, in, blocks,
+            Path::leaf(plan, in, blocks,
                        {{bundle.count, p},
                         {bundle.inStride, inStride},
                         {nextBlocks, block},
                         p * inStride});
         else
             for (ptrdiff_t j = 0; j < p; ++j)
-                Path::leaf(passes, in + j * inStride, blocks + j * block,
+                Path::leaf(plan, in + j * inStride, blocks + j * block,
                            {{bundle.fold, bundle.count / bundle.fold},
                             {bundle.inStride, bundle.fold * bundle.inStride},
                             {nextBlocks, bundle.foldStride},
@@ -253,7 +271,7 @@ void RunPanels(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
     const ptrdiff_t rows = outer * inner;
     const ptrdiff_t row = plan.length / rows * Path::width;
     if (plan.factorCount == 3) {
-        Path::leaf(plan.stages[2]->passes, in, out,
+        Path::leaf(plan, in, out,
                    {{outer, inner},
                     {inStride, outer * inStride},
                     {inner * row, row},
@@ -388,17 +406,6 @@ void ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStrid
     if (outStride == 1 && LeafHasKernels(plan))
         return RunLanes<RealLanesPath>(plan, in, out, inStride, work);
     Recurse(plan, 0, plan.length, data);
-}
-
-bool ExecuteComplexColumns(const FFTPlan &plan, const DBL *in, ptrdiff_t inPitch, DBL *out,
-                           ptrdiff_t outPitch, ptrdiff_t count, DBL *work) {
-    if (plan.whole.complex != nullptr || plan.factorCount < 2 || !LeafHasKernels(plan))
-        return false;
-    for (ptrdiff_t c = 0; c < count; c += complexBundle)
-        RecurseLanes<ComplexLanesPath>(
-            plan, 0, plan.length, in + 2 * c, out + 2 * c * outPitch, 2 * inPitch,
-            {std::min<ptrdiff_t>(complexBundle, count - c), 2, 2 * outPitch}, {work, nullptr});
-    return true;
 }
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,

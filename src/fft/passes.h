@@ -4,6 +4,7 @@
 #include "frame/widths.h"
 #include "qx/types.h"
 
+#include <cstddef>
 #include <cstdint>
 
 namespace qx {
@@ -24,6 +25,19 @@ QX_BY_WIDTH(void, ScaleReversed, (DBL * values, double scale, int32_t n))
 QX_BY_WIDTH(void, JoinMirrored, (const DBL *up, const DBL *down, DBL *complex, int32_t count))
 // The conjugate of complex value k of `from` becomes value -k of `to`, for k from 0 to count - 1.
 QX_BY_WIDTH(void, ConjugateBackward, (const DBL *from, DBL *to, int32_t count))
+
+// Rows of `count` complex values: row r is copied to `to` + r toPitch, and the conjugates of `conjugates`
+// values from number `skip` on go to `opposite` + r oppositePitch and downward. All in DBL units.
+struct RowsToSpread {
+    const DBL *from;
+    std::ptrdiff_t fromPitch;
+    DBL *to;
+    std::ptrdiff_t toPitch;
+    DBL *opposite;
+    std::ptrdiff_t oppositePitch;
+    int32_t rows, count, skip, conjugates;
+};
+QX_BY_WIDTH(void, SpreadRows, (const RowsToSpread &job))
 
 } // namespace qx
 

@@ -102,4 +102,19 @@ void ConjugateBackward(const DBL *from, DBL *to, int32_t count) {
     }
 }
 
+void SpreadRows(const RowsToSpread &job) {
+    const ptrdiff_t values = 2 * ptrdiff_t{job.count};
+    for (ptrdiff_t r = 0; r < job.rows; ++r) {
+        const DBL *const from = job.from + r * job.fromPitch;
+        DBL *const to = job.to + r * job.toPitch;
+        ptrdiff_t i = 0;
+        for (; i + nativeLanes <= values; i += nativeLanes)
+            Wide::load(from + i).store(to + i);
+        for (; i < values; i += 2)
+            Lanes<2>::load(from + i).store(to + i);
+        ConjugateBackward(from + 2 * ptrdiff_t{job.skip}, job.opposite + r * job.oppositePitch,
+                          job.conjugates);
+    }
+}
+
 } // namespace qx::QX_WIDTH

@@ -41,6 +41,22 @@ struct LeafColumns {
     std::ptrdiff_t legStride;
 };
 
+// Where the rows of blocks are: row k of block j at k pitch + j leg.
+struct BlockRows {
+    std::ptrdiff_t pitch, leg;
+};
+// Columns of a matrix are transformed abreast: up to mostAbreast neighbouring columns of interleaved complex
+// values, of which value j of all columns is a row.
+constexpr int mostAbreast = 16;
+// Value j is at j inLeg, result k at k outLeg; the two may be the same memory.
+typedef void (*AbreastLeaf)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, std::ptrdiff_t outLeg,
+                            std::ptrdiff_t columns);
+// Combines blocks of m rows. The input has whole lanes in each row, and what is behind `columns` is of no
+// account. Input and output may be the same memory, with the same rows.
+typedef void (*AbreastTwiddle)(const DBL *in, const BlockRows &inRows, DBL *out,
+                               const BlockRows &outRows, const FFTStage &stage, std::ptrdiff_t m,
+                               std::ptrdiff_t columns);
+
 // The loops of one radix that run in SIMD lanes: complex data is interleaved, results are contiguous,
 // and the twiddles come from tables in the order in which the lanes read them, in blocks of
 // complexLanes or realLanes. Every number of lanes gives the same bits.
@@ -63,6 +79,9 @@ struct LanesPasses {
     void (*realPairsBefore)(DBL *up, DBL *down, std::ptrdiff_t leg, std::ptrdiff_t count,
                             const DBL *lanes);
     int32_t complexLanes, realLanes;
+    // Columns of a matrix.
+    AbreastLeaf abreastLeaf;
+    AbreastTwiddle abreastTwiddle;
 };
 
 // Straight-line transforms of one length, with contiguous input and results; null where there are
@@ -70,6 +89,7 @@ struct LanesPasses {
 struct WholeTransform {
     void (*complex)(const DBL *in, DBL *out); // interleaved
     void (*real)(const DBL *in, DBL *out);
+    AbreastLeaf abreast;
 };
 // The longest length with a straight-line transform.
 constexpr int32_t longestWhole = 64;

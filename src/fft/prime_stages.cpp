@@ -127,9 +127,8 @@ void DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL
 // Multiplies value k of the spectrum by that of the roots and conjugates it: together with the
 // conjugation at the end, a forward transform then acts as the inverse transform.
 void SetConjugateProduct(const FFTStage &stage, ptrdiff_t k, double a, double b, Output y) {
-    const double c = stage.raderCos[k];
-    const double s = stage.raderSin[k];
-    y.set(k, c * a - s * b, -(a * s) - c * b);
+    const Pair w(Pair::Vector{stage.raderCos[k], stage.raderSin[k]});
+    y.set(k, NegatedInPairs(Pair(a) * w, false) - Pair(b) * w.reversed());
 }
 
 void RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
@@ -191,12 +190,15 @@ void RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL 
     SetConjugateProduct(stage, n / 2, half[n / 2], 0, spectrum);
     ExecuteComplex(plan, spectrum.re, spectrum.im, work, work + 1, 2, 2, inner);
     y[0] = sum;
-    for (ptrdiff_t i = 1; i < p; ++i) {
-        const ptrdiff_t k = stage.raderScatter[i];
-        if (2 * k > p)
-            continue;
-        y[k * outStride] = x0 + work[2 * i - 2];
-        y[(p - k) * outStride] = -work[2 * i - 1];
+    // The frequencies in places i and i + (p - 1) / 2 are opposite. The lower one is taken.
+    const ptrdiff_t opposite = (p - 1) / 2;
+    for (ptrdiff_t i = 1; i <= opposite; ++i) {
+        const ptrdiff_t first = stage.raderScatter[i];
+        const bool isLow = 2 * first < p;
+        const ptrdiff_t k = isLow ? first : p - first;
+        const DBL *const result = work + 2 * (isLow ? i - 1 : i - 1 + opposite);
+        y[k * outStride] = x0 + result[0];
+        y[(p - k) * outStride] = -result[1];
     }
 }
 

@@ -1,5 +1,6 @@
 #include "fft/two_dimensional.h"
 
+#include "fft/abreast.h"
 #include "fft/column_block.h"
 #include "fft/execute.h"
 #include "fft/passes.h"
@@ -71,77 +72,135 @@ private:
     HeapBlock<Code> padded_;
 };
 
-// The output of a forward transform. The columns are passed as contiguous copies, whose frequencies
-// ascend from 0.
+// The columns from first to last, none if last is the lower one.
+struct Opposites {
+    int32_t first, last;
+};
+
+// The output of a forward transform. First it holds the spectra of the rows, at their places in the order of
+// columns.
 class SpectrumMatrix {
 public:
     SpectrumMatrix(CDB *data, int32_t rows, int32_t cols, int32_t shift)
         : data_(data), rows_(rows), cols_(cols), zero_(IndexOf(0, rows, shift)),
           opposites_(shift != 0 && cols % 2 != 0 ? cols - 1 : cols) {}
 
-    void setColumns(int32_t c, int32_t count, const CDB *columns, int64_t pitch) const {
-        const int32_t front = rows_ - zero_;
-        ScatterColumns<ElementType::CDB>(columns, pitch, front, count,
-                                         data_ + c + int64_t{zero_} * cols_, cols_);
-        ScatterColumns<ElementType::CDB>(columns + front, pitch, zero_, count, data_ + c, cols_);
+    CDB *row(int32_t r) const { return data_ + int64_t{r} * cols_; }
+
+    // Transforms the first `cols` columns, of which the first `used` rows are set; the rest counts as zero.
+    ErrorCode transformColumns(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work) const {
+        return transform(plan, used, cols, work, {1, 0});
     }
 
-    // Sets the columns whose frequencies are opposite to those of columns that setColumns has set: the
-    // conjugates at the opposite rows. Not for columns that are their own opposites.
-    void setOppositeColumns(int32_t c, int32_t count) const {
-        if (count < 1)
-            return;
-        for (int32_t row = 0; row < rows_; ++row) {
-            const int32_t opposite = 2 * zero_ - row;
-            const int32_t target = opposite < 0        ? opposite + rows_
-                                   : opposite >= rows_ ? opposite - rows_
-                                                       : opposite;
-            ConjugateBackward(&data_[int64_t{row} * cols_ + c].re,
-                              &data_[int64_t{target} * cols_ + (opposites_ - c)].re, count);
-        }
+    // The same for the columns of spectra of real rows. Those that are opposite to columns from `first` to
+    // `last` are set, too: the conjugates at the opposite rows.
+    ErrorCode transformHalf(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
+                            const Opposites &opposites) const {
+        return transform(plan, used, cols, work, opposites);
     }
 
 private:
+    ErrorCode transform(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
+                        const Opposites &opposites) const {
+        return ColumnsAbreast::suit(plan) ? transformAbreast(plan, used, cols, opposites)
+                                          : transformOneByOne(plan, used, cols, work, opposites);
+    }
+
+    int32_t rowOf(int32_t frequency) const {
+        return frequency < rows_ - zero_ ? frequency + zero_ : frequency - (rows_ - zero_);
+    }
+
+    // Rows of results, of neighbouring frequencies that wrap around neither here nor, negated, at the
+    // opposite rows.
+    struct Results {
+        const DBL *first;
+        std::ptrdiff_t pitch;
+        int32_t frequency, rows;
+    };
+
+    // Sets these rows of the columns from c on, and of the columns that are opposite to them.
+    void setRows(const Results &results, int32_t c, int32_t count,
+                 const Opposites &opposites) const {
+        const int32_t from = std::max(c, opposites.first);
+        const int32_t conjugates = std::max(0, std::min(c + count - 1, opposites.last) - from + 1);
+        const int32_t f = results.frequency;
+        const std::ptrdiff_t pitch = 2 * std::ptrdiff_t{cols_};
+        DBL *const opposite = &row(rowOf(f == 0 ? 0 : rows_ - f))->re;
+        SpreadRows({results.first, results.pitch, &row(rowOf(f))[c].re, pitch,
+                    conjugates == 0 ? opposite : opposite + 2 * (opposites_ - from), -pitch,
+                    results.rows, count, conjugates == 0 ? 0 : from - c, conjugates});
+    }
+
+    // Calls set(f, end) for the longest ranges of frequencies that wrap around neither here nor, negated,
+    // at the opposite rows, in blocks of m.
+    template <class Set>
+    void forRanges(int32_t m, const Set &set) const {
+        for (int32_t f = 0; f < rows_;) {
+            int32_t end = std::min(rows_, (f / m + 1) * m);
+            for (const int32_t limit : {1, rows_ - zero_, zero_ + 1})
+                if (f < limit)
+                    end = std::min(end, limit);
+            set(f, end);
+            f = end;
+        }
+    }
+
+    ErrorCode transformAbreast(const FFTPlan &plan, int32_t used, int32_t cols,
+                               const Opposites &opposites) const {
+        ColumnsAbreast abreast;
+        if (const ErrorCode failed = abreast.prepare(plan, cols))
+            return failed;
+        for (int32_t r = used; r < rows_; ++r)
+            std::fill_n(row(r), cols, CDB{0, 0});
+        const std::ptrdiff_t pitch = 2 * std::ptrdiff_t{cols_};
+        const bool rowsStay = zero_ == 0 && opposites.last < opposites.first;
+        for (int32_t c = 0; c < cols; c += abreast.atOnce()) {
+            const int32_t count = std::min(abreast.atOnce(), cols - c);
+            DBL *const first = &data_[c].re;
+            if (rowsStay) {
+                abreast.transform(first, pitch, first, pitch, count);
+                continue;
+            }
+            abreast.transform(first, pitch, count);
+            forRanges(abreast.blockRows(), [&](int32_t f, int32_t end) {
+                setRows({abreast.result(f), abreast.pitch(), f, end - f}, c, count, opposites);
+            });
+        }
+        return 0;
+    }
+
+    ErrorCode transformOneByOne(const FFTPlan &plan, int32_t used, int32_t cols, DBL *work,
+                                const Opposites &opposites) const {
+        const int64_t pitch = PaddedPitch(rows_);
+        ComplexBlock columns, results, turned;
+        if (const ErrorCode failed = columns.allocateCleared(ColumnsAtOnce * pitch))
+            return failed;
+        if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
+            return failed;
+        if (const ErrorCode failed = turned.allocate(ColumnsAtOnce * int64_t{rows_}))
+            return failed;
+        for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
+            const int32_t count = ColumnsInBlock(c, cols);
+            GatherColumns<ElementType::CDB>(data_ + c, cols_, used, count, columns.data(), pitch);
+            for (int32_t i = 0; i < count; ++i)
+                if (const ErrorCode failed = Forward(&plan, columns.data() + i * pitch,
+                                                     results.data() + i * pitch, rows_, work))
+                    return failed;
+            ScatterColumns<ElementType::CDB>(results.data(), pitch, rows_, count, turned.data(),
+                                             ColumnsAtOnce);
+            forRanges(rows_, [&](int32_t f, int32_t end) {
+                setRows({&turned[f * ColumnsAtOnce].re, 2 * ColumnsAtOnce, f, end - f}, c, count,
+                        opposites);
+            });
+        }
+        return 0;
+    }
+
     CDB *data_;
     int32_t rows_, cols_;
     int32_t zero_;      // the row of frequency 0
     int32_t opposites_; // the sum of the indices of two opposite columns
 };
-
-// The columns of a matrix of up to this many values, which fits the second-level cache, are read in place;
-// those of larger matrices are first copied, row by row.
-constexpr int64_t mostReadInPlace = 1 << 16;
-
-// Transforms the columns in matrix, which is row-major with `usedRows` rows, padded with zeros to
-// `rows` values. Calls set(c, count, columns, pitch) for each block of columns.
-template <class Set>
-ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_t usedRows,
-                         int32_t rows, int32_t cols, DBL *work, const Set &set) {
-    const int64_t pitch = PaddedPitch(rows);
-    const bool readInPlace = usedRows == rows && int64_t{rows} * cols <= mostReadInPlace;
-    ComplexBlock columns;
-    ComplexBlock results;
-    if (const ErrorCode failed = columns.allocateCleared(ColumnsAtOnce * pitch))
-        return failed;
-    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
-        return failed;
-    for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
-        const int32_t count = ColumnsInBlock(c, cols);
-        const CDB *const first = matrix.data() + c;
-        const bool done =
-            readInPlace && ExecuteComplexColumns(*plan, &first->re, PaddedPitch(cols),
-                                                 &results.data()->re, pitch, count, work);
-        if (!done)
-            GatherColumns<ElementType::CDB>(first, PaddedPitch(cols), usedRows, count,
-                                            columns.data(), pitch);
-        for (int32_t i = 0; i < count && !done; ++i)
-            if (const ErrorCode failed = Forward(plan, columns.data() + i * pitch,
-                                                 results.data() + i * pitch, rows, work))
-                return failed;
-        set(c, count, results.data(), pitch);
-    }
-    return 0;
-}
 
 // The first n/2 + 1 values, in plain or in shifted order, of the spectrum whose half-complex
 // form is h.
@@ -260,33 +319,27 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
     const int32_t cols = region.cols;
     const int32_t used = RowsTaken(region);
     TransformWork work;
-    ComplexBlock matrix;
     ComplexBlock spectrum;
     if (const ErrorCode failed = work.take(std::max(rowPlan->complexWork, columnPlan->complexWork)))
-        return failed;
-    if (const ErrorCode failed = matrix.allocate(used * PaddedPitch(cols)))
         return failed;
     if (const ErrorCode failed = spectrum.allocate(cols))
         return failed;
     RegionRows<ElementType::CDB> rows(in, region);
     if (const ErrorCode failed = rows.prepare())
         return failed;
+    const SpectrumMatrix target(out, region.rows, cols, shift);
     const int32_t back = cols / 2;
     for (int32_t r = 0; r < used; ++r) {
-        CDB *const row = matrix.data() + r * PaddedPitch(cols);
-        CDB *const target = shift == 0 ? row : spectrum.data();
-        if (const ErrorCode failed = Forward(rowPlan, rows.row(r), target, cols, work.data()))
+        CDB *const row = target.row(r);
+        CDB *const plain = shift == 0 ? row : spectrum.data();
+        if (const ErrorCode failed = Forward(rowPlan, rows.row(r), plain, cols, work.data()))
             return failed;
         if (shift != 0) {
-            CopyElements(target + (cols - back), back, row);
-            CopyElements(target, cols - back, row + back);
+            CopyElements(plain + (cols - back), back, row);
+            CopyElements(plain, cols - back, row + back);
         }
     }
-    const SpectrumMatrix target(out, region.rows, cols, shift);
-    return ForwardColumns(columnPlan, matrix, used, region.rows, cols, work.data(),
-                          [&](int32_t c, int32_t count, const CDB *columns, int64_t pitch) {
-                              target.setColumns(c, count, columns, pitch);
-                          });
+    return target.transformColumns(*columnPlan, used, cols, work.data());
 }
 
 ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const DBL *in,
@@ -297,34 +350,25 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     const int32_t kept = cols / 2 + 1;
     const int32_t used = RowsTaken(region);
     TransformWork work;
-    ComplexBlock matrix;
     HeapBlock<ElementType::DBL> half;
     if (const ErrorCode failed = work.take(std::max(rowPlan->realWork, columnPlan->complexWork)))
-        return failed;
-    if (const ErrorCode failed = matrix.allocate(used * PaddedPitch(kept)))
         return failed;
     if (const ErrorCode failed = half.allocate(cols))
         return failed;
     RegionRows<ElementType::DBL> rows(in, region);
     if (const ErrorCode failed = rows.prepare())
         return failed;
+    const SpectrumMatrix target(out, region.rows, cols, shift);
     for (int32_t r = 0; r < used; ++r) {
         if (const ErrorCode failed =
                 FFTRealForward(rowPlan, rows.row(r), half.data(), 1, 1, cols, work.data()))
             return failed;
-        KeepHalf(half.data(), cols, shift, matrix.data() + r * PaddedPitch(kept));
+        KeepHalf(half.data(), cols, shift, target.row(r));
     }
     // Frequency 0 and, if n is even, n/2 are their own opposites.
     const int32_t first = shift != 0 && cols % 2 != 0 ? 0 : 1;
     const int32_t last = shift == 0 && cols % 2 != 0 ? kept - 1 : kept - 2;
-    const SpectrumMatrix target(out, region.rows, cols, shift);
-    return ForwardColumns(columnPlan, matrix, used, region.rows, kept, work.data(),
-                          [&](int32_t c, int32_t count, const CDB *columns, int64_t pitch) {
-                              target.setColumns(c, count, columns, pitch);
-                              const int32_t from = std::max(c, first);
-                              const int32_t to = std::min(c + count - 1, last);
-                              target.setOppositeColumns(from, to - from + 1);
-                          });
+    return target.transformHalf(*columnPlan, used, kept, work.data(), {first, last});
 }
 
 ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,

@@ -35,7 +35,8 @@
 // Where there are routines of eight lanes (cmake/QxFamily.cmake has the same condition). Not on
 // Windows: g++ keeps 64-byte vectors on the stack with aligned stores but does not align the stack
 // for them there (GCC bug 54412). Not on 32-bit x86, which has eight registers in place of 32.
-#if defined(__x86_64__) && !defined(_WIN32)
+// A build with QX_ONE_WIDTH has two lanes only.
+#if defined(__x86_64__) && !defined(_WIN32) && !defined(QX_ONE_WIDTH)
 #define QX_HAS_EIGHT_LANES
 #endif
 
@@ -47,7 +48,7 @@ namespace qx {
 // earlier sees 2. On ARM it is always 2.
 extern int32_t lanesInUse;
 
-#if defined(__x86_64__) || defined(__i386__)
+#if (defined(__x86_64__) || defined(__i386__)) && !defined(QX_ONE_WIDTH)
 #define QX_HAS_AVX2_BUILD 1
 
 template <auto Baseline, auto Avx2>

@@ -243,6 +243,19 @@ QX_INLINE L Hypotenuse(L x, L y, LaneMask<L> &rare) {
     return Select(isTiny | isZero, larger + smaller, root);
 }
 
+// Calls lanes(at) for all whole groups of lanes, and one(at) for the remaining elements and for
+// each element of a group for which lanes(at) returned false because it had rare arguments.
+template <int N, class OfLanes, class OfOne>
+QX_INLINE void ForEachOrRare(int32_t n, OfLanes lanes, OfOne one) {
+    int32_t i = 0;
+    for (; n - i >= N; i += N)
+        if (!lanes(i))
+            for (int32_t k = i; k < i + N; ++k)
+                one(k);
+    for (; i < n; ++i)
+        one(i);
+}
+
 } // namespace qx
 
 #endif

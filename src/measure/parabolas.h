@@ -46,14 +46,8 @@ inline bool IsRising(const Parabola &p) {
 constexpr int32_t maskWidth = 64;
 
 // IsRising of `count` windows.
-QX_BY_WIDTH(uint64_t, RisingWindows, (const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count))
-
-// Whether |c1| < reach * sign * c2, that is whether the curvature has the given sign and the vertex
-// lies within half of `reach` of the centre, and whether its amplitude can be beyond the threshold,
-// in the direction opposite to the sign. `reach` is below 2, w is 3 or 4.
-QX_BY_WIDTH(uint64_t, NarrowWindowsAtVertex,
-            (const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count, double reach,
-             double sign, double threshold))
+QX_BY_WIDTH_TO_8(uint64_t, RisingWindows,
+                 (const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count))
 
 // What is asked of the vertices of narrow windows, w = 3 or 4, and where they are.
 struct VertexLimits {
@@ -63,26 +57,62 @@ struct VertexLimits {
     double sign; // that the curvature is to have
     double threshold, mean;
 };
-// Those of `count` windows, in ascending order; behind them whatever a vector leaves.
-struct FoundVertices {
-    static constexpr int32_t windows = 8 * maskWidth; // at most
-    static constexpr int32_t length = windows + 8;
-    int32_t count;
-    DBL locations[length], amplitudes[length], curvatures[length];
+
+// Narrow windows are marked in groups of up to eight words of bits.
+constexpr int32_t groupWords = 8;
+constexpr int32_t groupWidth = groupWords * maskWidth;
+
+// The windows of a group whose vertex may be near the centre and beyond the threshold, and those of
+// them whose vertex has to be computed: it may be just beyond a limit, take the place of the vertex of
+// the window before, or lie within a sample of another one. The others have vertices that are
+// near the centre, beyond the threshold, and a sample or more from all others.
+struct VertexMarks {
+    uint64_t possible[groupWords], doubtful[groupWords];
 };
 
-// The vertices of the windows whose bits are set in `masks`. False where the windows have to be judged
-// one by one, since some may take the vertex of the one before.
-QX_BY_WIDTH(bool, FindVertices,
-            (const DBL *fitMatrix, int32_t w, const DBL *x, const uint64_t *masks, int32_t count,
-             const VertexLimits *limits, FoundVertices *found))
+// Marks `count` windows by the coefficients of their parabolas; all possible ones are doubtful.
+QX_BY_WIDTH_TO_8(void, MarkVertices,
+                 (const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count,
+                  const VertexLimits *limits, VertexMarks *marks))
 
-// Of up to maskWidth extrema those that stay in *kept, of two less than a sample apart the more extreme
-// one, or the first of equals. False where more than two are that close, or the first to the one before
-// it at lastLocation. Eight elements behind the last are read.
-QX_BY_WIDTH(bool, KeptOfClose,
-            (const DBL *locations, const DBL *amplitudes, int32_t count, double sign,
-             double lastLocation, uint64_t *kept))
+// Marks windows of three samples by comparing neighbouring samples, which leaves few in doubt. False if
+// these are too many, such as with NaN, infinities or tiny differences, and if the threshold may
+// exclude any.
+QX_BY_WIDTH_TO_8(bool, MarkBySteps,
+                 (const DBL *x, int32_t count, const VertexLimits *limits, VertexMarks *marks))
+
+// The vertices of `count` windows of a group, in ascending order. A location is NaN if the vertex is
+// beyond a limit.
+struct FoundVertices {
+    static constexpr int32_t length = groupWidth + 8;
+    int32_t count;
+    int32_t places[length]; // the numbers of the windows
+    DBL locations[length], amplitudes[length];
+};
+
+// The vertices of the windows whose bits are set in `count` words. False where the windows have to be
+// judged one by one, since some may take the vertex of the one before.
+QX_BY_WIDTH_TO_8(bool, FindVertices,
+                 (const DBL *fitMatrix, int32_t w, const DBL *x, const uint64_t *masks,
+                  int32_t count, const VertexLimits *limits, FoundVertices *found))
+
+// Where the vertices of windows go, `count` in all.
+struct VertexLists {
+    DBL *locations, *amplitudes, *curvatures;
+    int32_t count;
+};
+// The vertices of all windows whose bits are set in `words` words, which may start at any byte.
+QX_BY_WIDTH_TO_8(void, StoreVertices,
+                 (const DBL *fitMatrix, int32_t w, const DBL *x, const char *masks, int32_t words,
+                  const VertexLimits *limits, VertexLists lists))
+
+// Of up to maskWidth extrema, without those whose location is NaN, those that stay in *kept: of two
+// less than a sample apart the more extreme one, or the first of equals. False where this has to be
+// judged one by one: where more than two are that close, one of the first to the one before them at
+// lastLocation, or two with one between them. Eight elements behind the last are read.
+QX_BY_WIDTH_TO_8(bool, KeptOfClose,
+                 (const DBL *locations, const DBL *amplitudes, int32_t count, double sign,
+                  double lastLocation, uint64_t *kept))
 
 } // namespace qx
 

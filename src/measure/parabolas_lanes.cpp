@@ -21,10 +21,15 @@ QX_INLINE bool IsSlopeEnough(L c1) {
     return !Any((c1 >= L(-smallestSlope)) & (c1 <= L(smallestSlope)));
 }
 
-// The test of the vertices of narrow windows. Within the reach the amplitude differs from c0 by
-// less than |c1|, and rounding preserves the order.
+// The test of the vertices of narrow windows, |c1| < reach * sign * c2 with more than rounding could
+// hide. Within the reach the amplitude differs from c0 by less than |c1|, and rounding preserves the
+// order.
 struct VertexTest {
     double reach, towards, level; // towards * amplitude > level
+
+    explicit QX_INLINE VertexTest(const VertexLimits &limits)
+        : reach(limits.sign * limits.centre * (1 + 1e-9)), towards(-limits.sign),
+          level(-limits.sign * limits.threshold) {}
 
     QX_INLINE uint64_t bits(L c0, L c1, L c2) const {
         const L slope = Magnitude(c1);
@@ -161,71 +166,196 @@ struct WindowsOfFour {
     }
 };
 
+// The numbers of the bits that are set in a byte.
+struct ByteBits {
+    int32_t numbers[256][8];
+    constexpr ByteBits() : numbers() {
+        for (int byte = 0; byte < 256; ++byte)
+            for (int bit = 0, at = 0; bit < 8; ++bit)
+                if (byte >> bit & 1)
+                    numbers[byte][at++] = bit;
+    }
+};
+constexpr ByteBits byteBits;
+
 // The windows whose bits are set, by their numbers, and behind them the last one for the rest of a
-// vector.
-QX_INLINE int32_t PlacesOf(const uint64_t *masks, int32_t count, int32_t *places) {
-    constexpr int atOnce = 4; // the end of a loop is hard to predict
+// vector. Without a branch for each bit, which would be hard to predict.
+template <class WordOf>
+QX_INLINE int32_t PlacesOf(const WordOf &wordOf, int32_t count, int32_t *places) {
+    typedef int32_t Places __attribute__((vector_size(32)));
+    typedef int32_t InMemory __attribute__((vector_size(32), aligned(1), may_alias));
+    constexpr int few = 4;
     constexpr uint64_t none = uint64_t{1} << (maskWidth - 1); // whose number is never read
     int32_t found = 0;
     for (int32_t i = 0; i < count; ++i) {
-        const int32_t bits = __builtin_popcountll(masks[i]);
-        uint64_t left = masks[i];
-        for (int32_t first = 0; first < bits; first += atOnce)
-            for (int k = 0; k < atOnce; ++k, left &= left - 1)
-                places[found + first + k] = i * maskWidth + __builtin_ctzll(left | none);
-        found += bits;
+        const uint64_t word = wordOf(i);
+        if (word == 0)
+            continue;
+        const int32_t bits = __builtin_popcountll(word);
+        if (bits <= few) {
+            uint64_t left = word;
+            for (int k = 0; k < few; ++k, left &= left - 1)
+                places[found + k] = i * maskWidth + __builtin_ctzll(left | none);
+            found += bits;
+            continue;
+        }
+        for (int32_t bit = 0; bit < maskWidth; bit += 8) {
+            const auto byte = static_cast<unsigned>(word >> bit & 0xff);
+            const Places numbers = *reinterpret_cast<const InMemory *>(byteBits.numbers[byte]);
+            *reinterpret_cast<InMemory *>(places + found) = numbers + (i * maskWidth + bit);
+            found += __builtin_popcount(byte);
+        }
     }
     for (int k = 0; found > 0 && k < nativeLanes; ++k)
         places[found + k] = places[found - 1];
     return found;
 }
 
-// Keeps those of eight entries from `first` on whose bits are set behind the `kept` ones.
-QX_INLINE int32_t Keep(unsigned bits, int32_t first, int32_t kept, FoundVertices *found) {
-    for (; bits != 0; bits &= bits - 1, ++kept) {
-        const int32_t i = first + __builtin_ctz(bits);
-        found->locations[kept] = found->locations[i];
-        found->amplitudes[kept] = found->amplitudes[i];
-        found->curvatures[kept] = found->curvatures[i];
-    }
-    return kept;
+QX_INLINE L OfIntegers(const int32_t *numbers) {
+    typedef int32_t InMemory __attribute__((vector_size(4 * nativeLanes), aligned(1), may_alias));
+    typedef int32_t Integers __attribute__((vector_size(4 * nativeLanes)));
+    const Integers all = *reinterpret_cast<const InMemory *>(numbers);
+    return L(__builtin_convertvector(all, L::Vector));
 }
+
+// The vertices of the windows at nativeLanes places.
+struct Vertices {
+    L c2, t, y, d; // curvature, place from the centre, amplitude, second derivative
+
+    template <class Windows>
+    QX_INLINE static Vertices of(const DBL *fitMatrix, const DBL *x, const int32_t *places) {
+        const DBL *from[nativeLanes]; // the even lanes, then the odd ones
+        for (int k = 0; k < nativeLanes; ++k)
+            from[k / 2 + k % 2 * (nativeLanes / 2)] = x + places[k];
+        Vertices v;
+        L c0, c1;
+        Windows(from).fit(fitMatrix, c0, c1, v.c2);
+        v.d = L(2.0) * v.c2;
+        v.t = -c1 / v.d;
+        v.y = (v.t * v.c2 + c1) * v.t + c0;
+        return v;
+    }
+    QX_INLINE L location(const int32_t *places, const VertexLimits &limits) const {
+        return L(limits.position) + OfIntegers(places) + L(limits.centre) + t;
+    }
+    QX_INLINE L amplitude(const VertexLimits &limits) const { return y + L(limits.mean); }
+};
 
 template <class Windows>
 QX_INLINE bool Find(const DBL *fitMatrix, const DBL *x, const uint64_t *masks, int32_t count,
                     const VertexLimits &limits, FoundVertices *found) {
-    int32_t places[FoundVertices::length];
-    const int32_t windows = PlacesOf(masks, count, places);
-    const L sign(limits.sign), level = sign * L(limits.threshold);
-    int32_t kept = 0;
+    const int32_t windows = PlacesOf([=](int32_t i) { return masks[i]; }, count, found->places);
+    const L sign(limits.sign), level = sign * L(limits.threshold), none(__builtin_nan(""));
+    found->count = windows;
     for (int32_t first = 0; first < windows; first += nativeLanes) {
-        const DBL *from[nativeLanes]; // the even lanes, then the odd ones
-        L location, c0, c1, c2;
-        for (int k = 0; k < nativeLanes; ++k) {
-            from[k / 2 + k % 2 * (nativeLanes / 2)] = x + places[first + k];
-            location.v[k] = places[first + k];
-        }
-        Windows(from).fit(fitMatrix, c0, c1, c2);
-        const L d = L(2.0) * c2;
-        const L t = -c1 / d;
-        const L y = (t * c2 + c1) * t + c0;
-        const auto isSought = sign * c2 > L(0.0);
-        if (Any(isSought & ((Magnitude(d) < L(limits.smallestCurvature)) | (t < L(-0.5)))))
+        const int32_t *const places = found->places + first;
+        const Vertices v = Vertices::of<Windows>(fitMatrix, x, places);
+        const auto isSought = sign * v.c2 > L(0.0);
+        if (Any(isSought & ((Magnitude(v.d) < L(limits.smallestCurvature)) | (v.t < L(-0.5)))))
             return false;
-        (L(limits.position) + location + L(limits.centre) + t).store(found->locations + kept);
-        (y + L(limits.mean)).store(found->amplitudes + kept);
-        d.store(found->curvatures + kept);
-        const unsigned inside = windows - first >= nativeLanes ? (1U << nativeLanes) - 1
-                                                               : (1U << (windows - first)) - 1;
-        const unsigned counting =
-            inside & MaskBits(isSought & (Magnitude(t) <= L(limits.reach)) & (sign * y < level));
-        if (__builtin_expect(counting == (1U << nativeLanes) - 1, 1))
-            kept += nativeLanes;
-        else
-            kept = Keep(counting, kept, kept, found);
+        const auto isCounting =
+            isSought & (Magnitude(v.t) <= L(limits.reach)) & (sign * v.y < level);
+        Select(isCounting, v.location(places, limits), none).store(found->locations + first);
+        v.amplitude(limits).store(found->amplitudes + first);
     }
-    found->count = kept;
     return true;
+}
+
+// The vertices of all windows whose bits are set.
+template <class Windows>
+QX_INLINE void StoreAll(const DBL *fitMatrix, const DBL *x, const char *masks, int32_t words,
+                        const VertexLimits &limits, const VertexLists &lists) {
+    int32_t places[FoundVertices::length], at = 0;
+    VertexLimits group = limits;
+    for (int32_t word = 0; word < words; word += groupWords) {
+        const auto wordOf = [=](int32_t i) {
+            uint64_t bits;
+            __builtin_memcpy(&bits, masks + (std::ptrdiff_t{word} + i) * 8, sizeof bits);
+            return bits;
+        };
+        const int32_t left = words - word;
+        const int32_t windows = PlacesOf(wordOf, left < groupWords ? left : groupWords, places);
+        const DBL *const from = x + std::ptrdiff_t{word} * maskWidth;
+        group.position = limits.position + static_cast<double>(word) * maskWidth;
+        const auto store = [&](int32_t first, DBL *locations, DBL *amplitudes, DBL *curvatures) {
+            const Vertices v = Vertices::of<Windows>(fitMatrix, from, places + first);
+            v.location(places + first, group).store(locations);
+            v.amplitude(group).store(amplitudes);
+            v.d.store(curvatures);
+        };
+        // What a vector has too much is overwritten by the next one.
+        int32_t first = 0;
+        for (; first < windows && at + first + nativeLanes <= lists.count; first += nativeLanes)
+            store(first, lists.locations + at + first, lists.amplitudes + at + first,
+                  lists.curvatures + at + first);
+        for (; first < windows; first += nativeLanes) {
+            DBL last[3][nativeLanes];
+            store(first, last[0], last[1], last[2]);
+            for (int32_t k = 0; k < nativeLanes && at + first + k < lists.count; ++k) {
+                lists.locations[at + first + k] = last[0][k];
+                lists.amplitudes[at + first + k] = last[1][k];
+                lists.curvatures[at + first + k] = last[2][k];
+            }
+        }
+        at += windows;
+    }
+}
+
+// ---- Marks ----
+
+QX_INLINE uint64_t FirstBits(int32_t count) { return ~uint64_t{0} >> (maskWidth - count); }
+
+// The bits of the two windows at each end of a group, whose neighbours are in other groups.
+QX_INLINE void DoubtEnds(int32_t count, VertexMarks *marks) {
+    const int32_t ends[] = {0, 1, count - 2, count - 1};
+    for (const int32_t i : ends)
+        if (i >= 0 && i < count) {
+            const uint64_t bit = uint64_t{1} << i % maskWidth;
+            marks->doubtful[i / maskWidth] |= marks->possible[i / maskWidth] & bit;
+        }
+}
+
+// The windows at whose first sample the data rise or fall by more than `least`.
+struct Steps {
+    uint64_t rises, falls;
+};
+QX_INLINE Steps StepsOf(const DBL *x, int32_t count, double least) {
+    Steps steps = {};
+    const L up(least), down(-least);
+    int32_t i = 0;
+    for (; i + nativeLanes <= count; i += nativeLanes) {
+        const L step = L::load(x + i + 1) - L::load(x + i);
+        steps.rises |= uint64_t{MaskBits(step > up)} << i;
+        steps.falls |= uint64_t{MaskBits(step < down)} << i;
+    }
+    for (; i < count; ++i) {
+        const double step = x[i + 1] - x[i];
+        steps.rises |= uint64_t{step > least} << i;
+        steps.falls |= uint64_t{step < -least} << i;
+    }
+    return steps;
+}
+
+QX_INLINE double SumOfMagnitudes(const DBL *x, int32_t n) {
+    constexpr int sums = 4;
+    constexpr int ahead = groupWidth; // fetches the next group
+    L sum[sums];
+    for (L &part : sum)
+        part = L(0.0);
+    int32_t i = 0;
+    for (; i + sums * nativeLanes <= n; i += sums * nativeLanes)
+        for (int k = 0; k < sums; ++k) {
+            if (k * nativeLanes % 8 == 0)
+                __builtin_prefetch(x + i + k * nativeLanes + ahead);
+            sum[k] = sum[k] + Magnitude(L::load(x + i + k * nativeLanes));
+        }
+    const L all = (sum[0] + sum[1]) + (sum[2] + sum[3]);
+    double total = 0;
+    for (int k = 0; k < nativeLanes; ++k)
+        total += all[k];
+    for (; i < n; ++i)
+        total += __builtin_fabs(x[i]);
+    return total;
 }
 
 } // namespace
@@ -238,25 +368,25 @@ bool FindVertices(const DBL *fitMatrix, int32_t w, const DBL *x, const uint64_t 
 
 bool KeptOfClose(const DBL *locations, const DBL *amplitudes, int32_t count, double sign,
                  double lastLocation, uint64_t *kept) {
-    if (__builtin_fabs(lastLocation - locations[0]) < 1.0)
-        return false;
-    uint64_t close = 0, better = 0, threeClose = 0;
-    const L towards(sign);
-    const int32_t pairs = count - 1;
-    for (int32_t i = 0; i < pairs; i += nativeLanes) {
-        const L here = L::load(locations + i);
-        close |= uint64_t{MaskBits(Magnitude(here - L::load(locations + i + 1)) < L(1.0))} << i;
+    const uint64_t all = FirstBits(count);
+    uint64_t close = 0, better = 0, threeClose = 0, valid = 0, closeToLast = 0;
+    const L towards(sign), last(lastLocation);
+    for (int32_t i = 0; i < count; i += nativeLanes) {
+        const L here = L::load(locations + i), next = L::load(locations + i + 1);
+        valid |= uint64_t{MaskBits(here == here)} << i;
+        close |= uint64_t{MaskBits(Magnitude(here - next) < L(1.0))} << i;
         threeClose |= uint64_t{MaskBits(Magnitude(here - L::load(locations + i + 2)) < L(1.0))}
                       << i;
         better |= uint64_t{MaskBits(towards * L::load(amplitudes + i + 1) <
                                     towards * L::load(amplitudes + i))}
                   << i;
+        if (i < 4)
+            closeToLast |= MaskBits(Magnitude(last - here) < L(1.0));
     }
-    const uint64_t all = ~uint64_t{0} >> (maskWidth - count);
     close &= all >> 1;
     threeClose &= all >> 2;
-    *kept = all & ~((close & better) | (close & ~better) << 1);
-    return ((close & close << 1) | threeClose) == 0;
+    *kept = all & valid & ~((close & better) | (close & ~better) << 1);
+    return ((close & close << 1) | threeClose | (closeToLast & all)) == 0;
 }
 
 uint64_t RisingWindows(const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count) {
@@ -271,24 +401,81 @@ uint64_t RisingWindows(const DBL *fitMatrix, int32_t w, const DBL *x, int32_t co
         });
 }
 
-uint64_t NarrowWindowsAtVertex(const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count,
-                               double reach, double sign, double threshold) {
-    const VertexTest test = {sign * reach, -sign, -sign * threshold};
-    const auto one = [&](int32_t i) {
-        return test.one(OneProduct(fitMatrix, w, x + i), OneProduct(fitMatrix + w, w, x + i),
-                        OneProduct(fitMatrix + 2 * w, w, x + i));
-    };
+void MarkVertices(const DBL *fitMatrix, int32_t w, const DBL *x, int32_t count,
+                  const VertexLimits *limits, VertexMarks *marks) {
+    const VertexTest test(*limits);
+    for (int32_t first = 0; first < count; first += maskWidth) {
+        const DBL *const from = x + first;
+        const int32_t windows = count - first < maskWidth ? count - first : maskWidth;
+        const auto one = [&](int32_t i) {
+            return test.one(OneProduct(fitMatrix, w, from + i),
+                            OneProduct(fitMatrix + w, w, from + i),
+                            OneProduct(fitMatrix + 2 * w, w, from + i));
+        };
+        const uint64_t bits =
+            w == 3
+                ? Collect(
+                      windows, [&](int32_t i) { return AtVertexOfThree<together>(from + i, test); },
+                      [&](int32_t i) { return AtVertexOfThree<1>(from + i, test); }, one)
+                : Collect(
+                      windows,
+                      [&](int32_t i) {
+                          constexpr int half = together / 2;
+                          return AtVertexOfFour<half>(fitMatrix, from + i, test) |
+                                 AtVertexOfFour<half>(fitMatrix, from + i + half * nativeLanes,
+                                                      test)
+                                     << (half * nativeLanes);
+                      },
+                      [&](int32_t i) { return AtVertexOfFour<1>(fitMatrix, from + i, test); }, one);
+        marks->possible[first / maskWidth] = marks->doubtful[first / maskWidth] = bits;
+    }
+}
+
+// With steps beyond `least` the comparison of samples decides as that of the coefficients, whose
+// rounding errors are less than a hundredth of it. `least` also keeps certain curvatures above the
+// smallest one, and certain vertices a sample from all others.
+bool MarkBySteps(const DBL *x, int32_t count, const VertexLimits *limits, VertexMarks *marks) {
+    constexpr double largest = 1e300; // below it no coefficient overflows
+    const double level = -limits->sign * limits->threshold;
+    if (!(level < 0))
+        return false;
+    const double size = SumOfMagnitudes(x, count + 2);
+    if (!(size < largest) || !(level < -size))
+        return false;
+    const double least = limits->smallestCurvature + size * 0x1p-44;
+    const int32_t words = (count + maskWidth - 1) / maskWidth;
+    Steps steps[groupWords + 1];
+    steps[words] = {};
+    for (int32_t k = 0; k * maskWidth <= count; ++k) {
+        const int32_t left = count + 1 - k * maskWidth;
+        steps[k] = StepsOf(x + k * maskWidth, left < maskWidth ? left : maskWidth, least);
+    }
+    if (limits->sign > 0)
+        for (int32_t k = 0; k <= words; ++k)
+            steps[k] = {steps[k].falls, steps[k].rises};
+    int32_t doubts = 0;
+    for (int32_t k = 0; k < words; ++k) {
+        const int32_t left = count - k * maskWidth;
+        const auto behind = [](uint64_t bits, uint64_t next) {
+            return bits >> 1 | next << (maskWidth - 1);
+        };
+        const uint64_t certain = steps[k].rises & behind(steps[k].falls, steps[k + 1].falls);
+        const uint64_t possible = ~(steps[k].falls | behind(steps[k].rises, steps[k + 1].rises)) &
+                                  FirstBits(left < maskWidth ? left : maskWidth);
+        marks->possible[k] = possible;
+        marks->doubtful[k] = possible & ~certain;
+        doubts += __builtin_popcountll(marks->doubtful[k]);
+    }
+    DoubtEnds(count, marks);
+    return doubts <= count / 4;
+}
+
+void StoreVertices(const DBL *fitMatrix, int32_t w, const DBL *x, const char *masks, int32_t words,
+                   const VertexLimits *limits, VertexLists lists) {
     if (w == 3)
-        return Collect(
-            count, [&](int32_t i) { return AtVertexOfThree<together>(x + i, test); },
-            [&](int32_t i) { return AtVertexOfThree<1>(x + i, test); }, one);
-    return Collect(
-        count,
-        [&](int32_t i) {
-            return AtVertexOfFour<4>(fitMatrix, x + i, test) |
-                   AtVertexOfFour<4>(fitMatrix, x + i + 4 * nativeLanes, test) << (4 * nativeLanes);
-        },
-        [&](int32_t i) { return AtVertexOfFour<1>(fitMatrix, x + i, test); }, one);
+        StoreAll<WindowsOfThree>(fitMatrix, x, masks, words, *limits, lists);
+    else
+        StoreAll<WindowsOfFour>(fitMatrix, x, masks, words, *limits, lists);
 }
 
 } // namespace qx::QX_WIDTH

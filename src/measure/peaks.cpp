@@ -36,12 +36,22 @@ double PeakNormalize(DBL *window, int32_t w, bool ofValleys) {
     return scale;
 }
 
+// The vertex of a parabola: its place from the centre, its amplitude, and the second derivative.
+struct Vertex {
+    double t, y, d;
+};
+Vertex VertexOf(const Parabola &p) {
+    const double d = 2 * p.c2;
+    const double t = -p.c1 / d;
+    return {t, (t * p.c2 + p.c1) * t + p.c0, d};
+}
+
 class PeakScan {
 public:
     PeakScan(const PeakBlock &block, double mean, PeakDState *state, PeakList *found)
         : fitMatrix_(state->fitMatrix), w_(state->width), centre_((state->width - 1) * 0.5),
           ofValleys_(block.ofValleys), threshold_(block.threshold - mean), mean_(mean),
-          state_(state), found_(found) {}
+          block_(block.data), state_(state), found_(found) {}
 
     // The windows at x, x + 1, ... ErrOutOfMemory.
     ErrorCode run(const DBL *x, std::ptrdiff_t windows) {
@@ -60,14 +70,22 @@ private:
     template <int32_t W>
     ErrorCode runByVertex(const DBL *x, std::ptrdiff_t windows);
     template <int32_t W>
+    void markGroup(const DBL *fitMatrix, const DBL *x, std::ptrdiff_t first, std::ptrdiff_t windows,
+                   bool *mayTakeFormer);
+    template <int32_t W, class Store>
     ErrorCode runOneByOne(const DBL *fitMatrix, const DBL *x, std::ptrdiff_t first,
-                          std::ptrdiff_t windows, const uint64_t *masks, bool *mayTakeFormer);
-    template <class Previous>
+                          std::ptrdiff_t windows, const uint64_t *masks, bool *mayTakeFormer,
+                          const Store &store);
+    template <class Previous, class Store>
     ErrorCode refine(const Parabola &now, const Previous &previous, double scale, double position,
-                     bool &tookOwn);
+                     bool &tookOwn, const Store &store);
 
     // A vertex from the centre of its window.
     double furthest() const { return 0.5 * centre_ + 10 * epsilon; }
+    VertexLimits limitsAt(double position) const {
+        return {position,   centre_, furthest(), smallestCurvature, ofValleys_ ? 1.0 : -1.0,
+                threshold_, mean_};
+    }
     bool isSought(double curvature) const { return ofValleys_ ? curvature > 0 : curvature < 0; }
     Parabola previous() const {
         const DBL *const c = state_->previous;
@@ -95,6 +113,7 @@ private:
     double centre_;
     bool ofValleys_;
     double threshold_, mean_;
+    const DBL *block_;
     PeakDState *state_;
     PeakList *found_;
 };
@@ -117,7 +136,7 @@ ErrorCode PeakScan::runBySlope(const DBL *x, std::ptrdiff_t windows) {
             bool tookOwn;
             if (const ErrorCode failed = refine(
                     fit(x, i), [&] { return before(x, i); }, 1.0, position + static_cast<double>(i),
-                    tookOwn))
+                    tookOwn, [this](const Peak &peak) { return found_->store(peak); }))
                 return failed;
         }
         wasRising = rising >> (count - 1) & 1;
@@ -131,43 +150,63 @@ ErrorCode PeakScan::runBySlope(const DBL *x, std::ptrdiff_t windows) {
 // may use their vertex; this has no effect if that vertex has been tested already.
 template <int32_t W>
 ErrorCode PeakScan::runByVertex(const DBL *x, std::ptrdiff_t windows) {
-    // Twice the limit of the vertex position, because c1 is compared with c2, plus more than
-    // rounding could hide.
-    const double reach = centre_ * (1 + 1e-9);
-    const double sign = ofValleys_ ? 1.0 : -1.0;
     DBL fitMatrix[3 * W]; // a local copy, which no store of a result can change
     Copy(fitMatrix, fitMatrix_, 3 * W);
-    bool mayTakeFormer = true, isPlain = true;
-    FoundVertices found;
-    std::ptrdiff_t end;
-    for (std::ptrdiff_t first = 0; first < windows; first += end) {
-        end = std::min<std::ptrdiff_t>(windows - first,
-                                       first == 0 ? maskWidth : FoundVertices::windows);
-        uint64_t masks[FoundVertices::windows / maskWidth];
-        int32_t count = 0;
-        for (std::ptrdiff_t i = 0; i < end; i += maskWidth)
-            masks[count++] = NarrowWindowsAtVertex(fitMatrix, W, x + first + i, WindowsFrom(i, end),
-                                                   reach, sign, threshold_);
-        const double position = static_cast<double>(state_->position) + static_cast<double>(first);
-        const VertexLimits limits = {position, centre_,    furthest(), smallestCurvature,
-                                     sign,     threshold_, mean_};
-        isPlain = isPlain && (mayTakeFormer ||
-                              FindVertices(fitMatrix, W, x + first, masks, count, &limits, &found));
-        if (const ErrorCode failed =
-                isPlain && !mayTakeFormer
-                    ? found_->store(found)
-                    : runOneByOne<W>(fitMatrix, x, first, end, masks, &mayTakeFormer))
+    // The first window may use the vertex of the one before the run.
+    bool mayTakeFormer = true;
+    const std::ptrdiff_t head = std::min<std::ptrdiff_t>(windows, maskWidth);
+    const VertexLimits limits = limitsAt(state_->position);
+    VertexMarks marks;
+    MarkVertices(fitMatrix, W, x, static_cast<int32_t>(head), &limits, &marks);
+    const auto store = [this](const Peak &peak, std::ptrdiff_t) { return found_->store(peak); };
+    if (const ErrorCode failed =
+            runOneByOne<W>(fitMatrix, x, 0, head, marks.possible, &mayTakeFormer, store))
+        return failed;
+    if (windows > head) {
+        if (const ErrorCode failed = found_->beginMarks(fitMatrix, W, limits, x - block_, windows))
             return failed;
+        for (std::ptrdiff_t first = head; first < windows; first += groupWidth)
+            markGroup<W>(fitMatrix, x, first, std::min<std::ptrdiff_t>(groupWidth, windows - first),
+                         &mayTakeFormer);
+        found_->endMarks(x);
     }
     passed(fit<W>(x, windows - 1), 1.0, windows);
     return 0;
 }
 
-// The windows of `masks` from number `first` of a run on.
 template <int32_t W>
+void PeakScan::markGroup(const DBL *fitMatrix, const DBL *x, std::ptrdiff_t first,
+                         std::ptrdiff_t windows, bool *mayTakeFormer) {
+    const auto count = static_cast<int32_t>(windows);
+    const VertexLimits limits =
+        limitsAt(static_cast<double>(state_->position) + static_cast<double>(first));
+    VertexMarks marks;
+    FoundVertices found;
+    const auto isPlain = [&] {
+        return FindVertices(fitMatrix, W, x + first, marks.doubtful,
+                            (count + maskWidth - 1) / maskWidth, &limits, &found);
+    };
+    bool isDone =
+        W == 3 && !*mayTakeFormer && MarkBySteps(x + first, count, &limits, &marks) && isPlain();
+    if (!isDone) {
+        MarkVertices(fitMatrix, W, x + first, count, &limits, &marks);
+        isDone = !*mayTakeFormer && isPlain();
+    }
+    if (isDone)
+        return found_->mark(marks, found, first, count);
+    runOneByOne<W>(fitMatrix, x, first, windows, marks.possible, mayTakeFormer,
+                   [this](const Peak &peak, std::ptrdiff_t i) {
+                       found_->mark(peak, i);
+                       return 0;
+                   });
+}
+
+// The windows of `masks` from number `first` of a run on. `store` takes a peak and the window whose
+// vertex it is.
+template <int32_t W, class Store>
 ErrorCode PeakScan::runOneByOne(const DBL *fitMatrix, const DBL *x, std::ptrdiff_t first,
-                                std::ptrdiff_t windows, const uint64_t *masks,
-                                bool *mayTakeFormer) {
+                                std::ptrdiff_t windows, const uint64_t *masks, bool *mayTakeFormer,
+                                const Store &store) {
     const double position = state_->position;
     for (std::ptrdiff_t done = 0; done < windows; done += maskWidth) {
         const uint64_t all = ~uint64_t{0} >> (maskWidth - WindowsFrom(done, windows));
@@ -183,7 +222,7 @@ ErrorCode PeakScan::runOneByOne(const DBL *fitMatrix, const DBL *x, std::ptrdiff
             bool tookOwn = false;
             if (const ErrorCode failed = refine(
                     now, [&] { return before<W>(x, i); }, 1.0, position + static_cast<double>(i),
-                    tookOwn))
+                    tookOwn, [&](const Peak &peak) { return store(peak, tookOwn ? i : i - 1); }))
                 return failed;
             if (__builtin_expect(!tookOwn, 0)) {
                 left |= bit << 1 & all;
@@ -204,7 +243,8 @@ ErrorCode PeakScan::runScaled(const DBL *x, std::ptrdiff_t windows, DBL *work) {
         bool tookOwn;
         if (isCandidate)
             if (const ErrorCode failed = refine(
-                    now, [this] { return previous(); }, scale, state_->position, tookOwn))
+                    now, [this] { return previous(); }, scale, state_->position, tookOwn,
+                    [this](const Peak &peak) { return found_->store(peak); }))
                 return failed;
         passed(now, scale, 1);
     }
@@ -213,29 +253,26 @@ ErrorCode PeakScan::runScaled(const DBL *x, std::ptrdiff_t windows, DBL *work) {
 
 // The vertex of a candidate at `position`, or that of the previous window if it is nearer.
 // `tookOwn` is set to whether the candidate's own vertex was tested, accepted or not.
-template <class Previous>
+template <class Previous, class Store>
 ErrorCode PeakScan::refine(const Parabola &now, const Previous &previous, double scale,
-                           double position, bool &tookOwn) {
+                           double position, bool &tookOwn, const Store &store) {
     tookOwn = false;
-    double d = 2 * now.c2;
-    if (std::fabs(d) < smallestCurvature)
+    if (std::fabs(2 * now.c2) < smallestCurvature)
         return 0;
-    double t = -now.c1 / d;
-    double y = (t * now.c2 + now.c1) * t + now.c0;
+    auto [t, y, d] = VertexOf(now);
     tookOwn = true;
     if (position > 0 && t < -0.5) {
         const Parabola former = previous();
-        const double dp = 2 * former.c2;
         tookOwn = false;
-        if (dp == 0)
+        if (2 * former.c2 == 0)
             return 0;
-        const double tp = -former.c1 / dp;
-        tookOwn = !(std::fabs(t) > std::fabs(tp));
+        const Vertex formers = VertexOf(former);
+        tookOwn = !(std::fabs(t) > std::fabs(formers.t));
         if (!tookOwn) {
             position -= 1;
-            d = dp;
-            y = (tp * former.c2 + former.c1) * tp + former.c0;
-            t = tp;
+            t = formers.t;
+            y = formers.y;
+            d = formers.d;
             scale = 1.0;
         }
     }
@@ -243,7 +280,7 @@ ErrorCode PeakScan::refine(const Parabola &now, const Previous &previous, double
         return 0;
     if (!(ofValleys_ ? scale * y < threshold_ : scale * y > threshold_))
         return 0;
-    return found_->store(Peak{position + centre_ + t, scale * y + mean_, scale * d});
+    return store(Peak{position + centre_ + t, scale * y + mean_, scale * d});
 }
 
 ErrorCode BeginStream(const PeakBlock &block, PeakDState *state) {
@@ -347,46 +384,80 @@ ErrorCode PeakList::grow() {
     return 0;
 }
 
-ErrorCode PeakList::store(const FoundVertices &found) {
-    for (int32_t first = 0; first < found.count; first += maskWidth) {
-        const int32_t count = std::min(maskWidth, found.count - first);
+ErrorCode PeakList::beginMarks(const DBL *fitMatrix, int32_t w, const VertexLimits &limits,
+                               std::ptrdiff_t offset, std::ptrdiff_t windows) {
+    words_ = static_cast<int32_t>((windows + maskWidth - 1) / maskWidth);
+    const int64_t bytes = int64_t{words_} * int64_t{sizeof(Word)};
+    if (const ErrorCode failed = marks_.allocate(bytes))
+        return failed;
+    std::memset(marks_.bytes(), 0, static_cast<std::size_t>(bytes));
+    Copy(fitMatrix_, fitMatrix, 3 * std::ptrdiff_t{w});
+    w_ = w;
+    limits_ = limits;
+    offset_ = offset;
+    return 0;
+}
+
+void PeakList::mark(const Peak &peak, std::ptrdiff_t i) {
+    if (isClose(peak)) {
+        if (!isBetter(peak))
+            return;
+        if (lastMark_ >= 0)
+            word(lastMark_ / maskWidth) &= ~(uint64_t{1} << lastMark_ % maskWidth);
+        else
+            size_ -= size_ > 0;
+    }
+    word(i / maskWidth) |= uint64_t{1} << i % maskWidth;
+    lastMark_ = i;
+    setLast(peak);
+}
+
+void PeakList::mark(const VertexMarks &marks, const FoundVertices &found, std::ptrdiff_t first,
+                    int32_t count) {
+    for (int32_t i = 0; i * maskWidth < count; ++i)
+        word(first / maskWidth + i) = marks.possible[i];
+    const auto clear = [&](int32_t i) {
+        word((first + found.places[i]) / maskWidth) &=
+            ~(uint64_t{1} << found.places[i] % maskWidth);
+    };
+    for (int32_t begin = 0; begin < found.count; begin += maskWidth) {
+        const int32_t some = std::min(maskWidth, found.count - begin);
         uint64_t kept;
-        if (KeptOfClose(found.locations + first, found.amplitudes + first, count,
+        if (KeptOfClose(found.locations + begin, found.amplitudes + begin, some,
                         ofValleys_ ? 1.0 : -1.0, lastLocation_, &kept)) {
-            if (const ErrorCode failed = append(found, first, kept))
-                return failed;
+            for (uint64_t dropped = ~kept & ~uint64_t{0} >> (maskWidth - some); dropped != 0;
+                 dropped &= dropped - 1)
+                clear(begin + std::countr_zero(dropped));
+            if (kept == 0)
+                continue;
+            const int32_t last = begin + maskWidth - 1 - std::countl_zero(kept);
+            lastMark_ = first + found.places[last];
+            setLast(Peak{found.locations[last], found.amplitudes[last], 0});
             continue;
         }
-        for (int32_t i = first; i < first + count; ++i)
-            if (const ErrorCode failed =
-                    store(Peak{found.locations[i], found.amplitudes[i], found.curvatures[i]}))
-                return failed;
-    }
-    return 0;
-}
-
-ErrorCode PeakList::append(const FoundVertices &found, int32_t first, uint64_t kept) {
-    while (kept != 0) {
-        if (size_ == capacity_)
-            if (const ErrorCode failed = grow())
-                return failed;
-        DBL *to = place(size_);
-        DBL *const end = to + chunk - size_ % chunk;
-        DBL *const begin = to;
-        for (; kept != 0 && to != end; kept &= kept - 1, ++to) {
-            const int32_t i = first + std::countr_zero(kept);
-            to[0] = found.locations[i];
-            to[chunk] = found.amplitudes[i];
-            to[2 * chunk] = found.curvatures[i];
+        for (int32_t i = begin; i < begin + some; ++i) {
+            clear(i);
+            if (!std::isnan(found.locations[i]))
+                mark(Peak{found.locations[i], found.amplitudes[i], 0}, first + found.places[i]);
         }
-        size_ += static_cast<int32_t>(to - begin);
-        lastLocation_ = to[-1];
-        lastAmplitude_ = to[chunk - 1];
     }
-    return 0;
 }
 
-void PeakList::copyTo(DBL *locations, DBL *amplitudes, DBL *derivatives) const {
+void PeakList::endMarks(const DBL *x) {
+    for (int32_t i = 0; i < words_; ++i) {
+        const uint64_t bits = word(i);
+        marked_ += std::popcount(bits);
+        if (bits != 0)
+            lastMark_ = std::ptrdiff_t{i} * maskWidth + maskWidth - 1 - std::countl_zero(bits);
+    }
+    if (marked_ == 0)
+        return;
+    const Vertex last = VertexOf(FitWindow(fitMatrix_, w_, x + lastMark_));
+    const double position = limits_.position + static_cast<double>(lastMark_);
+    setLast(Peak{position + limits_.centre + last.t, last.y + limits_.mean, last.d});
+}
+
+void PeakList::copyTo(const DBL *block, DBL *locations, DBL *amplitudes, DBL *derivatives) const {
     for (int32_t i = 0; i < size_; i += chunk) {
         const int32_t count = std::min(chunk, size_ - i);
         const DBL *const from = place(i);
@@ -394,6 +465,10 @@ void PeakList::copyTo(DBL *locations, DBL *amplitudes, DBL *derivatives) const {
         Copy(amplitudes + i, from + chunk, count);
         Copy(derivatives + i, from + 2 * chunk, count);
     }
+    if (marked_ > 0)
+        StoreVertices(fitMatrix_, w_, block + offset_, static_cast<const char *>(marks_.bytes()),
+                      words_, &limits_,
+                      {locations + size_, amplitudes + size_, derivatives + size_, marked_});
 }
 
 void PointInto(DBL *buffer, int32_t w, PeakDState *state) {

@@ -11,7 +11,8 @@ constexpr double toInteger = 0x1.8p52; // adding and subtracting it rounds to an
 template <class L>
 __attribute__((always_inline)) inline L Indices(int32_t i) {
     const double from = i;
-    const double indices[4] = {from, from + 1.0, from + 2.0, from + 3.0};
+    const double indices[8] = {from,       from + 1.0, from + 2.0, from + 3.0,
+                               from + 4.0, from + 5.0, from + 6.0, from + 7.0};
     return L::load(indices);
 }
 
@@ -106,6 +107,26 @@ void SawtoothSamples(WavePhases phases, int32_t n, double amp, DBL *y) {
         const L second = q - L(2.0);
         return L(p.v < L(180.0).v ? q.v : second.v) * L(amp);
     });
+}
+
+void ChirpPhases(double step, double slope, int32_t first, int32_t n, DBL *y) {
+    typedef Lanes<nativeLanes> L;
+    const auto phases = [=]<class V>(V i) { return i * (V(step) * i + V(slope)); };
+    L indices = Indices<L>(first);
+    int32_t i = 0;
+    for (; n - i >= nativeLanes; i += nativeLanes, indices = indices + L(nativeLanes))
+        phases(indices).store(y + i);
+    for (; i < n; ++i)
+        phases(Lanes<1>(static_cast<double>(first) + i)).store(y + i);
+}
+
+void ScaleSamples(double amp, int32_t n, DBL *y) {
+    typedef Lanes<nativeLanes> L;
+    int32_t i = 0;
+    for (; n - i >= nativeLanes; i += nativeLanes)
+        (L(amp) * L::load(y + i)).store(y + i);
+    for (; i < n; ++i)
+        y[i] = amp * y[i];
 }
 
 } // namespace qx::QX_WIDTH

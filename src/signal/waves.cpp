@@ -146,11 +146,14 @@ ErrorCode GenArbitraryWave(double amp, double f, double &phase, ConstRealVector 
 void GenChirp(double amp, double f1, double f2, RealVector y) {
     const int32_t n = Count(y);
     const double step = (f2 - f1) * kPi / n;
-    for (int32_t i = 0; i < n; ++i)
-        y[i] = i * (step * i + 2.0 * kPi * f1);
-    Sines(y.data(), n, y.data());
-    for (int32_t i = 0; i < n; ++i)
-        y[i] = amp * y[i];
+    constexpr int32_t atOnce = 1024; // stays in the first cache
+    for (int32_t first = 0; first < n; first += std::min(atOnce, n - first)) {
+        const int32_t count = std::min(atOnce, n - first);
+        DBL *const to = y.data() + first;
+        ChirpPhases(step, 2.0 * kPi * f1, first, count, to);
+        Sines(to, count, to);
+        ScaleSamples(amp, count, to);
+    }
 }
 
 } // namespace qx

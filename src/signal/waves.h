@@ -27,10 +27,13 @@ struct WavePhases {
     double start;
     bool inPlace;
 };
-QX_BY_WIDTH(void, SquareSamples,
-            (WavePhases phases, int32_t n, double amp, double threshold, DBL *y))
-QX_BY_WIDTH(void, TriangleSamples, (WavePhases phases, int32_t n, double amp, DBL *y))
-QX_BY_WIDTH(void, SawtoothSamples, (WavePhases phases, int32_t n, double amp, DBL *y))
+QX_BY_WIDTH_TO_8(void, SquareSamples,
+                 (WavePhases phases, int32_t n, double amp, double threshold, DBL *y))
+QX_BY_WIDTH_TO_8(void, TriangleSamples, (WavePhases phases, int32_t n, double amp, DBL *y))
+QX_BY_WIDTH_TO_8(void, SawtoothSamples, (WavePhases phases, int32_t n, double amp, DBL *y))
+// i (step i + slope) from i = first on.
+QX_BY_WIDTH_TO_8(void, ChirpPhases, (double step, double slope, int32_t first, int32_t n, DBL *y))
+QX_BY_WIDTH_TO_8(void, ScaleSamples, (double amp, int32_t n, DBL *y))
 
 } // namespace qx
 

@@ -2,10 +2,13 @@
 
 #include "frame/constants.h"
 #include "special/extended.h"
+#include "special/gamma.h"
 #include "special/hypergeometric_terms.h"
 #include "special/kummer_regions.h"
+#include "special/reciprocal_gamma.h"
 
 #include <cmath>
+#include <initializer_list>
 
 namespace qx {
 
@@ -15,6 +18,10 @@ constexpr double kConnectionFrom = 0.9;
 constexpr double kFarthest = -1e280; // below it 1 / (1 - x) does not have the digits of two doubles
 constexpr double kGoodConnection = 1e-13;
 constexpr double kGoodParts = 1e-27;
+constexpr double kPlainFrom = 0.75, kPlainGood = 40 * kEpsilon, kPlainError = 10 * kEpsilon;
+constexpr double kPlain = 20, kPlainDistance = 0.05;
+constexpr double kPlainMostC = 6, kPlainMostS = 2.5; // beyond, the parts exceed the value
+constexpr double kPlainLoss = 4;                     // largest part relative to the value
 constexpr double kAside = 0x1p-32;
 constexpr Wide kOne = {{0.5, 0}, 1};
 
@@ -62,6 +69,42 @@ Estimated NearOne(const GaussArguments &p, const Point &point) {
     return Between(beside(-kAside), beside(kAside), off.high / kAside);
 }
 
+// The relative error of 1 / gamma(x) of a rounded x.
+double RoundingBesidePole(double x) {
+    return x > 0.5 ? 0 : kEpsilon * (1 + std::fabs(x)) / std::fabs(x - std::rint(x));
+}
+
+// The connection in double precision for moderate parameters and c - a - b away from integers.
+Estimated PlainConnection(const GaussArguments &p, Extended s, const Point &point) {
+    const Extended one = Whole(1);
+    const Extended d = p.c - p.a, e = p.c - p.b;
+    const double c = p.c.high;
+    const double off = std::fabs(s.high - std::rint(s.high));
+    for (const double parameter : {p.a.high, p.b.high, c, d.high, e.high, s.high})
+        if (!(std::fabs(parameter) <= kPlain))
+            return {kOne, kInfinity};
+    if (off < kPlainDistance || c < kPlainDistance || c > kPlainMostC ||
+        std::fabs(s.high) > kPlainMostS)
+        return {kOne, kInfinity};
+    const PlainValue m = PlainForm({{p.a, p.b, one - s, point.rest, true}, one, Whole(0)});
+    const PlainValue n = PlainForm({{d, e, one + s, point.rest, true}, one, Whole(0)});
+    if (std::isinf(m.error + n.error))
+        return {kOne, kInfinity};
+    const double first =
+        GammaFunction(s.high) * ReciprocalGamma(d.high) * ReciprocalGamma(e.high) * m.value;
+    const double second = GammaFunction(-s.high) * ReciprocalGamma(p.a.high) *
+                          ReciprocalGamma(p.b.high) * std::pow(point.rest.high, s.high) * n.value;
+    const double sum = first + second;
+    const double rounding = kPlainError + kEpsilon * (1 + std::fabs(s.high)) / off;
+    const double ofFirst = rounding + RoundingBesidePole(d.high) + RoundingBesidePole(e.high);
+    const double error =
+        (std::fabs(first) * (m.error + ofFirst) + std::fabs(second) * (n.error + rounding)) /
+        std::fabs(sum);
+    if (!(std::fabs(first) + std::fabs(second) <= kPlainLoss * std::fabs(sum)))
+        return {kOne, kInfinity};
+    return {WideOf(Whole(GammaFunction(c) * sum)), error};
+}
+
 // Euler's form, whose series ends because c - a or c - b is 0, -1, -2, ...
 Estimated Euler(const GaussArguments &p, const Point &point) {
     const Extended d = p.c - p.a, e = p.c - p.b;
@@ -72,6 +115,7 @@ Estimated Euler(const GaussArguments &p, const Point &point) {
 Estimated BySeries(const GaussArguments &p, const Point &point) {
     const Extended d = p.c - p.a, e = p.c - p.b;
     const double x = point.x.high;
+    const bool isTurned = x < -0.5;
     HyperForm forms[4];
     int count = 0;
     const auto add = [&](Extended a, Extended b, Extended at, Extended power) {
@@ -82,7 +126,7 @@ Estimated BySeries(const GaussArguments &p, const Point &point) {
         add(p.a, e, turned, -p.a);
         add(p.b, d, turned, -p.b);
     };
-    if (x < -0.5)
+    if (isTurned)
         addTurned();
     if (x > -0.95) {
         add(p.a, p.b, point.x, Whole(0));
@@ -91,6 +135,15 @@ Estimated BySeries(const GaussArguments &p, const Point &point) {
     if (x >= -0.5 && x < 0.4)
         addTurned();
     return BestForm(forms, count);
+}
+
+// The first form of BySeries in double precision, for x to kPlainFrom.
+PlainValue PlainSeries(double x, double a, double b, double c) {
+    const Extended none = Whole(0), rest = ExactSum(1, -x);
+    if (x >= -0.5)
+        return PlainForm({{Whole(a), Whole(b), Whole(c), Whole(x), true}, none, none});
+    return PlainForm(
+        {{Whole(a), ExactSum(c, -b), Whole(c), Whole(-x) / rest, true}, rest, Whole(-a)});
 }
 
 Estimated ByRegion(const GaussArguments &p, double x) {
@@ -105,6 +158,11 @@ Estimated ByRegion(const GaussArguments &p, double x) {
     if (Ends(d) || Ends(e))
         return Euler(p, point);
     Estimated near = {kOne, kInfinity};
+    if (x > kPlainFrom) {
+        near = PlainConnection(p, d - p.b, point);
+        if (near.error <= kPlainGood)
+            return near;
+    }
     if (x > kConnectionFrom)
         near = NearOne(p, point);
     if (-x / point.rest.high > kConnectionFrom) { // F(a, c - b; c; x / (x - 1)) (1 - x)^(-a)
@@ -134,6 +192,11 @@ double GaussByRegion(double x, double a, double b, double c) {
         return kNaN;
     if (x < kFarthest && !ends)
         return kNaN;
+    if (x > -2 && x <= kPlainFrom && !ends) {
+        const PlainValue plain = PlainSeries(x, a, b, c);
+        if (plain.error <= kPlainGood)
+            return plain.value;
+    }
     const Estimated value = ByRegion({Whole(a), Whole(b), Whole(c)}, x);
     return value.error <= kHyperAccepted ? value.value.rounded() : kNaN;
 }

@@ -19,6 +19,7 @@ constexpr double kBig = 0x1p300;
 constexpr int kBigExponent = 300;
 constexpr double kVanishing = 1e-250;
 constexpr int kSpareBits = 24;
+constexpr double kLeastFactor = 1e-250; // of a form in double precision
 
 // The result of a scan of a series, in units of 2^exponent.
 struct Scan {
@@ -106,6 +107,33 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
     return {ToPair(sum), roundings, exponent, peak, false};
 }
 
+// The same in double precision without the tests for overflow and underflow; incomplete if one is
+// near.
+template <bool HasB>
+Scan PlainSum(const HyperTerms &terms) {
+    constexpr double near = 0x1p-50, tolerance = 0x1p-60;
+    const double a = terms.a.high, b = terms.b.high, c = terms.c.high, x = terms.x.high;
+    const double end = HasB ? std::fabs(x) : 0;
+    double term = 1, sum = 1, roundings = 1, weight = 2;
+    for (double k = 0; k < kMostTerms; ++k) {
+        const double top = HasB ? (a + k) * (b + k) * x : (a + k) * x;
+        const double quotient = top / ((c + k) * (k + 1));
+        term *= quotient;
+        sum += term;
+        const double size = std::fabs(term);
+        roundings += size * weight;
+        weight += 0.2;
+        if (size > near * std::fabs(sum))
+            continue;
+        if (size == 0)
+            return {{sum, 0}, roundings, 0, 1, top == 0};
+        const double ratio = std::max(std::fabs(quotient), end);
+        if (size * ratio <= tolerance * std::fabs(sum) * (1 - ratio) && IsPast(terms, k))
+            return {{sum, 0}, roundings, 0, 1, true};
+    }
+    return {{sum, 0}, roundings, 0, 1, false};
+}
+
 Estimated None() { return {{{kNaN, 0}, 0}, kInfinity}; }
 
 Estimated Result(const Scan &scan, double error) {
@@ -164,7 +192,63 @@ Estimated Careful(const HyperTerms &terms, double largest, double tolerance) {
     return best;
 }
 
+Estimated TimesFactor(const Estimated &sum, const HyperForm &form) {
+    if (!HasFactor(form))
+        return sum;
+    const Estimated factor = QuickFactorOf(form);
+    return Times(sum, std::isinf(factor.error) ? FactorOf(form) : factor);
+}
+
 } // namespace
+
+namespace {
+
+Scan PlainScan(const HyperForm &form) {
+    return form.terms.hasB ? PlainSum<true>(form.terms) : PlainSum<false>(form.terms);
+}
+
+PlainValue PlainResult(const HyperForm &form, const Scan &scan) {
+    const PlainValue none = {kNaN, kInfinity};
+    const double error = scan.error(kEpsilon), sum = scan.sum.high;
+    if (!(error <= kGoodDouble))
+        return none;
+    if (!HasFactor(form))
+        return {sum, error};
+    const double p = form.power.high;
+    const bool isExp = form.base.high == 0;
+    const double power = isExp ? std::exp(p) : std::pow(form.base.high, p);
+    const double value = sum * power;
+    if (!(power > kLeastFactor && power < 1 / kLeastFactor && std::fabs(value) > kLeastFactor &&
+          std::fabs(value) < 1 / kLeastFactor))
+        return none;
+    double rest = isExp ? form.power.low : p * (form.base.low / form.base.high);
+    if (!isExp && form.power.low != 0)
+        rest += form.power.low * std::log(form.base.high);
+    return {value + value * rest, error + 2 * kEpsilon};
+}
+
+} // namespace
+
+PlainValue PlainForm(const HyperForm &form) {
+    if (!IsDouble(form.terms))
+        return {kNaN, kInfinity};
+    return PlainResult(form, PlainScan(form));
+}
+
+Estimated StraightForm(const HyperForm &form) {
+    constexpr double mostLost = 1e-6; // relative error in double precision
+    if (!IsDouble(form.terms))
+        return None();
+    const Scan scan = PlainScan(form);
+    const PlainValue plain = PlainResult(form, scan);
+    if (plain.error <= kGoodDouble)
+        return {WideOf({plain.value, 0}), plain.error};
+    if (!(scan.error(kEpsilon) <= mostLost))
+        return None();
+    const Scan pair = SumOf<Extended>(form.terms, kMostCarefulTerms, 0x1p-106);
+    const double error = pair.error(kPairEpsilon);
+    return error <= kGoodPair ? TimesFactor(Result(pair, error), form) : None();
+}
 
 Estimated SumOfParts(const Estimated &a, const Estimated &b) {
     const Wide sum = a.value + b.value;
@@ -193,13 +277,8 @@ Estimated BestForm(const HyperForm *forms, int count) {
     for (const HyperForm *form = forms; form < forms + count; ++form) {
         const Scan scan = SumOf<double>(form->terms, kMostTerms, 0x1p-60);
         const double error = scan.error(kEpsilon);
-        if (error <= kGoodDouble && IsDouble(form->terms)) {
-            const Estimated sum = Result(scan, error);
-            if (!HasFactor(*form))
-                return sum;
-            const Estimated factor = QuickFactorOf(*form);
-            return Times(sum, std::isinf(factor.error) ? FactorOf(*form) : factor);
-        }
+        if (error <= kGoodDouble && IsDouble(form->terms))
+            return TimesFactor(Result(scan, error), *form);
         if (!scan.isComplete)
             continue;
         const double factor = HasFactor(*form) ? FactorOf(*form).value.logarithm() : 0;

@@ -24,6 +24,15 @@ struct HyperForm {
     Extended base, power;
 };
 
+// A value in double precision; the error is infinite if the estimate is above 9e-15.
+struct PlainValue {
+    double value, error;
+};
+PlainValue PlainForm(const HyperForm &form);
+
+// The same, or in two doubles if the terms cancel by less than these have digits; none otherwise.
+Estimated StraightForm(const HyperForm &form);
+
 // The value by the first of the forms whose sum in double precision has an estimated error below
 // 9e-15. If there is none, by the form whose terms exceed the value least: in two doubles if these
 // have enough digits, otherwise in integers with as many more digits as cancel. The error is that

@@ -2,7 +2,9 @@
 
 #include "frame/constants.h"
 #include "special/extended.h"
+#include "special/gamma.h"
 #include "special/logarithms.h"
+#include "special/reciprocal_gamma.h"
 
 #include <algorithm>
 #include <cmath>
@@ -34,6 +36,27 @@ Estimated Part(Extended b, Extended a, double scale, double x, Extended power,
     return {value, sum.error + quotient.error};
 }
 
+// The asymptotic form in double precision for moderate arguments; d = b - a.
+Estimated PlainAsymptotic(double a, double b, double d, double x, const AsymptoticResult &rising,
+                          const AsymptoticResult &falling) {
+    constexpr double most = 20, farthest = 300, rounding = 12 * kEpsilon;
+    if (!(std::fabs(a) <= most && b > 0.1 && b <= most && std::fabs(d) <= most &&
+          std::fabs(x) <= farthest))
+        return {{Whole(kNaN), 0}, kInfinity};
+    const bool isTurned = x < 0;
+    const double y = std::fabs(x), p = isTurned ? d : a, q = isTurned ? a : d;
+    const double first =
+        ReciprocalGamma(p) * (isTurned ? 1 : std::exp(x)) * std::pow(y, -q) * rising.sum;
+    const double second = ReciprocalGamma(q) * (isTurned ? std::exp(x) : 1) * std::pow(y, -p) *
+                          CosPi(p) * falling.sum;
+    const double sum = first + second;
+    const double error =
+        rounding + (rising.error * std::fabs(first) + falling.error * std::fabs(second) +
+                    rounding * std::fabs(second)) /
+                       std::fabs(sum);
+    return {WideOf(Whole(GammaFunction(b) * sum)), std::isnan(error) ? kInfinity : error};
+}
+
 Estimated Asymptotic(double a, double b, double x) {
     const double y = std::fabs(x);
     const Extended d = ExactSum(b, -a);
@@ -46,6 +69,9 @@ Estimated Asymptotic(double a, double b, double x) {
         isTurned ? AsymptoticSum(d.high, 1 - a, -1 / y) : AsymptoticSum(a, e, -1 / y);
     if (rising.error > kGood)
         return {{Whole(kNaN), 0}, kInfinity};
+    const Estimated plain = PlainAsymptotic(a, b, d.high, x, rising, falling);
+    if (plain.error <= kGood)
+        return plain;
     const Extended p = isTurned ? d : Whole(a);
     const Extended q = isTurned ? Whole(a) : d;
     const Estimated first = Part(Whole(b), p, isTurned ? 0 : x, y, -q, rising);
@@ -112,6 +138,9 @@ double KummerByRegion(double x, double a, double b) {
     const HyperForm turned = {
         {ExactSum(b, -a), Whole(1), Whole(b), Whole(-x), false}, none, Whole(x)};
     const bool isStraight = x > 0 || (a < 0 && b > a);
+    const Estimated first = StraightForm(isStraight || isPole ? straight : turned);
+    if (first.error <= kGood)
+        return first.value.rounded();
     const HyperForm forms[] = {isStraight ? straight : turned, isStraight ? turned : straight};
     const Estimated value = isPole ? BestForm(&straight, 1) : BestForm(forms, 2);
     return value.error <= kHyperAccepted ? value.value.rounded() : kNaN;

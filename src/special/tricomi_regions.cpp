@@ -1,6 +1,7 @@
 #include "special/tricomi_regions.h"
 
 #include "frame/constants.h"
+#include "special/digamma.h"
 #include "special/extended.h"
 #include "special/gamma.h"
 #include "special/kummer_regions.h"
@@ -21,7 +22,9 @@ constexpr double kGoodParts = 1e-27;
 constexpr double kConnectionBelow = 1;
 constexpr double kConnectionFirst = 0.2;
 constexpr double kPlainBelow = 3, kPlainDistance = 0.05;
-constexpr double kPlain = 20; // parameters up to which gamma functions of doubles suffice
+constexpr double kPlain = 20;          // parameters up to which gamma functions of doubles suffice
+constexpr double kAsymptoticFrom = 25; // below it the asymptotic sum seldom has all digits
+constexpr double kPlainPower = 300;    // logarithm of a power without overflow or underflow
 constexpr double kAside = 0x1p-32;
 constexpr int kMostTerms = 40000;
 constexpr int kMostSteps = 3000;
@@ -253,7 +256,9 @@ Estimated PlainConnection(double a, double b, double x) {
     const Estimated n = BestForm(forms + 1, 1);
     const double first = GammaFunction(1 - b) * ReciprocalGamma(d);
     const double second = GammaFunction(b - 1) * ReciprocalGamma(a) * std::pow(x, 1 - b);
-    const double error = (kPlainError + kEpsilon * std::fabs(b)) / std::fabs(b - std::rint(b));
+    const double error =
+        kPlainError + kEpsilon * (1 + std::fabs(b) + std::fabs(d)) / std::fabs(b - std::rint(b)) +
+        (d > 0.5 ? 0 : kEpsilon * (1 + std::fabs(d)) / std::fabs(d - std::rint(d)));
     return SumOfParts({WideOf(Whole(first)) * m.value, m.error + error},
                       {WideOf(Whole(second)) * n.value, n.error + error});
 }
@@ -322,6 +327,114 @@ Estimated ByRegion(Extended a, Extended b, double x) {
     return connected.error < value.error ? connected : value;
 }
 
+// The sum of the logarithmic connection 13.2.9 for b = n + 1 and a > 0, without its finite part.
+Estimated LogarithmicSum(double a, int n, double x) {
+    constexpr int most = 200;
+    const double logX = std::log(x);
+    double psi = Digamma(a) - 2 * Digamma(1); // psi(a + k) - psi(1 + k) - psi(n + 1 + k)
+    for (int k = 1; k <= n; ++k)
+        psi -= 1.0 / k;
+    double term = 1, sum = logX + psi, size = std::fabs(logX) + std::fabs(psi) + 1;
+    for (int k = 0; k < most; ++k) {
+        term *= (a + k) * x / ((n + 1.0 + k) * (k + 1.0));
+        psi += 1 / (a + k) - 1 / (k + 1.0) - 1 / (n + 1.0 + k);
+        const double next = term * (logX + psi);
+        sum += next;
+        size += term * (std::fabs(logX) + std::fabs(psi) + 1);
+        if (std::fabs(next) + term < 0.1 * kEpsilon * std::fabs(sum) && k > a * x)
+            return {WideOf(Whole(sum)), 3 * kEpsilon * size / std::fabs(sum)};
+    }
+    return {kOne, kInfinity};
+}
+
+// For b = n + 1, n >= 0, a > 0 and small x.
+Estimated AtInteger(double a, int n, double x) {
+    double factorial = 1;
+    for (int k = 2; k <= n; ++k)
+        factorial *= k;
+    const Estimated sum = LogarithmicSum(a, n, x);
+    const double sign = n % 2 == 0 ? -1 : 1;
+    const double first = sign / factorial * ReciprocalGamma(a - n) * sum.value.rounded();
+    // (k - 1)! (1 - a + k)_(n - k) / (n - k)! x^(-k) from k = n down
+    double term = factorial / (n > 0 ? n : 1) * std::pow(x, -n), second = 0, size = 0;
+    for (int k = n; k >= 1; --k) {
+        second += term;
+        size += std::fabs(term);
+        if (k > 1)
+            term *= (k - a) / (n - k + 1.0) * x / (k - 1.0);
+    }
+    const double scale = ReciprocalGamma(a);
+    const double total = first + second * scale;
+    const double error = (std::fabs(first) * (sum.error + 10 * kEpsilon) +
+                          size * std::fabs(scale) * (10 + n) * kEpsilon) /
+                         std::fabs(total);
+    return {WideOf(Whole(total)), std::isnan(error) ? kInfinity : error};
+}
+
+// a > 0, b > 0: gamma(b) / gamma(a) x^(-b) exp(x) = M' U - M U' with U' / U = 1 - U(b + 1) / U from
+// the continued fraction 13.5.3, whose coefficients a, a - b + 1, a + 1, a - b + 2, ... are positive
+// but for a few. It takes about 90 / x pairs of levels, more for large a.
+// `power` is the value of x^(-b), or of it times a factor of U.
+Estimated ByWronskian(double a, double b, double x, double power) {
+    constexpr double digits = 39, big = 1e100;
+    const double y = std::min(x, 30.0), z = 1 / x;
+    const double lower = std::max(a + 0.5 * (1 - b), 0.0); // the mean of a and a - b + 1
+    const double pairs =
+        std::ceil((digits + y) / 4 * ((digits + y) / (4 * y) + 2 * std::sqrt(lower / y))) + 2;
+    double top = 1, bottom = 1, lost = 1; // how much a negative coefficient cancels
+    for (double m = pairs; m > 0; --m) {
+        const double second = (a - b + m) * z * bottom;
+        const double inner = top + second;
+        if (second < 0)
+            lost *= (top - second) / std::fabs(inner);
+        bottom = inner;
+        top = inner + (a + m - 1) * z * top;
+        if (std::fabs(top) > big) {
+            top *= 1 / big;
+            bottom *= 1 / big;
+        }
+    }
+    const double fall = (top - bottom) / bottom; // -U' / U
+    double term = 1, sum = 1, moment = 0;
+    for (double k = 0; term > 0.05 * kEpsilon * sum; ++k) {
+        term *= (a + k) * x / ((b + k) * (k + 1));
+        sum += term;
+        moment += (k + 1) * term;
+    }
+    const double value =
+        GammaFunction(b) * ReciprocalGamma(a) * power * std::exp(x) / (moment * z + sum * fall);
+    return {WideOf(Whole(value)), (15 + 3 * lost) * kEpsilon};
+}
+
+// In double precision for moderate arguments: the best for the region alone, or none.
+Estimated ByPlainRegion(double a, double b, double x) {
+    constexpr double least = 0.05, fromWronskian = 1.0, fromSlowly = 0.15, farthest = 60;
+    const Estimated none = {kOne, kInfinity};
+    const double d = a - b + 1;
+    if (!(a > least && a <= kPlain && std::fabs(b) <= kPlain && x <= farthest && x > 1e-10))
+        return none;
+    const double whole = std::rint(b);
+    if (b == whole) {
+        const int n = static_cast<int>(whole) - 1;
+        if (x < fromWronskian && n >= 0)
+            return AtInteger(a, n, x);
+        if (x < fromWronskian && d > least) { // b <= 0: x^(1-b) U(d, 2 - b, x)
+            Estimated value = AtInteger(d, -n, x);
+            value.value = value.value * WideOf(Whole(std::pow(x, 1 - b)));
+            return value;
+        }
+    } else if (x < fromWronskian && std::fabs(b - whole) > kPlainDistance) {
+        const Estimated value = PlainConnection(a, b, x);
+        if (value.error <= kGoodConnection)
+            return value;
+    }
+    if (x < fromSlowly || b > x + 15)
+        return none;
+    if (b >= 1)
+        return d > -2 ? ByWronskian(a, b, x, std::pow(x, -b)) : none;
+    return d > least ? ByWronskian(d, 2 - b, x, 1 / x) : none; // x^(1-b) U(d, 2 - b, x)
+}
+
 } // namespace
 
 double TricomiByRegion(double x, double a, double b) {
@@ -332,9 +445,20 @@ double TricomiByRegion(double x, double a, double b) {
     if (x == 0)
         return AtZero(a, b);
     const Extended d = ExactSum(1, -b) + Whole(a);
+    if (x < kAsymptoticFrom) {
+        const Estimated plain = ByPlainRegion(a, b, x);
+        if (plain.error <= kGoodConnection)
+            return plain.value.rounded();
+    }
     const AsymptoticResult sum = AsymptoticSum(a, d.high, -1 / x);
+    if (sum.error <= kGood && std::fabs(a * std::log(x)) < kPlainPower)
+        return std::pow(x, -a) * sum.sum;
     if (sum.error <= kGood)
         return (PowerOf(Whole(x), Whole(-a)).value * WideOf(Whole(sum.sum))).rounded();
+    const Estimated plain =
+        x < kAsymptoticFrom ? Estimated{kOne, kInfinity} : ByPlainRegion(a, b, x);
+    if (plain.error <= kGoodConnection)
+        return plain.value.rounded();
     const Estimated value = ByRegion(Whole(a), Whole(b), x);
     return value.error <= kHyperAccepted ? value.value.rounded() : kNaN;
 }

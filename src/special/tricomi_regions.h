@@ -5,7 +5,11 @@ namespace qx {
 
 // U(a, b, x), x >= 0. The methods are tried in this order:
 //
-//   the asymptotic sum (13.7.3 of the DLMF) where its smallest term is below 9e-15, and where it ends
+//   for a from 0.05 to 20, |b| <= 20 and x to 60 in double precision, if the estimated error is
+//          below 4e-14: below x = 1 the connection with M, at an integer b its limit (13.2.9 of the
+//          DLMF); from there on, and from 0.15 on elsewhere, the Wronskian with M and the continued
+//          fraction 13.5.3. From x = 25 on after the asymptotic sum
+//   the asymptotic sum (13.7.3) where its smallest term is below 9e-15, and where it ends
 //   x < 0.2, and x < 1 where a < 0: the two M of 13.2.42, with gammas and sums in two doubles; at b
 //          within 2^-32 of an integer the value between those at 2^-32 on both its sides, whose error
 //          is of second order. In double precision, to x = 3, for parameters to 20 and b away from

@@ -2,9 +2,11 @@
 
 #include "frame/constants.h"
 #include "special/logarithms.h"
+#include "special/tables/gamma_pairs.h"
 
 #include <cmath>
 #include <cstddef>
+#include <iterator>
 
 namespace qx {
 
@@ -140,20 +142,50 @@ Estimated PowerOf(Extended base, Extended power) {
     return {WideExp(exponent), kLogError * (1 + std::fabs(exponent.high))};
 }
 
-WideGamma GammaOf(Extended x) {
-    const Estimated none = {{Whole(kNaN), 0}, kInfinity};
-    if (!(x.high > kLowest && x.high < 1e15))
-        return {none, false};
+namespace {
+
+// 1 / gamma(x), 1 <= x <= 2.
+Extended ReciprocalGammaOf(Extended x) {
+    const Extended h = x - Whole(1.5);
+    constexpr std::size_t pairs = std::size(table::inverseGamma);
+    double tail = 0;
+    for (std::size_t k = std::size(table::inverseGammaRest); k-- > 0;)
+        tail = table::inverseGammaRest[k] + h.high * tail;
+    Extended sum = Whole(tail);
+    for (std::size_t k = pairs; k-- > 0;)
+        sum = table::inverseGamma[k] + h * sum;
+    return sum;
+}
+
+// first (first + 1) ... (first + count - 1).
+Wide Rising(Extended first, int count) {
     Wide product = {Whole(0.5), 1};
-    for (; x.high < kStirlingFrom; x = x + Whole(1)) {
-        if (x.high == 0)
-            return {none, true};
-        const Extended next = product.value * x;
+    for (int k = 0; k < count; ++k, first = first + Whole(1)) {
+        const Extended next = product.value * first;
         const bool isFar = std::fabs(next.high) > 1e100 || std::fabs(next.high) < 1e-100;
         product = isFar ? WideOf(next, product.exponent) : Wide{next, product.exponent};
     }
-    const Extended exponent = (x - Whole(0.5)) * LogOf(x) - x + kLogOfRootTwoPi + StirlingSum(x);
-    return {{WideExp(exponent) / product, kLogError * (1 + exponent.high)}, false};
+    return WideOf(product.value, product.exponent);
+}
+
+} // namespace
+
+WideGamma GammaOf(Extended x) {
+    if (!(x.high > kLowest && x.high < 1e15))
+        return {{{Whole(kNaN), 0}, kInfinity}, false};
+    if (x.high >= kStirlingFrom) {
+        const Extended exponent =
+            (x - Whole(0.5)) * LogOf(x) - x + kLogOfRootTwoPi + StirlingSum(x);
+        return {{WideExp(exponent), kLogError * (1 + exponent.high)}, false};
+    }
+    if (x.high <= 0 && x.low == 0 && std::floor(x.high) == x.high)
+        return {{{Whole(kNaN), 0}, kInfinity}, true};
+    const int steps = static_cast<int>(std::floor(x.high)) - 1;
+    const Extended base = x - Whole(steps); // in [1, 2]
+    const Wide gamma = WideOf(Whole(1) / ReciprocalGammaOf(base));
+    if (steps >= 0)
+        return {{gamma * Rising(base, steps), kLogError}, false};
+    return {{gamma / Rising(x, -steps), kLogError}, false};
 }
 
 Estimated GammaQuotientOf(const Extended (&numerators)[2], const Extended (&denominators)[2]) {

@@ -32,8 +32,9 @@ struct Estimated {
 Wide WideExp(Extended x);
 Estimated PowerOf(Extended base, Extended power);
 
-// gamma(x) for x from -2000 to 1e15: by Stirling's series from 30 on and by the recurrence below
-// 30. The error is about 2^-90 |ln gamma(max(x, 30))|; it is infinite if x is out of range.
+// gamma(x) for x from -2000 to 1e15: by Stirling's series from 30 on, below by the recurrence from
+// a polynomial on [1, 2]. The error is about 2^-90 or, from 30 on, 2^-90 ln gamma(x); it is infinite
+// if x is out of range.
 struct WideGamma {
     Estimated gamma;
     bool isPole; // 0, -1, -2, ...

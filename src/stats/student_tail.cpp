@@ -2,6 +2,7 @@
 
 #include "frame/constants.h"
 #include "frame/extended.h"
+#include "special/direct_tails.h"
 #include "special/tables/student.h"
 
 #include <algorithm>
@@ -14,7 +15,7 @@ namespace {
 constexpr double kMostDegrees = 1e6;
 constexpr double kNearest = 1e-100, kFarthest = 1e5;
 constexpr double kCentralTo = 0.9;
-constexpr double kLargestLogarithm = 640.0; // of 1 / tail
+constexpr double kLeastTail = 1e-278;
 
 double DensityAtZero(double n) {
     constexpr double low = -0x1.cbc0d30ebfd15p-56; // of 1 / sqrt(2 pi), the part below its double
@@ -40,45 +41,34 @@ double CentralSeries(double n, double y) {
     return 1.0 + rest;
 }
 
-// F(1, 1/2; c; -z), c = n / 2 + 1: 1 / (1 + k_1 z / (1 + k_2 z / ...)).
-double Fraction(double n, double z, double t) {
-    const double root = std::sqrt(1.0 + z);
-    const double geometric =
-        37.0 / std::log1p(2.0 / (root - 1.0)); // levels for the limit of k, 1/4
-    const double levels = std::min(390.0 / (t * t) + 8.0, geometric + 2.0);
+// F(1, 1/2; n / 2 + 1; -z).
+double Fraction(double n, double z) {
+    constexpr double digits = 37.0;
     const double c = 0.5 * n + 1.0;
-    double value = 1.0;
-    for (double m = std::ceil(0.5 * levels); m > 0; --m) {
-        const double middle = c + 2.0 * m - 1.0;
-        const double odd = z * (0.5 + m) * (c - 1.0 + m) / (middle * (middle + 1.0));
-        const double even = z * m * (c + m - 1.5) / ((middle - 1.0) * middle);
-        value = 1.0 + even / (1.0 + odd / value);
-    }
-    return 1.0 / (1.0 + z * 0.5 / (c * value));
+    return BetaFraction(0.5, c, z, FractionLevels(c, z, digits));
 }
-
-double SizeOfLogarithm(double t, double n) { return 0.5 * (n + 1.0) * std::log1p(t * t / n); }
 
 } // namespace
 
 StudentTail StudentTailAt(double t, double n) {
     StudentTail tail = {0.0, 0.0, t <= kCentralTo, false};
-    if (!(n >= 1.0 && n <= kMostDegrees && t >= kNearest && t <= kFarthest) ||
-        SizeOfLogarithm(t, n) > kLargestLogarithm)
+    if (!(n >= 1.0 && n <= kMostDegrees && t >= kNearest && t <= kFarthest))
         return tail;
-    tail.isKnown = true;
     const double front = DensityAtZero(n);
     const Extended quotient = ExactProduct(t, t) / Extended{n, 0.0};
     const Extended base = ExactSum(1.0, quotient.high);
     const Extended whole = {base.high, base.low + quotient.low};
     if (tail.isCentral) {
+        tail.isKnown = true;
         tail.density = front * PowerOfBase(whole, 0.5 * (n + 1.0));
         tail.part = t * tail.density * CentralSeries(n, quotient.high / whole.high);
         return tail;
     }
     const double power = front * PowerOfBase(whole, 0.5 * (n - 1.0));
     tail.density = power / whole.high;
-    tail.part = power / t * Fraction(n, 1.0 / quotient.high, t);
+    tail.isKnown = tail.density > kLeastTail;
+    if (tail.isKnown)
+        tail.part = power / t * Fraction(n, 1.0 / quotient.high);
     return tail;
 }
 

@@ -2,9 +2,10 @@
 
 #include "frame/constants.h"
 #include "special/digamma.h"
+#include "special/direct_tails.h"
 #include "special/gamma.h"
 #include "special/logarithms.h"
-#include "special/tables/normal.h"
+#include "special/normal_tail.h"
 #include "special/tail_integrals.h"
 #include "stats/student_tail.h"
 
@@ -17,6 +18,7 @@ namespace {
 
 constexpr double kMostDegrees = 1e25;
 constexpr double kLeastTail = 1e-250;
+constexpr double kNormalDoubles = 37.0; // up to here the normal tail is not subnormal
 constexpr double kFarStudent = 1e140;   // from here on the tail is a power of t to the last digit
 constexpr double kNearStudent = 1e-150; // up to here the tail is a half to the last digit
 
@@ -43,6 +45,22 @@ double ValueOf(const Tails &tails, DistributionValue what) {
     return IsLogarithm(what) ? tails.logarithm(isLower) : tails.part(isLower);
 }
 
+// Below this the error of a part is not increased by its logarithm or that of the other part.
+constexpr double kQuickLogarithm = 0.1;
+
+// Whether the plain numbers suffice for the value.
+bool Suffices(const DirectTails &tails, DistributionValue what) {
+    return tails.isKnown && tails.smaller > kLeastTail &&
+           (!IsLogarithm(what) || tails.smaller < kQuickLogarithm);
+}
+
+double ValueOf(const DirectTails &tails, DistributionValue what) {
+    const bool isLower = IsLowerPart(what);
+    if (!IsLogarithm(what))
+        return tails.part(isLower);
+    return isLower == tails.isLower ? std::log(tails.smaller) : std::log1p(-tails.smaller);
+}
+
 // The value if all of the distribution is below the argument, or above it.
 double ValueAtEnd(bool isBelow, DistributionValue what) {
     if (what == DistributionValue::Density)
@@ -65,49 +83,22 @@ Extended ExponentOfNormal(double x) {
 }
 
 // P(X > x), x >= 0.
-Scaled UpperNormal(double x) {
-    const double factor = x < 2.0    ? table::millsNear(x)
-                          : x < 10.0 ? table::millsMid(x)
-                                     : table::millsFar(1.0 / x / x) / x;
-    return {factor, ExponentOfNormal(x)};
+Scaled UpperNormal(double x) { return {ScaledNormalTail(x), ExponentOfNormal(x)}; }
+
+// x with P(X < x) = p, or -x for the upper part, 0 < p < 1: rational functions, on the intervals of
+// M. J. Wichura (The percentage points of the normal distribution, 1988).
+double NormalPointOf(double p) {
+    constexpr double central = 0.425, far = 5.0;
+    const double q = p - 0.5; // exact from 1/4 on
+    if (std::fabs(q) <= central)
+        return q * table::pointCentral(q * q);
+    const double r = std::sqrt(-std::log(q < 0.0 ? p : 1.0 - p));
+    const double x = r < far ? table::pointNear(r) : table::pointFar(r);
+    return q < 0.0 ? -x : x;
 }
 
-// x with P(0 < X < x) = p, p <= 0.25 or so: Newton's method on a series that keeps small values
-// accurate.
-double CentralNormalPoint(double p) {
-    double x = p * kRootTwoPi;
-    for (int turn = 0; turn < 6; ++turn) {
-        const double value = x * table::centralNormal(x * x);
-        const double density = kInverseRootTwoPi * std::exp(-0.5 * x * x);
-        const double step = (p - value) / density;
-        x += step;
-        if (std::fabs(step) < 1e-9 * x)
-            break;
-    }
-    return x;
-}
-
-// x with P(X > x) = p, p at most 1/2. The start value is formula 26.2.23 of M. Abramowitz and I. A.
-// Stegun, Handbook of mathematical functions, 1964.
-double UpperNormalPoint(double p) {
-    if (p > 0.25)
-        return CentralNormalPoint(0.5 - p);
-    const double logP = std::log(p);
-    const double u = std::sqrt(-2.0 * logP);
-    double x = u - ((0.010328 * u + 0.802853) * u + 2.515517) /
-                       (((0.001308 * u + 0.189269) * u + 1.432788) * u + 1.0);
-    for (int turn = 0; turn < 5; ++turn) {
-        const Scaled upper = UpperNormal(x);
-        const double got = upper.value();
-        const double excess = got > 1e-290 ? std::log(got / p) : upper.logarithm() - logP;
-        // Newton's step for the logarithm of the tail, whose derivative is -phi / P.
-        const double step = excess * upper.factor * kRootTwoPi;
-        x += step;
-        if (std::fabs(step) < 1e-8)
-            break;
-    }
-    return x;
-}
+// x with P(X > x) = p, 0 < p <= 1/2.
+double UpperNormalPoint(double p) { return p == 0.5 ? 0.0 : -NormalPointOf(p); }
 
 Tails ChiSquareTails(double x, double dof) {
     return GammaTails(0.5 * dof, std::max(0.5 * x, kLeastHalf));
@@ -117,6 +108,16 @@ Tails ChiSquareTails(double x, double dof) {
 UnitPoint FisherShare(double f, double n, double d) {
     const double scale = f > 1e150 ? 0x1p-300 : f < 1e-150 ? 0x1p300 : 1.0;
     return UnitPoint::Share(ExactProduct(f * scale, n), Whole(d * scale));
+}
+
+// The lower part up to the median, which is close to the quotient of the medians of two gamma
+// distributions.
+DirectTails DirectFisherTails(double f, double n, double d) {
+    constexpr double farthest = 1e100; // n f does not overflow
+    if (!(f > 1.0 / farthest && f < farthest))
+        return {0.0, false, 0.0, false};
+    const bool isLower = f * (n * (3.0 * d - 2.0)) < (3.0 * n - 2.0) * d;
+    return DirectBetaTails(f, 0.5 * n, 0.5 * d, isLower);
 }
 
 // If n is tiny compared with d, the part above f is n times an integral over t^-1 that does not
@@ -237,6 +238,42 @@ double Solve(double start, double p, bool isUpper, TailsAt tailsAt) {
     return x;
 }
 
+// A point with one more step, by tails with a smaller error: if a part changes less than its argument,
+// the error of the part is amplified.
+template <class TailsAt>
+double Refined(double x, double p, bool isUpper, TailsAt tailsAt) {
+    const Tails tails = tailsAt(x);
+    const double missing = LogOfShare(p, tails, !isUpper);
+    const double step = missing * (tails.part(!isUpper) / tails.slope.value());
+    return x + x * (isUpper ? -step : step);
+}
+
+// The point by Halley's method for the logarithm of a part as a function of ln x. `bend` returns the
+// derivative of the logarithm of the slope; `scale` is about the inverse of the distribution's width
+// in ln x. A NaN if the tails are unknown or the steps do not settle.
+template <class TailsAt, class Bend, class AccurateAt>
+double SolveQuickly(double start, double p, bool isUpper, double scale, TailsAt tailsAt, Bend bend,
+                    AccurateAt accurateAt) {
+    constexpr double longest = 2.0;
+    constexpr double close = 4e-6; // after a step of this length, in widths, the next is below eps
+    const double direction = isUpper ? -1.0 : 1.0;
+    double x = start;
+    for (int turn = 0; turn < 12; ++turn) {
+        const DirectTails tails = tailsAt(x);
+        const double part = tails.part(!isUpper);
+        if (!tails.isKnown || !(part > kLeastTail))
+            return kNaN;
+        const double rate = direction * tails.slope / part;
+        const double newton = std::log(p / part) / rate;
+        const double turned = 1.0 + 0.5 * newton * (bend(x) - rate);
+        const double step = std::clamp(turned > 0.5 ? newton / turned : newton, -longest, longest);
+        x += x * std::expm1(step);
+        if (std::fabs(step) * scale < close)
+            return std::fabs(rate) < 1.2 ? Refined(x, p, isUpper, accurateAt) : x;
+    }
+    return kNaN;
+}
+
 // Solves for the part that is at most 1/2; 1 - p is then exact.
 void TakeSmaller(double &p, bool &isUpper) {
     if (p <= 0.5)
@@ -253,6 +290,48 @@ bool IsAtEnd(double p, bool isUpper, double lowerEnd, double *point) {
     return true;
 }
 
+// Start values are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical functions,
+// 1964: 26.5.22 for Fisher's distribution, Student's for one degree.
+double QuickFisherPoint(double p, bool isUpper, double n, double d, double z) {
+    if (!(n >= 1.0 && d >= 1.0 && p > kLeastTail))
+        return kNaN;
+    double start;
+    if (n < 2.0 || d < 2.0) {
+        const bool isFirst = n < 2.0;
+        const double many = isFirst ? d : n;
+        const bool takesUpper = isUpper == isFirst; // of t^2, or of 1 / t^2
+        const double half = takesUpper ? 0.5 * p : 0.5 - 0.5 * p;
+        const double t = StudentUpperPoint(half, many, UpperNormalPoint(half));
+        start = isFirst ? t * t : 1.0 / (t * t);
+    } else {
+        const double first = 1.0 / (n - 1.0), second = 1.0 / (d - 1.0);
+        const double h = 2.0 / (first + second);
+        const double lambda = (z * z - 3.0) / 6.0;
+        const double w = z * std::sqrt(std::max(h + lambda, 0.1)) / h -
+                         (first - second) * (lambda + 5.0 / 6.0 - 2.0 / (3.0 * h));
+        start = std::exp(std::clamp(2.0 * w, -200.0, 200.0));
+    }
+    if (!(start > 0.0 && start < kInfinity))
+        return kNaN;
+    const double scale = 1.0 + std::sqrt(0.5 * n * d / (n + d));
+    return SolveQuickly(
+        start, p, isUpper, scale, [=](double f) { return DirectFisherTails(f, n, d); },
+        [=](double f) { return 0.5 * n * d * (1.0 - f) / (n * f + d); },
+        [=](double f) { return FisherTails(f, n, d); });
+}
+
+double QuickChiSquarePoint(double p, bool isUpper, double dof, double start) {
+    if (!(dof >= 1.0 && p > kLeastTail && start > 0.0))
+        return kNaN;
+    if (dof == 2.0)
+        return isUpper ? -2.0 * std::log(p) : -2.0 * std::log1p(-p);
+    return SolveQuickly(
+        start, p, isUpper, 1.0 + std::sqrt(0.5 * dof),
+        [=](double x) { return DirectGammaTails(0.5 * dof, 0.5 * x); },
+        [=](double x) { return 0.5 * (dof - x); },
+        [=](double x) { return ChiSquareTails(x, dof); });
+}
+
 } // namespace
 
 double NormalValue(double x, DistributionValue what) {
@@ -260,8 +339,12 @@ double NormalValue(double x, DistributionValue what) {
         return Scaled{kInverseRootTwoPi, ExponentOfNormal(x)}.value();
     if (std::isinf(x))
         return ValueAtEnd(x > 0.0, what);
-    const Tails tails = {UpperNormal(std::fabs(x)), x < 0.0, {}};
-    return ValueOf(tails, what);
+    const double size = std::fabs(x);
+    if (size < kNormalDoubles && !IsLogarithm(what)) {
+        const double smaller = ScaledNormalTail(size) * ExpOf(ExponentOfNormal(size));
+        return IsLowerPart(what) == (x < 0.0) ? smaller : 1.0 - smaller;
+    }
+    return ValueOf({UpperNormal(size), x < 0.0, {}}, what);
 }
 
 double StudentValue(double t, double dof, DistributionValue what) {
@@ -280,6 +363,9 @@ double FisherValue(double f, double n, double d, DistributionValue what) {
         return DensityAtZero(n, 1.0);
     if (f <= 0.0 || std::isinf(f))
         return ValueAtEnd(f > 0.0, what);
+    const DirectTails quick = DirectFisherTails(f, n, d);
+    if (Suffices(quick, what))
+        return what == DistributionValue::Density ? quick.slope / f : ValueOf(quick, what);
     const Tails tails = FisherTails(f, n, d);
     return what == DistributionValue::Density ? (tails.slope * (1.0 / f)).value()
                                               : ValueOf(tails, what);
@@ -291,6 +377,9 @@ double ChiSquareValue(double x, double dof, DistributionValue what) {
         return DensityAtZero(dof, 0.5);
     if (x <= 0.0 || std::isinf(x))
         return ValueAtEnd(x > 0.0, what);
+    const DirectTails quick = DirectGammaTails(0.5 * dof, 0.5 * x);
+    if (Suffices(quick, what))
+        return what == DistributionValue::Density ? quick.slope / x : ValueOf(quick, what);
     const Tails tails = ChiSquareTails(x, dof);
     return what == DistributionValue::Density ? (tails.slope * (1.0 / x)).value()
                                               : ValueOf(tails, what);
@@ -300,9 +389,8 @@ double NormalPoint(double p, bool isUpper) {
     double end;
     if (IsAtEnd(p, isUpper, -kInfinity, &end))
         return end;
-    TakeSmaller(p, isUpper);
-    const double x = p == 0.5 ? 0.0 : UpperNormalPoint(p);
-    return isUpper || x == 0.0 ? x : -x;
+    const double x = NormalPointOf(p);
+    return isUpper ? 0.0 - x : x;
 }
 
 double StudentPoint(double p, bool isUpper, double dof) {
@@ -344,6 +432,9 @@ double FisherPoint(double p, bool isUpper, double n, double d) {
     d = std::min(d, kMostDegrees);
     TakeSmaller(p, isUpper);
     const double z = UpperNormalPoint(p);
+    const double quick = QuickFisherPoint(p, isUpper, n, d, isUpper ? z : -z);
+    if (!std::isnan(quick))
+        return quick;
     const double spread = std::min(std::sqrt(2.0 / n + 2.0 / d), 50.0);
     return Solve(std::exp((isUpper ? z : -z) * spread), p, isUpper,
                  [=](double f) { return FisherTails(f, n, d); });
@@ -364,6 +455,9 @@ double ChiSquarePoint(double p, bool isUpper, double dof) {
         const double log = (std::log(p) + LnGammaFunction(0.5 * dof + 1.0)) * 2.0 / dof;
         start = 2.0 * std::exp(std::max(log, -690.0));
     }
+    const double quick = QuickChiSquarePoint(p, isUpper, dof, start);
+    if (!std::isnan(quick))
+        return quick;
     return Solve(start, p, isUpper, [=](double x) { return ChiSquareTails(x, dof); });
 }
 

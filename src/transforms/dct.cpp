@@ -7,7 +7,6 @@
 
 #include <cmath>
 #include <cstddef>
-#include <type_traits>
 
 namespace qx {
 namespace {
@@ -17,45 +16,55 @@ typedef Lanes<2> Pair;
 // Below, (c, s) denotes cos and sin of pi k / (2n); for n - k they are (s, c), so bins k and n - k share
 // one pair.
 
-// `Length` is the type of n: an integer, or a constant for a length that is transformed whole, for which
-// the compiler unrolls the loops and computes the scale.
-template <class Length>
-ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, DBL *out, Length n, DBL *work) {
-    constexpr bool isLong = std::is_same_v<Length, int32_t>;
+ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, DBL *out, int32_t n, DBL *work) {
     const double scale = 2.0 / std::sqrt(2.0 * n);
     const double root = std::sqrt(static_cast<double>(n));
     DBL *const reordered = work;
     DBL *const h = work + n;
-    if (isLong)
-        GatherEvenOdd(x, n, reordered);
-    else
-        for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-            reordered[j] = x[2 * j];
-            reordered[n - 1 - j] = x[2 * j + 1];
-        }
-    if constexpr (!isLong)
-        plan->whole.real(reordered, h);
-    else if (const ErrorCode failed = FFTRealForward(plan, reordered, h, 1, 1, n))
+    GatherEvenOdd(x, n, reordered);
+    if (const ErrorCode failed = FFTRealForward(plan, reordered, h, 1, 1, n))
         return failed;
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
         return ErrOutOfMemory;
 
     out[0] = h[0] / root;
-    if (isLong)
-        TurnHalfComplex(h, wave, scale, n, out);
-    else
-        for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
-            // The values of h are read one by one: a single load of two values that a short transform
-            // has stored separately would wait for both stores.
-            const Pair w = Pair::load(wave + 2 * k);
-            const double im = h[n - k];
-            const Pair turned = Pair(h[k]) * w + Pair(Pair::Vector{im, -im}) * w.reversed();
-            const Pair result = turned * Pair(scale);
-            out[k] = result[0];
-            out[n - k] = result[1];
-        }
+    TurnHalfComplex(h, wave, scale, n, out);
     out[n / 2] = h[n / 2] * wave[n] * scale;
+    return 0;
+}
+
+// Eight values, the block of image coding, are so few that calls and passes through memory would take most of
+// the time. Both directions have the operations of the general routines for each result, in registers.
+
+constexpr double cosineOfEighth = 0x1.6a09e667f3bcdp-1; // as in the straight-line transforms
+
+// The transform of 8 real values in their new order (0, 2, 4, 6, 7, 5, 3, 1), then the rotations.
+ErrorCode ForwardEight(const FFTPlan *plan, const DBL *x, DBL *out) {
+    const DBL *const wave = QuarterWave(plan);
+    if (!wave)
+        return ErrOutOfMemory;
+    const double outer = x[0] + x[7], outerTurned = x[0] - x[7];
+    const double inner = x[4] + x[3], innerTurned = x[4] - x[3];
+    const double left = x[2] + x[5], leftTurned = x[2] - x[5];
+    const double right = x[6] + x[1], rightTurned = x[6] - x[1];
+    const double even = outer + inner, odd = left + right;
+    const double low = cosineOfEighth * (leftTurned - rightTurned);
+    const double high = cosineOfEighth * (leftTurned + rightTurned);
+
+    const Pair scale(2.0 / std::sqrt(16.0));
+    const auto rotate = [&](int k, double re, double im) {
+        const Pair w = Pair::load(wave + 2 * k);
+        const Pair turned = Pair(re) * w + Pair(Pair::Vector{im, -im}) * w.reversed();
+        const Pair result = turned * scale;
+        out[k] = result[0];
+        out[8 - k] = result[1];
+    };
+    out[0] = (even + odd) / std::sqrt(8.0);
+    rotate(1, outerTurned + low, -(innerTurned + high));
+    rotate(2, outer - inner, -(left - right));
+    rotate(3, outerTurned - low, innerTurned - high);
+    out[4] = (even - odd) * wave[8] * scale[0];
     return 0;
 }
 
@@ -99,29 +108,44 @@ ErrorCode InverseEven(const FFTPlan *plan, const DBL *spectrum, DBL *out, int32_
     return 0;
 }
 
-// The same for 8 values, in one piece. The inverse Fourier transform is the forward transform with the
-// results k and n - k exchanged; only its real parts are needed.
-ErrorCode InverseEight(const FFTPlan *plan, const DBL *spectrum, DBL *out, DBL *work) {
-    constexpr std::ptrdiff_t n = 8;
+// Only the real parts of the inverse Fourier transform are needed, which is the forward transform of
+// z with the results k and n - k exchanged. Pairs are complex values up to the last stage, and there
+// two real parts.
+ErrorCode InverseEight(const FFTPlan *plan, const DBL *spectrum, DBL *out) {
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
         return ErrOutOfMemory;
-    DBL *const z = work;
-    DBL *const u = work + 2 * n;
-    const Pair scale(std::sqrt(2.0 * n));
-    // Both parts of a value are stored together: the transform loads them together, and would wait for
-    // two separate stores.
-    Pair(Pair::Vector{spectrum[0] * std::sqrt(static_cast<double>(n)), 0.0}).store(z);
-    for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
-        const Pair w = Pair::load(wave + 2 * k) * scale;
-        (Pair(spectrum[k]) * w).store(z + 2 * k);
-        (Pair(spectrum[n - k]) * w.reversed()).store(z + 2 * (n - k));
-    }
-    plan->whole.complex(z, u);
-    for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-        out[2 * j] = u[2 * ((n - j) % n)] * (1.0 / n);
-        out[2 * j + 1] = u[2 * (j + 1)] * (1.0 / n);
-    }
+    const auto secondNegated = [](Pair x) { return NegatedInPairs(x, false); };
+    const auto timesI = [](Pair x) { return NegatedInPairs(Swapped(x), true); };
+    const Pair scale(std::sqrt(16.0));
+    const Pair w1 = Pair::load(wave + 2) * scale, w2 = Pair::load(wave + 4) * scale;
+    const Pair w3 = Pair::load(wave + 6) * scale, w4 = Pair::load(wave + 8) * scale;
+    const double z0 = spectrum[0] * std::sqrt(8.0);
+    const double z4 = spectrum[4] * w4[1];
+    const Pair z1 = Pair(spectrum[1]) * w1, z7 = Pair(spectrum[7]) * w1.reversed();
+    const Pair z2 = Pair(spectrum[2]) * w2, z6 = Pair(spectrum[6]) * w2.reversed();
+    const Pair z3 = Pair(spectrum[3]) * w3, z5 = Pair(spectrum[5]) * w3.reversed();
+
+    // Real parts of the transform of z0, z2, z4, z6: 0 and 1, then 2 and 3.
+    const Pair ends(Pair::Vector{z0 + z4, z0 - z4});
+    const Pair middle = z2 + secondNegated(z6);
+    const Pair even01 = ends + middle, even23 = ends - middle;
+    // Of z1, z3, z5, z7: the real part of 0 with the imaginary one of 2, then 1 and 3 turned by odd eighths.
+    const Pair sum15 = z1 + z5, difference15 = z1 - z5;
+    const Pair sum37 = z3 + z7, turned37 = timesI(z3 - z7);
+    const Pair odd02 = sum15 + secondNegated(sum37);
+    const Pair odd1 = difference15 - turned37, odd3 = difference15 + turned37;
+    const Pair odd13 =
+        Pair(cosineOfEighth) * (PairsLow(odd1, odd3) + secondNegated(PairsHigh(odd1, odd3)));
+
+    const Pair odd01 = PairsLow(odd02, odd13), odd23 = secondNegated(PairsHigh(odd02, odd13));
+    const Pair eighth(1.0 / 8);
+    const Pair u01 = (even01 + odd01) * eighth, u45 = (even01 - odd01) * eighth;
+    const Pair u23 = (even23 + odd23) * eighth, u67 = (even23 - odd23) * eighth;
+    u01.store(out);
+    PairsHigh(u67, u23.reversed()).store(out + 2);
+    PairsLow(u67, u23.reversed()).store(out + 4);
+    u45.reversed().store(out + 6);
     return 0;
 }
 
@@ -157,12 +181,12 @@ ErrorCode InverseOdd(const FFTPlan *plan, const DBL *spectrum, DBL *out, int32_t
 ErrorCode DCTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work) {
     const auto n = static_cast<int32_t>(out.size());
     QX_EXPECTS(n >= 1 && plan->length == DCTPlanLength(n));
+    if (n == 8 && in.size() >= 8)
+        return ForwardEight(plan, in.data(), out.data());
     PaddedInput x;
     if (const ErrorCode failed = x.take(in, n))
         return failed;
-    if (n == 8) // the block of image coding, so short that the overhead dominates
-        return ForwardEven(plan, x.data, out.data(), std::integral_constant<int32_t, 8>(), work);
-    const auto forward = n % 2 == 0 ? ForwardEven<int32_t> : ForwardOdd;
+    const auto forward = n % 2 == 0 ? ForwardEven : ForwardOdd;
     return forward(plan, x.data, out.data(), n, work);
 }
 
@@ -170,7 +194,7 @@ ErrorCode DCTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DB
     const auto n = static_cast<int32_t>(out.size());
     QX_EXPECTS(n >= 1 && in.size() >= n && plan->length == DCTPlanLength(n));
     if (n == 8)
-        return InverseEight(plan, in.data(), out.data(), work);
+        return InverseEight(plan, in.data(), out.data());
     const auto inverse = n % 2 == 0 ? InverseEven : InverseOdd;
     return inverse(plan, in.data(), out.data(), n, work);
 }

@@ -104,7 +104,7 @@ std::vector<std::string> ActionsOn(const SpoilPlace &place) {
             actions.push_back(std::string("= ").append(std::to_string(value)));
     } else {
         actions = SizeActions(place);
-        if (AllLayouts().count(place.element) != 0 && place.dimensions == 1)
+        if (FindLayout(place.element) != nullptr && place.dimensions == 1)
             actions.push_back("size -1");
         for (const char *action :
              {"fill nan",     "fill 0",       "fill 1",       "fill -1",      "fill inf",

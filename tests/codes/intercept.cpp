@@ -51,7 +51,7 @@ std::size_t PartSize(const std::string &part) {
                                             : 4;
 }
 bool IsRecord(const std::string &element) {
-    return AllLayouts().count(element) != 0 && !IsComplex(element);
+    return FindLayout(element) != nullptr && !IsComplex(element);
 }
 
 // A double beyond the range of a whole number becomes the nearest one.
@@ -296,12 +296,12 @@ private:
         }
     }
     void addRecord(const InterceptedArgument &argument, Value &value) {
-        const auto layout = AllLayouts().find(argument.element);
-        if (layout == AllLayouts().end() || value.pointer == nullptr)
+        const RecordLayout *const layout = FindLayout(argument.element);
+        if (layout == nullptr || value.pointer == nullptr)
             return;
-        copyInput(argument, value, layout->second.size);
+        copyInput(argument, value, layout->size);
         auto *bytes = static_cast<unsigned char *>(value.pointer);
-        for (const LayoutField &field : layout->second.fields) {
+        for (const LayoutField &field : layout->fields) {
             const std::string name = std::string(argument.name) + "." + field.name;
             if (field.dimensions > 0)
                 all_.push_back({name, field.dimensions, field.element,
@@ -376,6 +376,13 @@ void Remember(const Places &places) {
 }
 
 } // namespace
+
+const RecordLayout *FindLayout(std::string_view name) {
+    for (const RecordLayout &layout : AllLayouts())
+        if (layout.name == name)
+            return &layout;
+    return nullptr;
+}
 
 int32_t Intercepted(const Interceptable &target, Value *values) {
     if (active == nullptr || active->exportName != target.name)

@@ -22,35 +22,44 @@ struct InterceptedArgument {
     const char *name;
     ArgumentKind kind;
     bool isByValue, isInput, isOutput; // neither isInput nor isOutput: both read and written
-    std::string element;               // a host type, or a record's name
+    ElementName element;               // a host type, or a record's name
+};
+
+struct EffectOfNaN {
+    const char *place; // an argument, or "record.field"
+    const char *words;
 };
 
 struct Interceptable {
     const char *name;
     int32_t (*real)(const Value *);
     bool returnsCode;
-    std::vector<ErrorCode> codes;
-    std::vector<ErrorCode> checks; // in documentation order: some codes more than once
+    std::span<const ErrorCode> codes;
+    std::span<const ErrorCode> checks; // in documentation order: some codes more than once
     bool hasInOrder(ErrorCode first, ErrorCode later) const;
-    std::vector<InterceptedArgument> arguments;
-    std::map<std::string, std::string> nan; // the effect of a NaN, by argument or "record.field"
+    std::span<const InterceptedArgument> arguments;
+    std::span<const EffectOfNaN> nan;
 };
 
 struct LayoutField {
     const char *name;
     std::size_t offset;
     int dimensions; // of an array; 0 for a number
-    std::string element;
+    ElementName element;
 };
 struct RecordLayout {
+    const char *name;
     std::size_t size;
-    std::vector<LayoutField> fields;
+    std::span<const LayoutField> fields;
 };
 
 // Generated from the catalogue by the build.
-const std::vector<Interceptable> &AllInterceptable();
-const std::map<std::string, RecordLayout> &AllLayouts();
+std::span<const Interceptable> AllInterceptable();
+std::span<const RecordLayout> AllLayouts();
 const std::map<std::string, ErrorCode> &AllCodes();
+
+// Null if there is no record of this name.
+const RecordLayout *FindLayout(std::string_view name);
 
 int32_t Intercepted(const Interceptable &target, Value *values);
 

@@ -45,19 +45,28 @@ def function(e, place):
             f"    {'' if e['returns'] == 'void' else 'return '}{call};\n}}\n")
 
 
-def row(e, place, codes):
-    parameters = "".join(
-        f'            {{"{a["name"]}", ArgumentKind::{kind_of(a)}, '
+def tables(e, place, codes):
+    arguments = "".join(
+        f'    {{"{a["name"]}", ArgumentKind::{kind_of(a)}, '
         f'{str(a["kind"] == "value").lower()}, {str(a["direction"] == "in").lower()}, '
         f'{str(a["direction"] == "out").lower()}, '
         f'"{a.get("element", "")}"}},\n' for a in e["arguments"])
+    nan = "".join(f'    {{"{of}", "{" or ".join(words)}"}},\n' for of, words in e["nan"].items())
+    return (constants("ErrorCode", f"codesOf{place}", ", ".join(str(codes[c]) for c in e["codes"])) +
+            constants("ErrorCode", f"checksOf{place}", ", ".join(str(codes[c]) for c in e["checks"])) +
+            constants("InterceptedArgument", f"argumentsOf{place}", arguments) +
+            constants("EffectOfNaN", f"nanOf{place}", nan))
+
+
+def constants(kind, name, rows):
+    """An array, or an empty span."""
+    return f"constexpr {kind} {name}[] = {{\n{rows}}};\n" if rows else f"constexpr std::span<const {kind}> {name};\n"
+
+
+def row(e, place):
     real_ = "nullptr" if "*" in e["returns"] else f"Real{place}"
-    numbers = ", ".join(str(codes[c]) for c in e["codes"])
-    checks = ", ".join(str(codes[c]) for c in e["checks"])
-    nan = ", ".join(f'{{"{place}", "{" or ".join(words)}"}}' for place, words in e["nan"].items())
-    return (f'        {{"{e["name"]}", {real_}, {str(e["returns"] == "ErrorCode").lower()},\n'
-            f'         {{{numbers}}},\n         {{{checks}}},\n         {{\n{parameters}        }},\n'
-            f'         {{{nan}}}}},\n')
+    return (f'    {{"{e["name"]}", {real_}, {str(e["returns"] == "ErrorCode").lower()}, '
+            f"codesOf{place}, checksOf{place}, argumentsOf{place}, nanOf{place}}},\n")
 
 
 def kind_of(a):
@@ -66,15 +75,15 @@ def kind_of(a):
     return KINDS.get(a["kind"], "Other")
 
 
-def record(name, fields):
+def fields(name, of_record):
     rows = ""
-    for f in fields:
+    for f in of_record:
         if "element" in f and "count" not in f:
-            rows += f'        {{"{f["name"]}", offsetof({name}, {f["name"]}), 0, "{f["element"]}"}},\n'
+            rows += f'    {{"{f["name"]}", offsetof({name}, {f["name"]}), 0, "{f["element"]}"}},\n'
         elif "array" in f:
-            rows += (f'        {{"{f["name"]}", offsetof({name}, {f["name"]}), {f["dimensions"]},'
+            rows += (f'    {{"{f["name"]}", offsetof({name}, {f["name"]}), {f["dimensions"]},'
                      f' "{f["array"]}"}},\n')
-    return f'        {{"{name}", {{sizeof({name}), {{\n{rows}        }}}}}},\n'
+    return constants("LayoutField", f"fieldsOf{name}", rows)
 
 
 def main(catalogue_file, output):
@@ -87,16 +96,17 @@ def main(catalogue_file, output):
     text = ('#include "tests/codes/intercept.h"\n\n#include "qx/qx.h"\n\n#include <cstddef>\n\n'
             f"void *qxExportTargets[{len(exports)}];\n\nnamespace qx::test {{\n\nnamespace {{\n\n"
             + "".join(real(e, i) for e, i in callable_) +
-            "\n} // namespace\n\nconst std::vector<Interceptable> &AllInterceptable() {\n"
-            "    static const std::vector<Interceptable> all = {\n"
-            + "".join(row(e, i, codes) for i, e in enumerate(exports)) +
-            "    };\n    return all;\n}\n\nconst std::vector<const char *> &ExportNames() {\n"
+            "\n" + "".join(tables(e, i, codes) for i, e in enumerate(exports)) +
+            "constexpr Interceptable interceptable[] = {\n" + "".join(row(e, i) for i, e in enumerate(exports)) +
+            "};\n\n" + "".join(fields(name, catalogue["records"][name]["fields"]) for name in used) +
+            "constexpr RecordLayout layouts[] = {\n" +
+            "".join(f'    {{"{name}", sizeof({name}), fieldsOf{name}}},\n' for name in used) +
+            "};\n\n} // namespace\n\nstd::span<const Interceptable> AllInterceptable() { return interceptable; }\n"
+            "std::span<const RecordLayout> AllLayouts() { return layouts; }\n\n"
+            "const std::vector<const char *> &ExportNames() {\n"
             "    static const std::vector<const char *> all = {"
             + ", ".join(f'"{e["name"]}"' for e in exports) +
-            "};\n    return all;\n}\n\nconst std::map<std::string, RecordLayout> &AllLayouts() {\n"
-            "    static const std::map<std::string, RecordLayout> all = {\n"
-            + "".join(record(name, catalogue["records"][name]["fields"]) for name in used) +
-            "    };\n    return all;\n}\n\nconst std::map<std::string, ErrorCode> &AllCodes() {\n"
+            "};\n    return all;\n}\n\nconst std::map<std::string, ErrorCode> &AllCodes() {\n"
             "    static const std::map<std::string, ErrorCode> all = {\n"
             + "".join(f'        {{"{name}", {number}}},\n' for name, number in codes.items()) +
             "    };\n    return all;\n}\n\n} // namespace qx::test\n\n"

@@ -119,9 +119,8 @@ private:
 
 // The size of an element in bytes, and how it is printed.
 void PrintElements(const OutputValue &value) {
-    const auto record = AllRecords().find(value.element);
-    const RecordType plain = {ElementSize(value.element), {{0, 1, value.element}}};
-    const RecordType &type = record == AllRecords().end() ? plain : record->second;
+    RecordField whole;
+    const RecordType type = LayoutOf(value.element, whole);
     for (std::size_t at = 0; at + type.size <= value.bytes; at += type.size) {
         std::printf("  %s[%zu] =", value.name.c_str(), at / type.size);
         for (const RecordField &field : type.fields)

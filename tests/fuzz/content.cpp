@@ -178,19 +178,25 @@ int32_t TypeCode(const std::string &element) {
 }
 
 std::size_t ElementSize(const std::string &element) {
-    if (const auto record = AllRecords().find(element); record != AllRecords().end())
-        return record->second.size;
+    if (const RecordType *record = FindRecord(element); record != nullptr)
+        return record->size;
     return element == "DBL"                       ? 8
            : element == "U8"                      ? 1
            : element == "U16" || element == "I16" ? 2
                                                   : 4;
 }
 
+RecordType LayoutOf(const std::string &element, RecordField &whole) {
+    if (const RecordType *record = FindRecord(element); record != nullptr)
+        return *record;
+    whole = {0, 1, element};
+    return {element, ElementSize(element), {&whole, 1}};
+}
+
 std::vector<unsigned char> SomeElements(Random &random, const std::string &element, int32_t rows,
                                         int32_t cols, Content content) {
-    const RecordType plain = {ElementSize(element), {{0, 1, element}}};
-    const auto record = AllRecords().find(element);
-    const RecordType &type = record == AllRecords().end() ? plain : record->second;
+    RecordField whole;
+    const RecordType type = LayoutOf(element, whole);
     std::vector<unsigned char> bytes(type.size * static_cast<std::size_t>(rows) *
                                      static_cast<std::size_t>(cols));
     const double constant = SomeReal(random, {rows, cols}, true);

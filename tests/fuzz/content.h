@@ -1,6 +1,7 @@
 #ifndef QX_TESTS_FUZZ_CONTENT_H
 #define QX_TESTS_FUZZ_CONTENT_H
 
+#include "tests/fuzz/thunk.h"
 #include "tests/support/recipe.h"
 
 #include <cstdint>
@@ -54,6 +55,8 @@ int32_t SomeWhole(Random &random, const Sizes &sizes);
 double SomeReal(Random &random, const Sizes &sizes, bool isUsual);
 
 std::size_t ElementSize(const std::string &element);
+// The fields of an element: those of a record, or, of any other, `whole`, which this sets.
+RecordType LayoutOf(const std::string &element, RecordField &whole);
 // The type code of the host; 0 for a record.
 int32_t TypeCode(const std::string &element);
 // rows by cols elements (a 1-D array is one row); each field of a record is generated separately.

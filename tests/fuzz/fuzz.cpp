@@ -151,9 +151,9 @@ bool Read(int count, char **words) {
             for (const Subject &subject : AllSubjects())
                 std::printf("%s%s\n", subject.name.c_str(),
                             subject.thunk == nullptr ? ": by recipe only" : "");
-            for (const std::string &name : NotDriven())
+            for (const char *name : NotDriven())
                 if (!IsSubject(name))
-                    std::printf("not driven: %s\n", name.c_str());
+                    std::printf("not driven: %s\n", name);
             std::exit(0);
         }
         if (value == nullptr)

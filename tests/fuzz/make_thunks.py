@@ -45,19 +45,24 @@ def thunk(export):
     return f"int32_t Thunk_{export['name']}([[maybe_unused]] const Value *v) {{ {body} }}\n"
 
 
-def table(export, exports):
+def parameters(export):
     rows = "".join(
-        f'        {{"{a["name"]}", Kind::{KINDS[a["kind"]]}, {str(a["direction"] != "in").lower()},'
+        f'    {{"{a["name"]}", Kind::{KINDS[a["kind"]]}, {str(a["direction"] != "in").lower()},'
         f' {str(a["direction"] != "out").lower()}, "{a["element"] if "element" in a else ""}"}},\n'
         for a in export["arguments"])
+    return f"constexpr Parameter parametersOf{export['name']}[] = {{\n{rows}}};\n" if rows else ""
+
+
+def row(export, exports):
+    table = f"parametersOf{export['name']}" if export["arguments"] else "{}"
     return (f'    {{"{export["name"]}", Thunk_{export["name"]}, {release_of(export, exports)},'
-            f' {str(export["returns"] == "ErrorCode").lower()}, {{\n{rows}    }}}},\n')
+            f' {str(export["returns"] == "ErrorCode").lower()}, {table}}},\n')
 
 
-def record(name, fields):
-    rows = "".join(f'        {{offsetof({name}, {f["name"]}), {f.get("count", 1)}, "{f["element"]}"}},\n'
-                   for f in fields)
-    return f'    {{"{name}", {{sizeof({name}), {{\n{rows}    }}}}}},\n'
+def fields(name, of_record):
+    rows = "".join(f'    {{offsetof({name}, {f["name"]}), {f.get("count", 1)}, "{f["element"]}"}},\n'
+                   for f in of_record)
+    return f"constexpr RecordField fieldsOf{name}[] = {{\n{rows}}};\n"
 
 
 def main(catalogue_file, output):
@@ -65,20 +70,21 @@ def main(catalogue_file, output):
         catalogue = json.load(file)
     exports, records = catalogue["exports"], catalogue["records"]
     driven = [e for e in exports if is_driven(e, records)]
-    used = {a["element"] for e in driven for a in e["arguments"] if a.get("element") in records}
+    used = sorted({a["element"] for e in driven for a in e["arguments"] if a.get("element") in records})
     text = ('#include "tests/fuzz/thunk.h"\n\n#include "qx/qx.h"\n\n#include <cstddef>\n\n'
-            "namespace qx::test {\n\nnamespace {\n\n" + "".join(map(thunk, driven)) +
-            "\n} // namespace\n\nconst std::vector<Thunk> &AllThunks() {\n"
-            "    static const std::vector<Thunk> all = {\n" +
-            "".join(table(e, exports) for e in driven) +
-            "    };\n    return all;\n}\n\n"
-            "const std::map<std::string, RecordType> &AllRecords() {\n"
-            "    static const std::map<std::string, RecordType> all = {\n" +
-            "".join(record(name, records[name]["fields"]) for name in sorted(used)) +
-            "    };\n    return all;\n}\n\nconst std::vector<std::string> &NotDriven() {\n"
-            "    static const std::vector<std::string> all = {" +
-            ", ".join(f'"{e["name"]}"' for e in exports if e not in driven) +
-            "};\n    return all;\n}\n\n} // namespace qx::test\n")
+            "namespace qx::test {\n\nnamespace {\n\n" + "".join(map(thunk, driven)) + "\n" +
+            "".join(map(parameters, driven)) +
+            "const Thunk thunks[] = {\n" + "".join(row(e, exports) for e in driven) + "};\n\n" +
+            "".join(fields(name, records[name]["fields"]) for name in used) +
+            "constexpr RecordType records[] = {\n" +
+            "".join(f'    {{"{name}", sizeof({name}), fieldsOf{name}}},\n' for name in used) + "};\n\n" +
+            "constexpr const char *notDriven[] = {" +
+            ", ".join(f'"{e["name"]}"' for e in exports if e not in driven) + "};\n\n} // namespace\n\n" +
+            "std::span<const Thunk> AllThunks() { return thunks; }\n\n"
+            "const RecordType *FindRecord(std::string_view name) {\n"
+            "    for (const RecordType &record : records)\n        if (record.name == name)\n"
+            "            return &record;\n    return nullptr;\n}\n\n"
+            "std::span<const char *const> NotDriven() { return notDriven; }\n\n} // namespace qx::test\n")
     with open(output, "w", encoding="utf-8") as file:
         file.write(text)
 

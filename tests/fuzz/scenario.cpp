@@ -18,7 +18,7 @@ enum class Sharing { Nothing, InputAndOutput, TwoOutputs };
 // An array argument before `at` whose handle it may share, or -1. Arguments that already share a
 // handle are excluded.
 int SomeAlias(Random &random, const Scenario &scenario, std::size_t at, Sharing sharing) {
-    const std::vector<Parameter> &parameters = scenario.thunk->parameters;
+    const std::span<const Parameter> parameters = scenario.thunk->parameters;
     const auto fit = [sharing](const Parameter &one, const Parameter &other) {
         return one.kind == other.kind && one.element == other.element &&
                (sharing == Sharing::TwoOutputs ? one.isOut && other.isOut
@@ -70,7 +70,7 @@ Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &s
 
 // Makes one array claim a negative size: one of two, or both, so that their product is positive.
 void ClaimNegativeSize(Random &random, Scenario &scenario) {
-    const std::vector<Parameter> &parameters = scenario.thunk->parameters;
+    const std::span<const Parameter> parameters = scenario.thunk->parameters;
     const auto at = static_cast<std::size_t>(random.below(static_cast<int32_t>(parameters.size())));
     Argument &argument = scenario.arguments[at];
     if (!parameters[at].isArray() || argument.aliasOf >= 0)
@@ -332,15 +332,14 @@ void ValueHash::add(const OutputValue &value) {
     for (const int32_t size : value.sizes)
         Mix(sizes_, static_cast<uint32_t>(std::max(size, 0)));
     Mix(sizes_, value.bytes);
-    const auto record = AllRecords().find(value.element);
-    if (record == AllRecords().end()) {
+    const RecordType *const record = FindRecord(value.element);
+    if (record == nullptr) {
         MixField(elements_, value.element, value.elements, value.bytes);
         return;
     }
     // Field by field, since the padding between them is undefined.
-    const RecordType &type = record->second;
-    for (std::size_t at = 0; at < value.bytes; at += type.size)
-        for (const RecordField &field : type.fields)
+    for (std::size_t at = 0; at < value.bytes; at += record->size)
+        for (const RecordField &field : record->fields)
             MixField(elements_, field.element, value.elements + at + field.offset,
                      field.count * ElementSize(field.element));
 }

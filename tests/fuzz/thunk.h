@@ -3,14 +3,14 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <map>
+#include <span>
 #include <string>
-#include <vector>
+#include <string_view>
 
 namespace qx::test {
 
 // Generated from the catalogue by the build: each export with its arguments, callable without
-// types.
+// types. The tables are constants, so no call initialises them, in whichever thread it is.
 
 enum class Kind {
     Array1D,
@@ -25,11 +25,18 @@ enum class Kind {
     Error
 };
 
+// A name in the tables.
+struct ElementName : std::string_view {
+    constexpr ElementName(const char *name) : std::string_view(name) {}
+    ElementName(const std::string &name) : std::string_view(name) {}
+    operator std::string() const { return std::string(*this); }
+};
+
 struct Parameter {
     const char *name;
     Kind kind;
     bool isOut, isIn;
-    std::string element; // a host type, or a record's name
+    ElementName element; // a host type, or a record's name
     bool isArray() const { return kind == Kind::Array1D || kind == Kind::Array2D; }
     int dimensions() const { return kind == Kind::Array2D ? 2 : 1; }
 };
@@ -45,23 +52,25 @@ struct Thunk {
     int32_t (*call)(const Value *);
     int32_t (*release)(void **); // of an instance word
     bool returnsCode;
-    std::vector<Parameter> parameters;
+    std::span<const Parameter> parameters;
 };
 
 struct RecordField {
-    std::size_t offset;
-    std::size_t count;
-    std::string element;
+    std::size_t offset = 0;
+    std::size_t count = 0;
+    ElementName element = "";
 };
 struct RecordType {
+    ElementName name;
     std::size_t size;
-    std::vector<RecordField> fields;
+    std::span<const RecordField> fields;
 };
 
-const std::vector<Thunk> &AllThunks();
-const std::map<std::string, RecordType> &AllRecords();
+std::span<const Thunk> AllThunks();
+// Null if there is no record of this name.
+const RecordType *FindRecord(std::string_view name);
 // Exports whose arguments the catalogue cannot describe.
-const std::vector<std::string> &NotDriven();
+std::span<const char *const> NotDriven();
 
 } // namespace qx::test
 

@@ -147,6 +147,44 @@ class Table:
                        f"    {float(centre)!r},", "    {"] + self.values(numerator, "        ") + \
                       ["    },", "    {"] + self.values(denominator, "        ") + ["    }", "};", ""]
 
+    def pieces(self, name, what, function, width, count, degree):
+        """Polynomials on `count` intervals of the same width from 0 on, in the distance from the middle of the
+        interval in widths."""
+        rows, worst, rounded = [], mpf(0), mpf(0)
+        for k in range(count):
+            values = [(h, function(width * (k + mpf(1) / 2 + h))) for h in nodes(-mpf(1) / 2, mpf(1) / 2, degree + 1)]
+            system = matrix(degree + 1, degree + 1)
+            for i, (h, _) in enumerate(values):
+                for j in range(degree + 1):
+                    system[i, j] = h**j
+            exact = list(lu_solve(system, matrix([f for _, f in values])))
+            for i in range(9):
+                h = mpf(i - 4) / 9
+                f = function(width * (k + mpf(1) / 2 + h))
+                worst = max(worst, abs(horner(exact, h) / f - 1))
+                rounded = max(rounded, abs(horner([as_double(c) for c in exact], h) / f - 1))
+            rows.append(exact)
+        line = (f"{what}; degree {degree} in {count} pieces of width {mp.nstr(width, 6)} from 0 on: "
+                f"{mp.nstr(worst, 2)}, {mp.nstr(rounded, 2)}")
+        print(name, line, flush=True)
+        self.comment(line)
+        self.lines += [f"inline constexpr double {name}[{count}][{degree + 1}] = {{"]
+        for row in rows:
+            body = self.values(row, "     ")
+            body[0] = "    {" + body[0].lstrip()
+            body[-1] += "},"
+            self.lines += body
+        self.lines += ["};", ""]
+
+    def pairs(self, name, what, values, rest=lambda v, high: v - high):
+        """Numbers in twice the precision, each as a double and the rest."""
+        self.comment(what)
+        self.lines += [f"inline constexpr Extended {name}[] = {{"]
+        for v in values:
+            high = as_double(v)
+            self.lines.append(f"    {{{float(high).hex()}, {float(rest(v, high)).hex()}}},")
+        self.lines += ["};", ""]
+
     def write(self, path):
         with open(path, "w") as file:
             file.write("\n".join(self.lines + ["} // namespace qx::table", "", "#endif", ""]))

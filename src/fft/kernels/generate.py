@@ -48,6 +48,8 @@ WHOLE = [6, 12, 15, 20, 24, 28, 30, 36, 40, 48]
 BY_HALF = [n for n in range(20, 65, 2) if n // 2 in RADICES + WHOLE]
 # Radices with loops of eight lanes for complex data.
 WIDE = [4, 7, 8, 9, 10, 16, 32]
+# Those with loops of eight lanes for columns of matrices.
+WIDE_ABREAST = sorted([2, 3, 5, *WIDE])
 # Those with stages of eight lanes for real data. Smaller ones fit the registers of four lanes.
 WIDE_REAL = [16, 32]
 # Composite length -> its factor r; coprime factors are recognised.
@@ -430,6 +432,10 @@ def file_of(p):
         texts.append(prime_turns(p))
     texts += [side_by_side(part, p, f"Whole{part}Transform<{p}>(in, out);")
               for part in (["Complex"] if by_half else ["Complex", "Real"])]
+    if p in WHOLE:
+        texts.append(f"template <>\nvoid ComplexAbreast<{p}>(const DBL *in, ptrdiff_t inLeg, DBL *out, "
+                     "ptrdiff_t outLeg, ptrdiff_t columns) {\n"
+                     f"    ComplexAbreastLeaf<{p}>(in, inLeg, out, outLeg, columns);\n}}\n")
     if 2 * p in BY_HALF:
         turns = [part(k, 2 * p) / 2 for k in range(1, (p + 1) // 2) for part in (cos_turn, sin_turn)]
         texts.append(side_by_side("Real", 2 * p,
@@ -459,7 +465,9 @@ def choice_file():
     wholes = []
     for n in sorted({*complex_lengths, *BY_HALF}):
         of_complex = f"ComplexSideBySide<{n}>" if n in complex_lengths else "nullptr"
-        wholes.append(f"    case {n}:\n        return {{{of_complex}, RealSideBySide<{n}>}};")
+        abreast = (f"KernelsFor<{n}>()->lanes.abreastLeaf" if n in RADICES else
+                   f"ComplexAbreast<{n}>" if n in WHOLE else "nullptr")
+        wholes.append(f"    case {n}:\n        return {{{of_complex}, RealSideBySide<{n}>, {abreast}}};")
     return enclosed("The choice of kernels", [
         "const KernelSet *KernelsOf(int32_t radix) {\n    switch (radix) {",
         *kernels, "    default:\n        return nullptr;\n    }\n}\n",
@@ -471,11 +479,15 @@ def choice_file():
 def passes_file_of(p):
     texts = [
         packed_text(p),
-        f"template <>\nvoid TakeWideComplex<{p}>(LanesPasses &passes) {{\n"
-        f"    passes.complexLeaf = ComplexLanesLeaf<{p}>;\n"
-        f"    passes.complexTwiddle = ComplexLanesTwiddle<{p}>;\n"
-        f"    passes.complexColumns = ComplexTwiddleColumns<{p}>;\n"
-        "    passes.complexLanes = nativeLanes;\n}\n"]
+        f"template <>\nvoid TakeWideAbreast<{p}>(LanesPasses &passes) {{\n"
+        f"    passes.abreastLeaf = ComplexAbreastLeaf<{p}>;\n"
+        f"    passes.abreastTwiddle = ComplexAbreastTwiddle<{p}>;\n}}\n"]
+    if p in WIDE:
+        texts.append(f"template <>\nvoid TakeWideComplex<{p}>(LanesPasses &passes) {{\n"
+                     f"    passes.complexLeaf = ComplexLanesLeaf<{p}>;\n"
+                     f"    passes.complexTwiddle = ComplexLanesTwiddle<{p}>;\n"
+                     f"    passes.complexColumns = ComplexTwiddleColumns<{p}>;\n"
+                     "    passes.complexLanes = nativeLanes;\n}\n")
     if p in WIDE_REAL:
         texts += [split_text(p),
                   f"template <>\nvoid TakeWideReal<{p}>(LanesPasses &passes) {{\n"
@@ -488,7 +500,7 @@ def passes_file_of(p):
 
 def passes_choice_file():
     """Stages whose columns do not fill eight lanes stay with four, as do short real ones."""
-    def choice(passes, radices, condition):
+    def choice(passes, radices, condition="true"):
         cases = [f"        case {p}:\n            TakeWide{passes}<{p}>(passes);\n            break;"
                  for p in radices]
         return "\n".join([f"    if ({condition}) {{\n        switch (radix) {{", *cases,
@@ -497,6 +509,7 @@ def passes_choice_file():
         "LanesPasses PassesOf(int32_t radix, int32_t m) {",
         "    LanesPasses passes = avx2::PassesOf(radix, m);",
         choice("Complex", WIDE, "m % packedColumns == 0"),
+        choice("Abreast", WIDE_ABREAST),
         choice("Real", WIDE_REAL, "fillsWideRealLanes(m) && m * radix >= 1024"),
         "    return passes;\n}\n"], "kernel_set")
 
@@ -513,7 +526,7 @@ def main():
     for p in RADICES + WHOLE:
         (folder / f"kernels_{p}.cpp").write_text(file_of(p))
     (folder / "kernels_choice.cpp").write_text(choice_file())
-    for p in WIDE:
+    for p in WIDE_ABREAST:
         (folder / f"passes_{p}.cpp").write_text(passes_file_of(p))
     (folder / "passes_choice.cpp").write_text(passes_choice_file())
 

@@ -553,6 +553,129 @@ constexpr auto PairsInPanels() -> decltype(LanesPasses::realPairs) {
         return nullptr;
 }
 
+// ---- Columns of a matrix abreast ----
+//
+// Neighbouring columns fill the lanes. So the rows of the matrix are read and written as they are, and all
+// lanes have the same twiddles.
+
+// The twiddles of one row of the blocks, j from 1 to P - 1, with each in all lanes: the cosine, then the
+// sine as Twiddled needs it.
+template <int P>
+using RowTurns = double[2 * nativeLanes * (P > 1 ? P - 1 : 1)];
+
+// A value times the twiddle of a row.
+QX_INLINE Wide RowTwiddled(Wide x, const double *turn) {
+    const Wide c = Wide::load(turn);
+    const Wide s = Wide::load(turn + nativeLanes);
+    if constexpr (isWide)
+        return x * c + Swapped(x) * s;
+    else
+        return MinusPlus(x * c, Swapped(x) * s);
+}
+
+struct RowTwiddledIn {
+    PackedIn columns;
+    const double *turns;
+    QX_INLINE Wide at(int j) const {
+        const Wide x = columns.at(j);
+        return j == 0 ? x : RowTwiddled(x, turns + (j - 1) * 2 * nativeLanes);
+    }
+};
+
+template <int P>
+void SpreadTurns(const FFTStage &stage, ptrdiff_t k, double *turns) {
+    const ptrdiff_t entry = (k - 1) * (P - 1);
+    for (int j = 0; j < P - 1; ++j) {
+        const Wide c(k == 0 ? 1.0 : stage.twiddleCos[entry + j]);
+        const Wide s(k == 0 ? 0.0 : stage.twiddleSin[entry + j]);
+        c.store(turns + j * 2 * nativeLanes);
+        (isWide ? NegatedInPairs(s, true) : s).store(turns + j * 2 * nativeLanes + nativeLanes);
+    }
+}
+
+// The columns of one row of blocks that do not fill the lanes, and rows so far apart that they share sets
+// of the cache, pass through the stack by whole rows.
+template <int P>
+bool passOnStack(ptrdiff_t leg, ptrdiff_t columns) {
+    return columns % packedColumns != 0 || (P > 8 && legsCollide(leg, P));
+}
+constexpr int abreastWidth = 2 * mostAbreast;
+
+// P rows of `columns` values, with zeros behind them up to whole lanes.
+template <int P>
+void RowsToStack(const DBL *in, ptrdiff_t leg, ptrdiff_t columns, double *rows) {
+    const ptrdiff_t values = 2 * columns;
+    const ptrdiff_t whole = values - values % nativeLanes;
+    for (int j = 0; j < P; ++j) {
+        const DBL *const from = in + j * leg;
+        double *const to = rows + j * abreastWidth;
+        for (ptrdiff_t i = 0; i < whole; i += nativeLanes)
+            Wide::load(from + i).store(to + i);
+        if (whole < values)
+            Wide::loadFirst(from + whole, values - whole).store(to + whole);
+    }
+}
+template <int P>
+void RowsFromStack(const double *rows, ptrdiff_t columns, DBL *out, ptrdiff_t leg) {
+    const ptrdiff_t values = 2 * columns;
+    const ptrdiff_t whole = values - values % nativeLanes;
+    for (int k = 0; k < P; ++k) {
+        const double *const from = rows + k * abreastWidth;
+        DBL *const to = out + k * leg;
+        for (ptrdiff_t i = 0; i < whole; i += nativeLanes)
+            Wide::load(from + i).store(to + i);
+        if (whole < values)
+            Wide::load(from + whole).storeFirst(to + whole, values - whole);
+    }
+}
+
+template <int P>
+__attribute__((noinline)) void AbreastLeafColumns(const DBL *in, ptrdiff_t inLeg, DBL *out,
+                                                  ptrdiff_t outLeg, ptrdiff_t columns) {
+    for (ptrdiff_t c = 0; c < columns; c += packedColumns)
+        RunPacked<P, Wide>(PackedIn{in + 2 * c, inLeg}, PackedOut{out + 2 * c, outLeg});
+}
+template <int P>
+void ComplexAbreastLeaf(const DBL *in, ptrdiff_t inLeg, DBL *out, ptrdiff_t outLeg,
+                        ptrdiff_t columns) {
+    const bool readsStack = passOnStack<P>(inLeg, columns);
+    const bool writesStack = passOnStack<P>(outLeg, columns);
+    if (!readsStack && !writesStack)
+        return AbreastLeafColumns<P>(in, inLeg, out, outLeg, columns);
+    alignas(64) double rows[P * abreastWidth];
+    if (readsStack)
+        RowsToStack<P>(in, inLeg, columns, rows);
+    AbreastLeafColumns<P>(readsStack ? rows : in, readsStack ? abreastWidth : inLeg,
+                          writesStack ? rows : out, writesStack ? abreastWidth : outLeg, columns);
+    if (writesStack)
+        RowsFromStack<P>(rows, columns, out, outLeg);
+}
+
+template <int P>
+__attribute__((noinline)) void AbreastTwiddleColumns(const DBL *in, ptrdiff_t inLeg, DBL *out,
+                                                     ptrdiff_t outLeg, const double *turns,
+                                                     ptrdiff_t columns) {
+    for (ptrdiff_t c = 0; c < columns; c += packedColumns)
+        RunPacked<P, Wide>(RowTwiddledIn{{in + 2 * c, inLeg}, turns},
+                           PackedOut{out + 2 * c, outLeg});
+}
+template <int P>
+void ComplexAbreastTwiddle(const DBL *in, const BlockRows &inRows, DBL *out,
+                           const BlockRows &outRows, const FFTStage &stage, ptrdiff_t m,
+                           ptrdiff_t columns) {
+    alignas(64) RowTurns<P> turns;
+    alignas(64) double rows[P * abreastWidth];
+    const bool writesStack = in != out && passOnStack<P>(outRows.leg, columns);
+    for (ptrdiff_t k = 0; k < m; ++k) {
+        SpreadTurns<P>(stage, k, turns);
+        DBL *const to = out + k * outRows.pitch;
+        AbreastTwiddleColumns<P>(in + k * inRows.pitch, inRows.leg, writesStack ? rows : to,
+                                 writesStack ? abreastWidth : outRows.leg, turns, columns);
+        if (writesStack)
+            RowsFromStack<P>(rows, columns, to, outRows.leg);
+    }
+}
+
 template <int P>
 constexpr KernelSet MakeKernels() {
     return {RealLeafKernel<P>,
@@ -561,7 +684,8 @@ constexpr KernelSet MakeKernels() {
             ComplexTwiddleKernel<P>,
             {ComplexLanesLeaf<P>, RealLanesLeaf<P>, ComplexLanesTwiddle<P>, RealLanesTwiddle<P>,
              RealLanesEdges<P>, ComplexTwiddleColumns<P>, PairsInPanels<P>(),
-             PairsInPanels<P, PairLanesBeforeIn<P>>(), nativeLanes, nativeLanes}};
+             PairsInPanels<P, PairLanesBeforeIn<P>>(), nativeLanes, nativeLanes,
+             ComplexAbreastLeaf<P>, ComplexAbreastTwiddle<P>}};
 }
 
 } // namespace qx::QX_WIDTH

@@ -37,16 +37,23 @@ QX_BY_WIDTH(WholeTransform, WholeOf, (int32_t length))
 namespace QX_WIDTH {
 template <int P>
 const KernelSet *KernelsFor();
-// Replace the loops of four lanes by those of eight: for complex data, and for the stages of real data.
+// Replace the loops of four lanes by those of eight: for complex data, for the stages of real data, and for
+// columns of matrices.
 template <int P>
 void TakeWideComplex(LanesPasses &passes);
 template <int P>
 void TakeWideReal(LanesPasses &passes);
+template <int P>
+void TakeWideAbreast(LanesPasses &passes);
 // One transform of contiguous values; complex ones are interleaved.
 template <int P>
 void ComplexSideBySide(const DBL *in, DBL *out);
 template <int P>
 void RealSideBySide(const DBL *in, DBL *out);
+// Complex columns of a matrix, for a length without a KernelSet.
+template <int P>
+void ComplexAbreast(const DBL *in, std::ptrdiff_t inLeg, DBL *out, std::ptrdiff_t outLeg,
+                    std::ptrdiff_t columns);
 } // namespace QX_WIDTH
 #ifdef QX_HAS_EIGHT_LANES
 namespace avx2 {

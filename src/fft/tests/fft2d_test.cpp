@@ -108,32 +108,86 @@ TEST(TwoDimensional, ForwardTakesARegionPadsAndShifts) {
             }
 }
 
-// Columns whose length has several factors are read in place or copied first. Both ways give the
-// bits of the transform of a single column.
-TEST(TwoDimensional, ColumnsHaveTheBitsOfOneAlone) {
-    for (const Shape size : {Shape{64, 64}, {60, 17}, {77, 9}, {106, 5}, {1024, 8}, {300, 240}}) {
-        SCOPED_TRACE(testing::Message() << size.rows << "x" << size.cols);
-        const qx::PlanReference rowPlan(size.cols), columnPlan(size.rows);
-        const std::vector<CDB> x = RandomComplex(size.rows * size.cols, 1);
-        std::vector<CDB> rows(x.size()), out(x.size()), wanted(x.size()), column(size.rows);
-        for (int32_t r = 0; r < size.rows; ++r) {
-            const CDB *const from = &x[r * size.cols];
-            CDB *const to = &rows[r * size.cols];
-            qx::FFTComplexForward(rowPlan.get(), &from->re, &from->im, &to->re, &to->im, 2, 2,
-                                  size.cols);
-        }
-        for (int32_t c = 0; c < size.cols; ++c) {
-            qx::FFTComplexForward(columnPlan.get(), &rows[c].re, &rows[c].im, &column[0].re,
-                                  &column[0].im, 2 * size.cols, 2, size.rows);
-            for (int32_t r = 0; r < size.rows; ++r)
-                wanted[r * size.cols + c] = column[r];
-        }
-        ASSERT_EQ(qx::FFT2DComplexForward(rowPlan.get(), columnPlan.get(), x.data(),
-                                          {size.rows, size.cols, 0, 0, size.rows, size.cols}, 0,
-                                          out.data()),
-                  0);
-        EXPECT_TRUE(SameBits(out, wanted));
+// Row by row and column by column, each value at its place in plain or shifted order. Rows from `used` on
+// are zero.
+template <class Row>
+std::vector<CDB> OneByOne(Shape size, int32_t used, int32_t shift, const Row &row) {
+    const qx::PlanReference columnPlan(size.rows);
+    std::vector<CDB> half(std::size_t(size.rows) * size.cols), wanted(half.size());
+    std::vector<CDB> column(size.rows);
+    for (int32_t r = 0; r < used; ++r)
+        row(r, &half[r * size.cols]);
+    const int32_t down = shift != 0 ? size.rows / 2 : 0, right = shift != 0 ? size.cols / 2 : 0;
+    for (int32_t c = 0; c < size.cols; ++c) {
+        qx::FFTComplexForward(columnPlan.get(), &half[c].re, &half[c].im, &column[0].re,
+                              &column[0].im, 2 * size.cols, 2, size.rows);
+        for (int32_t r = 0; r < size.rows; ++r)
+            wanted[(r + down) % size.rows * size.cols + (c + right) % size.cols] = column[r];
     }
+    return wanted;
+}
+
+void CheckAgainstOneByOne(Shape size, int32_t used, int32_t shift) {
+    SCOPED_TRACE(testing::Message()
+                 << size.rows << "x" << size.cols << " " << used << " " << shift);
+    const int32_t cols = size.cols;
+    const qx::PlanReference rowPlan(cols), columnPlan(size.rows);
+    const qx::MatrixRegion region{used, cols, 0, 0, size.rows, cols};
+    const std::vector<CDB> x = RandomComplex(used * cols, 1);
+    std::vector<CDB> out(std::size_t(size.rows) * cols);
+    ASSERT_EQ(qx::FFT2DComplexForward(rowPlan.get(), columnPlan.get(), x.data(), region, shift,
+                                      out.data()),
+              0);
+    EXPECT_TRUE(SameBits(out, OneByOne(size, used, shift, [&](int32_t r, CDB *to) {
+                             const CDB *const from = &x[r * cols];
+                             qx::FFTComplexForward(rowPlan.get(), &from->re, &from->im, &to->re,
+                                                   &to->im, 2, 2, cols);
+                         })));
+
+    const Signal real = RandomSignal(used * cols, 1);
+    ASSERT_EQ(qx::FFT2DRealForward(rowPlan.get(), columnPlan.get(), real.data(), region, shift,
+                                   out.data()),
+              0);
+    // Half of the columns are transformed, those of negative frequencies in shifted order. The others are
+    // the conjugates of their opposites.
+    const int32_t sign = shift != 0 ? -1 : 1;
+    std::vector<CDB> wanted = OneByOne(size, used, shift, [&](int32_t r, CDB *to) {
+        std::vector<double> h(cols);
+        qx::FFTRealForward(rowPlan.get(), &real[r * cols], h.data(), 1, 1, cols);
+        for (int32_t k = 0; k <= cols / 2; ++k)
+            to[(cols + sign * k) % cols] = {h[k], k > 0 && 2 * k < cols ? sign * h[cols - k] : 0};
+    });
+    const auto at = [&](int32_t r, int32_t f) -> CDB & {
+        const int32_t down = shift != 0 ? size.rows / 2 : 0, right = shift != 0 ? cols / 2 : 0;
+        return wanted[(r + size.rows + down) % size.rows * cols + (f + cols + right) % cols];
+    };
+    for (int32_t f = 1; 2 * f < cols; ++f)
+        for (int32_t r = 0; r < size.rows; ++r)
+            at(-r, -sign * f) = {at(r, sign * f).re, -at(r, sign * f).im};
+    EXPECT_TRUE(SameBits(out, wanted));
+}
+
+// Columns run abreast where all factors have kernels. They have the bits of a single column, whether they
+// fill the lanes or not, with rows that share sets of the cache or not.
+TEST(TwoDimensional, ColumnsHaveTheBitsOfOneAlone) {
+    for (int32_t rows = 1; rows <= 66; ++rows)
+        CheckAgainstOneByOne({rows, rows % 5 + 16}, rows, rows % 2);
+    for (const Shape size : {Shape{64, 64},
+                             {60, 17},
+                             {77, 9},
+                             {106, 5},
+                             {1024, 8},
+                             {300, 240},
+                             {640, 18},
+                             {17 * 19, 7},
+                             {41 * 43, 3},
+                             {256, 128},
+                             {480, 1},
+                             {2, 1}})
+        for (const int32_t shift : {0, 1}) {
+            CheckAgainstOneByOne(size, size.rows, shift);
+            CheckAgainstOneByOne(size, size.rows / 2 + 1, shift);
+        }
 }
 
 TEST(TwoDimensional, InversesReturnTheMatrix) {

@@ -212,8 +212,9 @@ TEST(Transform, GivesTheSameBitsAtEveryStrideAndAlignment) {
         CheckStrides(n);
         CheckStridesOfInverses(n);
     }
-    for (const int32_t n : {100, 107, 167, 210, 2 * 167, 529, 720, 1000, 1024, 2048, 2809, 8192,
-                            17 * 1024, 24010, 65536, 1 << 17, 1 << 18})
+    for (const int32_t n :
+         {74,   82,   83,   86,   100,  107,       167,   210,   2 * 167, 529,    720,
+          1000, 1024, 2048, 2809, 8192, 17 * 1024, 24010, 65536, 1 << 17, 1 << 18})
         CheckStrides(n);
 }
 

@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <functional>
 #include <limits>
@@ -243,6 +244,32 @@ TEST(CascadeFilter, IsItsSectionsInSequenceInBlocksOfAnySize) {
             EXPECT_LT(MaxError(w, ThroughSections(order, a, b, ToLong(z))), 1e-14);
             EXPECT_TRUE(SameBits(Samples<CDBArray>(CxSigIIR_Filter_PtbyPt, form, a, b)(z), w));
         }
+}
+
+// A block is passed through in tiles, each longer than the way through the sections.
+TEST(CascadeFilter, EndsOfLongBlocksPassThroughAllSections) {
+    for (const int32_t form : {0, 1})
+        for (const int32_t sections : {5, 17})
+            for (const int32_t n : {2047, 2049, 4095, 4097, 4105, 6145}) {
+                SCOPED_TRACE(testing::Message() << form << " " << sections << " " << n);
+                const int order = form == 0 ? 2 : 4;
+                Signal a = RandomSignal(order * sections, 5),
+                       b = RandomSignal((order + 1) * sections, 6);
+                for (double &value : a)
+                    value *= 0.9 / order;
+                for (std::size_t i = 0; i < b.size(); i += static_cast<std::size_t>(order) + 1)
+                    b[i] += 1.5;
+                const Signal x = RandomSignal(n, 7);
+                const auto y = Cascade<DBLArray>(IIR_Filter2, form, a, b)(x);
+                auto stream = Cascade<DBLArray>(IIR_Filter2, form, a, b);
+                Signal inPieces;
+                for (std::size_t from = 0; from < x.size(); from += 40) {
+                    const Signal piece = stream(Slice(x, from, std::min(x.size(), from + 40)));
+                    inPieces.insert(inPieces.end(), piece.begin(), piece.end());
+                }
+                EXPECT_TRUE(SameBits(y, inPieces));
+                EXPECT_LT(MaxError(y, ThroughSections(order, a, b, ToLong(x))), 1e-14);
+            }
 }
 
 // Unused lanes, a NaN and the flush to zero in one lane must not affect other samples.

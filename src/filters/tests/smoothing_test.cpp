@@ -225,8 +225,10 @@ TEST(MedianFilter, EveryWindowHasItsMedian) {
                         SameBits(MedianFilter(x, left, right), MediansByDefinition(x, left, right)))
                         << n << ": " << left << ", " << right;
                 }
-    // Several tiles, and windows too wide for lanes.
+    // Several tiles, of which the last may be short, and windows too wide for lanes.
     for (const auto &[n, left, right] : {std::tuple(70000, 3, 2),
+                                         {4099, 3, 2},
+                                         {6200, 9, 0},
                                          {30000, 20, 20},
                                          {9000, 128, 127},
                                          {3000, 200, 150},

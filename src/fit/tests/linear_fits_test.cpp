@@ -700,8 +700,12 @@ Samples ResidualsOfStackLoss(const double *c) {
     }
     return rest;
 }
-Samples FitStackLoss(qx::FitNorm norm, const Samples &w = {}) {
-    const auto rows = [](const qx::RowBlock &block) { WriteStackLoss(block); };
+Samples FitStackLoss(qx::FitNorm norm, const Samples &w = {}, double unit = 1.0) {
+    const auto rows = [unit](const qx::RowBlock &block) {
+        WriteStackLoss(block);
+        for (int32_t i = 0; i < block.count; ++i)
+            block.column(4)[i] *= unit;
+    };
     const DBLArray weights(w), c({0, 0, 0, 0});
     EXPECT_EQ(qx::SolveRobustly({rows, stackDays, 4, w.empty() ? nullptr : weights.data()}, norm,
                                 {1e-10, 0.0, qx::robustIterations}, c.data()),
@@ -722,6 +726,18 @@ TEST(LinearFits, LeastAbsoluteResidualsOfTheStackLoss) {
     EXPECT_LT(sumAt(found), sumAt(best) * 1.0006);
     for (int j = 0; j < 4; ++j)
         EXPECT_NEAR(found[j], best[j], 0.02 * std::fabs(best[j]));
+}
+
+// The steps end by the change relative to the residuals, so a unit of the data changes nothing.
+TEST(LinearFits, RobustFitsDoNotDependOnTheUnitOfTheData) {
+    for (const qx::FitNorm norm : {qx::leastAbsolute, qx::bisquare}) {
+        const Samples plain = FitStackLoss(norm);
+        for (const double unit : {0x1p-20, 0x1p20}) {
+            const Samples found = FitStackLoss(norm, {}, unit);
+            for (int j = 0; j < 4; ++j)
+                EXPECT_NEAR(found[j] / unit, plain[j], 1e-12 * std::fabs(plain[j])) << norm;
+        }
+    }
 }
 
 double MedianOf(Samples values) {

@@ -35,7 +35,8 @@ struct Outcome {
 };
 
 Outcome RunProbe(const std::string &program, const std::string &arguments = "") {
-    FILE *pipe = Open(Path(QX_PROBE_FOLDER + program) + " " + arguments + " 2>&1");
+    FILE *pipe =
+        Open(std::string(QX_RUNNER) + Path(QX_PROBE_FOLDER + program) + " " + arguments + " 2>&1");
     std::string text;
     std::array<char, 256> buffer;
     while (std::fgets(buffer.data(), buffer.size(), pipe) != nullptr)

@@ -392,6 +392,8 @@ TYPED_TEST(Blas, UpdatesOfRankTwoChangeOneTriangle) {
             for (const int n : {0, 1, 7, 64, 65, 150})
                 for (const int k : {0, 1, 33})
                     for (const double beta : {0.0, 1.0, 0.5}) {
+                        if (n == 150 && (k < 33 || beta != 0.5)) // takes seconds
+                            continue;
                         SCOPED_TRACE((std::string{uplo, trans} + Sizes({n, k})));
                         const bool plain = trans == 'N';
                         const int rows = plain ? n : k, cols = plain ? k : n;

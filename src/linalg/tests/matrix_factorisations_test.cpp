@@ -9,6 +9,8 @@
 
 #include <algorithm>
 #include <limits>
+#include <numeric>
+#include <random>
 #include <stdexcept>
 #include <string>
 #include <tuple>
@@ -602,6 +604,37 @@ TEST(Balancing, ScalesDownToLessThanTwiceTheRow) {
     EXPECT_EQ(MatrixBalance_head(a.handle(), 2, &low, &high, scale.handle()), 0);
     EXPECT_EQ(scale.values(), (std::vector<double>{0.25, 1.0}));
     EXPECT_EQ(a.values(), (std::vector<double>{1.0, 4.0, 2.0, 1.0}));
+}
+
+// Isolated eigenvalues at both ends, found by exchanges that meet the same rows repeatedly.
+TEST(Balancing, UndoesManyExchangesInTheirOrder) {
+    constexpr int n = 9, front = 3, behind = 3;
+    std::vector<int> order(n);
+    std::iota(order.begin(), order.end(), 0);
+    std::mt19937 random(3);
+    for (int round = 0; round < 20; ++round) {
+        std::shuffle(order.begin(), order.end(), random);
+        const std::vector<double> full = RealMatrix(Kind("random"), n, n);
+        std::vector<double> a(n * n, 0.0);
+        for (int i = 0; i < n; ++i)
+            for (int j = 0; j < n; ++j) // triangular in the first columns and the last rows
+                if (i <= j || (j >= front && i < n - behind))
+                    a[order[i] * n + order[j]] = full[i * n + j];
+        const DBL2DArray matrix(n, n, a);
+        const Exact before = Contents(matrix);
+        std::vector<double> unit(n * n, 0.0);
+        for (int i = 0; i < n; ++i)
+            unit[i * n + i] = 1.0;
+        const DBL2DArray right(n, n, unit);
+        DBLArray scale;
+        int32_t low, high;
+        ASSERT_EQ(MatrixBalance_head(matrix.handle(), 1, &low, &high, scale.handle()), 0);
+        EXPECT_EQ(low, front + 1);
+        EXPECT_EQ(high, n - behind);
+        ASSERT_EQ(EigenVBack_head(1, 0, low, high, scale.handle(), right.handle()), 0);
+        const Exact X = Contents(right), balanced = Contents(matrix);
+        EXPECT_EQ((before * X - X * balanced).norm(), 0.0L);
+    }
 }
 
 // Row indices before and after the block, and beyond both ends of the rows.

@@ -113,15 +113,19 @@ TEST(Elementary, HaveTheBitsOfTheScalarFunctions) {
 
 // Each special argument in each place of a group, so that effects on its neighbours are detected.
 TEST(Elementary, HaveTheBitsForSpecialArguments) {
-    const Numbers special = {0.0,     -0.0,    1,        -1,       inf,      -inf,   NAN,
-                             5e-324,  1e-310,  0x1p-27,  0x1p-26,  0x1p26,   0x1p27, 1e22,
-                             1e308,   pi / 4,  pi / 2,   pi,       -pi,      2 * pi, 0x1.921fbp20,
-                             0x1p511, 0x1p512, 0x1p-450, 0x1p-900, 2.2e-308, 3,      0x1p-1022};
+    const Numbers special = {0.0,      -0.0,    1,        -1,       inf,      -inf,   NAN,
+                             5e-324,   1e-310,  0x1p-27,  0x1p-26,  0x1p26,   0x1p27, 1e22,
+                             1e308,    pi / 4,  pi / 2,   pi,       -pi,      2 * pi, 0x1.921fbp20,
+                             0x1p511,  0x1p512, 0x1p-450, 0x1p-900, 2.2e-308, 3,      0x1p-1022,
+                             0x1.8p511};
     for (const double first : special)
         for (const double second : special)
             for (std::size_t n = 1; n <= 9; ++n) {
                 Numbers x(n, 0.75), y(n, 0.5);
                 x[n - 1] = first;
+                y[n - 1] = second;
+                Compare(x, y); // both in one lane
+                y[n - 1] = 0.5;
                 y[n / 2] = second;
                 Compare(x, y);
                 std::vector<double> inPlace = x;

@@ -35,11 +35,13 @@ public:
     const PeakDRequest *operator->() const { return request_; }
     const Spoiled<DBL1D> &data() const { return data_; }
 
-    Outcome take(const PeakList &found) {
+    // `block` has the samples that were scanned; a resize may move it.
+    template <class Block>
+    Outcome take(const PeakList &found, const Block &block) {
         for (InOut<DBL1D> *array : {&locations_, &amplitudes_, &derivatives_})
             if (const Outcome bad = array->resize(found.size()))
                 return bad;
-        found.copyTo(locations_.data(), amplitudes_.data(), derivatives_.data());
+        found.copyTo(block.data(), locations_.data(), amplitudes_.data(), derivatives_.data());
         request_->count = found.size();
         return 0;
     }
@@ -125,17 +127,16 @@ public:
         std::memcpy(copy_.data(), samples.data(), static_cast<std::size_t>(size_) * sizeof(DBL));
         return 0;
     }
-    // The block of `array` stays in place while the step runs.
     void showOf(const Spoiled<DBL1D> &array) {
-        shown_ = array.data();
+        shown_ = &array;
         size_ = array.size();
     }
-    DBL *data() const { return shown_ != nullptr ? shown_ : copy_.data(); }
+    DBL *data() const { return shown_ != nullptr ? shown_->data() : copy_.data(); }
     int32_t size() const { return size_; }
 
 private:
     Scratch<ElementType::DBL> copy_;
-    DBL *shown_ = nullptr;
+    const Spoiled<DBL1D> *shown_ = nullptr;
     int32_t size_ = 0;
 };
 
@@ -168,7 +169,7 @@ Outcome Peaks(DBL1D source, InOutRequest request, InOutStream stream, int32_t mo
     PeakList found = ListFor(block, *state);
     if (const ErrorCode bad = PeakDetectStep(block, state, &found))
         return bad;
-    if (const Outcome bad = request.take(found))
+    if (const Outcome bad = request.take(found, scanned))
         return bad.code();
     return isLast ? stream.release() : Outcome(0);
 }

@@ -223,6 +223,91 @@ TEST(PeakD, FindsThePeaksOfTheDefinition) {
         }
 }
 
+// The rule of narrow windows for one window after the other, whose numbers have the same bits.
+Peaks OneByOne(const Samples &x, int32_t w, double threshold, int32_t polarity) {
+    DBL fitMatrix[12];
+    EXPECT_EQ(qx::BuildFitMatrix(w, fitMatrix), 0);
+    const double sign = polarity == 1 ? 1 : -1, centre = (w - 1) * 0.5;
+    struct Vertex {
+        double c2, t, y;
+    };
+    const auto vertex = [&](std::size_t i) {
+        const qx::Parabola p = qx::FitWindow(fitMatrix, w, x.data() + i);
+        const double t = -p.c1 / (2 * p.c2);
+        return Vertex{p.c2, t, (t * p.c2 + p.c1) * t + p.c0};
+    };
+    Peaks found;
+    for (std::size_t i = 0; i + static_cast<std::size_t>(w) <= x.size(); ++i) {
+        Vertex v = vertex(i);
+        std::size_t at = i;
+        if (!(sign * v.c2 > 0) || std::fabs(2 * v.c2) < 1e-10)
+            continue;
+        if (i > 0 && v.t < -0.5) {
+            const Vertex former = vertex(i - 1);
+            if (former.c2 == 0)
+                continue;
+            if (std::fabs(v.t) > std::fabs(former.t)) {
+                v = former;
+                --at;
+            }
+        }
+        if (!(sign * v.c2 > 0) || std::fabs(v.t) > 0.5 * centre + 0x1.4p-49 ||
+            !(sign * v.y < sign * threshold))
+            continue;
+        const Peak peak = {static_cast<double>(at) + centre + v.t, v.y, 2 * v.c2};
+        if (!found.empty() && std::fabs(found.back().location - peak.location) < 1) {
+            if (!(sign * peak.amplitude < sign * found.back().amplitude))
+                continue;
+            found.pop_back();
+        }
+        found.push_back(peak);
+    }
+    return found;
+}
+
+// Narrow windows are scanned in groups of 512, and many samples are only compared. What this leaves
+// in doubt: equal and nearly equal neighbours, tiny steps, thresholds near the samples, values that
+// are not finite.
+TEST(PeakD, GroupsOfWindowsGiveThePeaksOfSingleWindows) {
+    typedef double (*Kind)(Noise &, double);
+    const Kind kinds[] = {
+        [](Noise &, double v) { return v; },
+        [](Noise &, double v) { return std::round(4 * v) * 0.005; },
+        [](Noise &, double v) { return std::round(v); },
+        [](Noise &noise, double v) {
+            return (3 + std::round(2 * v)) * (1 + 0x1p-52 * static_cast<double>(noise.bits() % 5));
+        },
+        [](Noise &, double v) { return 1000 + 1e-10 * std::round(3 * v); },
+        [](Noise &, double v) { return 2e-10 * v; },
+        [](Noise &, double v) { return 1e307 * v; },
+        [](Noise &noise, double v) {
+            const uint64_t which = noise.bits() % 400;
+            return which == 0 ? nan : which == 1 ? inf : which == 2 ? -inf : v;
+        },
+        [](Noise &noise, double v) { return noise.bits() % 300 == 0 ? 1e14 * v : v; },
+    };
+    int seed = 0;
+    std::size_t found = 0;
+    for (const Kind &kind : kinds)
+        for (const int32_t n : {66, 67, 69, 70, 71, 133, 134, 578, 580, 581, 582, 583, 646, 3000})
+            for (const int32_t width : {3, 4})
+                for (const double threshold : {-inf, -0.5, 0.0049, 1.0})
+                    for (const int32_t polarity : {0, 1}) {
+                        SCOPED_TRACE(testing::Message()
+                                     << (&kind - kinds) << ' ' << n << ' ' << width << ' '
+                                     << threshold << ' ' << polarity);
+                        Noise noise(static_cast<uint64_t>(++seed));
+                        Samples x(static_cast<std::size_t>(n));
+                        for (double &value : x)
+                            value = kind(noise, noise.symmetric());
+                        const double limit = polarity == 0 ? threshold : -threshold;
+                        const Peaks peaks = PeaksOf(x, width, limit, polarity);
+                        ASSERT_EQ(peaks, OneByOne(x, width, limit, polarity));
+                        found += peaks.size();
+                    }
+    EXPECT_GT(found, 100000U);
+}
+
 TEST(PeakD, FindsThePeaksOfKnownWaveforms) {
     // The fit of a parabola is exact for any width.
     for (const int32_t width : {3, 4, 5, 8, 21}) {

@@ -390,6 +390,12 @@ TEST(PolyRootsNtBst, BairstowImprovesPairs) {
         1, 1, -2, {-0.5, -std::sqrt(0.75)}, {-0.5, std::sqrt(0.75)}, {2, -3}, {2, 3}, {7, 8}};
     for (int i = 0; i < 8; ++i)
         EXPECT_LT(std::abs(roots[i] - expected[i]), 1e-13) << i;
+
+    // With a loose tolerance the iteration ends by both changes, of which the sum's is below the
+    // tolerance two steps before the product's.
+    const Complexes loose = Polish(coefficients, {}, {{2, 3.24}, {2, -3.24}}, 50, 0.01);
+    ASSERT_EQ(loose.size(), 2U);
+    EXPECT_LT(std::abs(loose[1] - Complex(2, 3)), 1e-4);
 }
 
 TEST(PolyRootsNtBst, GuessesMayStayAsTheyAre) {

@@ -264,6 +264,40 @@ TEST(Waves, ChirpSweepsFromFirstToLastFrequency) {
     }
 }
 
+// The samples of vectors, of what they leave, and of blocks of a chirp have the bits of single ones.
+TEST(Waves, VectorsGiveTheSamplesOfSingleNumbers) {
+    const double duty = 30;
+    for (const double f : {0.0, 0.004, 0.01, -0.01, 1.0 / 64, 0.3, -7.7})
+        for (const double start : {0.0, 123.4, -200.0, 4e6})
+            for (const int32_t n : {1, 2, 3, 7, 8, 9, 15, 17, 1000, 1003}) {
+                SCOPED_TRACE(testing::Message() << f << ' ' << start << ' ' << n);
+                DBLArray square, triangle, sawtooth;
+                double phases[3] = {start, start, start};
+                ASSERT_EQ(Call(SquareWaveCIN, square, n, f, phases[0], &duty), 0);
+                ASSERT_EQ(Call(TriangleWaveCIN, triangle, n, f, phases[1]), 0);
+                ASSERT_EQ(Call(SawtoothWaveCIN, sawtooth, n, f, phases[2]), 0);
+                for (int32_t i = 0; i < n; ++i) {
+                    const double rest = std::fmod(i * 360.0 * f + start, 360.0);
+                    const double p = rest < 0 ? rest + 360 : rest;
+                    ASSERT_EQ(square[i], p < 3.6 * duty ? amp : -amp) << i;
+                    const double q = p / 180;
+                    ASSERT_EQ(triangle[i], amp * 2 * (q < 0.5 ? q : q < 1.5 ? 1 - q : q - 2)) << i;
+                    const double s = p * 0.005555555555555556;
+                    ASSERT_EQ(sawtooth[i], (p < 180 ? s : s - 2) * amp) << i;
+                }
+            }
+    const double f1 = 0.01, f2 = 0.2;
+    for (const int32_t n : {1, 7, 9, 1023, 1024, 1025, 1033, 2048, 5000}) {
+        DBLArray x;
+        ErrorCode err = 1;
+        ChirpCIN(x.handle(), &n, &amp, &f1, &f2, &err);
+        EXPECT_EQ(err, 0);
+        const double pi = std::numbers::pi, step = (f2 - f1) * pi / n;
+        for (int32_t i = 0; i < n; ++i)
+            ASSERT_EQ(x[i], amp * std::sin(i * (step * i + 2 * pi * f1))) << n << ' ' << i;
+    }
+}
+
 TEST(Waves, FailuresLeaveThePhase) {
     for (const Wave &wave : Waves())
         for (const int32_t n : {0, -1}) {
@@ -359,6 +393,8 @@ TEST(Ramps, IncludeOrExcludeTheEnd) {
                            {1, 1, 2, 0, 2, ErrFewerThanTwo},
                            {3, 1, 2, 0, 2, ErrInvalidSelector},
                            {3, 0, 2, 0, 1, ErrNotStrictlyPositive},
+                           {3, nan, 2, 0, 1, ErrNotStrictlyPositive},
+                           {3, 1, nan, 0, 1, ErrNotStrictlyPositive},
                            {3, 1, -2, 1, 1, ErrNotStrictlyPositive}}) {
         EXPECT_EQ(RampPtrn85(x.handle(), bad.n, bad.start, bad.end, bad.excludeEnd, bad.scale),
                   bad.code);

@@ -102,9 +102,17 @@ TEST(SpecialIntegrals, KeepsTheRulesOfDomainsAndLimits) {
         {"Dawson", {kNaN, 0}, kNaN},
         {"Dawson", {-1e10, 0}, -0.5e-10},
         {"FresnelIntegrals", {-kInfinity, 0}, -0.5},
+        {"FresnelIntegrals", {0x1p53}, 0.5},
     };
     for (const auto &rule : rules)
         qx::test::ExpectRule(Exports(), rule);
+    // From 2^53 on, x^2 / 4 is whole, so S is 1/2 - 1 / (pi x): at 2^53 the next number below 1/2.
+    const auto sine = [](double x) {
+        return qx::test::Value(Exports(), "FresnelIntegrals", {x}, 1);
+    };
+    EXPECT_EQ(sine(0x1p53), 0.5 - 0x1p-54);
+    EXPECT_EQ(sine(-0x1p53), -0.5 + 0x1p-54);
+    EXPECT_EQ(sine(0x1p60), 0.5);
 }
 
 TEST(SpecialIntegrals, RecurrencesAndReflectionsHold) {

@@ -90,13 +90,15 @@ TEST(Convolution, DirectSumsKeepTheirOrderToTheBit) {
 
 TEST(Convolution, InfinitiesAffectOnlyTheirOutputs) {
     for (const auto &[nx, ny] : {Lengths{300, 40}, Lengths{40, 300}, Lengths{50, 50}})
-        for (const double broken : {inf, -inf, nan}) {
-            Signal x = RandomSignal(nx, 1), y = RandomSignal(ny, 2);
-            y[static_cast<std::size_t>(ny) / 3] = broken;
-            EXPECT_TRUE(SameValues(Directly(x, y), InOrder(x, y)));
-            x[static_cast<std::size_t>(nx) - 2] = inf;
-            EXPECT_TRUE(SameValues(Directly(x, y), InOrder(x, y)));
-        }
+        for (const double broken : {inf, -inf, nan})
+            for (const int32_t at : {ny / 3, 0, ny - 1}) { // the outer taps pass the ends last
+                Signal x = RandomSignal(nx, 1), y = RandomSignal(ny, 2);
+                y[static_cast<std::size_t>(at)] = broken;
+                EXPECT_TRUE(SameValues(Directly(x, y), InOrder(x, y))) << at;
+                EXPECT_TRUE(SameValues(Directly(y, x), InOrder(y, x))) << at;
+                x[static_cast<std::size_t>(nx) - 2] = inf;
+                EXPECT_TRUE(SameValues(Directly(x, y), InOrder(x, y))) << at;
+            }
 }
 
 // The window of the longer sequence is traversed in ascending order; x counts as the shorter one if
@@ -324,6 +326,10 @@ TEST(Deconvolution, DividesTheSeriesWhereTheSpectrumIsSingular) {
     }
     const Division decaying = Divided({1e-300, 0, 0, 0, 0, 0, 0, 0}, {1e5, 1e5});
     EXPECT_EQ(decaying.quotient[1], -1e-305);
+    // A sum over the taps times an impulse: the infinite one gives its own value only where the
+    // impulse meets it, and NaN elsewhere.
+    const Division infinite = Divided({inf, 1, 2, 3}, {1, 1});
+    EXPECT_TRUE(SameValues(infinite.quotient, {inf, nan, nan}));
     const Division flushed = Divided({1e-300, 0, 0, 0, 0, 0, 0, 0}, {1e10, 1e10});
     EXPECT_EQ(flushed.quotient, Signal(7, 0.0)) << "no denormals";
 }

@@ -81,6 +81,14 @@ def points():
             x = random.choice([-6, -1.5, 0.1, 2, 7])
             yield "f", f, [float(exp(x * min(4, sqrt(2 / mpf(dof) + 2 / mpf(d))))), dof, d]
 
+    # Degrees of the direct evaluation and on both sides of its ends, at points in both tails.
+    for dof in (1.0, 1.05, 1.9, 2.0, 2.5, 5.0, 17.3, 50.0, 99.0, 390.5, 410.5):
+        for spread in (-5, -1.2, -0.1, 0.2, 1.7, 5):
+            yield "chi2", chi2, [dof * float(exp(spread * min(1, sqrt(2 / mpf(dof))))), dof]
+        for d in (1.0, 1.7, 2.0, 9.0, 48.6, 97.3, 101.0):
+            for spread in (-4, -0.3, 0.4, 5):
+                yield "f", f, [float(exp(spread * min(3, sqrt(2 / mpf(dof) + 2 / mpf(d))))), dof, d]
+
 
 if __name__ == "__main__":
     data = Path(__file__).parent / "data"

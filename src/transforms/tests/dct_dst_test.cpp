@@ -1,4 +1,5 @@
 #include "fft/plan_slot.h"
+#include "fft/quarter_wave.h"
 #include "qx/dct_dst.h"
 #include "qx/errors.h"
 #include "tests/support/heap_probe.h"
@@ -314,6 +315,22 @@ TEST(DCTDST, ThePlanComesBeforeTheWorkOfTheCosineTransformOnly) {
     }
 }
 
+// The work memory serves rows and columns, of which either may need more.
+TEST(DCTDST, LongRowsAndLongColumnsHaveEnoughWork) {
+    for (const Family &family : Families)
+        for (const Shape size : {Shape{2, 50001}, {50001, 2}, {1, 20001}, {20001, 1}}) {
+            SCOPED_TRACE(testing::Message() << family.name << " " << size.rows << "x" << size.cols);
+            const DBLMatrix in(size.rows, size.cols);
+            Fill(in, RandomSignal(in.size()));
+            DBLMatrix out, back;
+            Node node;
+            ASSERT_EQ(family.forward2D(in.handle(), out.handle(), 0, 0, &node.slot, &node.second),
+                      0);
+            ASSERT_EQ(family.inverse2D(out.handle(), back.handle(), &node.slot, &node.second), 0);
+            EXPECT_LT(MaxError(back.values(), ToLong(in.values())), 2 * Rounding);
+        }
+}
+
 // Rows and columns commute up to rounding; the bits show which came first.
 TEST(DCTDST, InverseRunsColumnsFirstForTheCosineAndRowsFirstForTheSine) {
     constexpr int32_t rows = 7, cols = 10;
@@ -366,6 +383,49 @@ TEST(DCTDST, TransformsAShortInputInPlace) {
     EXPECT_LT(MaxError(Signal(values.begin(), values.begin() + 4), expected), Rounding);
     EXPECT_EQ(values[4], x[4]);
     qx::destroy_oxfft_table(plan);
+}
+
+// Eight values have code of their own, with the bits of the steps that other even lengths take.
+TEST(DCTDST, EightValuesHaveTheBitsOfTheGeneralSteps) {
+    constexpr int32_t n = 8;
+    const qx::PlanReference reference(n);
+    const FFTPlan *const plan = reference.get();
+    const DBL *const wave = qx::QuarterWave(plan);
+    for (uint64_t seed = 1; seed <= 200; ++seed) {
+        const Signal x = RandomSignal(n, seed);
+        Signal out(x), wanted(n), reordered(n), h(n), work(4 * n), z(2 * n), u(2 * n);
+        ASSERT_EQ(qx::DCTForward(plan, {out.data(), n}, {out.data(), n}, work.data()), 0);
+        for (int32_t j = 0; j < n / 2; ++j) {
+            reordered[j] = x[2 * j];
+            reordered[n - 1 - j] = x[2 * j + 1];
+        }
+        qx::FFTRealForward(plan, reordered.data(), h.data(), 1, 1, n);
+        wanted[0] = h[0] / std::sqrt(8.0);
+        for (int32_t k = 1; k < n / 2; ++k) {
+            const double c = wave[2 * k], s = wave[2 * k + 1];
+            wanted[k] = (h[k] * c + h[n - k] * s) * 0.5;
+            wanted[n - k] = (h[k] * s - h[n - k] * c) * 0.5;
+        }
+        wanted[n / 2] = h[n / 2] * wave[n] * 0.5;
+        EXPECT_TRUE(SameBits(out, wanted)) << seed;
+
+        out = x;
+        ASSERT_EQ(qx::DCTInverse(plan, {out.data(), n}, {out.data(), n}, work.data()), 0);
+        z[0] = x[0] * std::sqrt(8.0);
+        for (int32_t k = 1; k <= n / 2; ++k) {
+            const double c = wave[2 * k] * 4, s = wave[2 * k + 1] * 4;
+            z[2 * k] = x[k] * c;
+            z[2 * k + 1] = x[k] * s;
+            z[2 * (n - k)] = x[n - k] * s;
+            z[2 * (n - k) + 1] = x[n - k] * c;
+        }
+        qx::FFTComplexInverse(plan, &z[0], &z[1], &u[0], &u[1], 2, 2, n);
+        for (int32_t j = 0; j < n / 2; ++j) {
+            wanted[2 * j] = u[2 * j];
+            wanted[2 * j + 1] = u[2 * (n - 1 - j)];
+        }
+        EXPECT_TRUE(SameBits(out, wanted)) << seed;
+    }
 }
 
 TEST(DCTDST, RequestsBeyondMemoryEndInACode) {

@@ -186,6 +186,9 @@ TEST(CounterShuffles, MoveElementsWithTheirNumbers) {
     }
     I32Array indices;
     EXPECT_EQ(RiffleIntNum2026_head(indices.handle(), 3, 1, 1, -1.0), ErrIndexOutOfRange);
+    // The last element's number is below 2^53.
+    EXPECT_EQ(RiffleIntNum2026_head(indices.handle(), 3, 1, 1, 0x1p53 - 3), 0);
+    EXPECT_EQ(RiffleIntNum2026_head(indices.handle(), 3, 1, 1, 0x1p53 - 2), ErrIndexOutOfRange);
 }
 
 } // namespace
