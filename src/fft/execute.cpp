@@ -1,7 +1,6 @@
 #include "fft/execute.h"
 
 #include "fft/kernels/kernels.h"
-#include "fft/panels.h"
 #include "fft/passes.h"
 #include "fft/prime_stages.h"
 
@@ -117,10 +116,6 @@ struct ComplexLanesPath {
     static constexpr ptrdiff_t width = 2; // DBL units of one value
     static constexpr ptrdiff_t bundle = complexBundle;
     static bool gainsByBuffer(int32_t, int32_t) { return true; }
-    static constexpr bool buffersRows = true; // in the first sweep of panels
-    static void panels(const FFTPlan &plan, DBL *out, DBL *panel) {
-        ComplexPanels(plan, out, panel);
-    }
     static void leaf(const FFTPlan &plan, const DBL *in, DBL *out, const LeafColumns &columns) {
         plan.stages[plan.factorCount - 1]->passes.complexLeaf(in, out, columns);
     }
@@ -138,8 +133,6 @@ struct RealLanesPath {
     // Only if the columns are copied in any case. Separate input and output double the addresses of a
     // stage, which reads from both ends of each block: 10^3 to 10^5 took 1.15 to 1.3 times as long.
     static bool gainsByBuffer(int32_t p, int32_t m) { return p > 4 && m % 256 == 0; }
-    static constexpr bool buffersRows = false;
-    static void panels(const FFTPlan &plan, DBL *out, DBL *panel) { RealPanels(plan, out, panel); }
     static void leaf(const FFTPlan &plan, const DBL *in, DBL *out, const LeafColumns &columns) {
         const int32_t radix = plan.factors[plan.factorCount - 1];
         if (columns.count[0] * columns.count[1] <= 2 && gainsByFrequencies(radix))
@@ -192,7 +185,7 @@ void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, 
     if (level == plan.factorCount - 2) {
         if (bundle.count == 1)
             Path::leaf(plan, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
-        else if (buffered || bundle.fold == PTRDIFF_MAX)
+        else if (bundle.fold == PTRDIFF_MAX)
             Path::leaf(plan, in, blocks,
                        {{bundle.count, p},
                         {bundle.inStride, inStride},
@@ -217,8 +210,8 @@ void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, 
                 plan, level + 1, m, in + j * inStride, blocks + j * block, p * inStride,
                 follow
                     ? Bundle{more * bundle.count, bundle.inStride, nextBlocks, bundle.count, block}
-                    : Bundle{bundle.count, bundle.inStride, nextBlocks,
-                             buffered ? PTRDIFF_MAX : bundle.fold, bundle.foldStride},
+                    : Bundle{bundle.count, bundle.inStride, nextBlocks, bundle.fold,
+                             bundle.foldStride},
                 memory);
     } else {
         const ptrdiff_t together = p % Path::bundle == 0 ? Path::bundle : 8;
@@ -248,7 +241,11 @@ public:
     BufferLoan(const BufferLoan &) = delete;
     BufferLoan &operator=(const BufferLoan &) = delete;
 
-    DBL *data() const { return FirstLine(memory_); }
+    // The first cache line of the buffer, or null.
+    DBL *data() const {
+        const auto address = reinterpret_cast<std::uintptr_t>(memory_);
+        return reinterpret_cast<DBL *>((address + 63) / 64 * 64);
+    }
 
 private:
     const FFTPlan &plan_;
@@ -262,43 +259,8 @@ __attribute__((noinline)) void RunOnStack(const FFTPlan &plan, const DBL *in, DB
     RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0}, {work, buffer});
 }
 
-// In the two sweeps of panels.h.
-template <class Path>
-void RunPanels(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
-               const LanesMemory &memory) {
-    const ptrdiff_t outer = plan.factors[0];
-    const ptrdiff_t inner = plan.factors[1];
-    const ptrdiff_t rows = outer * inner;
-    const ptrdiff_t row = plan.length / rows * Path::width;
-    if (plan.factorCount == 3) {
-        Path::leaf(plan, in, out,
-                   {{outer, inner},
-                    {inStride, outer * inStride},
-                    {inner * row, row},
-                    rows * inStride});
-        return Path::panels(plan, out, memory.buffer);
-    }
-    Bundle bundle{Path::bundle, inStride, inner * row};
-    if (outer < Path::bundle) {
-        bundle.fold = outer;
-        bundle.foldStride = row;
-    }
-    for (ptrdiff_t j = 0; j < rows; j += Path::bundle)
-        RecurseLanes<Path>(plan, 2, static_cast<int32_t>(plan.length / rows), in + j * inStride,
-                           out + (j % outer * inner + j / outer) * row, rows * inStride, bundle,
-                           {memory.work, Path::buffersRows ? memory.buffer : nullptr});
-    Path::panels(plan, out, memory.buffer);
-}
-
 template <class Path>
 void RunLanes(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride, DBL *work) {
-    if (plan.panelBlock != 0) {
-        const BufferLoan loan(plan);
-        const LanesMemory memory{work, loan.data()};
-        if (memory.buffer != nullptr)
-            return RunPanels<Path>(plan, in, out, inStride, memory);
-        return RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0}, memory);
-    }
     const int32_t level = plan.bufferLevel;
     if (level < 0 || !Path::gainsByBuffer(plan.factors[level], plan.length / plan.bufferBlocks))
         return RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0},

@@ -3,7 +3,6 @@
 #include "fft/execute.h"
 #include "fft/factorise.h"
 #include "fft/kernels/kernels.h"
-#include "fft/panels.h"
 #include "fft/prime_stages.h"
 #include "frame/constants.h"
 #include "frame/elements.h"
@@ -118,15 +117,9 @@ bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
 }
 
 bool BuildLanes(FFTStage *stage, int32_t p, int32_t m) {
-    const int64_t complexSize = ComplexLanesSize(stage->passes, p, m);
-    const int64_t realSize = RealLanesSize(stage->passes, p, m);
-    const int64_t realStart = (complexSize + lineValues - 1) / lineValues * lineValues;
-    DBL *memory = nullptr;
-    if (!Allocate(memory, realStart + realSize + lineValues))
+    if (!Allocate(stage->complexLanes, ComplexLanesSize(stage->passes, p, m)) ||
+        !Allocate(stage->realLanes, RealLanesSize(stage->passes, p, m)))
         return false;
-    stage->lanesMemory = memory;
-    stage->complexLanes = FirstLine(memory);
-    stage->realLanes = stage->complexLanes + realStart;
     FillComplexLanes(*stage, p, m, stage->complexLanes);
     FillRealLanes(*stage, p, m, stage->realLanes);
     return true;
@@ -270,21 +263,6 @@ void MeasureWork(FFTPlan *plan) {
     }
 }
 
-bool HasPanels(const FFTPlan &plan) {
-    constexpr int32_t shortest = 1 << 11;
-    return plan.length >= shortest && (plan.length & (plan.length - 1)) == 0;
-}
-
-int64_t PanelValues(const FFTPlan &plan) { return plan.factors[0] * int64_t{plan.panelBlock}; }
-
-int64_t PanelLeafValues(const FFTPlan &plan) {
-    if (plan.factorCount == 3)
-        return 0;
-    const int32_t rows = plan.factors[0] * plan.factors[1];
-    const int32_t leaf = plan.length / rows / plan.factors[2];
-    return complexBundle * plan.factors[2] * BlockPitch(2 * leaf);
-}
-
 // The buffer serves the first level, or the second if the first factor is so small that the blocks of the
 // second would otherwise share cache sets.
 bool BuildBuffer(FFTPlan *plan) {
@@ -292,14 +270,6 @@ bool BuildBuffer(FFTPlan *plan) {
                                         << 17; // beyond, the extra memory costs as much as it gains
     const int32_t level = plan->factorCount > 3 && plan->factors[0] <= 4 ? 1 : 0;
     plan->bufferLevel = -1;
-    if (HasPanels(*plan)) {
-        plan->panelBlock = plan->factors[1] * panelRow + lineValues;
-        plan->bufferLevel = 2;
-        DBL *memory = nullptr;
-        const bool built = Allocate(memory, std::max(PanelValues(*plan), PanelLeafValues(*plan)) + lineValues);
-        plan->buffer.store(memory, std::memory_order_relaxed);
-        return built;
-    }
     if (plan->factorCount < 2 || plan->length > longestBuffered ||
         plan->kinds[level] != KernelFactor || plan->kinds[plan->factorCount - 1] != KernelFactor)
         return true;
@@ -333,9 +303,8 @@ void Dismantle(FFTPlan *plan) {
         if (stage == nullptr)
             continue;
         for (DBL *table : {stage->rootCos, stage->rootSin, stage->twiddleCos, stage->twiddleSin,
-                           stage->raderCos, stage->raderSin})
+                           stage->raderCos, stage->raderSin, stage->complexLanes, stage->realLanes})
             std::free(table);
-        std::free(stage->lanesMemory);
         std::free(stage->raderGather);
         std::free(stage->raderScatter);
         qx::destroy_oxfft_table(stage->raderPlan);

@@ -69,15 +69,6 @@ struct LanesPasses {
                         std::ptrdiff_t m);
     // The part of realTwiddle for column 0 and, for even m, column m / 2.
     void (*realEdges)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, std::ptrdiff_t m);
-    // Parts of the twiddle loops, for panels: `count` neighbouring columns, or pairs of columns in place
-    // (`down` is one past the highest of the mirrored ones), with the block of the lane table in which
-    // they begin. The first pair of realPairsBefore is the last of the block before.
-    void (*complexColumns)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, std::ptrdiff_t outLeg,
-                           std::ptrdiff_t count, const DBL *lanes);
-    void (*realPairs)(DBL *up, DBL *down, std::ptrdiff_t leg, std::ptrdiff_t count,
-                      const DBL *lanes);
-    void (*realPairsBefore)(DBL *up, DBL *down, std::ptrdiff_t leg, std::ptrdiff_t count,
-                            const DBL *lanes);
     int32_t complexLanes, realLanes;
     // Columns of a matrix.
     AbreastLeaf abreastLeaf;
@@ -117,7 +108,6 @@ struct FFTStage {
     // twiddles in the order in which these loops read them.
     qx::LanesPasses passes;
     DBL *complexLanes, *realLanes;
-    void *lanesMemory; // of both, each of which begins on a cache line
 };
 
 // Everything that a transform of one length needs. A plan is read-only from its creation to its
@@ -151,9 +141,6 @@ struct FFTPlan {
     // do not, and the pitch keeps the values of a column from mapping to one set of the cache. The
     // level, -1 for none, and the number of blocks.
     int32_t bufferLevel, bufferBlocks;
-    // Of a plan with panels (panels.h): how far the blocks of the first level are apart in the buffer; 0
-    // for other plans. A spare line keeps their rows from mapping to the same sets.
-    int32_t panelBlock;
     // The buffer, if it does not fit on the stack, for one transform at a time; null while a transform
     // uses it. Other transforms meanwhile run without a buffer, with the same results.
     mutable std::atomic<void *> buffer;
@@ -163,12 +150,6 @@ struct FFTPlan {
 };
 
 namespace qx {
-
-// The first cache line of a table or a buffer, or null. A line more than what it holds is allocated.
-inline DBL *FirstLine(void *memory) {
-    const auto address = reinterpret_cast<std::uintptr_t>(memory);
-    return reinterpret_cast<DBL *>((address + 63) / 64 * 64);
-}
 
 // In a buffer each block begins on a cache line and is followed by a spare line.
 constexpr int32_t lineValues = 64 / sizeof(DBL);

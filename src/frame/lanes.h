@@ -377,17 +377,6 @@ QX_INLINE void StorePairs(Lanes<8> pairs, DBL *const *to, std::ptrdiff_t at) {
 
 // ---- Other lanes ----
 
-// The last lane of `before`, then those of x but the last.
-template <int N>
-QX_INLINE Lanes<N> LastBefore(Lanes<N> before, Lanes<N> x) {
-    if constexpr (N == 2)
-        return Lanes<N>(__builtin_shufflevector(before.v, x.v, 1, 2));
-    else if constexpr (N == 4)
-        return Lanes<N>(__builtin_shufflevector(before.v, x.v, 3, 4, 5, 6));
-    else
-        return Lanes<N>(__builtin_shufflevector(before.v, x.v, 7, 8, 9, 10, 11, 12, 13, 14));
-}
-
 // Transposes a square block of N vectors: lane j of vector i and lane i of vector j exchange
 // places. Interleaves the two halves of the vectors log2(N) times.
 template <int N>

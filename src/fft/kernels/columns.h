@@ -221,27 +221,6 @@ struct PairLanesIn {
     }
 };
 
-// The same for columns that begin one before a block of the lane table, which are the last lane of the
-// block before and the first ones of this.
-template <int P>
-struct PairLanesBeforeIn {
-    const DBL *up, *down;
-    ptrdiff_t leg;
-    const DBL *lanes;
-    QX_INLINE Complex<Wide> at(int j) const {
-        const Wide re = Wide::load(up + j * leg);
-        const Wide im = Wide::load(down + j * leg).reversed();
-        if (j == 0)
-            return {re, im};
-        constexpr ptrdiff_t block = (P - 1) * 2 * nativeLanes;
-        const DBL *const twiddle = lanes + (j - 1) * 2 * nativeLanes;
-        const Wide c = LastBefore(Wide::load(twiddle - block), Wide::load(twiddle));
-        const Wide s = LastBefore(Wide::load(twiddle - block + nativeLanes),
-                                  Wide::load(twiddle + nativeLanes));
-        return {re * c - im * s, im * c + re * s};
-    }
-};
-
 template <int P, class Leg = ptrdiff_t>
 struct PairLanesOut {
     DBL *up, *down;

@@ -486,14 +486,11 @@ def passes_file_of(p):
         texts.append(f"template <>\nvoid TakeWideComplex<{p}>(LanesPasses &passes) {{\n"
                      f"    passes.complexLeaf = ComplexLanesLeaf<{p}>;\n"
                      f"    passes.complexTwiddle = ComplexLanesTwiddle<{p}>;\n"
-                     f"    passes.complexColumns = ComplexTwiddleColumns<{p}>;\n"
                      "    passes.complexLanes = nativeLanes;\n}\n")
     if p in WIDE_REAL:
         texts += [split_text(p),
                   f"template <>\nvoid TakeWideReal<{p}>(LanesPasses &passes) {{\n"
                   f"    passes.realTwiddle = RealWideTwiddle<{p}>;\n"
-                  f"    passes.realPairs = RealPairLanes<{p}>;\n"
-                  f"    passes.realPairsBefore = RealPairLanes<{p}, PairLanesBeforeIn<{p}>>;\n"
                   "    passes.realLanes = nativeLanes;\n}\n"]
     return enclosed(f"The loops of {p} in eight lanes", texts, "kernel_set")
 

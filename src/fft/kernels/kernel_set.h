@@ -438,13 +438,13 @@ void RealTwiddleKernel(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, 
 }
 
 // `count` neighbouring pairs of columns, a multiple of the lanes, in place; `down` is one past the
-// highest of the mirrored columns. `In` reads them with their twiddles.
-template <int P, class In = PairLanesIn>
+// highest of the mirrored columns.
+template <int P>
 __attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, ptrdiff_t count,
                                              const DBL *lanes) {
     for (ptrdiff_t k = 0; k < count; k += nativeLanes) {
         down -= nativeLanes;
-        SplitTransform<P>::template run<Wide>(In{up, down, leg, lanes},
+        SplitTransform<P>::template run<Wide>(PairLanesIn{up, down, leg, lanes},
                                               PairLanesOut<P>{up, down, leg});
         up += nativeLanes;
         lanes += 2 * nativeLanes * (P - 1);
@@ -542,15 +542,6 @@ constexpr bool fillsWideRealLanes(ptrdiff_t m) { return m % 16 == 0; }
 template <int P>
 void RealLanesEdges(const DBL *in, ptrdiff_t inLeg, DBL *out, ptrdiff_t m) {
     RealEdgeColumns<P>({in, inLeg, out, m}, 1, m);
-}
-
-// Stages of the larger primes have no loops over pairs, and no panels.
-template <int P, class In = PairLanesIn>
-constexpr auto PairsInPanels() -> decltype(LanesPasses::realPairs) {
-    if constexpr (P % 2 == 0)
-        return RealPairLanes<P, In>;
-    else
-        return nullptr;
 }
 
 // ---- Columns of a matrix abreast ----
@@ -683,9 +674,8 @@ constexpr KernelSet MakeKernels() {
             ComplexLeafKernel<P>,
             ComplexTwiddleKernel<P>,
             {ComplexLanesLeaf<P>, RealLanesLeaf<P>, ComplexLanesTwiddle<P>, RealLanesTwiddle<P>,
-             RealLanesEdges<P>, ComplexTwiddleColumns<P>, PairsInPanels<P>(),
-             PairsInPanels<P, PairLanesBeforeIn<P>>(), nativeLanes, nativeLanes,
-             ComplexAbreastLeaf<P>, ComplexAbreastTwiddle<P>}};
+             RealLanesEdges<P>, nativeLanes, nativeLanes, ComplexAbreastLeaf<P>,
+             ComplexAbreastTwiddle<P>}};
 }
 
 } // namespace qx::QX_WIDTH

@@ -8,10 +8,9 @@ int64_t ComplexLanesSize(const LanesPasses &passes, int32_t p, int32_t m) {
     return int64_t{m / (passes.complexLanes / 2)} * passes.complexLanes * (p - 1);
 }
 
-// The last column of the table: the middle one too if it fills the lanes, because eight lanes and panels
-// pass it through as one more pair (RealWideTwiddle).
+// The last column that runs in lanes: in eight lanes the middle one too (RealWideTwiddle).
 static ptrdiff_t LastInLanes(const LanesPasses &passes, ptrdiff_t m) {
-    return m % (2 * passes.realLanes) == 0 ? m / 2 : (m - 1) / 2;
+    return passes.realLanes == 8 ? m / 2 : (m - 1) / 2;
 }
 
 int64_t RealLanesSize(const LanesPasses &passes, int32_t p, int32_t m) {

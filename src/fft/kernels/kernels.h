@@ -65,8 +65,8 @@ const KernelSet *KernelsFor();
 // The lane tables hold the twiddles of a stage with factor p in the order in which the kernels read
 // them: block after block of columns that fill the lanes, and in a block entry by entry of j from 1 to
 // p - 1. The complex table starts at column 0 and has packed entries; the real table has columns 1 to
-// (m - 1) / 2, because the rest mirrors them, and column m / 2 too where it fills the last block; an
-// entry is all cosines, then all sines. Columns that do not fill a block are left out.
+// (m - 1) / 2, because the rest mirrors them, and in eight lanes column m / 2 too; an entry is all
+// cosines, then all sines. Columns that do not fill a block are left out.
 int64_t ComplexLanesSize(const LanesPasses &passes, int32_t p, int32_t m);
 int64_t RealLanesSize(const LanesPasses &passes, int32_t p, int32_t m);
 void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table);
