@@ -398,7 +398,7 @@ def FDist2026_head(f: float | ArrayLike, n: float | ArrayLike, d: float | ArrayL
 
 
 def ChiSquare2026_head(x: float | ArrayLike, dof: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
-    """As TDist2026_head, of the chi-square distribution, by the incomplete gamma integral in the ..."""
+    """As TDist2026_head, of the chi-square distribution: 0 for x below 0. A value of the standard ..."""
 
 
 def InvNdist2026_head(p: float | ArrayLike, tail: int | ArrayLike) -> float | NDArray[Any]:

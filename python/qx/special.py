@@ -656,7 +656,7 @@ def hyperu(a: ArrayLike, b: ArrayLike, x: ArrayLike) -> Any:
     --------
     >>> import qx
     >>> qx.special.hyperu(1.0, 1.5, 8.0)
-    0.11832619145678035
+    0.11832619145678037
     """
     return core.hyperu(x, a, b)
 

@@ -119,7 +119,7 @@ class Distribution:
     >>> qx.stats.chi2.cdf(3.841, 1).round(3)
     0.95
     >>> float(qx.stats.norm.sf(20.0)), float(qx.stats.norm.isf(1e-300))
-    (2.7536241186062337e-89, 37.0470962993612)
+    (2.7536241186062337e-89, 37.047096299361186)
     """
 
     def __init__(self, name: Any, parameters: Any) -> None:

@@ -206,6 +206,16 @@ DirectTails DirectBetaTails(double f, double a, double b, bool takesLower) {
     const Extended first = ExactProduct(a, f);
     const Extended sum = ExactSum(a, b);
     const Extended whole = first + Extended{b, 0.0};
+    const double p = takesLower ? a : b;
+    double left = takesLower ? b : a;
+    const Extended near = (takesLower ? first : Extended{b, 0.0}) / whole;
+    const double u = near.high;
+    const Extended share = (takesLower ? Extended{b, 0.0} : first) / whole;
+    const double v = share.high;
+    if (left == 1.0) {
+        const double part = Power(near, p);
+        return IsInRange(part) ? DirectTails{part, takesLower, p * part * v, true} : kUnknown;
+    }
     const Extended g = sum / whole;
     const double ofX = Power(Extended{f, 0.0} * g, a), ofY = Power(g, b);
     const double stirling = StirlingFactor(a) * StirlingFactor(b) / StirlingFactor(sum.high) *
@@ -213,14 +223,8 @@ DirectTails DirectBetaTails(double f, double a, double b, bool takesLower) {
     const double slope = ofX * ofY * stirling;
     if (!IsInRange(ofX) || !IsInRange(ofY) || !IsInRange(slope))
         return kUnknown;
-    const double p = takesLower ? a : b;
-    double left = takesLower ? b : a;
-    const Extended near = (takesLower ? first : Extended{b, 0.0}) / whole;
-    const double u = near.high;
     if (u < kNearEnd && u * sum.high < kNearEnd * (p + 1.0))
         return {slope / p * LowerSeries(left, p, u, near.low / u), takesLower, slope, true};
-    const Extended share = (takesLower ? Extended{b, 0.0} : first) / whole;
-    const double v = share.high;
     const Sides at = {u, v, share.low / v};
     if (left <= 1.0)
         return {LastPart(slope, p, left, at, 1.0), takesLower, slope, true};
