@@ -115,7 +115,6 @@ struct Bundle {
 struct ComplexLanesPath {
     static constexpr ptrdiff_t width = 2; // DBL units of one value
     static constexpr ptrdiff_t bundle = complexBundle;
-    static bool gainsByBuffer(int32_t, int32_t) { return true; }
     static void leaf(const FFTPlan &plan, const DBL *in, DBL *out, const LeafColumns &columns) {
         plan.stages[plan.factorCount - 1]->passes.complexLeaf(in, out, columns);
     }
@@ -130,9 +129,6 @@ struct ComplexLanesPath {
 struct RealLanesPath {
     static constexpr ptrdiff_t width = 1;
     static constexpr ptrdiff_t bundle = realBundle;
-    // Only if the columns are copied in any case. Separate input and output double the addresses of a
-    // stage, which reads from both ends of each block: 10^3 to 10^5 took 1.15 to 1.3 times as long.
-    static bool gainsByBuffer(int32_t p, int32_t m) { return p > 4 && m % 256 == 0; }
     static void leaf(const FFTPlan &plan, const DBL *in, DBL *out, const LeafColumns &columns) {
         const int32_t radix = plan.factors[plan.factorCount - 1];
         if (columns.count[0] * columns.count[1] <= 2 && gainsByFrequencies(radix))
@@ -261,11 +257,10 @@ __attribute__((noinline)) void RunOnStack(const FFTPlan &plan, const DBL *in, DB
 
 template <class Path>
 void RunLanes(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride, DBL *work) {
-    const int32_t level = plan.bufferLevel;
-    if (level < 0 || !Path::gainsByBuffer(plan.factors[level], plan.length / plan.bufferBlocks))
+    if (!GainsByBuffer(plan, Path::width))
         return RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0},
                                   {work, nullptr});
-    if (BufferValues(plan, Path::width) <= stackBufferValues)
+    if (IsBufferOnStack(plan, Path::width))
         return RunOnStack<Path>(plan, in, out, inStride, work);
     const BufferLoan loan(plan);
     RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0}, {work, loan.data()});

@@ -275,11 +275,10 @@ bool BuildBuffer(FFTPlan *plan) {
         return true;
     plan->bufferLevel = level;
     plan->bufferBlocks = plan->factors[0] * (level == 0 ? 1 : plan->factors[1]);
-    const int64_t values = BufferValues(*plan, 2);
-    if (values <= stackBufferValues)
+    if (!GainsByBuffer(*plan, 2) || IsBufferOnStack(*plan, 2))
         return true;
     DBL *memory = nullptr;
-    const bool built = Allocate(memory, values + lineValues);
+    const bool built = Allocate(memory, BufferValues(*plan, 2) + lineValues);
     plan->buffer.store(memory, std::memory_order_relaxed);
     return built;
 }

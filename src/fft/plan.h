@@ -137,9 +137,9 @@ struct FFTPlan {
     int64_t complexWork, realWork;
 
     // The blocks that the stage of one level combines may be kept in a buffer, from which the stage
-    // writes to the results. In the buffer each block starts on a cache line, which the host's arrays
-    // do not, and the pitch keeps the values of a column from mapping to one set of the cache. The
-    // level, -1 for none, and the number of blocks.
+    // writes to the results (GainsByBuffer). In the buffer each block starts on a cache line, which the
+    // host's arrays do not, and the pitch keeps the values of a column from mapping to one set of the
+    // cache. The level, -1 for none, and the number of blocks.
     int32_t bufferLevel, bufferBlocks;
     // The buffer, if it does not fit on the stack, for one transform at a time; null while a transform
     // uses it. Other transforms meanwhile run without a buffer, with the same results.
@@ -160,8 +160,24 @@ inline std::ptrdiff_t BlockPitch(std::ptrdiff_t values) {
 inline std::ptrdiff_t BufferValues(const FFTPlan &plan, std::ptrdiff_t width) {
     return plan.bufferBlocks * BlockPitch(width * (plan.length / plan.bufferBlocks));
 }
-// Buffers up to this size are on the stack.
-constexpr int32_t stackBufferValues = 2304;
+// Buffers up to this size are on the stack. With a longer one, the input, the buffer and the results of a
+// complex transform do not fit into the first-level cache together.
+constexpr int32_t stackBufferValues = 1856;
+inline bool IsBufferOnStack(const FFTPlan &plan, std::ptrdiff_t width) {
+    return BufferValues(plan, width) <= stackBufferValues;
+}
+// Whether a transform is faster with a buffer: if without it, the stage would have to copy its columns
+// (legsCollide in kernels/columns.h), and a complex one also if the cache holds it all. Elsewhere the buffer
+// displaces input and results. Real stages read from both ends of each block, and separate input and output
+// double their addresses.
+inline bool GainsByBuffer(const FFTPlan &plan, std::ptrdiff_t width) {
+    if (plan.bufferLevel < 0)
+        return false;
+    const std::ptrdiff_t side = plan.length / plan.bufferBlocks * width;
+    const bool collide =
+        plan.factors[plan.bufferLevel] > 4 && side * std::ptrdiff_t{sizeof(DBL)} % 2048 == 0;
+    return collide || (width == 2 && IsBufferOnStack(plan, width));
+}
 
 // The implementation of the two exports of the same names: returns the shared plan of a length, or
 // null, and releases it. (Calls are qualified, because the exports are visible too.)

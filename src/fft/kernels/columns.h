@@ -26,6 +26,10 @@ constexpr bool legsCollide(ptrdiff_t leg, int p) {
     return p > 4 && leg * ptrdiff_t{sizeof(DBL)} % 2048 == 0;
 }
 
+// How many columns, or pairs of mirrored ones, a stage copies together. The host's arrays do not begin on
+// cache lines: the more columns, the fewer lines are shared with the copies before and after.
+constexpr int columnsCopied = 4 * nativeLanes;
+
 // `rows` runs of `width` values each.
 template <int Width>
 QX_INLINE void CopyRows(const DBL *from, ptrdiff_t fromPitch, DBL *to, ptrdiff_t toPitch,

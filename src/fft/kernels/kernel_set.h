@@ -356,16 +356,15 @@ void ComplexLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStag
                          ptrdiff_t m) {
     const ptrdiff_t leg = 2 * m;
     if (legsCollide(leg, P)) { // m is a multiple of the columns that are copied
-        constexpr ptrdiff_t copied = 8;
-        constexpr int width = 2 * copied;
+        constexpr int width = 2 * columnsCopied;
         double rows[P * width];
-        for (ptrdiff_t k = 0; k < m; k += copied) {
+        for (ptrdiff_t k = 0; k < m; k += columnsCopied) {
             const DBL *const lanes = stage.complexLanes + 2 * k * (P - 1);
             if (legsCollide(inLeg, P)) {
                 CopyRows<width>(in + 2 * k, inLeg, rows, width, P);
-                ComplexTwiddleColumns<P>(rows, width, rows, width, copied, lanes);
+                ComplexTwiddleColumns<P>(rows, width, rows, width, columnsCopied, lanes);
             } else {
-                ComplexTwiddleColumns<P>(in + 2 * k, inLeg, rows, width, copied, lanes);
+                ComplexTwiddleColumns<P>(in + 2 * k, inLeg, rows, width, columnsCopied, lanes);
             }
             CopyRows<width>(rows, width, out + 2 * k, leg, P);
         }
@@ -501,7 +500,7 @@ ptrdiff_t RealPairsInLanes(const RealBlocks &blocks, const FFTStage &stage, ptrd
                            ptrdiff_t last) {
     ptrdiff_t k = 1;
     if (legsCollide(m, P))
-        k = RealPairsOnStack < P, isWide ? 16 : 8 > (blocks, stage, m, k, last);
+        k = RealPairsOnStack<P, columnsCopied>(blocks, stage, m, k, last);
     if (blocks.in != blocks.out)
         return RealPairsOnStack<P, nativeLanes>(blocks, stage, m, k, last);
     const ptrdiff_t left = last - (k - 1);
