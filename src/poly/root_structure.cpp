@@ -6,6 +6,7 @@
 #include "poly/common_divisor.h"
 #include "poly/complex_arithmetic.h"
 #include "poly/root_products.h"
+#include "poly/simple_roots.h"
 
 #include <algorithm>
 #include <cmath>
@@ -172,7 +173,10 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
     constexpr double errorGrowth = 100.0;
     *rootCount = 0;
     CommonDivisor divisor;
+    SimpleRootsProof proof;
     if (const ErrorCode failed = divisor.allocate(degree))
+        return failed;
+    if (const ErrorCode failed = proof.allocate(degree))
         return failed;
     Scratch<Complex> work;
     if (const ErrorCode failed = work.allocate(2 * int64_t{degree} + 1))
@@ -182,14 +186,27 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
         current[i] = p[i];
     int32_t left = degree, largest = degree;
     for (int32_t level = 1; left > 0; ++level) {
-        if (const ErrorCode failed = divisor.find(current, left, largest, tolerance))
-            return failed;
-        if (!divisor.isFound())
-            break;
-        const int32_t count = divisor.quotientDegree();
         CDB *const target = level == 1 ? roots : found;
-        if (const ErrorCode failed = CompanionRoots(divisor.quotient(), count, target))
-            return failed;
+        // Most polynomials have simple roots only, and then the search for a divisor takes most of
+        // the time: it is made if the roots do not prove that there is none.
+        bool hasRoots = false, isSimple = false;
+        if (left <= largest) {
+            const ErrorCode status = CompanionRoots(current, left, target);
+            if (status == ErrOutOfMemory)
+                return status;
+            hasRoots = status == 0;
+            isSimple = hasRoots && proof.holds(current, left, tolerance, target);
+        }
+        if (!isSimple) {
+            if (const ErrorCode failed = divisor.find(current, left, largest, tolerance))
+                return failed;
+            if (!divisor.isFound())
+                break;
+        }
+        const int32_t count = isSimple ? left : divisor.quotientDegree();
+        if (!(hasRoots && count == left))
+            if (const ErrorCode failed = CompanionRoots(divisor.quotient(), count, target))
+                return failed;
         if (level == 1) {
             *rootCount = count;
             for (int32_t j = 0; j < count; ++j)
@@ -199,6 +216,8 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
         }
         left -= count;
         largest = count;
+        if (left == 0)
+            break;
         for (int32_t i = 0; i <= left; ++i)
             current[i] = divisor.divisor()[i];
         tolerance = std::max(tolerance, errorGrowth * divisor.error());
