@@ -7,10 +7,25 @@
 #include <cmath>
 
 namespace qx {
+namespace {
 
+CDB Widened(double x) { return {x, 0.0}; }
+CDB Widened(CDB z) { return z; }
+
+template <ElementType E>
+typename ScalarOf<E>::type Solution(CDB x) {
+    if constexpr (E == ElementType::DBL)
+        return x.re;
+    else
+        return x;
+}
+
+} // namespace
+
+// `triangle_` is also large enough for a real matrix and its triangle.
 ErrorCode LeastSquaresSystem::allocate(int64_t maxRows, int64_t maxCols) {
     return memory_.take(Sized(augmented_, maxRows * (maxCols + 1)),
-                        Sized(triangle_, std::min(maxRows, maxCols + 1) * (maxCols + 1)));
+                        Sized(triangle_, maxRows * (maxCols + 1)));
 }
 
 void LeastSquaresSystem::reset(int32_t rows, int32_t cols) {
@@ -32,20 +47,47 @@ void LeastSquaresSystem::addProductBy(const CDB *a, int32_t degree, int32_t shif
             at(row + s + i, col + s) += a[i];
 }
 
+bool LeastSquaresSystem::copyRealParts() const {
+    DBL *const real = reinterpret_cast<DBL *>(triangle_.data());
+    bool isReal = true;
+    for (std::ptrdiff_t i = 0; i < rows_ && isReal; ++i)
+        for (std::ptrdiff_t j = i * width(); j < (i + 1) * width(); ++j) {
+            isReal &= augmented_[j].im == 0.0 && std::fabs(augmented_[j].re) < 0x1p300;
+            real[j] = augmented_[j].re;
+        }
+    return isReal;
+}
+
 // The right side is factored as an additional column and so becomes Q^H times itself.
-ErrorCode LeastSquaresSystem::solve(CDB *x) {
-    CDB *const r = triangle_.data();
+template <ElementType E>
+ErrorCode LeastSquaresSystem::solveWith(const ElementOf<E> *augmented, ElementOf<E> *triangle,
+                                        CDB *x) const {
+    ElementOf<E> *const r = triangle;
     const auto rows = static_cast<int32_t>(rows_), cols = static_cast<int32_t>(width());
-    if (const ErrorCode failed = QRDecompose<ElementType::CDB>(
-            {augmented_.data(), rows, cols}, qrOnlyR, {}, {r, std::min(rows, cols), cols}))
+    if (const ErrorCode failed =
+            QRDecompose<E>({augmented, rows, cols}, qrOnlyR, {}, {r, std::min(rows, cols), cols}))
         return failed;
     for (std::ptrdiff_t i = cols_ - 1; i >= 0; --i) {
-        CDB sum = r[i * width() + cols_];
+        typename ScalarOf<E>::type sum = r[i * width() + cols_];
         for (std::ptrdiff_t j = i + 1; j < cols_; ++j)
-            sum -= r[i * width() + j] * x[j];
-        x[i] = Quotient(sum, r[i * width() + i]);
+            sum = sum - r[i * width() + j] * Solution<E>(x[j]);
+        x[i] = Widened(Quotient(sum, r[i * width() + i]));
     }
     return 0;
+}
+
+// Complex arithmetic with real elements has the same bits as real arithmetic, except for the signs
+// of zeros in imaginary parts, unless something is infinite or NaN.
+ErrorCode LeastSquaresSystem::solve(CDB *x) {
+    if (copyRealParts()) {
+        DBL *const real = reinterpret_cast<DBL *>(triangle_.data());
+        if (const ErrorCode failed =
+                solveWith<ElementType::DBL>(real, real + rows_ * width(), x))
+            return failed;
+        if (std::all_of(x, x + cols_, [](CDB value) { return IsFinite(value); }))
+            return 0;
+    }
+    return solveWith<ElementType::CDB>(augmented_.data(), triangle_.data(), x);
 }
 
 ErrorCode CommonDivisor::allocate(int32_t maxDegree) {

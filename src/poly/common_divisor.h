@@ -33,6 +33,12 @@ public:
 
 private:
     std::ptrdiff_t width() const { return cols_ + 1; }
+    // The real parts as a matrix at the place of the triangle, if there are no others and no
+    // product of two elements overflows.
+    bool copyRealParts() const;
+    template <ElementType E>
+    ErrorCode solveWith(const ElementOf<E> *augmented, ElementOf<E> *triangle, CDB *x) const;
+
     ComplexVector augmented_, triangle_;
     ScratchParts memory_;
     std::ptrdiff_t rows_ = 0, cols_ = 0;
