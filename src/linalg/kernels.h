@@ -83,6 +83,14 @@ QX_BY_WIDTH_TO_8(void, ReflectRows,
 QX_BY_WIDTH_TO_8(void, ReflectColumns,
                  (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
 
+// A sweep of the double-shift QR iteration over the rows from `top` to `last` of a Hessenberg matrix,
+// of which only the eigenvalues are wanted: the bulge starts at row `first`, where the shifted
+// product has the first column (column[0], column[1], column[2]). Elements below the subdiagonal
+// are not cleared.
+QX_BY_WIDTH_TO_8(void, ChaseBulge,
+                 (DBL * h, std::ptrdiff_t stride, int32_t top, int32_t first, int32_t last,
+                  const double *column))
+
 // The first three kernels for either element. x and y have as many elements as a has rows or
 // columns.
 template <ElementType E>

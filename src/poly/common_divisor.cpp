@@ -81,8 +81,7 @@ ErrorCode LeastSquaresSystem::solveWith(const ElementOf<E> *augmented, ElementOf
 ErrorCode LeastSquaresSystem::solve(CDB *x) {
     if (copyRealParts()) {
         DBL *const real = reinterpret_cast<DBL *>(triangle_.data());
-        if (const ErrorCode failed =
-                solveWith<ElementType::DBL>(real, real + rows_ * width(), x))
+        if (const ErrorCode failed = solveWith<ElementType::DBL>(real, real + rows_ * width(), x))
             return failed;
         if (std::all_of(x, x + cols_, [](CDB value) { return IsFinite(value); }))
             return 0;
