@@ -28,6 +28,15 @@ QX_BY_WIDTH_TO_8(void, AddOuterProductComplex,
                  (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
                   const CDB *y))
 
+// Column by column, a -= v (v^H a) / kappa: product[j] = the sum over i of conj(v[i]) a[i][j], i
+// ascending, and a[i][j] += v[i] (-(product[j] / kappa)).
+QX_BY_WIDTH_TO_8(void, ReflectFromLeftReal,
+                 (DBL * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *v,
+                  double kappa))
+QX_BY_WIDTH_TO_8(void, ReflectFromLeftComplex,
+                 (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *v,
+                  CDB kappa))
+
 // a[i][j] -= x[i] y[j], where x is a column of the matrix of a, so its elements are also `stride`
 // apart.
 QX_BY_WIDTH_TO_8(void, SubtractOuterProductComplex,

@@ -84,6 +84,98 @@ void AddOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t
         AddComplexRows<1>(y, 0, cols, x + i, a + i * stride);
 }
 
+// Some vectors of all rows, whose products with v stay in registers.
+template <class L, int Vectors>
+static QX_INLINE void ReflectSomeColumns(DBL *a, std::ptrdiff_t stride, int32_t rows, const DBL *v,
+                                         double kappa) {
+    L p[Vectors];
+    for (int c = 0; c < Vectors; ++c)
+        p[c] = L(0.0);
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c)
+            p[c] = p[c] + L(v[i]) * L::load(a + i * stride + c * L::count);
+    for (int c = 0; c < Vectors; ++c)
+        p[c] = -(p[c] / L(kappa));
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c) {
+            DBL *const at = a + i * stride + c * L::count;
+            (L::load(at) + L(v[i]) * p[c]).store(at);
+        }
+}
+
+void ReflectFromLeftReal(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *v,
+                         double kappa) {
+    typedef Lanes<nativeLanes> L;
+    int32_t j = 0;
+    for (; j + 4 * nativeLanes <= cols; j += 4 * nativeLanes)
+        ReflectSomeColumns<L, 4>(a + j, stride, rows, v, kappa);
+    for (; j + 2 * nativeLanes <= cols; j += 2 * nativeLanes)
+        ReflectSomeColumns<L, 2>(a + j, stride, rows, v, kappa);
+    for (; j + nativeLanes <= cols; j += nativeLanes)
+        ReflectSomeColumns<L, 1>(a + j, stride, rows, v, kappa);
+    for (; j + 2 <= cols; j += 2)
+        ReflectSomeColumns<Lanes<2>, 1>(a + j, stride, rows, v, kappa);
+    if (j < cols)
+        ReflectSomeColumns<Lanes<1>, 1>(a + j, stride, rows, v, kappa);
+}
+
+// The quotient by one complex number, as the operator of frame/complex.h forms it.
+struct ComplexDivisor {
+    double ratio, denominator;
+    bool isMoreReal;
+
+    explicit ComplexDivisor(const CDB &by)
+        : isMoreReal(__builtin_fabs(by.re) >= __builtin_fabs(by.im)) {
+        ratio = isMoreReal ? by.im / by.re : by.re / by.im;
+        denominator = isMoreReal ? by.re + by.im * ratio : by.im + by.re * ratio;
+    }
+    template <class L>
+    QX_INLINE L quotient(L x) const {
+        const L numerator = isMoreReal ? x + NegativeFirst<L>(-ratio) * Swapped(x)
+                                       : x * L(ratio) - NegativeFirst<L>(1.0) * Swapped(x);
+        return numerator / L(denominator);
+    }
+};
+
+template <class L, int Vectors>
+static QX_INLINE void ReflectSomeComplexColumns(DBL *a, std::ptrdiff_t stride, int32_t rows,
+                                                const CDB *v, const ComplexDivisor &kappa) {
+    L p[Vectors], swapped[Vectors];
+    for (int c = 0; c < Vectors; ++c)
+        p[c] = L(0.0);
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c) {
+            const L row = L::load(a + i * stride + c * L::count);
+            p[c] = p[c] + (L(v[i].re) * row + NegativeFirst<L>(-v[i].im) * Swapped(row));
+        }
+    for (int c = 0; c < Vectors; ++c) {
+        p[c] = -kappa.quotient(p[c]);
+        swapped[c] = Swapped(p[c]);
+    }
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c) {
+            DBL *const at = a + i * stride + c * L::count;
+            (L::load(at) + (L(v[i].re) * p[c] + NegativeFirst<L>(v[i].im) * swapped[c])).store(at);
+        }
+}
+
+void ReflectFromLeftComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *v,
+                            CDB kappa) {
+    typedef Lanes<nativeLanes> L;
+    const ComplexDivisor divisor(kappa);
+    DBL *const parts = reinterpret_cast<DBL *>(a);
+    const std::ptrdiff_t end = 2 * std::ptrdiff_t{cols}, step = 2 * stride;
+    std::ptrdiff_t j = 0;
+    for (; j + 4 * nativeLanes <= end; j += 4 * nativeLanes)
+        ReflectSomeComplexColumns<L, 4>(parts + j, step, rows, v, divisor);
+    for (; j + 2 * nativeLanes <= end; j += 2 * nativeLanes)
+        ReflectSomeComplexColumns<L, 2>(parts + j, step, rows, v, divisor);
+    for (; j + nativeLanes <= end; j += nativeLanes)
+        ReflectSomeComplexColumns<L, 1>(parts + j, step, rows, v, divisor);
+    for (; j < end; j += 2)
+        ReflectSomeComplexColumns<Lanes<2>, 1>(parts + j, step, rows, v, divisor);
+}
+
 template <class L>
 static QX_INLINE void SubtractComplexMultiple(const CDB &factor, const DBL *y, DBL *a) {
     const L row = L::load(y);
