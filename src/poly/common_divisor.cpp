@@ -20,6 +20,13 @@ typename ScalarOf<E>::type Solution(CDB x) {
         return x;
 }
 
+double LargestPart(const CDB *a, int32_t count) {
+    double largest = 0.0;
+    for (int32_t i = 0; i < count; ++i)
+        largest = std::max(largest, AbsSum(a[i])); // without NaN
+    return largest;
+}
+
 } // namespace
 
 // `triangle_` is also large enough for a real matrix and its triangle.
@@ -99,47 +106,84 @@ ErrorCode CommonDivisor::allocate(int32_t maxDegree) {
     return system_.allocate(size, size);
 }
 
-ErrorCode CommonDivisor::find(const CDB *p, int32_t n, int32_t largest, double tolerance) {
-    // A degree is tried if the singular value, relative to the polynomial, is at most this many
-    // tolerances.
-    constexpr double trialFactor = 100.0;
+void CommonDivisor::begin(const CDB *p, int32_t n, double tolerance) {
     p_ = p;
     n_ = n;
+    tolerance_ = tolerance;
+    tried_ = 0;
     quotientDegree_ = -1;
     for (int32_t i = 0; i < n; ++i)
         slope_[i] = p[i] * (double(n - i) / n);
-    const double threshold = trialFactor * tolerance * CoefficientNorm(p, std::ptrdiff_t{n} + 1);
     sylvester_.begin(p, n, slope_.data(), n - 1);
-    for (int32_t k = 1; k <= std::min(largest, n - 1); ++k) {
+}
+
+ErrorCode CommonDivisor::search(int32_t largest) {
+    // A degree is tried if the singular value, relative to the polynomial, is at most this many
+    // tolerances.
+    constexpr double trialFactor = 100.0;
+    const double threshold = trialFactor * tolerance_ * CoefficientNorm(p_, std::ptrdiff_t{n_} + 1);
+    while (tried_ < std::min(largest, n_ - 1)) {
+        ++tried_;
         sylvester_.advance();
         if (!(sylvester_.smallestSingularValue() <= threshold))
             continue;
         bool isDivisor = false;
-        if (const ErrorCode failed = tryDegree(k, tolerance, &isDivisor))
+        if (const ErrorCode failed = tryDegree(tried_, &isDivisor))
             return failed;
         if (isDivisor) {
-            quotientDegree_ = k;
+            quotientDegree_ = tried_;
             return 0;
         }
     }
-    if (largest >= n) {
-        degree_ = quotientDegree_ = n;
+    if (largest >= n_) {
+        degree_ = quotientDegree_ = n_;
         residual_ = 0.0;
         u()[0] = {1.0, 0.0};
-        for (int32_t i = 0; i <= n; ++i)
-            v()[i] = p[i];
+        for (int32_t i = 0; i <= n_; ++i)
+            v()[i] = p_[i];
     }
     return 0;
 }
 
-ErrorCode CommonDivisor::tryDegree(int32_t k, double tolerance, bool *isDivisor) {
+// Euclid's algorithm: with k distinct roots, the k-th remainder of p and p' vanishes, up to
+// rounding errors and those of the coefficients.
+int32_t CommonDivisor::likelyQuotientDegree() {
+    constexpr double vanishing = 1e-6;
+    CDB *upper = unknowns_.data(), *lower = step_.data();
+    for (int32_t i = 0; i <= n_; ++i)
+        upper[i] = p_[i];
+    for (int32_t i = 0; i < n_; ++i)
+        lower[i] = slope_[i];
+    double ofUpper = LargestPart(upper, n_ + 1), ofLower = LargestPart(lower, n_);
+    for (int32_t k = 1; k < n_; ++k) {
+        const int32_t count = n_ - k; // coefficients of the remainder
+        const CDB first = Quotient(upper[0], lower[0]);
+        const CDB second = Quotient(upper[1] - first * lower[1], lower[0]);
+        for (int32_t i = 0; i < count; ++i) {
+            const CDB next = i + 2 <= count ? first * lower[i + 2] : CDB{};
+            upper[i] = upper[i + 2] - next - second * lower[i + 1];
+        }
+        const double size = LargestPart(upper, count);
+        const double terms = ofUpper + (AbsSum(first) + AbsSum(second)) * ofLower;
+        if (!(size > 0.0) || !IsFinite(size))
+            return size == 0.0 ? k : n_;
+        if (size < vanishing * terms)
+            return k;
+        ofUpper = ofLower;
+        ofLower = size;
+        std::swap(upper, lower);
+    }
+    return n_;
+}
+
+ErrorCode CommonDivisor::tryDegree(int32_t k, bool *isDivisor) {
     degree_ = k;
     ErrorCode failed = firstGuess();
     if (failed == 0)
         failed = refine();
     if (failed != 0)
         return failed == ErrOutOfMemory ? failed : 0;
-    *isDivisor = residual_ <= tolerance;
+    *isDivisor = residual_ <= tolerance_;
     return 0;
 }
 

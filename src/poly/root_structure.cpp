@@ -209,17 +209,24 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
     for (int32_t level = 1; left > 0; ++level) {
         CDB *const target = level == 1 ? roots : found;
         // Most polynomials have simple roots only, and then the search for a divisor takes most of
-        // the time: it is made if the roots do not prove that there is none.
+        // the time: it is made if the roots do not prove that there is none. It begins before them
+        // if a divisor is likely.
+        const bool mayBeSimple = left <= largest;
         bool hasRoots = false, isSimple = false;
-        if (left <= largest) {
+        divisor.begin(current, left, tolerance);
+        const int32_t likely = mayBeSimple ? divisor.likelyQuotientDegree() : left;
+        if (likely < left - 1)
+            if (const ErrorCode failed = divisor.search(likely + 1))
+                return failed;
+        if (!divisor.isFound() && mayBeSimple) {
             const ErrorCode status = CompanionRoots(current, left, target);
             if (status == ErrOutOfMemory)
                 return status;
             hasRoots = status == 0;
             isSimple = hasRoots && proof.holds(current, left, tolerance, target);
         }
-        if (!isSimple) {
-            if (const ErrorCode failed = divisor.find(current, left, largest, tolerance))
+        if (!divisor.isFound() && !isSimple) {
+            if (const ErrorCode failed = divisor.search(largest))
                 return failed;
             if (!divisor.isFound())
                 break;
