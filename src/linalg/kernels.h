@@ -28,6 +28,15 @@ QX_BY_WIDTH_TO_8(void, AddOuterProductComplex,
                  (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
                   const CDB *y))
 
+// Column by column, a -= v (v^H a) / kappa: product[j] = the sum over i of conj(v[i]) a[i][j], i
+// ascending, and a[i][j] += v[i] (-(product[j] / kappa)).
+QX_BY_WIDTH_TO_8(void, ReflectFromLeftReal,
+                 (DBL * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *v,
+                  double kappa))
+QX_BY_WIDTH_TO_8(void, ReflectFromLeftComplex,
+                 (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *v,
+                  CDB kappa))
+
 // a[i][j] -= x[i] y[j], where x is a column of the matrix of a, so its elements are also `stride`
 // apart.
 QX_BY_WIDTH_TO_8(void, SubtractOuterProductComplex,
@@ -82,6 +91,14 @@ QX_BY_WIDTH_TO_8(void, ReflectRows,
 // Applies one reflection to columns, in the first `rows` rows.
 QX_BY_WIDTH_TO_8(void, ReflectColumns,
                  (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
+
+// A sweep of the double-shift QR iteration over the rows from `top` to `last` of a Hessenberg matrix,
+// of which only the eigenvalues are wanted: the bulge starts at row `first`, where the shifted
+// product has the first column (column[0], column[1], column[2]). Elements below the subdiagonal
+// are not cleared.
+QX_BY_WIDTH_TO_8(void, ChaseBulge,
+                 (DBL * h, std::ptrdiff_t stride, int32_t top, int32_t first, int32_t last,
+                  const double *column))
 
 // The first three kernels for either element. x and y have as many elements as a has rows or
 // columns.

@@ -84,6 +84,98 @@ void AddOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t
         AddComplexRows<1>(y, 0, cols, x + i, a + i * stride);
 }
 
+// Some vectors of all rows, whose products with v stay in registers.
+template <class L, int Vectors>
+static QX_INLINE void ReflectSomeColumns(DBL *a, std::ptrdiff_t stride, int32_t rows, const DBL *v,
+                                         double kappa) {
+    L p[Vectors];
+    for (int c = 0; c < Vectors; ++c)
+        p[c] = L(0.0);
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c)
+            p[c] = p[c] + L(v[i]) * L::load(a + i * stride + c * L::count);
+    for (int c = 0; c < Vectors; ++c)
+        p[c] = -(p[c] / L(kappa));
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c) {
+            DBL *const at = a + i * stride + c * L::count;
+            (L::load(at) + L(v[i]) * p[c]).store(at);
+        }
+}
+
+void ReflectFromLeftReal(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *v,
+                         double kappa) {
+    typedef Lanes<nativeLanes> L;
+    int32_t j = 0;
+    for (; j + 4 * nativeLanes <= cols; j += 4 * nativeLanes)
+        ReflectSomeColumns<L, 4>(a + j, stride, rows, v, kappa);
+    for (; j + 2 * nativeLanes <= cols; j += 2 * nativeLanes)
+        ReflectSomeColumns<L, 2>(a + j, stride, rows, v, kappa);
+    for (; j + nativeLanes <= cols; j += nativeLanes)
+        ReflectSomeColumns<L, 1>(a + j, stride, rows, v, kappa);
+    for (; j + 2 <= cols; j += 2)
+        ReflectSomeColumns<Lanes<2>, 1>(a + j, stride, rows, v, kappa);
+    if (j < cols)
+        ReflectSomeColumns<Lanes<1>, 1>(a + j, stride, rows, v, kappa);
+}
+
+// The quotient by one complex number, as the operator of frame/complex.h forms it.
+struct ComplexDivisor {
+    double ratio, denominator;
+    bool isMoreReal;
+
+    explicit ComplexDivisor(const CDB &by)
+        : isMoreReal(__builtin_fabs(by.re) >= __builtin_fabs(by.im)) {
+        ratio = isMoreReal ? by.im / by.re : by.re / by.im;
+        denominator = isMoreReal ? by.re + by.im * ratio : by.im + by.re * ratio;
+    }
+    template <class L>
+    QX_INLINE L quotient(L x) const {
+        const L numerator = isMoreReal ? x + NegativeFirst<L>(-ratio) * Swapped(x)
+                                       : x * L(ratio) - NegativeFirst<L>(1.0) * Swapped(x);
+        return numerator / L(denominator);
+    }
+};
+
+template <class L, int Vectors>
+static QX_INLINE void ReflectSomeComplexColumns(DBL *a, std::ptrdiff_t stride, int32_t rows,
+                                                const CDB *v, const ComplexDivisor &kappa) {
+    L p[Vectors], swapped[Vectors];
+    for (int c = 0; c < Vectors; ++c)
+        p[c] = L(0.0);
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c) {
+            const L row = L::load(a + i * stride + c * L::count);
+            p[c] = p[c] + (L(v[i].re) * row + NegativeFirst<L>(-v[i].im) * Swapped(row));
+        }
+    for (int c = 0; c < Vectors; ++c) {
+        p[c] = -kappa.quotient(p[c]);
+        swapped[c] = Swapped(p[c]);
+    }
+    for (int32_t i = 0; i < rows; ++i)
+        for (int c = 0; c < Vectors; ++c) {
+            DBL *const at = a + i * stride + c * L::count;
+            (L::load(at) + (L(v[i].re) * p[c] + NegativeFirst<L>(v[i].im) * swapped[c])).store(at);
+        }
+}
+
+void ReflectFromLeftComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *v,
+                            CDB kappa) {
+    typedef Lanes<nativeLanes> L;
+    const ComplexDivisor divisor(kappa);
+    DBL *const parts = reinterpret_cast<DBL *>(a);
+    const std::ptrdiff_t end = 2 * std::ptrdiff_t{cols}, step = 2 * stride;
+    std::ptrdiff_t j = 0;
+    for (; j + 4 * nativeLanes <= end; j += 4 * nativeLanes)
+        ReflectSomeComplexColumns<L, 4>(parts + j, step, rows, v, divisor);
+    for (; j + 2 * nativeLanes <= end; j += 2 * nativeLanes)
+        ReflectSomeComplexColumns<L, 2>(parts + j, step, rows, v, divisor);
+    for (; j + nativeLanes <= end; j += nativeLanes)
+        ReflectSomeComplexColumns<L, 1>(parts + j, step, rows, v, divisor);
+    for (; j < end; j += 2)
+        ReflectSomeComplexColumns<Lanes<2>, 1>(parts + j, step, rows, v, divisor);
+}
+
 template <class L>
 static QX_INLINE void SubtractComplexMultiple(const CDB &factor, const DBL *y, DBL *a) {
     const L row = L::load(y);
@@ -377,6 +469,95 @@ void ReflectColumns(DBL *a, std::ptrdiff_t stride, int32_t rows,
         }
         row[0] -= p * h.w[0];
         row[1] -= p * h.w[1];
+    }
+}
+
+// A reflection of two or three rows and columns, I - w u^T from the left and I - u w^T from the
+// right with u[0] = 1 in the first and w[0] = 1 in the second.
+struct BulgeReflection {
+    double q, r, x, y, z;
+
+    template <class L, int Size>
+    QX_INLINE void ofRows(DBL *row, std::ptrdiff_t stride) const {
+        const L a = L::load(row), b = L::load(row + stride);
+        L p = a + b * L(q);
+        if constexpr (Size == 3) {
+            const L c = L::load(row + 2 * stride);
+            p = p + c * L(r);
+            (c - p * L(z)).store(row + 2 * stride);
+        }
+        (a - p * L(x)).store(row);
+        (b - p * L(y)).store(row + stride);
+    }
+    template <int Size>
+    QX_INLINE void ofColumns(DBL *row) const {
+        double p = row[0] * x + row[1] * y;
+        if constexpr (Size == 3) {
+            p = p + row[2] * z;
+            row[2] -= p * r;
+        }
+        row[0] -= p;
+        row[1] -= p * q;
+    }
+};
+
+// A vector that is loaded should not straddle elements that were stored apart just before, which
+// the processor has to wait for. So vectors start at fixed columns, and the elements next to the
+// diagonal, which column reflections store one by one, are loaded so. The rows from which the next
+// reflection is formed are processed first.
+template <int Size>
+static QX_INLINE void ReflectBulge(DBL *h, std::ptrdiff_t stride, int32_t top, int32_t k,
+                                   int32_t last, const BulgeReflection &by) {
+    const int32_t end = last + 1;
+    DBL *const row = h + k * stride;
+    int32_t j = k;
+    for (; j < end && (j < k + 3 || j % 2 != 0); ++j)
+        by.ofRows<Lanes<1>, Size>(row + j, stride);
+    const int32_t bottom = last < k + 3 ? last : k + 3;
+    for (int32_t i = bottom; i >= k; --i)
+        by.ofColumns<Size>(h + i * stride + k);
+    for (; j + 2 <= end && j % nativeLanes != 0; j += 2)
+        by.ofRows<Lanes<2>, Size>(row + j, stride);
+    for (; j + nativeLanes <= end; j += nativeLanes)
+        by.ofRows<Lanes<nativeLanes>, Size>(row + j, stride);
+    for (; j + 2 <= end; j += 2)
+        by.ofRows<Lanes<2>, Size>(row + j, stride);
+    if (j < end)
+        by.ofRows<Lanes<1>, Size>(row + j, stride);
+    for (int32_t i = k - 1; i >= top; --i)
+        by.ofColumns<Size>(h + i * stride + k);
+}
+
+void ChaseBulge(DBL *h, std::ptrdiff_t stride, int32_t top, int32_t first, int32_t last,
+                const double *column) {
+    double a = column[0], b = column[1], c = column[2];
+    for (int32_t k = first; k < last; ++k) {
+        DBL *const row = h + k * stride;
+        double scale = 1.0;
+        if (k != first) {
+            a = row[k - 1];
+            b = row[stride + k - 1];
+            c = k == last - 1 ? 0.0 : double(row[2 * stride + k - 1]);
+            scale = __builtin_fabs(a) + __builtin_fabs(b) + __builtin_fabs(c);
+            if (scale == 0.0)
+                continue;
+            a /= scale;
+            b /= scale;
+            c /= scale;
+        }
+        const double s = __builtin_copysign(__builtin_sqrt(a * a + b * b + c * c), a);
+        if (k != first)
+            row[k - 1] = -s * scale;
+        else if (top != first)
+            row[k - 1] = -row[k - 1];
+        if (s == 0.0)
+            continue;
+        a += s;
+        const BulgeReflection by = {b / a, c / a, a / s, b / s, c / s};
+        if (k == last - 1)
+            ReflectBulge<2>(h, stride, top, k, last, by);
+        else
+            ReflectBulge<3>(h, stride, top, k, last, by);
     }
 }
 

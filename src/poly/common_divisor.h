@@ -33,6 +33,12 @@ public:
 
 private:
     std::ptrdiff_t width() const { return cols_ + 1; }
+    // The real parts as a matrix at the place of the triangle, if there are no others and no
+    // product of two elements overflows.
+    bool copyRealParts() const;
+    template <ElementType E>
+    ErrorCode solveWith(const ElementOf<E> *augmented, ElementOf<E> *triangle, CDB *x) const;
+
     ComplexVector augmented_, triangle_;
     ScratchParts memory_;
     std::ptrdiff_t rows_ = 0, cols_ = 0;
@@ -45,10 +51,16 @@ class CommonDivisor {
 public:
     ErrorCode allocate(int32_t maxDegree);
 
+    // p is not copied and must outlive this.
+    void begin(const CDB *p, int32_t n, double tolerance);
     // Finds the smallest degree of v, up to `largest`, for which the errors of the coefficients of
     // the products are at most `tolerance`, relative to coefficients above 1 and absolute for
-    // others. Degree n always qualifies, with u = 1.
-    ErrorCode find(const CDB *p, int32_t n, int32_t largest, double tolerance);
+    // others. Degree n always qualifies, with u = 1. A search that found nothing may be continued
+    // with a larger `largest`.
+    ErrorCode search(int32_t largest);
+    // A guess of the degree that the search finds, of n^2 operations: it says where to look first,
+    // and decides nothing.
+    int32_t likelyQuotientDegree();
     bool isFound() const { return quotientDegree_ >= 0; }
     int32_t quotientDegree() const { return quotientDegree_; }
     const CDB *divisor() const { return unknowns_.data(); } // u, of degree n - quotientDegree
@@ -56,7 +68,7 @@ public:
     double error() const { return residual_; }
 
 private:
-    ErrorCode tryDegree(int32_t k, double tolerance, bool *isDivisor);
+    ErrorCode tryDegree(int32_t k, bool *isDivisor);
     ErrorCode firstGuess();
     ErrorCode refine();
     void setUpStep();
@@ -67,8 +79,9 @@ private:
     CDB *v() const { return u() + (n_ - degree_ + 1); }
     CDB *w() const { return v() + (degree_ + 1); }
 
-    int32_t n_ = 0, degree_ = 0;
+    int32_t n_ = 0, degree_ = 0, tried_ = 0;
     int32_t quotientDegree_ = -1;
+    double tolerance_ = 0.0;
     double residual_ = 0.0;
     const CDB *p_ = nullptr;
     SylvesterMatrices sylvester_;

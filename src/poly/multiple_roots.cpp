@@ -92,10 +92,7 @@ private:
 };
 
 // Roots count as distinct unless they are exactly equal.
-ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, MultipleRoots &roots) {
-    CDB *const values = roots.simple.data(); // read before they are overwritten
-    if (const ErrorCode failed = CompanionRoots(p, degree, values))
-        return failed;
+void TakeEigenvalues(const CDB *values, int32_t degree, MultipleRoots &roots) {
     roots.count = 0;
     for (int32_t i = 0; i < degree; ++i) {
         const CDB value = values[i];
@@ -108,7 +105,6 @@ ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, MultipleRoots &roots) {
         else
             Append(roots, value, 1);
     }
-    return 0;
 }
 
 // ErrIterationLimit if the steps do not converge.
@@ -134,10 +130,17 @@ ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, doub
     if (const ErrorCode failed = normalised.assign(ascending, degree))
         return failed;
     const CDB *const p = normalised.coefficients();
+    Scratch<ElementType::CDB> eigenvalues;
+    if (const ErrorCode failed = eigenvalues.allocate(degree))
+        return failed;
     if (const ErrorCode failed = GCDRootStructure(p, degree, tolerance, roots.simple.data(),
                                                   roots.multiplicity.data(), &roots.count))
         return failed;
     bool isFound = DegreeOf(roots) == degree;
+    // If all roots are simple, they are the eigenvalues, in the order in which those were found.
+    const bool areEigenvalues = roots.count == degree;
+    for (int32_t i = 0; areEigenvalues && i < degree; ++i)
+        eigenvalues[i] = roots.simple[i];
     if (isFound && refines) {
         const ErrorCode status = Refine(p, degree, tolerance, roots);
         if (status != 0 && status != ErrIterationLimit)
@@ -147,9 +150,12 @@ ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, doub
         for (int32_t i = 0; i < roots.count; ++i)
             roots.refined[i] = roots.simple[i];
     }
-    if (!isFound)
-        if (const ErrorCode failed = TakeEigenvalues(p, degree, roots))
-            return failed;
+    if (!isFound) {
+        if (!areEigenvalues)
+            if (const ErrorCode failed = CompanionRoots(p, degree, eigenvalues.data()))
+                return failed;
+        TakeEigenvalues(eigenvalues.data(), degree, roots);
+    }
     Scale(roots, normalised.sigma());
     if (isFound && refines)
         DropRoundingErrors(degree, roots);

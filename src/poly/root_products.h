@@ -15,11 +15,6 @@ namespace qx {
 class GrowingProduct {
 public:
     GrowingProduct(CDB *coefficients) : a_(coefficients) { a_[0] = {1.0, 0.0}; }
-    GrowingProduct(CDB *coefficients, const GrowingProduct &other)
-        : a_(coefficients), degree_(other.degree_) {
-        for (int32_t i = 0; i <= degree_; ++i)
-            a_[i] = other.a_[i];
-    }
     void multiply(CDB root) {
         a_[degree_ + 1] = {};
         SubtractShifted(root, degree_ + 1, a_);

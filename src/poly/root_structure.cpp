@@ -6,6 +6,7 @@
 #include "poly/common_divisor.h"
 #include "poly/complex_arithmetic.h"
 #include "poly/root_products.h"
+#include "poly/simple_roots.h"
 
 #include <algorithm>
 #include <cmath>
@@ -63,9 +64,10 @@ public:
     ErrorCode allocate() {
         const int64_t length = int64_t{degree_} + 1;
         DBL *distances;
-        if (const ErrorCode failed = memory_.take(Sized(product_, length), Sized(others_, length),
-                                                  Sized(change_, count_), Sized(best_, count_),
-                                                  Sized(order_, count_), Sized(distances, count_)))
+        if (const ErrorCode failed =
+                memory_.take(Sized(product_, length), Sized(others_, length),
+                             Sized(change_, count_), Sized(best_, count_), Sized(order_, count_),
+                             Sized(row_, count_), Sized(distances, count_)))
             return failed;
         LejaOrder(
             count_, [this](int32_t j) { return std::log(ScaledHypot(roots_[j])); },
@@ -76,6 +78,7 @@ public:
 
     // Takes the step and sets its relative size, or returns the code with which it failed.
     ErrorCode step(double *size) {
+        setUpStep();
         if (const ErrorCode failed = system_.solve(change_))
             return failed;
         double ofChange = 0.0, ofRoots = 0.0;
@@ -102,34 +105,52 @@ public:
         return leastError_;
     }
 
-    // Sets up the next step, and the backward error of the current roots. With s the product of (x
-    // - root)^(multiplicity - 1), the polynomial is s times all x - root, and its derivative with
-    // respect to root j is -multiplicity s times all of these but the j-th.
-    void setUp() {
-        GrowingProduct before =
-            multiplyPowers(product_); // times the factors before the one left out
-        system_.reset(degree_, count_);
-        for (int32_t k = 0; k < count_; ++k) {
-            GrowingProduct rest(others_, before);
-            for (int32_t i = k + 1; i < count_; ++i)
-                rest.multiply(roots_[order_[i]]);
-            const int32_t j = order_[k];
-            for (int32_t i = 0; i < degree_; ++i)
-                system_.at(i, j) = others_[i] * -double(multiplicities_[j]);
-            before.multiply(roots_[j]);
-        }
+    // Multiplies the factors and measures the backward error of the current roots.
+    void multiply() {
+        GrowingProduct product = multiplyPowers(product_);
+        for (int32_t k = 0; k < count_; ++k)
+            product.multiply(roots_[order_[k]]);
         error_ = 0.0;
         for (int32_t i = 0; i < degree_; ++i) {
-            const double size = Modulus(p_[i + 1]), weight = size > 1.0 ? 1.0 / size : 1.0;
-            system_.right(i) = product_[i + 1] - p_[i + 1];
-            const double off = Modulus(system_.right(i)) * weight;
+            const double off = Modulus(product_[i + 1] - p_[i + 1]) * weight(i);
             if (!(off <= error_) && error_ == error_)
                 error_ = off; // a NaN is kept
-            system_.scaleRow(i, weight);
         }
     }
 
 private:
+    double weight(int32_t i) const {
+        const double size = Modulus(p_[i + 1]);
+        return size > 1.0 ? 1.0 / size : 1.0;
+    }
+    // With s the product of (x - root)^(multiplicity - 1), the polynomial is s times all x - root,
+    // and its derivative with respect to root j is -multiplicity s times all of these but the j-th.
+    // Row i of the system has coefficient i + 1 of the polynomial, row i of `system_` meanwhile
+    // coefficient i of the products without one factor, in Leja's order: column k is complete once
+    // all factors after the k-th have been multiplied to it.
+    void setUpStep() {
+        system_.reset(degree_, count_);
+        GrowingProduct before = multiplyPowers(others_); // times the factors before the next one
+        int32_t length = degree_ - count_ + 1;
+        for (int32_t k = 0; k < count_; ++k, ++length) {
+            const CDB root = roots_[order_[k]];
+            for (std::ptrdiff_t i = length - 1; k > 0 && i > 0; --i)
+                SubtractMultiple(root, k, &system_.at(i - 1, 0), &system_.at(i, 0));
+            for (std::ptrdiff_t i = 0; i < length; ++i)
+                system_.at(i, k) = others_[i];
+            before.multiply(root);
+        }
+        for (int32_t i = 0; i < degree_; ++i) {
+            const double factor = weight(i);
+            for (int32_t k = 0; k < count_; ++k)
+                row_[k] = system_.at(i, k);
+            for (int32_t k = 0; k < count_; ++k) {
+                const int32_t j = order_[k];
+                system_.at(i, j) = row_[k] * -double(multiplicities_[j]) * factor;
+            }
+            system_.right(i) = (product_[i + 1] - p_[i + 1]) * factor;
+        }
+    }
     GrowingProduct multiplyPowers(CDB *coefficients) const {
         GrowingProduct product(coefficients);
         bool isComplete = false;
@@ -150,7 +171,8 @@ private:
     const I32 *multiplicities_;
     int32_t degree_, count_;
     double error_ = 0.0, leastError_ = kInfinity;
-    CDB *product_ = nullptr, *others_ = nullptr, *change_ = nullptr, *best_ = nullptr;
+    CDB *product_ = nullptr, *others_ = nullptr, *change_ = nullptr, *best_ = nullptr,
+        *row_ = nullptr;
     I32 *order_ = nullptr;
     ScratchParts memory_;
     LeastSquaresSystem system_;
@@ -172,7 +194,10 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
     constexpr double errorGrowth = 100.0;
     *rootCount = 0;
     CommonDivisor divisor;
+    SimpleRootsProof proof;
     if (const ErrorCode failed = divisor.allocate(degree))
+        return failed;
+    if (const ErrorCode failed = proof.allocate(degree))
         return failed;
     Scratch<Complex> work;
     if (const ErrorCode failed = work.allocate(2 * int64_t{degree} + 1))
@@ -182,14 +207,34 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
         current[i] = p[i];
     int32_t left = degree, largest = degree;
     for (int32_t level = 1; left > 0; ++level) {
-        if (const ErrorCode failed = divisor.find(current, left, largest, tolerance))
-            return failed;
-        if (!divisor.isFound())
-            break;
-        const int32_t count = divisor.quotientDegree();
         CDB *const target = level == 1 ? roots : found;
-        if (const ErrorCode failed = CompanionRoots(divisor.quotient(), count, target))
-            return failed;
+        // Most polynomials have simple roots only, and then the search for a divisor takes most of
+        // the time: it is made if the roots do not prove that there is none. It begins before them
+        // if a divisor is likely.
+        const bool mayBeSimple = left <= largest;
+        bool hasRoots = false, isSimple = false;
+        divisor.begin(current, left, tolerance);
+        const int32_t likely = mayBeSimple ? divisor.likelyQuotientDegree() : left;
+        if (likely < left - 1)
+            if (const ErrorCode failed = divisor.search(likely + 1))
+                return failed;
+        if (!divisor.isFound() && mayBeSimple) {
+            const ErrorCode status = CompanionRoots(current, left, target);
+            if (status == ErrOutOfMemory)
+                return status;
+            hasRoots = status == 0;
+            isSimple = hasRoots && proof.holds(current, left, tolerance, target);
+        }
+        if (!divisor.isFound() && !isSimple) {
+            if (const ErrorCode failed = divisor.search(largest))
+                return failed;
+            if (!divisor.isFound())
+                break;
+        }
+        const int32_t count = isSimple ? left : divisor.quotientDegree();
+        if (!(hasRoots && count == left))
+            if (const ErrorCode failed = CompanionRoots(divisor.quotient(), count, target))
+                return failed;
         if (level == 1) {
             *rootCount = count;
             for (int32_t j = 0; j < count; ++j)
@@ -199,6 +244,8 @@ ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *
         }
         left -= count;
         largest = count;
+        if (left == 0)
+            break;
         for (int32_t i = 0; i <= left; ++i)
             current[i] = divisor.divisor()[i];
         tolerance = std::max(tolerance, errorGrowth * divisor.error());
@@ -213,12 +260,12 @@ ErrorCode PejorativeRefine(const CDB *p, int32_t degree, double tolerance, CDB *
     if (const ErrorCode failed = refinement.allocate())
         return failed;
     double before = kInfinity, size = 0.0;
-    refinement.setUp();
+    refinement.multiply();
     for (int32_t turn = 0; turn < stepLimit; ++turn) {
         refinement.keepIfBest();
         if (const ErrorCode failed = refinement.step(&size))
             return failed == ErrOutOfMemory ? failed : ErrIterationLimit;
-        refinement.setUp();
+        refinement.multiply();
         // Small steps that no longer decrease are rounding errors.
         if (!(size > 4.0 * kEpsilon && size < 0.5 * before) && turn > 0)
             break;

@@ -47,6 +47,17 @@ void SubtractShifted(CDB factor, int32_t count, CDB *a) {
     }
 }
 
+void SubtractMultiple(CDB factor, std::ptrdiff_t n, const CDB *x, CDB *y) {
+    const DBL *const from = Parts(x);
+    DBL *const to = Parts(y);
+    std::ptrdiff_t j = 0;
+    for (; j + nativeLanes <= 2 * n; j += nativeLanes)
+        (L::load(to + j) - Product(factor.re, factor.im, L::load(from + j))).store(to + j);
+    for (; j < 2 * n; j += 2)
+        (Lanes<2>::load(to + j) - Product(factor.re, factor.im, Lanes<2>::load(from + j)))
+            .store(to + j);
+}
+
 void SubtractFourColumns(const CDB *columns, std::ptrdiff_t stride, const CDB *factors,
                          std::ptrdiff_t n, CDB *x) {
     std::ptrdiff_t j = 0;

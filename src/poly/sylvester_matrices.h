@@ -78,6 +78,9 @@ QX_BY_WIDTH(void, ReflectPairs,
 // a[i] -= factor a[i - 1] for i = count to 1, in this order.
 QX_BY_WIDTH(void, SubtractShifted, (CDB factor, int32_t count, CDB *a))
 
+// y[k] -= factor x[k] for k = 0 to n - 1.
+QX_BY_WIDTH(void, SubtractMultiple, (CDB factor, std::ptrdiff_t n, const CDB *x, CDB *y))
+
 } // namespace qx
 
 #endif

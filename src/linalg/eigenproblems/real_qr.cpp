@@ -182,11 +182,15 @@ private:
             if (i > m + 2)
                 at(i, i - 3) = 0.0;
         }
+        if (!wantsVectors_) {
+            ChaseBulge(h_.data(), h_.stride(), l, m, last, p);
+            return;
+        }
         for (int32_t k = m; k < last; ++k)
             chase(l, m, k, last, p);
     }
 
-    // Moves the bulge on from row k.
+    // Moves the bulge on from row k, in the whole matrix.
     void chase(int32_t l, int32_t m, int32_t k, int32_t last, double p[3]) {
         const int32_t size = k == last - 1 ? 2 : 3;
         double scale = 1.0;
@@ -211,13 +215,11 @@ private:
         const double x = p[0] / s, y = p[1] / s, z = p[2] / s;
         const double q = p[1] / p[0], r = p[2] / p[0];
 
-        const int32_t from = k, to = wantsVectors_ ? n_ : last + 1;
         const SmallReflection rows{0, size, {1.0, q, r}, {x, y, z}};
-        ReflectRows(&at(k, from), h_.stride(), to - from, &rows, 1);
+        ReflectRows(&at(k, k), h_.stride(), n_ - k, &rows, 1);
         SmallReflection columns{k, size, {x, y, z}, {1.0, q, r}};
         vectors_.add(columns);
-        const int32_t top = wantsVectors_ ? 0 : l;
-        ReflectColumns(&at(top, 0), h_.stride(), std::min(last, k + 3) + 1 - top, &columns);
+        ReflectColumns(&at(0, 0), h_.stride(), std::min(last, k + 3) + 1, &columns);
     }
 
     RealMatrix h_;

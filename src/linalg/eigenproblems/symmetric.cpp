@@ -161,8 +161,7 @@ private:
     void accumulate() {
         SetIdentity<E>(basis_);
         for (int32_t i = 1; i < n_; ++i)
-            ReflectFromLeft<E>(basis_.block(0, 0, i, i), {matrix_.row(i), i}, Conj(kappa_[i]),
-                               work_);
+            ReflectFromLeft<E>(basis_.block(0, 0, i, i), {matrix_.row(i), i}, Conj(kappa_[i]));
         CopyTransposed<E>(basis_, matrix_);
     }
 

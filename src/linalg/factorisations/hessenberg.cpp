@@ -27,7 +27,7 @@ ErrorCode ReduceToHessenberg(const MatrixView<E> &a, int32_t low, int32_t high,
             v[i] = a(k + 1 + i, k);
         first[k] = v[0];
         *below = ScalarOf<E>::Of(reflection.beta);
-        ReflectFromLeft<E>(a.block(k + 1, k + 1, rows, n - k - 1), v, reflection.kappa, work);
+        ReflectFromLeft<E>(a.block(k + 1, k + 1, rows, n - k - 1), v, reflection.kappa);
         ReflectFromRight<E>(a.block(0, k + 1, high + 1, rows), v, Conj(reflection.kappa), work);
     }
 
@@ -41,7 +41,7 @@ ErrorCode ReduceToHessenberg(const MatrixView<E> &a, int32_t low, int32_t high,
             a(k + 1 + i, k) = T{};
         }
         if (!q.isEmpty())
-            ReflectFromLeft<E>(q.block(k + 1, k + 1, rows, rows), v, Conj(kappa[k]), work);
+            ReflectFromLeft<E>(q.block(k + 1, k + 1, rows, rows), v, Conj(kappa[k]));
     }
     return 0;
 }

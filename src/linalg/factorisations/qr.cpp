@@ -30,9 +30,9 @@ public:
     HouseholderQR(int32_t m, int32_t n) : m_(m), n_(n), count_(std::min(m, n)) {}
 
     ErrorCode take(const ConstMatrixView<E> &a) {
-        if (const ErrorCode failed = memory_.take(
-                SizedPadded(matrix_, m_, n_), Sized(kappa_, count_), Sized(first_, count_),
-                Sized(column_, m_), Sized(work_, int64_t{m_} + std::max(m_, n_))))
+        if (const ErrorCode failed =
+                memory_.take(SizedPadded(matrix_, m_, n_), Sized(kappa_, count_),
+                             Sized(first_, count_), Sized(column_, m_)))
             return failed;
         CopyMatrix<E>(a, matrix_);
         return 0;
@@ -84,7 +84,7 @@ public:
             for (int32_t i = k + 1; i < m_; ++i)
                 column_[i - k] = at(i)[k];
             ReflectFromLeft<E>(q.block(k, k, m_ - k, q.cols() - k), column_.part(0, m_ - k),
-                               Conj(kappa_[k]), work_);
+                               Conj(kappa_[k]));
         }
     }
 
@@ -101,7 +101,7 @@ private:
         first_[k] = at(k)[k];
         at(k)[k] = ScalarOf<E>::Of(reflection.beta);
         ReflectFromLeft<E>(matrix_.block(k, k + 1, m_ - k, n_ - k - 1), column_.part(0, m_ - k),
-                           reflection.kappa, work_);
+                           reflection.kappa);
     }
 
     void exchangeColumns(int32_t i, int32_t j) {
@@ -125,7 +125,7 @@ private:
     ScratchParts memory_;
     MatrixView<E> matrix_;
     VectorView<E> kappa_, first_; // the vectors' elements on the diagonal
-    VectorView<E> column_, work_;
+    VectorView<E> column_;
 };
 
 template <ElementType E>

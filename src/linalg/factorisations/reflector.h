@@ -48,22 +48,17 @@ public:
     Value kappa = ScalarOf<E>::Of(0.0);
 };
 
-// a becomes H a: a - v (v^H a) / kappa. `work` has at least rows + cols elements.
+// a becomes H a: a - v (v^H a) / kappa.
 template <ElementType E>
-void ReflectFromLeft(const MatrixView<E> &a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
-                     VectorView<E> work) {
-    const int32_t rows = a.rows(), cols = a.cols();
-    if (AbsSum(kappa) == 0.0 || cols < 1)
+void ReflectFromLeft(const MatrixView<E> &a, ConstVectorView<E> v,
+                     typename ScalarOf<E>::type kappa) {
+    QX_EXPECTS(v.size() == a.rows());
+    if (AbsSum(kappa) == 0.0 || a.cols() < 1)
         return;
-    const VectorView<E> conjugate = work.part(0, rows), product = work.part(rows, cols);
-    for (int32_t i = 0; i < rows; ++i)
-        conjugate[i] = Conj(v[i]);
-    for (ElementOf<E> &element : product)
-        element = {};
-    AddTransposedProduct<E>(a, conjugate, product);
-    for (ElementOf<E> &element : product)
-        element = -(element / kappa);
-    AddOuterProduct<E>(a, v, product);
+    if constexpr (E == ElementType::DBL)
+        ReflectFromLeftReal(a.data(), a.stride(), a.rows(), a.cols(), v.data(), kappa);
+    else
+        ReflectFromLeftComplex(a.data(), a.stride(), a.rows(), a.cols(), v.data(), kappa);
 }
 
 // a becomes a H: a - (a v) v^H / kappa. `work` has at least rows + cols elements.

@@ -159,7 +159,7 @@ private:
             setUnit(v, i);
             if (i > 0)
                 ReflectFromLeft<E>(v.block(i, i, n_ - i, n_ - i), {at(i - 1) + i, n_ - i},
-                                   Conj(rightKappa_[i - 1]), work_);
+                                   Conj(rightKappa_[i - 1]));
         }
     }
     void accumulateLeft(const MatrixView<E> &u) {
@@ -168,7 +168,7 @@ private:
             for (int32_t k = i; k < m_; ++k)
                 column_[k - i] = at(k)[i];
             ReflectFromLeft<E>(u.block(i, i, m_ - i, n_ - i), column_.part(0, m_ - i),
-                               Conj(leftKappa_[i]), work_);
+                               Conj(leftKappa_[i]));
         }
     }
     // Row i, and column i from the diagonal on, become those of the unit matrix.

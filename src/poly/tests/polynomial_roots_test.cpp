@@ -1,5 +1,8 @@
 #include "qx/polynomial_roots.h"
 
+#include "poly/common_divisor.h"
+#include "poly/root_structure.h"
+#include "poly/simple_roots.h"
 #include "qx/errors.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/recipe.h"
@@ -591,6 +594,129 @@ TEST(MultPolyRoots, WithoutAStructureTheRootsAreEigenvalues) {
     for (const Complex &root : exact.refined)
         expected.push_back({root, 1});
     EXPECT_LT(LargestError(loose.refined, expected), 1e-14);
+}
+
+// Where a careless proof of simple roots would skip the search: few roots among many, near the
+// limit of the tolerance, or with coefficients and roots of any size.
+TEST(MultPolyRoots, OneMultipleRootAmongManyIsFound) {
+    std::vector<Multiple> circle = {{0.5, 2}};
+    for (int k = 0; k < 40; ++k)
+        circle.push_back({std::polar(1.0 + 0.01 * (k % 5), 0.1 + 0.157 * k), 1});
+    const std::vector<Multiple> few = {{2, 3}, {-3, 1}, {{0, 1}, 1}, {{1, -2}, 1}};
+    for (const std::vector<Multiple> &example : {circle, few})
+        for (const double size : {1.0, 1e3, 1e-4}) {
+            std::vector<Multiple> roots = example;
+            for (Multiple &root : roots)
+                root.root *= size;
+            Complexes coefficients = Expanded(roots);
+            for (Complex &a : coefficients)
+                a *= 1e-30;
+            const Structure found = FindStructure(coefficients);
+            ASSERT_EQ(found.multiplicities.size(), roots.size());
+            EXPECT_EQ(found.multiplicities.back(), example[0].times);
+            EXPECT_LT(std::abs(found.refined.back() / roots[0].root - 1.0), 1e-10);
+        }
+}
+
+TEST(MultPolyRoots, TheDistanceFromAMultipleRootDecides) {
+    const auto count = [](double distance, double tolerance) {
+        return FindStructure(Product({1, 1 + distance, -2, {0, 1.5}, {0.5, -1}}), Refined,
+                             tolerance)
+            .refined.size();
+    };
+    EXPECT_EQ(count(1e-7, 1e-10), 4U);
+    EXPECT_EQ(count(1e-6, 1e-10), 4U);
+    EXPECT_EQ(count(1e-3, 1e-10), 5U);
+    EXPECT_EQ(count(1e-3, 1e-5), 4U);
+    EXPECT_EQ(count(0.1, 1e-5), 5U);
+    // Ill-conditioned, but simple.
+    for (const int degree : {8, 12, 16}) {
+        Complexes roots;
+        for (int k = 1; k <= degree; ++k)
+            roots.emplace_back(k);
+        EXPECT_EQ(FindRealStructure(Product(roots)).multiplicities,
+                  std::vector<int32_t>(degree, 1));
+    }
+}
+
+// p with descending coefficients, and whether its eigenvalues prove that its roots are simple.
+bool IsProvedSimple(const Complexes &p, double tolerance) {
+    std::vector<CDB> a;
+    for (const Complex &coefficient : p)
+        a.push_back({coefficient.real(), coefficient.imag()});
+    const auto n = static_cast<int32_t>(a.size()) - 1;
+    std::vector<CDB> roots(a.size());
+    EXPECT_EQ(CompanionRoots(a.data(), n, roots.data()), 0);
+    SimpleRootsProof proof;
+    EXPECT_EQ(proof.allocate(n), 0);
+    const bool holds = proof.holds(a.data(), n, tolerance, roots.data());
+    roots[0].re += 1.0; // proves nothing
+    EXPECT_FALSE(proof.holds(a.data(), n, tolerance, roots.data()));
+    roots[0] = roots[1];
+    EXPECT_FALSE(proof.holds(a.data(), n, tolerance, roots.data()));
+    return holds;
+}
+
+// Polynomials with a double root, moved by up to the tolerance, are never proved simple; those
+// whose roots are far apart always are.
+TEST(SimpleRootsProof, HoldsOnlyAwayFromMultipleRoots) {
+    qx::test::Noise noise(5);
+    for (int round = 0; round < 120; ++round) {
+        const int others = 1 + round % 40;
+        const bool isReal = round % 2 == 0;
+        const double tolerance = std::pow(10.0, -4.0 - round % 3 * 3);
+        Complexes roots = {0.8, 0.8};
+        for (int k = 0; k < others; ++k)
+            roots.push_back(isReal && others < 8
+                                ? Complex(2 * noise.symmetric())
+                                : std::polar(1.0 + 0.2 * noise.symmetric(), 3.1 * (k + 0.5)));
+        Complexes p = Product(roots);
+        std::reverse(p.begin(), p.end());
+        for (std::size_t k = 1; k < p.size(); ++k) {
+            const double by = 0.95 * tolerance * std::max(1.0, std::abs(p[k]));
+            p[k] += round % 4 < 2 ? std::copysign(by, noise.symmetric()) : 0.0;
+        }
+        EXPECT_FALSE(IsProvedSimple(p, tolerance)) << round;
+    }
+    for (int degree = 2; degree <= 60; degree += 2) {
+        Complexes p(degree + 1);
+        for (Complex &coefficient : p)
+            coefficient = {0.1 * noise.symmetric() / degree, 0.1 * noise.symmetric() / degree};
+        p[0] = 1;
+        p[degree] += Complex(0, 1);
+        EXPECT_TRUE(IsProvedSimple(p, 1e-10)) << degree;
+        EXPECT_FALSE(IsProvedSimple(p, 1e-2)) << degree;
+    }
+}
+
+// Real systems are solved in real arithmetic. The factor i of a row changes no solution, but makes
+// the system complex.
+TEST(LeastSquaresSystem, RealAndComplexSystemsHaveTheSameSolution) {
+    qx::test::Noise noise(7);
+    for (const double size : {1.0, 1e-120, 1e120}) {
+        constexpr int rows = 9, cols = 4;
+        LeastSquaresSystem real, turned;
+        ASSERT_EQ(real.allocate(rows, cols), 0);
+        ASSERT_EQ(turned.allocate(rows, cols), 0);
+        real.reset(rows, cols);
+        turned.reset(rows, cols);
+        for (int i = 0; i < rows; ++i)
+            for (int j = 0; j <= cols; ++j) {
+                const double value = size * noise.symmetric();
+                real.at(i, j) = {value, 0.0};
+                turned.at(i, j) = i % 2 == 0 ? CDB{0.0, value} : CDB{value, 0.0};
+            }
+        CDB x[cols], y[cols];
+        ASSERT_EQ(real.solve(x), 0);
+        ASSERT_EQ(turned.solve(y), 0);
+        for (int j = 0; j < cols; ++j) {
+            EXPECT_NEAR(x[j].re, y[j].re, 1e-14);
+            EXPECT_NEAR(y[j].im, 0.0, 1e-14);
+            EXPECT_EQ(x[j].im, 0.0);
+        }
+        real.at(0, 0).re = HUGE_VAL;
+        EXPECT_EQ(real.solve(x), ErrNonFiniteInput);
+    }
 }
 
 TEST(MultPolyRoots, RootsAtZeroAndLowDegrees) {
