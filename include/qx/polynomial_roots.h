@@ -87,8 +87,9 @@ QX_API ErrorCode CxPolyRoots2026_head(QX_IN CDB1D coef, QX_OUT CDB1D roots, QX_O
 
     The time grows with the cube of the degree, and up to its fourth power if many divisors are
     tried in vain. The memory is about 10 complex numbers times the square of the degree. Measured
-    with random coefficients: 0.3 s at degree 200, 12 s and about 75 MB at degree 700; 94 s at
-    degree 700 with coefficients that decrease like exp(-k^2 / 7000).
+    with random coefficients, whose roots are soon proved to be simple: 0.02 s at degree 200, 4 s and
+    about 75 MB at degree 700; 21 s at degree 700 with coefficients that decrease like exp(-k^2 /
+    7000).
     Codes: ErrEmptyInput (coef is empty), ErrOutOfMemory (no memory, or the host refuses an output),
     ErrBadCoefficients (a coefficient is not finite), ErrAllCoefficientsZero (all coefficients are
     0), ErrOrderNotPositive (the polynomial is constant), ErrNonFiniteInput (the polynomial
