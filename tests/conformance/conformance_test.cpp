@@ -361,9 +361,9 @@ TEST_P(Conformance, TheHostMayExchangeWordsWithinAResize) {
     CheckBlocks();
 }
 
-// A sanitizer sees what threads share in the first rounds already.
+// A sanitizer sees what threads share in the first round.
 #if defined(__SANITIZE_THREAD__) || defined(__SANITIZE_ADDRESS__)
-constexpr int threadRounds = 2;
+constexpr int threadRounds = 1;
 #else
 constexpr int threadRounds = 5;
 #endif
