@@ -51,7 +51,7 @@ bool SimpleRootsProof::measureDistances(const CDB *roots, int32_t n) {
             least = std::min(least, distance);
             product_[j] *= distance;
             inverses_[j] += inverse;
-            least_[j] = std::min<double>(least_[j], distance);
+            least_[j] = std::min(double(least_[j]), distance);
             if (!IsInRange(distance) || !IsInRange(product) || !IsInRange(product_[j]))
                 return false;
         }
