@@ -114,7 +114,7 @@ class Julia(Language):
 
 
 @unittest.skipUnless("QX_TEST_OCTAVE" in os.environ and installed("mkoctfile", "octave-cli"),
-                     "compiles for a minute: QX_TEST_OCTAVE=1, with Debian's octave-dev")
+                     "compiles for a minute and needs Debian's octave-dev: QX_TEST_OCTAVE=1")
 class Octave(Language):
     def test_first_call(self):
         self.run_in("mkoctfile", "-std=c++20", "-O0", "octave/qx.cc", f"-I{SOURCE}/include", f"-I{BUILD}/include",
@@ -128,4 +128,4 @@ class Octave(Language):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

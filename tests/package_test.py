@@ -314,4 +314,4 @@ class Source(InAFolder):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped
