@@ -1,7 +1,8 @@
 // Ten engineering tasks with the functions by topics. Each task prints the error of its result, and the program
 // fails if an error exceeds its limit.
 //
-//     c++ -std=c++20 -Iinclude -Ibuild/release/include examples/ten_tasks.cpp -Lbuild/release -lqxanalysis -lqxrt
+//     c++ -std=c++20 -Iinclude -Ibuild/release/include examples/ten_tasks.cpp
+//         -Lbuild/release -Wl,-rpath,$PWD/build/release -lqxanalysis -lqxrt
 
 #include "qx/qx.hpp"
 

@@ -86,15 +86,38 @@ class CSharp(Language):
         self.assertEqual(self.run_in("mono", "Sizes.exe"), self.sizes_in_c())
 
 
+# A record that a call changes, and one without gaps.
+JULIA_RECORDS = """
+import QXAnalysis
+const QX = QXAnalysis
+x, state = QX.array([0.0, 1, 0]), Ref(QX.TriggerState(0, 0, 0, 0, 0.0))
+index, position = Ref(Int32(0)), Ref(0.0)
+QX.Triggerh_86(x, 0.5, 0.0, 0, 0, 0, state, index, position)
+println("trigger ", index[], " ", state[].hasLast)
+status = Ref(QX.WorkspaceStatus(1, QX.ErrOutOfMemory))
+QX.EnableAnalysisWorkspaceH(status)
+println("status ", status[].status, " ", QX.error_name(status[].code))
+"""
+
+
 class Julia(Language):
-    DUE = ["mean 5.0", "modes [4.0] (code 0)", "order 0: ErrOrderNotPositive"]
+    DUE = ["mean 5.0", "modes [4.0] (code 0)", "order 0: ErrOrderNotPositive", "trigger 1 1", "status 1 ErrOutOfMemory"]
+
+    def setUp(self):
+        super().setUp()
+        names = [name for name in RECORDS if name not in bindings.JULIA]  # complex numbers are Julia's own
+        (self.folder / "records.jl").write_text(JULIA_RECORDS + "".join(
+            f'println("{name} ", sizeof(QX.{name}))\n' for name in names), "utf-8")
+        self.due = self.DUE + [line for line in self.sizes_in_c() if line.split()[0] in names]
 
     @unittest.skipUnless(installed("julia"), "julia is not installed; Debian 12 has no package")
-    def test_first_call(self):
-        self.assertEqual(self.run_in("julia", "--project=julia", "julia/first_call.jl"), self.DUE)
+    def test_first_call_and_records(self):
+        found = [*self.run_in("julia", "--project=julia", "julia/first_call.jl"),
+                 *self.run_in("julia", "--project=julia", "records.jl")]
+        self.assertEqual(found, self.due)
 
     @unittest.skipUnless("QX_TEST_OTHER_DEBIAN" in os.environ, "needs a network and minutes: QX_TEST_OTHER_DEBIAN=1")
-    def test_first_call_with_the_julia_of_debian_11(self):
+    def test_with_the_julia_of_debian_11(self):
         made = subprocess.run([SOURCE / "tools/setup/other-root", "bullseye"], stdout=subprocess.PIPE, text=True)
         if made.returncode:
             self.skipTest("a bullseye root cannot be made here")
@@ -105,27 +128,35 @@ class Julia(Language):
         shutil.copy("/etc/resolv.conf", root / "etc/resolv.conf")
         inside = """which julia >/dev/null || { apt-get update -qq && apt-get install -y -qq --no-install-recommends julia
             } >/tmp/julia.log 2>&1
-            cd /opt/bindings && HOME=/tmp QX_LIBRARY_DIR=/opt/libraries julia --project=julia julia/first_call.jl"""
+            cd /opt/bindings && export HOME=/tmp QX_LIBRARY_DIR=/opt/libraries
+            for program in julia/first_call.jl records.jl; do julia --project=julia $program; done"""
         # Julia needs /proc. What is mounted in a separate namespace disappears with it.
         shown = self.run_in("unshare", "--mount", "--propagation", "private", "sh", "-ec", f"""
             mount -t proc proc {root}/proc && mount --bind /dev {root}/dev
             DEBIAN_FRONTEND=noninteractive exec env -u LD_LIBRARY_PATH chroot {root} sh -ec '{inside}'""")
-        self.assertEqual(shown[-3:], self.DUE)
+        self.assertEqual(shown[-len(self.due):], self.due)
 
 
 @unittest.skipUnless("QX_TEST_OCTAVE" in os.environ and installed("mkoctfile", "octave-cli"),
-                     "compiles for a minute: QX_TEST_OCTAVE=1, with Debian's octave-dev")
+                     "compiles for a minute and needs Debian's octave-dev: QX_TEST_OCTAVE=1")
 class Octave(Language):
     def test_first_call(self):
         self.run_in("mkoctfile", "-std=c++20", "-O0", "octave/qx.cc", f"-I{SOURCE}/include", f"-I{BUILD}/include",
                     f"-L{BUILD}", "-lqxanalysis", "-lqxrt")
         found = self.run_in("octave-cli", "--path", self.folder, "octave/first_call.m")
-        self.assertEqual(found, [*DUE, "Moment_head: The order, degree or number of taps is out of range; it must be "
-                                 "at least 1. (ErrOrderNotPositive)", "residual 0"])
-        refused = subprocess.run(["octave-cli", "--path", self.folder, "--eval", 'qx ("Mean_head", 1, 2)'],
-                                 env=ENVIRONMENT, capture_output=True, text=True)
-        self.assertIn("Mean_head: 1 inputs are needed", refused.stderr)
+        self.assertEqual(found, ["mean 5", "modes [4]", "Moment_head: The order, degree or number of taps is out of "
+                                 "range; it must be at least 1. (ErrOrderNotPositive)", "residual 0"])
+        for call, message in (('"Mean_head", 1, 2', "Mean_head: 1 inputs are needed"),
+                              ('"Moment_head", [1 2], 1.5', "qx: input 2: 1.5 is not an integer of 32 bits"),
+                              ('"Moment_head", [1 2], NaN', "qx: input 2: nan is not an integer of 32 bits"),
+                              ('"Moment_head", [1 2], 1e12', "qx: input 2: 1000000000000 is not an integer of 32 bits"),
+                              ('"Moment_head", [1 2], 2i', "qx: input 2: a real number is needed"),
+                              ('"Moment_head", [1 2], [1 2]', "qx: input 2: one number is needed"),
+                              ('"Mean_head", [1 2i]', "qx: input 1: real numbers are needed")):
+            refused = subprocess.run(["octave-cli", "--path", self.folder, "--eval", f"qx ({call})"],
+                                     env=ENVIRONMENT, capture_output=True, text=True)
+            self.assertIn(message, refused.stderr, call)
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

@@ -82,4 +82,4 @@ class Boundary(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

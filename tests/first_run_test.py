@@ -494,4 +494,4 @@ if __name__ == "__main__":
         except OSError as error:
             print(f"SKIPPED: there is no pseudo-terminal here ({error}); nothing has run")
             sys.exit(SKIPPED)
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

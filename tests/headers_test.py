@@ -81,5 +81,5 @@ class Cpp(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    ran = unittest.main(exit=False).result
+    ran = unittest.main(exit=False, verbosity=2).result
     sys.exit(77 if ran.wasSuccessful() and ran.skipped else not ran.wasSuccessful())

@@ -1,5 +1,6 @@
 """Rules for every source of the tree that no compiler checks."""
 
+import os
 import re
 import sys
 import unittest
@@ -39,6 +40,13 @@ class House(unittest.TestCase):
             for path in (ROOT / f"include/qx/{topic}.h", family / f"recipes/{topic}.cpp", test):
                 self.assertTrue(path.exists(),
                                 f"{path.relative_to(ROOT)} for {exports.relative_to(ROOT)}")
+
+    def test_scripts_can_be_called_as_they_are_documented(self):
+        folders = ("bench", "debian", "docs", "src", "tests", "tools")
+        scripts = [path for place in (ROOT.glob("*"), *((ROOT / name).rglob("*") for name in folders)) for path in place
+                   if path.is_file() and path.open("rb").read(2) == b"#!"]
+        self.assertIn(ROOT / "tools/bindings.py", scripts)
+        self.assertEqual([str(path) for path in scripts if not os.access(path, os.X_OK)], [])
 
     def test_tests_left_out_under_emulators_exist(self):
         tests = {f"{suite}.{name}" for path in (ROOT / "src").glob("*/tests/*.cpp")

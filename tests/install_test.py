@@ -139,4 +139,4 @@ class Readme(Using):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

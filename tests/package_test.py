@@ -181,6 +181,15 @@ def unpacked(wheel, folder):
                 path.chmod(0o755)
 
 
+def python_files():
+    """The files of the Python package that every package must contain; the stubs are made anew."""
+    place = SOURCE / "python/qx"
+    found = {str(path.relative_to(place)) for path in place.rglob("*")
+             if path.is_file() and "__pycache__" not in path.parts and path.suffix != ".pyi"}
+    assert {"page.css", "commands/report.py"} <= found
+    return found
+
+
 def made_wheel():
     return Path(run(SOURCE / "tools/package", "wheel").strip())
 
@@ -192,6 +201,7 @@ class Wheel(InAFolder):
         version = re.search(r"-py3-none-manylinux_2_(\d+)_x86_64\.whl$", wheel.name)
         self.assertLessEqual(int(version[1]), 17)
         unpacked(wheel, self.folder)
+        self.assertEqual({name for name in python_files() if not (self.folder / "qx" / name).exists()}, set())
         for name in ("libqxanalysis.so", "libqxrt.so", "print_hashes"):
             paths = re.findall(r"(?:RUNPATH|RPATH) +(\S+)", run("objdump", "-p", self.folder / "qx" / name))
             self.assertEqual(paths, ["$ORIGIN"], name)
@@ -216,6 +226,15 @@ class Wheel(InAFolder):
             "-static-libgcc", "-Wl,--gc-sections", f"-Wl,{wrapped}", "-o", "throws", cwd=self.folder)
         self.assertEqual(run(self.folder / "throws"), "caught\n")
         self.assertNotRegex(run("objdump", "-T", self.folder / "throws"), "_dl_find_object.*GLIBC")
+
+
+class DebianRules(InAFolder):
+    def test_the_python_package_is_complete(self):
+        if not Path("/usr/share/dpkg/architecture.mk").exists():
+            self.skipTest("dpkg-dev is not installed")
+        run("make", "-f", "debian/rules", "python-files", f"PYTHON={self.folder}", cwd=SOURCE)
+        self.assertEqual({str(path.relative_to(self.folder)) for path in self.folder.rglob("*") if path.is_file()},
+                         python_files())
 
 
 @unittest.skipUnless("QX_TEST_OTHER_DEBIAN" in os.environ, "needs a network and minutes: QX_TEST_OTHER_DEBIAN=1")
@@ -260,7 +279,10 @@ class OtherDebian(InAFolder):
         self.addCleanup(self.inside, root, "dpkg -P qxanalysis")
         self.inside(root, f"""export DEBIAN_FRONTEND=noninteractive; apt-get update -qq
             apt-get install -y --no-install-recommends /opt/{package.name}
-            dpkg --verify qxanalysis; dpkg -L qxanalysis >/tmp/listed""")
+            dpkg --verify qxanalysis""")
+        place = "/usr/lib/python3/dist-packages/qx/"
+        listed = self.inside(root, "dpkg -L qxanalysis").split("\n")
+        self.assertEqual({place + name for name in python_files()} - set(listed), set())
         shown = self.inside(root, """cd / && python3 -c 'import qx; print(qx.stats.mean([1.0, 3.0]), qx.__version__)'
             ls /usr/include/qx/qx.hpp /usr/include/qx/qx.h /usr/lib/*/pkgconfig/qxanalysis.pc
             ls /usr/share/doc/qxanalysis/licences/NOTICE.md /usr/share/doc/qxanalysis/README.md""")
@@ -292,4 +314,4 @@ class Source(InAFolder):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

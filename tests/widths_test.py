@@ -120,4 +120,4 @@ def lists(words):
 if __name__ == "__main__":
     NM, OBJDUMP, MODULE, *words = sys.argv[1:]
     OBJECTS = lists(words)
-    unittest.main(argv=sys.argv[:1])
+    unittest.main(argv=sys.argv[:1], verbosity=2)  # ./test names what is skipped

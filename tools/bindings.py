@@ -186,13 +186,35 @@ def julia_type(text, records):
     base = re.sub(r"\b(const|struct)\b|\*", "", text).strip()
     if "*" not in text:
         return JULIA.get(base, "Ptr{Cvoid}")
-    return f"Ptr{{{JULIA.get(base, 'Cvoid' if base in records else 'Ptr{Cvoid}')}}}"
+    return f"Ptr{{{JULIA.get(base, base if base in records else 'Ptr{Cvoid}')}}}"
+
+
+def julia_record(name, record):
+    fields = [(safe("julia", field), JULIA.get(kind) or julia_type(kind, {}) if count == 1 else
+               f"NTuple{{{count}, {JULIA[kind]}}}") for field, kind, count in fields_of(record)]
+    text = record.get("documentation", name).replace("\\", "\\\\").replace('"', '\\"').replace("$", "\\$")
+    yield f'\n"""\n    {name}({", ".join(field for field, _ in fields)})\n\n{text}\n"""\n'
+    if not record["packed"]:
+        yield f"struct {name}\n" + "".join(f"    {field}::{kind}\n" for field, kind in fields) + "end\n"
+        return
+    # Julia has no packed structures.
+    sizes = [f"sizeof({kind})" for _, kind in fields]
+    yield f"struct {name}\n    bytes::NTuple{{{' + '.join(sizes)}, UInt8}}\nend\n"
+    yield f"{name}({', '.join(field for field, _ in fields)}) =\n    {name}(packed(" \
+          + ", ".join(f"convert({kind}, {field})" for field, kind in fields) + "))\n"
+    yield f"function Base.getproperty(record::{name}, name::Symbol)\n    bytes = getfield(record, :bytes)\n"
+    for i, (field, kind) in enumerate(fields):
+        yield f"    name == :{field} && return part(bytes, {kind}, {' + '.join(sizes[:i]) or 0})\n"
+    yield "    getfield(record, name)\nend\n"
 
 
 def julia(catalogue):
     yield f"# {WARNING}\n\n"
     for code, number in catalogue["codes"].items():
         yield f"const {code} = Int32({number})\n"
+    for name, record in catalogue["records"].items():
+        if not name.startswith("Array") and name not in JULIA:
+            yield from julia_record(name, record)
     for export in catalogue["exports"]:
         names = [safe("julia", one["name"]) for one in export["arguments"]]
         kinds = [julia_type(one["type"], catalogue["records"]) for one in export["arguments"]]

@@ -17,11 +17,14 @@ from pathlib import Path
 ROOT = Path(__file__).resolve().parent.parent
 TABLE = ROOT / "python/qx/topical/newest.py"
 
-# Functions that the Python topics build from several calls, or have under another name, and that are one call here.
+# Functions that are one call here, and that Python builds from several calls or has under another name. A key with
+# None is no function here; if no other function calls its export, the top of the header says so.
 INSTEAD = {
     "linalg": {"solve": "EqsByLUDri_head", "solve_complex": "CxEqsByLUDri_head", "lu_solve": "LULinEqs_head",
                "lu_solve_complex": "CxLULinEqs_head", "inv": "InvMatrixLUDri_head", "inv_complex": "CxInvMatrixLUDri_head",
-               "solve_inverse": None, "solve_inverse_complex": None},
+               "solve_many": "EqsSetByLU2026_head", "solve_many_complex": "CxEqsSetByLU2026_head",
+               "solve_inverse": None, "solve_inverse_complex": None, "lu_inv": "LUInvMatrix_head",
+               "lu_inv_complex": "CxLUInvMatrix_head"},
     "filters": {"zero_phase": "zeroPhaseCascadeFiltH", "Filter_roots": None, "Filter_roots_complex": None,
                 "Filter_polynomial": None},
     "windows": {"get": None},
@@ -34,6 +37,8 @@ INSTEAD = {
     "measure": {"delay": None, "delay_spectrum": None, "sound_level": None},
     "fft": {"rfft_long": None, "fft_real": None, "fft_real_sized": None},
 }
+# Exports that a hand-written class calls.
+BY_HAND = {"PeakD": "peak_finder.hpp"}
 ENDINGS = ("_complex_single", "_complex", "_single")
 
 # Streams: the name of the class; hidden arguments, with their values in the first and in later calls (the plain
@@ -52,6 +57,14 @@ STREAMS = {
     "shift_frequency": ("FrequencyShiftStream", {}, ("phase",)),
     "zero_phase": (None, {"keepState": (0, 0)}, ("stateForward", "stateBackward")),
 }
+
+# Streams whose calls return more elements than their block has: the most for n elements.
+MOST = {
+    "resample": "mode_ == 1 ? detail::MostFrom(n, L_) : mode_ == 3 ? detail::MostFrom(n, L_, M_) : n",
+    "cic_interpolate": "detail::MostFrom(n, factor_)",
+}
+# Streams that restart a recurrence with each block.
+TO_ROUNDING = {"shift_frequency"}
 
 # Functions that are a special case of an export: the arguments with fixed values.
 FIXED = {
@@ -295,7 +308,9 @@ class Function:
         self.begins, self.kept = {**begins, **{name: (value, value) for name, value in self.fixed.items()}}, kept
         for one in export["arguments"]:
             if one["kind"] in ("opaque", "procedure", "buffer", "instance") or one.get("byAddress"):
-                raise LookupError(f"its argument {one['name']} has no form here")
+                form = {"opaque": "a pointer", "procedure": "a function", "buffer": "memory without a size",
+                        "instance": "instance data"}.get(one["kind"], "a handle by its address")
+                raise LookupError(f"its argument {one['name']} is {form}")
             if one["kind"] == "record" and any("dimensions" in field for field in RECORDS[one["element"]]["fields"]):
                 raise LookupError(f"its record {one['element']} holds arrays")
         self.arguments = [Argument(topic, base, one) for one in export["arguments"] if one["kind"] != "error"]
@@ -444,24 +459,35 @@ class Function:
             flags.append(f"const {kind} {name}_ = begun_ ? {kind}{{{later}}} : {kind}{{{first}}};")
             handed[name] = one.handed
         reset = "".join(f"        {one.name}_ = {{}};\n" for one in kept if not one.is_array)
+        most = MOST.get(self.base)
         for name, one in [("x_", x)] + [("y_", y)] * (y is not x):
             making.append(f"{name} = detail::Array1<{one.type}>(call);")
             members.append(f"detail::Array1<{one.type}> {name};")
-            reserving.append(f"        if (call.ready())\n            {name}.reserve(call, longest);\n")
+            count = "most(longest)" if most and one is y else "longest"
+            reserving.append(f"        if (call.ready())\n            {name}.reserve(call, \"longest\", {count});\n")
         parameters = self.parameters(of=fixed)
         made = "\n        ".join(making)
         flag_lines = "".join(f"        {line}\n" for line in flags)
         call = self.call(handed).replace("\n    ", "\n        ").rstrip()
         ended = self.ended().replace("\n    ", "\n        ")
         source = "x_" if y is x else "y_"
-        room = "" if y is x else "        y_.reserve(call, block.size());\n"
+        count = "most(block.size())" if most else "block.size()"
+        room = "" if y is x else f"        y_.reserve(call, \"block\", {count});\n" \
+            "        if (!call.ready())\n            return call.with(Found());\n"
+        most_text = "    // The most elements that a call returns for n elements.\n" \
+            f"    std::size_t most(std::size_t n) const {{\n        return {most};\n    }}\n" if most else ""
+        promise = "the results of all blocks together agree with those of one block to rounding" \
+            if self.base in TO_ROUNDING else \
+            "the results do not depend on the division into blocks, to the bit"
+        aliased = " `out` may be the block itself." if y.type == x.type else ""
+        state = "// The first block also allocates the state.\n" if any(one.is_array for one in kept) else ""
         member_lines = "".join(f"    {one}\n" for one in members)
         place = f"{self.topic.name}::{self.stream}"
-        return f"""// {self.name} for blocks of any size; the results do not depend on the division into blocks, to the bit.
+        return f"""// {self.name} for blocks of any size; {promise}.
 // A block that is not longer than the longest before it, or than `longest`, allocates no memory except the scratch
 // memory of the export, which is taken from the workspace if that is enabled (qx/frame.h). A stream may be used by
 // only one thread at a time.
-class {self.stream} {{
+{state}class {self.stream} {{
 public:
     explicit {self.stream}({parameters}{', ' if parameters else ''}std::size_t longest = 0) {{
         detail::Call call("{place}");
@@ -469,7 +495,7 @@ public:
 {''.join(reserving)}        made_ = call.status();
     }}
 
-    // Processes the next block and returns the part of `out` that is filled. `out` may be the block itself.
+    // Processes the next block and returns the part of `out` that is filled.{aliased}
     Returned<std::span<{y.type}>> operator()(Returning, std::span<const {x.type}> block, std::span<{y.type}> out) {{
         const Returned<std::span<const {y.type}>> found = step(block);
         detail::Call call("{place}");
@@ -492,7 +518,7 @@ public:
 {reset}    }}
 
 private:
-    Returned<std::span<const {y.type}>> step(std::span<const {x.type}> block) {{
+{most_text}    Returned<std::span<const {y.type}>> step(std::span<const {x.type}> block) {{
         typedef std::span<const {y.type}> Found;
         detail::Call call("{place}");
         if (made_.failed() || block.empty())
@@ -516,14 +542,19 @@ private:
 """
 
 
-def table():
+def everything():
+    """The exports of the Python topics by topic and key."""
     tree = ast.parse(TABLE.read_text("utf-8"))
     values = {node.targets[0].id: node.value for node in tree.body
               if isinstance(node, ast.Assign) and isinstance(node.targets[0], ast.Name)}
     found = ast.literal_eval(values["NEWEST"])
-    for topic, changes in INSTEAD.items():
-        found[topic] = {key: name for key, name in {**found[topic], **changes}.items() if name}
     return {topic: found[topic] for topic in ast.literal_eval(values["TOPICS"]) if topic in found}
+
+
+def table():
+    """The exports of the functions here."""
+    return {topic: {key: name for key, name in {**keys, **INSTEAD.get(topic, {})}.items() if name}
+            for topic, keys in everything().items()}
 
 
 RECORDS = {}
@@ -536,7 +567,7 @@ def text(catalogue):
         export["text"] = export["documentation"]
         if "Codes:" not in export["text"] and export["as"]:
             export["text"] += " " + by_name[export["as"]]["documentation"]
-    bodies, left_out = [], []
+    bodies, reasons, called = [], {}, set(BY_HAND)
     for name, keys in table().items():
         topic, written = Topic(name), []
         for key, export in keys.items():
@@ -547,12 +578,32 @@ def text(catalogue):
                 written.append(function.text())
                 if function.stream:
                     written.append(function.stream_text())
+                called.add(export)
             except LookupError as error:
-                left_out.append(f"//   {name}.{key}, {export}: {error}\n")
+                reasons[export] = str(error)
         enumerations = "\n".join(map(topic.enumeration_text, topic.enumerations))
         bodies.append(f"namespace {name} {{\n\n{enumerations}\n" + "\n".join(written) + f"\n}} // namespace {name}\n")
-    return HEAD + "// Not included, because they need more than one call:\n" + "".join(left_out) + \
-        "\nnamespace qx {\n\n" + "\n".join(bodies) + "\n} // namespace qx\n\n#endif\n"
+    return HEAD + missing(called, reasons, by_name) + "\nnamespace qx {\n\n" + "\n".join(bodies) + \
+        "\n} // namespace qx\n\n#endif\n"
+
+
+def missing(called, reasons, by_name):
+    """The list of the exports of the Python topics that no function here calls."""
+    lines = []
+    for name, keys in everything().items():
+        for key, export in keys.items():
+            if export not in called:
+                reason = reasons.get(export) or reason_of(by_name[export])
+                lines.append(f"//   {name}.{key}, {export}: {reason}\n")
+    return "// Exports that Python's topics call and that no function here calls:\n" + "".join(lines)
+
+
+def reason_of(export):
+    try:
+        Function(Topic(""), "", "", export)
+    except LookupError as error:
+        return str(error)
+    return "one step of a longer computation"
 
 
 HEAD = """#ifndef QX_QX_HPP

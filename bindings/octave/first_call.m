@@ -1,7 +1,7 @@
 % Mean, modes and a failure: octave-cli --path FOLDER_OF_qx.oct first_call.m
 x = [2 4 4 4 5 5 7 9];
 printf ("mean %g\n", qx ("Mean_head", x));
-printf ("modes [%g] (code 0)\n", qx ("ModeH", x, 0));
+printf ("modes [%g]\n", qx ("ModeH", x, 0));
 try
   qx ("Moment_head", x, 0);
 catch err

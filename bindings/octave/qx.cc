@@ -3,14 +3,20 @@
 //     mean = qx ("Mean_head", [1 2 4]);
 //     [values, vectors] = qx ("EigenValueVector_head", [2 1; 1 3], 1);
 //
-// Built by: mkoctfile -std=c++20 qx.cc -I.../include -L... -lqxanalysis -lqxrt
+// A number or an element that an export takes as an integer must be one that fits, and a real one must have no
+// imaginary part; anything else is refused.
+//
+// Built by: mkoctfile -std=c++20 qx.cc -I.../include -I.../build/release/include -L.../build/release -lqxanalysis -lqxrt
 
 #include <octave/oct.h>
 
 #include "qx/calls.hpp"
 #include "qx/qx.h"
 
+#include <cmath>
+#include <limits>
 #include <map>
+#include <sstream>
 #include <string>
 
 namespace {
@@ -27,9 +33,16 @@ public:
 
     template <class T>
     T number(int i) const {
-        return static_cast<T>(values_(i + 1).double_value());
+        const std::complex<double> z = complex(i);
+        if (z.imag() != 0)
+            refuse(i, "a real number is needed");
+        return converted<T>(i, z.real());
     }
-    std::complex<double> complex(int i) const { return values_(i + 1).complex_value(); }
+    std::complex<double> complex(int i) const {
+        if (values_(i + 1).numel() != 1)
+            refuse(i, "one number is needed");
+        return values_(i + 1).complex_value();
+    }
 
     template <class T>
     qx::detail::Array1<T> array1(int i) const {
@@ -59,6 +72,22 @@ public:
     }
 
 private:
+    [[noreturn]] static void refuse(int i, const std::string &why) {
+        wrong("qx: input " + std::to_string(i + 1) + ": " + why);
+    }
+    template <class T>
+    static T converted(int i, double x) {
+        typedef std::numeric_limits<T> Limits;
+        if constexpr (Limits::is_integer) {
+            if (!(x >= Limits::min() && x <= Limits::max() && x == std::floor(x))) {
+                std::ostringstream text;
+                text.precision(15);
+                text << x << " is not an integer of " << 8 * sizeof(T) << " bits";
+                refuse(i, text.str());
+            }
+        }
+        return static_cast<T>(x);
+    }
     template <class Array>
     static Array checked(const qx::detail::Call &call, Array made) {
         if (!call.ready())
@@ -74,9 +103,11 @@ private:
         const octave_idx_type rows = m.rows(), cols = m.cols();
         for (octave_idx_type k = 0; k < rows * cols; ++k) {
             const Complex z = byRows ? m(k / cols, k % cols) : m(k % rows, k / rows);
-            if constexpr (std::is_arithmetic_v<T>)
-                all.push_back(static_cast<T>(z.real()));
-            else
+            if constexpr (std::is_arithmetic_v<T>) {
+                if (z.imag() != 0)
+                    refuse(i, "real numbers are needed");
+                all.push_back(converted<T>(i, z.real()));
+            } else
                 all.push_back(T(static_cast<typename T::value_type>(z.real()),
                                 static_cast<typename T::value_type>(z.imag())));
         }

@@ -8,6 +8,7 @@
 #include "qx/errors.h"
 #include "qx/host.h"
 
+#include <algorithm>
 #include <complex>
 #include <cstddef>
 #include <cstdint>
@@ -182,6 +183,17 @@ private:
     Status status_;
 };
 
+// n factor / divisor, rounded up; the largest size if that is too large, and 0 for a factor or
+// divisor that the export refuses.
+inline std::size_t MostFrom(std::size_t n, int32_t factor, int32_t divisor = 1) {
+    if (factor < 1 || divisor < 1)
+        return 0;
+    const auto times = static_cast<uint64_t>(factor), by = static_cast<uint64_t>(divisor);
+    const uint64_t most = n > UINT64_MAX / times ? UINT64_MAX : n * times;
+    return static_cast<std::size_t>(
+        std::min<uint64_t>(most / by + (most % by != 0 ? 1 : 0), SIZE_MAX));
+}
+
 // An array of the host for one call, or for the lifetime of a stream.
 template <class T>
 class Array1 {
@@ -213,10 +225,10 @@ public:
                 static_cast<std::size_t>((*handle_)->dimSize)};
     }
     // From now on no resize up to `count` elements allocates memory.
-    void reserve(Call &call, std::size_t count) {
+    void reserve(Call &call, const char *argument, std::size_t count) {
         if (count > INT32_MAX ||
             QXHostReserve1D(handle_, host::Element<T>::typeCode, static_cast<int32_t>(count)) != 0)
-            call.refuse(ErrOutOfMemory, "longest");
+            call.refuse(ErrOutOfMemory, argument);
     }
     // Replaces the elements; memory is allocated only if there are more than before.
     void assign(Call &call, const char *argument, std::span<const T> values) {
@@ -348,20 +360,24 @@ Matrix<T> Taken(const Array2<T> &array) {
     return MatrixOf(array.view());
 }
 
-// Copies an output to a container. After a failure the container stays empty.
-template <class To, class From>
-void Take(Call &call, To &to, const From &from) {
-    if (!call.ready())
-        return;
+// Runs a step that allocates memory for a container; the call fails if there is none.
+template <class Step>
+void Allocating([[maybe_unused]] Call &call, const Step &step) {
 #if QX_EXCEPTIONS
     try {
-        to = Taken(from);
+        step();
     } catch (const std::bad_alloc &) {
         call.refuse(ErrOutOfMemory, "");
     }
 #else
-    to = Taken(from);
+    step();
 #endif
+}
+// Copies an output to a container. After a failure the container stays empty.
+template <class To, class From>
+void Take(Call &call, To &to, const From &from) {
+    if (call.ready())
+        Allocating(call, [&] { to = Taken(from); });
 }
 template <class T>
 std::span<T> CopiedInto(Call &call, std::span<T> place, std::span<const T> found) {

@@ -15,11 +15,12 @@ struct Peaks {
 };
 
 // Finds peaks above a threshold, or valleys below it, from a parabola over each window of `width`
-// samples, block by block. Each block has at least `width` samples. Calls PeakD. The last `width`
-// samples of a block are scanned with the next one, or by `last`.
+// samples, in blocks of any size. Calls PeakD, with at least `width` samples at a time: the others
+// are kept for the next block, or for `last`. The division into blocks changes the results only
+// where PeakD2014 says so.
 class PeakFinder {
 public:
-    explicit PeakFinder(double threshold, int32_t width = 3, bool valleys = false) {
+    explicit PeakFinder(double threshold, int32_t width = 5, bool valleys = false) {
         detail::Call call(place);
         data_ = detail::Array1<double>(call);
         locations_ = detail::Array1<double>(call);
@@ -29,29 +30,51 @@ public:
         request_.threshold = threshold;
         request_.width = width;
         request_.polarity = valleys ? 1 : 0;
+        if (width < 3 || width > widest)
+            call.refuse(ErrInvalidSelector, "width");
         made_ = call.status();
     }
 
+    // The peaks that have become certain with this block.
     Returned<Peaks> operator()(Returning, std::span<const double> block) {
         return step(block, false);
     }
     Peaks operator()(std::span<const double> block) { return step(block, false).value(); }
-    // Passes the last block; the next one starts a new stream.
-    Returned<Peaks> last(Returning, std::span<const double> block) { return step(block, true); }
-    Peaks last(std::span<const double> block) { return step(block, true).value(); }
+    // Passes the last block, which may be empty; the next one starts a new stream.
+    Returned<Peaks> last(Returning, std::span<const double> block = {}) {
+        return step(block, true);
+    }
+    Peaks last(std::span<const double> block = {}) { return step(block, true).value(); }
+    // Restarts the stream.
+    void reset() {
+        begun_ = false;
+        kept_.clear();
+    }
 
 private:
     Returned<Peaks> step(std::span<const double> block, bool isLast) {
-        static constexpr detail::Blame blames[] = {{ErrInvalidSelector, "width"},
-                                                   {ErrWidthOutOfRange, "block"},
-                                                   {ErrIterationLimit, "width"}};
         detail::Call call(place);
         Peaks found;
         if (made_.failed())
             return {found, made_};
-        data_.assign(call, "block", block);
+        detail::Allocating(call, [&] { kept_.insert(kept_.end(), block.begin(), block.end()); });
+        const auto width = static_cast<std::size_t>(request_.width);
+        // As many samples are kept as the last call needs.
+        const std::size_t kept = isLast ? 0 : width;
+        if (call.ready() && kept_.size() >= width + kept) {
+            scan(call, kept_.size() - kept, isLast, found);
+            kept_.erase(kept_.begin(), kept_.end() - static_cast<std::ptrdiff_t>(kept));
+        }
+        if (isLast || !call.ready())
+            reset();
+        return call.with(std::move(found));
+    }
+
+    void scan(detail::Call &call, std::size_t count, bool isLast, Peaks &found) {
+        static constexpr detail::Blame blames[] = {{ErrIterationLimit, "width"}};
+        data_.assign(call, "block", std::span(kept_).first(count));
         if (!call.ready())
-            return call.with(found);
+            return;
         request_.data = data_.handle();
         request_.locations = locations_.handle();
         request_.amplitudes = amplitudes_.handle();
@@ -60,19 +83,21 @@ private:
             (begun_ ? 0U : unsigned{QXPeakFirstBlock}) | (isLast ? unsigned{QXPeakLastBlock} : 0U);
         DBL1D buffer = buffer_.handle();
         ErrorCode err = QXSuccess;
-        const ErrorCode code = PeakD(&request_, &state_, &buffer, &err);
-        call.ended(code, blames);
-        begun_ = call.ready() && !isLast;
+        call.ended(PeakD(&request_, &state_, &buffer, &err), blames);
+        begun_ = true;
         detail::Take(call, found.locations, locations_);
         detail::Take(call, found.amplitudes, amplitudes_);
         detail::Take(call, found.derivatives, derivatives_);
-        return call.with(std::move(found));
+        if (!call.ready())
+            found = {};
     }
 
     static constexpr const char *place = "measure::PeakFinder";
+    static constexpr int32_t widest = 1 << 30; // of PeakD
     detail::Array1<double> data_, locations_, amplitudes_, derivatives_, buffer_;
     PeakDRequest request_{};
     PeakDState state_{};
+    std::vector<double> kept_; // samples that have not been scanned
     Status made_;
     bool begun_ = false;
 };

@@ -86,7 +86,7 @@ public:
         detail::Call call(place);
         block_ = detail::Array1<double>(call);
         if (call.ready())
-            block_.reserve(call, longest);
+            block_.reserve(call, "longest", longest);
         made_ = call.status();
     }
 
@@ -106,8 +106,10 @@ public:
                        blames);
             if (index < 0 || !call.ready())
                 break;
-            found.positions.push_back(static_cast<double>(before_) + position);
-            found.indices.push_back(before_ + index);
+            detail::Allocating(call, [&] {
+                found.positions.push_back(static_cast<double>(before_) + position);
+                found.indices.push_back(before_ + index);
+            });
             start = index + 1;
         }
         if (!call.ready()) {

@@ -559,4 +559,4 @@ class Finding(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

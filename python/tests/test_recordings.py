@@ -321,4 +321,4 @@ class Commands(InFolder):
 
 
 if __name__ == "__main__":
-    unittest.main()
+    unittest.main(verbosity=2)  # ./test names what is skipped

@@ -121,14 +121,60 @@ TEST(Streams, HaveTheBitsOfTheWholeAndTakeNoMemory) {
     HasTheBitsOfTheWhole<double, double>("CIC", qx::multirate::CICInterpolateStream(3, 4), 4);
 }
 
-TEST(Streams, WithADeclaredLongestBlockTakeNoMemoryAfterTheFirst) {
-    const auto [a, b, zeros, poles, gain] = qx::filters::butterworth(0.1, 4);
-    qx::filters::CascadeStream stream(a, b, qx::filters::Form::second_order, 512);
-    Samples x = Signal<double>(512);
-    stream(std::span(x).first(1), x); // the export sizes its state
+// After a first block of one sample, which allocates the state, one of 512, all that was declared.
+template <class In, class Out, class Stream>
+void TakesNoMemory(const char *name, Stream stream) {
+    SCOPED_TRACE(name);
+    const std::vector<In> x = Signal<In>(512);
+    std::vector<Out> y(3000);
+    stream(std::span<const In>(x).first(1), y);
     const qx::test::HeapProbe heap;
-    stream(x, x);
+    EXPECT_TRUE(stream(qx::returned, std::span<const In>(x), std::span(y)));
     EXPECT_EQ(heap.allocations(), 0);
+}
+
+TEST(Streams, WithADeclaredLongestBlockTakeNoMemoryAfterTheFirst) {
+    using qx::multirate::Mode;
+    const Workspace workspace;
+    const auto [a, b, zeros, poles, gain] = qx::filters::butterworth(0.1, 4);
+    constexpr auto second = qx::filters::Form::second_order;
+    TakesNoMemory<double, double>("cascade", qx::filters::CascadeStream(a, b, second, 512));
+    const Samples taps = Signal<double>(31);
+    const std::vector<float> singleTaps(taps.begin(), taps.end());
+    for (const Mode mode : {Mode::same_rate, Mode::interpolate, Mode::decimate, Mode::rational})
+        TakesNoMemory<double, double>("resample",
+                                      qx::multirate::ResampleStream(5, 3, taps, mode, 1, 0, 512));
+    TakesNoMemory<std::complex<float>, std::complex<float>>(
+        "resample",
+        qx::multirate::ResampleComplexSingleStream(7, 2, singleTaps, Mode::rational, 1, 0, 512));
+    TakesNoMemory<double, double>("CIC", qx::multirate::CICInterpolateStream(3, 4, 1, false, 512));
+    TakesNoMemory<double, double>("CIC", qx::multirate::CICDecimateStream(3, 4, 1, false, 512));
+    TakesNoMemory<double, Complex>("shift", qx::multirate::FrequencyShiftStream(0.1, 1, 512));
+    // More than an array can have is refused, and nothing of it is lost in a conversion.
+    qx::multirate::CICInterpolateStream huge(1, 1 << 30, 1, false, std::size_t{1} << 28);
+    const Samples x(1);
+    Samples y(1);
+    EXPECT_EQ(huge(qx::returned, x, y).code(), ErrOutOfMemory);
+    EXPECT_STREQ(huge(qx::returned, x, y).status().argument, "longest");
+}
+
+template <class In, class Stream>
+void AgreesWithTheWhole(Stream stream) {
+    const std::vector<In> x = Signal<In>(3000);
+    const std::vector<Complex> whole = stream(x);
+    stream.reset();
+    std::size_t from = 0;
+    for (const std::size_t size : {700, 1, 2, 13, 699, 60, 1525})
+        for (const Complex &z : stream(std::span<const In>(x).subspan(from, size))) {
+            EXPECT_NEAR(std::abs(z - whole[from]), 0, 1e-12) << from;
+            ++from;
+        }
+    EXPECT_EQ(from, x.size());
+}
+
+TEST(Streams, ThatShiftFrequenciesAgreeWithTheWhole) {
+    AgreesWithTheWhole<double>(qx::multirate::FrequencyShiftStream(0.123));
+    AgreesWithTheWhole<Complex>(qx::multirate::FrequencyShiftComplexStream(-77, 1000));
 }
 
 TEST(Streams, ReportFailuresAndRestart) {
@@ -369,10 +415,65 @@ TEST(TriggerStream, HasTheTriggersOfTheWholeAndReportsFailures) {
         for (std::size_t i = 0; i < found.positions.size(); ++i)
             EXPECT_NEAR(found.positions[i], whole.positions[i], 1e-12);
     }
+    if (qx::test::HeapProbe::works()) {
+        Stream shortOfMemory(1.5);
+        shortOfMemory(std::span(x)); // allocates its own array
+        for (const int32_t i : {1, 2, 9}) {
+            const qx::test::HeapProbe heap(i);
+            const auto found = shortOfMemory(qx::returned, std::span(x));
+            EXPECT_EQ(found.code(), ErrOutOfMemory) << i;
+            EXPECT_TRUE(found->indices.empty());
+        }
+        EXPECT_EQ(shortOfMemory(x).indices, Stream(1.5)(x).indices) << "restarted by the failure";
+    }
     Stream wrong(1.5, Stream::Direction::rising, -1);
     const auto refused = wrong(qx::returned, std::span(x));
     EXPECT_FALSE(refused);
     EXPECT_EQ(refused.code(), ErrNegativeSetting);
+}
+
+TEST(PeakFinder, HasThePeaksOfTheWholeInBlocksOfAnySize) {
+    const std::size_t n = 3060;
+    Samples x(n);
+    for (std::size_t i = 0; i < n; ++i)
+        x[i] = std::cos(static_cast<double>(i) * 0.1 - 1); // periods of 62.8 samples
+    for (const bool valleys : {false, true}) {
+        qx::measure::PeakFinder finder(valleys ? -0.5 : 0.5, 5, valleys);
+        const qx::measure::Peaks whole = finder.last(x);
+        ASSERT_EQ(whole.locations.size(), valleys ? 48U : 49U);
+        for (std::size_t i = 0; i < whole.locations.size(); ++i) {
+            const double turns = static_cast<double>(i) + (valleys ? 0.5 : 0);
+            EXPECT_NEAR(whole.locations[i], 10 + 20 * 3.141592653589793 * turns, 0.02);
+            EXPECT_NEAR(whole.amplitudes[i], valleys ? -1 : 1, 0.001);
+            EXPECT_NEAR(whole.derivatives[i], valleys ? 0.01 : -0.01, 0.001);
+        }
+        finder(std::span(x).first(100));
+        finder.reset(); // forgets these samples
+        qx::measure::Peaks found;
+        const auto append = [&](const qx::measure::Peaks &part) {
+            found.locations.insert(found.locations.end(), part.locations.begin(),
+                                   part.locations.end());
+            found.amplitudes.insert(found.amplitudes.end(), part.amplitudes.begin(),
+                                    part.amplitudes.end());
+        };
+        std::size_t from = 0;
+        for (const std::size_t size : {3, 1, 0, 4, 700, 1, 2, 13, 699, 60, 1525, 52}) {
+            append(finder(std::span(x).subspan(from, size)));
+            from += size;
+        }
+        ASSERT_EQ(from, n);
+        append(finder.last());
+        EXPECT_EQ(found.locations, whole.locations);
+        EXPECT_EQ(found.amplitudes, whole.amplitudes);
+        EXPECT_TRUE(finder.last(std::span(x).first(4)).locations.empty()) << "less than a window";
+        EXPECT_EQ(finder.last(x).locations, whole.locations) << "a new stream";
+    }
+    EXPECT_EQ(qx::measure::PeakFinder(0.5).last(x).locations,
+              qx::measure::PeakFinder(0.5, 5).last(x).locations)
+        << "the width of Python";
+    const auto refused = qx::measure::PeakFinder(0.5, 2)(qx::returned, x);
+    EXPECT_EQ(refused.code(), ErrInvalidSelector);
+    EXPECT_STREQ(refused.status().argument, "width");
 }
 
 } // namespace

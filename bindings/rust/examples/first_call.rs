@@ -10,7 +10,8 @@ fn main() {
     unsafe {
         Mean_head(x, &mut mean, &mut err);
         println!("mean {mean}");
-        println!("modes {:?} (code {})", { ModeH(x, 0, modes); elements(modes) }, err);
+        err = ModeH(x, 0, modes);
+        println!("modes {:?} (code {err})", elements(modes));
         Moment_head(x, &order, &mut moment, &mut err);
         println!("order 0: {}", CStr::from_ptr(QXHostErrorName(err)).to_string_lossy());
         QXHostFree(modes.cast());

@@ -1,7 +1,8 @@
 """The common interface of everything that works block by block.
 
 A stream is called with successive blocks of any size, and returns the output for each. The outputs of all
-blocks together have the same bits as the output for a single block. `reset()` starts afresh, `copy()`
+blocks together have the same bits as the output for a single block (docs/guides/streams.md has the two
+exceptions). `reset()` starts afresh, `copy()`
 returns an independent stream in the same state, and `finish()` returns the output that is still pending at
 the end of the signal. Streams can be pickled.
 """
