@@ -102,9 +102,9 @@ def remark(name):
 def page():
     functions = served()
     lines = ["# Exports and topics", "",
-             'Each export, with the functions of the Python topics that call it. Exports marked "not called, for comparison"',
-             "are other revisions or forms of those that the topics call; `qx.exports` has all exports. Written by",
-             "`tools/topics_table.py` from `python/qx/topical/newest.py`.", ""]
+             'Each export, with the functions of the Python topics that call it. Exports marked "not called, for',
+             'comparison" are other revisions or forms of those that the topics call; `qx.exports` has all exports. Written',
+             "by `tools/topics_table.py` from `python/qx/topical/newest.py`.", ""]
     for family in library().catalogue["families"]:
         names = [name for name, entry in library().entries.items() if entry["family"] == family["name"]]
         if names:
