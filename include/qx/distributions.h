@@ -86,10 +86,11 @@ QX_API int32_t NormDist2026_head(QX_IN const DBL *x, QX_IN const int32_t *what, 
                                  QX_OUT ErrorCode *err);
 
 /** As NormDist2026_head, of Student's distribution with *dof degrees of freedom, which need not be
-    an integer; values above 1e25, including infinity, count as 1e25, where the distribution is
-    normal. Method: from 1 to 1e6 degrees a series or a continued fraction with positive terms;
-    otherwise the smaller tail is the incomplete beta integral in the logarithm of t / (1 - t) by
-    quadrature, with its leading factor in twice the precision (C. Loader's deviance).
+    an integer, within 4 eps and its logarithms within 4.3; values above 1e25, including infinity,
+    count as 1e25, where the distribution is normal. Method: from 1 to 1e6 degrees a series or a
+    continued fraction with positive terms; otherwise the smaller tail is the incomplete beta
+    integral in the logarithm of t / (1 - t) by quadrature, with its leading factor in twice the
+    precision (C. Loader's deviance).
     Codes: ErrInvalidSelector (what is not 0 to 4), ErrTooFewForParameters (dof is not above 0),
     ErrNaNInData (t is NaN).
     NaN: t refused with ErrNaNInData; dof refused with ErrTooFewForParameters. */

@@ -172,7 +172,8 @@ QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D 
 
 /** One damped step of a fit: solves for d the system a d = gradient, in which the diagonal of a is
     multiplied by 1 + *lambda, and adds d to the coefficients. A step that overflows makes a
-    coefficient infinite, with the code 0. The code is in *err and is the function result.
+    coefficient infinite, with the code 0. A fit by such steps has neither bounds nor a covariance;
+    NonlinearFit2026 makes the whole fit, with both. The code is in *err and is the function result.
     Codes: ErrEmptyInput (the sizes are 0 or disagree), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (a diagonal element is not finite), ErrSingularMatrix (the system is singular,
     or a new coefficient is NaN).

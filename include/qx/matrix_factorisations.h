@@ -171,9 +171,10 @@ QX_API ErrorCode SVDEx_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, QX_
 QX_API ErrorCode CxSVDEx_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
                               QX_OUT CDB2D v);
 
-/** As SVD_head, for the values only, which are the same, to the bit, as with the vectors. */
+/** As SVD_head, for the values only, which are the same, to the bit, as with the vectors.
+    SVDS2026_head scales by itself. */
 QX_API int32_t SVDS_head(QX_IN DBL2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
-/** As SVDS_head, for complex elements. */
+/** As SVDS_head, for complex elements; CxSVDS2026_head scales by itself. */
 QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n), of any

@@ -13,9 +13,11 @@ QX_BEGIN_DECLS
     real quadratic factor. `roots` holds one root per guess: first those of the real guesses in
     their order, then, from the complex guesses, the pairs of real roots and the conjugate pairs.
     Complex guesses are unchanged if the polynomial has fewer than 4 coefficients, and so is a guess
-    without a partner. PolyRoots2026_head needs no guesses. Iterations end when a relative change is
-    below the tolerance, or at their limit, with the best values so far. A null array of guesses
-    counts as empty. If coef is empty, `roots` is emptied.
+    without a partner. Iterations end when a relative change is below the tolerance, or at their
+    limit, with the best values so far, and Bairstow's as soon as a step is not shorter than the last
+    one: for 1000 polynomials of degree 10 with normal random coefficients and guesses up to 1.4 %
+    off, 283 had pairs that were not found to 6 digits, with the code 0. PolyRoots2026_head needs no
+    guesses. A null array of guesses counts as empty. If coef is empty, `roots` is emptied.
     Codes: WarnEmptyResult (coef is empty), ErrOutOfMemory (no memory, or the host refuses
     `roots`).
     NaN: coef, newtonTolerance, bairstowTolerance in no result; realGuesses, complexGuesses in some

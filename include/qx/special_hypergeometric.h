@@ -26,10 +26,11 @@ QX_BEGIN_DECLS
 
     NaN where an argument is NaN or infinite, |x| > 1, or x = 1 and c <= a + b; +infinity where c is
     0, -1, -2, ... and the series does not terminate earlier. The limit form is summed to 1.8e-11.
-    Both forms in 1 - x lose digits like x^(1-c) if c is large and x below 0.5, and give NaN if an
-    infinity arises within them. Terminating series are summed in their order; their terms alternate
-    for x > 0, so that with more than 32 terms or with parameters beyond 40 no digit may be left.
-    QX_Gauss_2026 does not lose these digits.
+    From x = 0.2 on, with a and b from 0.25 to 2.5, errors reach 3e-10 where c - a - b is an integer
+    and 6e-5 where it is 1e-8 from one. Both forms in 1 - x lose digits like x^(1-c) if c is large
+    and x below 0.5, and give NaN if an infinity arises within them. Terminating series are summed
+    in their order; their terms alternate for x > 0, so that with more than 32 terms or with
+    parameters beyond 40 no digit may be left. QX_Gauss_2026 does not lose these digits.
     NaN: x, a, b, c in all results. */
 QX_API void QX_Gauss(double x, double a, double b, double c, QX_OUT DBL *value);
 

@@ -1234,7 +1234,7 @@ def SVDS_head(a: ArrayLike) -> NDArray[np.float64]:
 
 
 def CxSVDS_head(a: ArrayLike) -> NDArray[np.float64]:
-    """As SVDS_head, for complex elements. Singular value decomposition a = u diag(s) v^T of the m by n ..."""
+    """As SVDS_head, for complex elements; CxSVDS2026_head scales by itself. Singular value ..."""
 
 
 def SVD2026_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
