@@ -1,8 +1,8 @@
 // Singular values, eigenproblems and factorisations against the LAPACK of OpenBLAS
-// (bench/peer_lapack.h).
+// (bench/peer_lapack.h), and the revisions of 2026 also against their elders.
 //
-// bench_linalg_factorisations [GROUP...]: svd, values, symmetric, general and qr, each also with 2026 at
-// its end for the revision and with "complex" in front of it; cholesky; all by default.
+// bench_linalg_factorisations [GROUP...]: svd, values, symmetric, general, qr, complexsvd, complexvalues,
+// hermitian, complexgeneral, complexqr, cholesky; all by default.
 
 #include "bench/lapack_drivers.h"
 #include "bench/timing.h"
@@ -13,9 +13,9 @@
 #include "linalg/factorisations/svd.h"
 
 #include <algorithm>
+#include <array>
 #include <cstdint>
 #include <cstring>
-#include <functional>
 #include <random>
 #include <string>
 #include <utility>
@@ -62,42 +62,69 @@ std::vector<ElementOf<E>> Hermitian(int32_t n) {
     return a;
 }
 
-// Minima of interleaved runs: other work on the machine only adds to the times.
-template <class Ours, class Peer>
-void Compare(Ratios &ratios, const std::string &name, int32_t n, const Ours &ours,
-             const Peer &peer) {
-    const std::size_t ourRepeats = RepeatsFor(1e-4, ours), peerRepeats = RepeatsFor(1e-4, peer);
-    double our = 1e9, their = 1e9, taken = 0;
-    for (int round = 0; round < 40 && (round < 5 || taken < 2.0); ++round) {
-        const double first = SecondsOf(ourRepeats, ours), second = SecondsOf(peerRepeats, peer);
-        taken += first + second;
-        our = std::min(our, first / static_cast<double>(ourRepeats));
-        their = std::min(their, second / static_cast<double>(peerRepeats));
+// The seconds of a call of each contestant, by the minima of interleaved runs: other work on the machine only
+// adds to the times.
+template <class... Work>
+std::array<double, sizeof...(Work)> Times(const Work &...contestants) {
+    const std::array<std::size_t, sizeof...(Work)> repeats = {RepeatsFor(1e-4, contestants)...};
+    std::array<double, sizeof...(Work)> least;
+    least.fill(1e9);
+    double taken = 0;
+    for (int round = 0; round < 40 && (round < 5 || taken < 1.0 * sizeof...(Work)); ++round) {
+        std::size_t i = 0;
+        const auto run = [&](const auto &work) {
+            const double seconds = SecondsOf(repeats[i], work);
+            taken += seconds;
+            least[i] = std::min(least[i], seconds / static_cast<double>(repeats[i]));
+            ++i;
+        };
+        (run(contestants), ...);
     }
-    std::printf("%-28s n %5d %12.3f us  ratio %5.2f\n", name.c_str(), n, our * 1e6, our / their);
-    std::fflush(stdout);
-    ratios.add(our / their, "n " + std::to_string(n));
+    return least;
 }
+
+// The ratios of an elder and of its revision to their peers, and of the revision to the elder.
+class Comparison {
+public:
+    explicit Comparison(const std::string &what)
+        : what_(what), elder_(what), revision_(what + ", revision"),
+          overElder_(what + ", revision") {}
+    void add(int32_t n, const std::array<double, 3> &times) {
+        add(n, {times[0], times[1], times[2], times[2]});
+    }
+    // Of the elder, the revision, the elder's peer and the revision's.
+    void add(int32_t n, const std::array<double, 4> &times) {
+        const auto [elder, revision, elderPeer, peer] = times;
+        std::printf("%-44s n %5d  elder %12.3f us  ratio %5.2f  revision %12.3f us  ratio %5.2f\n",
+                    what_.c_str(), n, elder * 1e6, elder / elderPeer, revision * 1e6,
+                    revision / peer);
+        std::fflush(stdout);
+        const std::string name = "n " + std::to_string(n);
+        elder_.add(elder / elderPeer, name);
+        revision_.add(revision / peer, name);
+        overElder_.add(revision / elder, name);
+    }
+    void summary(const char *elderPeer, const char *peer) const {
+        elder_.summary(elderPeer);
+        revision_.summary(peer);
+        overElder_.summary("elder");
+    }
+
+private:
+    std::string what_;
+    Ratios elder_, revision_, overElder_;
+};
 
 const std::vector<int32_t> orders = {2, 4, 8, 16, 50, 100, 200, 500};
 
-enum class Method { Elder, Revision };
-
-// The names of a group: "complex ..., revision".
 template <ElementType E>
-std::string Named(const std::string &what, Method method) {
-    return (E == Complex ? "complex " : "") + what +
-           (method == Method::Revision ? ", revision" : "");
-}
+const std::string kind = E == Complex ? "complex " : "";
 
 template <ElementType E>
-void SingularValueDecomposition(bool withVectors, Method method) {
+void SingularValueDecomposition(bool withVectors) {
     typedef ElementOf<E> T;
-    const auto scaling =
-        method == Method::Revision ? qx::SVDScaling::Always : qx::SVDScaling::LargeNorms;
-    Ratios ratios(
-        Named<E>(withVectors ? "singular value decompositions" : "singular values", method));
-    const std::string name = Named<E>(withVectors ? "svd" : "values", method);
+    Comparison comparison(kind<E> +
+                          (withVectors ? "singular value decompositions" : "singular values"));
     for (const int32_t n : orders) {
         if (E == Complex && n > 200)
             continue; // which would take longer than all other groups
@@ -109,64 +136,65 @@ void SingularValueDecomposition(bool withVectors, Method method) {
                              work, length, reals.data());
         };
         std::vector<T> work = WorkFor<T>(driver);
-        Compare(
-            ratios, name, n,
-            [&] {
-                if (withVectors)
-                    qx::SVDecompose<E>({a.data(), n, n}, {u.data(), n, n}, {s.data(), n},
-                                       {v.data(), n, n}, scaling);
-                else
-                    qx::SingularValues<E>({a.data(), n, n}, {s.data(), n}, scaling);
-            },
-            [&] {
-                copy = a;
-                driver(work.data(), static_cast<int32_t>(work.size()));
-            });
+        const auto decompose = [&](qx::SVDScaling scaling) {
+            if (withVectors)
+                qx::SVDecompose<E>({a.data(), n, n}, {u.data(), n, n}, {s.data(), n},
+                                   {v.data(), n, n}, scaling);
+            else
+                qx::SingularValues<E>({a.data(), n, n}, {s.data(), n}, scaling);
+        };
+        comparison.add(n, Times([&] { decompose(qx::SVDScaling::LargeNorms); },
+                                [&] { decompose(qx::SVDScaling::Always); },
+                                [&] {
+                                    copy = a;
+                                    driver(work.data(), static_cast<int32_t>(work.size()));
+                                }));
     }
-    ratios.summary(E == Real ? "dgesvd" : "zgesvd");
+    const char *const peer = E == Real ? "dgesvd" : "zgesvd";
+    comparison.summary(peer, peer);
 }
 
 template <ElementType E>
-void SymmetricEigenproblem(Method method) {
+void SymmetricEigenproblem() {
     typedef ElementOf<E> T;
-    const bool isRevision = method == Method::Revision;
-    const auto solve = isRevision ? qx::SymmetricEigenBlocked<E> : qx::SymmetricEigen<E>;
-    const char *const what = E == Real ? "symmetric eigenproblems" : "Hermitian eigenproblems";
-    Ratios ratios(what + std::string(isRevision ? ", revision" : ""));
+    Comparison comparison(E == Real ? "symmetric eigenproblems" : "Hermitian eigenproblems");
     for (const int32_t n : orders) {
         const std::vector<T> a = Hermitian<E>(n);
         std::vector<T> v(a.size()), copy = a;
         std::vector<double> w(n), reals(1 + 5 * n + 2 * n * n);
         std::vector<int32_t> integers(3 + 5 * n);
-        const auto driver = [&](T *work, int32_t length) {
-            if (isRevision)
-                qx::bench::Heevd(n, copy.data(), w.data(), work, length, reals.data(),
-                                 integers.data());
-            else
-                qx::bench::Heev(n, copy.data(), w.data(), work, length, reals.data());
+        const auto iterate = [&](T *work, int32_t length) {
+            qx::bench::Heev(n, copy.data(), w.data(), work, length, reals.data());
         };
-        std::vector<T> work = WorkFor<T>(driver);
-        Compare(
-            ratios,
-            std::string(E == Real ? "symmetric" : "Hermitian") + (isRevision ? ", revision" : ""),
+        const auto divide = [&](T *work, int32_t length) {
+            qx::bench::Heevd(n, copy.data(), w.data(), work, length, reals.data(), integers.data());
+        };
+        std::vector<T> work = WorkFor<T>(iterate), more = WorkFor<T>(divide);
+        comparison.add(
             n,
-            [&] {
-                solve({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
-            },
-            [&] {
-                copy = a;
-                driver(work.data(), static_cast<int32_t>(work.size()));
-            });
+            Times(
+                [&] {
+                    qx::SymmetricEigen<E>({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
+                },
+                [&] {
+                    qx::SymmetricEigenBlocked<E>({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
+                },
+                [&] {
+                    copy = a;
+                    iterate(work.data(), static_cast<int32_t>(work.size()));
+                },
+                [&] {
+                    copy = a;
+                    divide(more.data(), static_cast<int32_t>(more.size()));
+                }));
     }
-    const char *const peers[] = {"dsyev", "dsyevd", "zheev", "zheevd"};
-    ratios.summary(peers[2 * (E == Complex) + isRevision]);
+    comparison.summary(E == Real ? "dsyev" : "zheev", E == Real ? "dsyevd" : "zheevd");
 }
 
 template <ElementType E>
-void GeneralEigenproblem(Method method) {
+void GeneralEigenproblem() {
     typedef ElementOf<E> T;
-    const auto solve = method == Method::Revision ? qx::EigenBlocked<E> : qx::EigenGeneral<E>;
-    Ratios ratios(Named<E>("general eigenproblems", method));
+    Comparison comparison(kind<E> + "general eigenproblems");
     for (const int32_t n : orders) {
         const std::vector<T> a = Random<E>(n);
         std::vector<CDB> w(n), vectors(a.size());
@@ -176,23 +204,27 @@ void GeneralEigenproblem(Method method) {
             qx::bench::Geev(n, copy.data(), w.data(), v.data(), work, length, reals.data());
         };
         std::vector<T> work = WorkFor<T>(driver);
-        Compare(
-            ratios, Named<E>("general", method), n,
-            [&] {
-                solve({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
-            },
-            [&] {
-                copy = a;
-                driver(work.data(), static_cast<int32_t>(work.size()));
-            });
+        comparison.add(
+            n, Times(
+                   [&] {
+                       qx::EigenGeneral<E>({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
+                   },
+                   [&] {
+                       qx::EigenBlocked<E>({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
+                   },
+                   [&] {
+                       copy = a;
+                       driver(work.data(), static_cast<int32_t>(work.size()));
+                   }));
     }
-    ratios.summary(E == Real ? "dgeev" : "zgeev");
+    const char *const peer = E == Real ? "dgeev" : "zgeev";
+    comparison.summary(peer, peer);
 }
 
 template <ElementType E>
-void QR(Method method) {
+void QR() {
     typedef ElementOf<E> T;
-    Ratios ratios(Named<E>("QR factorisations with all of q", method));
+    Comparison comparison(kind<E> + "QR factorisations with all of q");
     for (const int32_t n : orders) {
         const std::vector<T> a = Random<E>(n);
         std::vector<T> q(a.size()), r(a.size()), tau(n), copy = a;
@@ -203,23 +235,23 @@ void QR(Method method) {
             qx::bench::Ungqr(n, copy.data(), tau.data(), work, length);
         };
         std::vector<T> work = WorkFor<T>(factor), formWork = WorkFor<T>(form);
-        Compare(
-            ratios, Named<E>("qr", method), n,
-            [&] {
-                if (method == Method::Revision)
-                    qx::QRDecomposeBlocked<E>({a.data(), n, n}, qx::qrFull, {}, {q.data(), n, n},
-                                              {r.data(), n, n});
-                else
-                    qx::QRDecompose<E>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
-                                       {r.data(), n, n});
-            },
-            [&] {
-                copy = a;
-                factor(work.data(), static_cast<int32_t>(work.size()));
-                form(formWork.data(), static_cast<int32_t>(formWork.size()));
-            });
+        comparison.add(n, Times(
+                              [&] {
+                                  qx::QRDecompose<E>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
+                                                     {r.data(), n, n});
+                              },
+                              [&] {
+                                  qx::QRDecomposeBlocked<E>({a.data(), n, n}, qx::qrFull, {},
+                                                            {q.data(), n, n}, {r.data(), n, n});
+                              },
+                              [&] {
+                                  copy = a;
+                                  factor(work.data(), static_cast<int32_t>(work.size()));
+                                  form(formWork.data(), static_cast<int32_t>(formWork.size()));
+                              }));
     }
-    ratios.summary(E == Real ? "dgeqrf and dorgqr" : "zgeqrf and zungqr");
+    const char *const peer = E == Real ? "dgeqrf and dorgqr" : "zgeqrf and zungqr";
+    comparison.summary(peer, peer);
 }
 
 void Cholesky() {
@@ -233,8 +265,7 @@ void Cholesky() {
         for (int32_t j = 0; j < n; ++j)
             for (int32_t i = j; i < n; ++i)
                 packed.push_back(a[static_cast<std::size_t>(i) * n + j]);
-        Compare(
-            ratios, "cholesky", n,
+        const auto [ours, peer] = Times(
             [&] {
                 work = packed;
                 qx::PackedCholesky<Real>({work.data(), qx::PackedLength(n)}, n);
@@ -244,36 +275,29 @@ void Cholesky() {
                 int32_t info;
                 dpotrf("L", &n, copy.data(), &n, &info, 1);
             });
+        std::printf("%-44s n %5d        %12.3f us  ratio %5.2f\n", "cholesky", n, ours * 1e6,
+                    ours / peer);
+        ratios.add(ours / peer, "n " + std::to_string(n));
     }
     ratios.summary("dpotrf");
-}
-
-typedef std::vector<std::pair<std::string, std::function<void()>>> Groups;
-
-template <ElementType E>
-void AddGroups(Method method, Groups *groups) {
-    const auto add = [&](const char *name, const std::function<void()> &run) {
-        groups->push_back({(E == Complex ? "complex" : "") + std::string(name) +
-                               (method == Method::Revision ? "2026" : ""),
-                           run});
-    };
-    add("svd", [=] { SingularValueDecomposition<E>(true, method); });
-    add("values", [=] { SingularValueDecomposition<E>(false, method); });
-    add("symmetric", [=] { SymmetricEigenproblem<E>(method); });
-    add("general", [=] { GeneralEigenproblem<E>(method); });
-    add("qr", [=] { QR<E>(method); });
 }
 
 } // namespace
 
 int main(int argc, char **argv) {
-    Groups groups;
-    for (const Method method : {Method::Elder, Method::Revision})
-        AddGroups<Real>(method, &groups);
-    for (const Method method : {Method::Elder, Method::Revision})
-        AddGroups<Complex>(method, &groups);
-    groups.push_back({"cholesky", Cholesky});
+    const std::pair<const char *, void (*)()> groups[] = {
+        {"svd", [] { SingularValueDecomposition<Real>(true); }},
+        {"values", [] { SingularValueDecomposition<Real>(false); }},
+        {"symmetric", SymmetricEigenproblem<Real>},
+        {"general", GeneralEigenproblem<Real>},
+        {"qr", QR<Real>},
+        {"complexsvd", [] { SingularValueDecomposition<Complex>(true); }},
+        {"complexvalues", [] { SingularValueDecomposition<Complex>(false); }},
+        {"hermitian", SymmetricEigenproblem<Complex>},
+        {"complexgeneral", GeneralEigenproblem<Complex>},
+        {"complexqr", QR<Complex>},
+        {"cholesky", Cholesky}};
     for (const auto &[name, run] : groups)
-        if (argc < 2 || std::find(argv + 1, argv + argc, name) != argv + argc)
+        if (argc < 2 || std::find(argv + 1, argv + argc, std::string(name)) != argv + argc)
             run();
 }
