@@ -150,8 +150,8 @@ TEST(Streams, WithADeclaredLongestBlockTakeNoMemoryAfterTheFirst) {
     TakesNoMemory<double, double>("CIC", qx::multirate::CICInterpolateStream(3, 4, 1, false, 512));
     TakesNoMemory<double, double>("CIC", qx::multirate::CICDecimateStream(3, 4, 1, false, 512));
     TakesNoMemory<double, Complex>("shift", qx::multirate::FrequencyShiftStream(0.1, 1, 512));
-    // More than an array can have is refused, and nothing of it is lost in a conversion.
-    qx::multirate::CICInterpolateStream huge(1, 1 << 30, 1, false, std::size_t{1} << 28);
+    // 2^32 elements are refused, and not taken for 0.
+    qx::multirate::CICInterpolateStream huge(1, 1 << 30, 1, false, 4);
     const Samples x(1);
     Samples y(1);
     EXPECT_EQ(huge(qx::returned, x, y).code(), ErrOutOfMemory);
