@@ -1,4 +1,4 @@
-"""Filter design against SciPy, in one process.
+"""Filter design against SciPy, and the IIR design of 2026 also against its elder, in one process.
 
 Ours is the export, called through the binding. SciPy's results have the same form: second-order sections for IIR
 filters, taps for FIR filters.
@@ -90,6 +90,8 @@ def narrow_cases():
 def main():
     compare("IIR design", "scipy.signal, sections of second order", iir_cases(elder))
     compare("IIR design of 2026", "scipy.signal, sections of second order", iir_cases(newest))
+    compare("IIR design of 2026", "elder",
+            ((name, ours, theirs) for (name, ours, _), (_, theirs, _) in zip(iir_cases(newest), iir_cases(elder))))
     compare("equiripple design", "scipy.signal.remez", remez_cases())
     compare("narrow-band filter", "our FIR filter of the same length", narrow_cases())
 

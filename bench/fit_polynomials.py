@@ -19,6 +19,7 @@ from summary import print_summary  # noqa: E402
 
 
 I32 = 3  # the type's code
+BY_SINGULAR_VALUES = 6
 
 
 def ratio(ours, theirs, n):
@@ -61,13 +62,15 @@ def matrix_of(host, values):
 
 
 def revisions(host, module):
-    """PolyFit2026_head against numpy.polyfit, and GenLSFit2026_head against numpy.linalg.lstsq."""
+    """PolyFit2026_head against numpy.polyfit, GenLSFit2026_head against numpy.linalg.lstsq, and both against their
+    elders with the algorithm by singular values that leaves out the smallest."""
     host.QXHostNew2D.restype = ctypes.c_void_p
-    module.PolyFit2026_head.argtypes = ([ctypes.c_void_p] * 2 + [ctypes.c_int32, ctypes.c_void_p, ctypes.c_double]
-                                        + [ctypes.c_void_p] * 5)
-    module.GenLSFit2026_head.argtypes = ([ctypes.c_void_p] * 3 + [ctypes.c_double, ctypes.c_int32]
-                                         + [ctypes.c_void_p] * 4)
-    ratios, general = [], []
+    for export, choice in (("PolyFit2026_head", ctypes.c_double), ("PolyFit81_head", ctypes.c_int32)):
+        getattr(module, export).argtypes = ([ctypes.c_void_p] * 2 + [ctypes.c_int32, ctypes.c_void_p, choice]
+                                            + [ctypes.c_void_p] * 5)
+    for export, choice in (("GenLSFit2026_head", ctypes.c_double), ("GenLSFit80_head", ctypes.c_int32)):
+        getattr(module, export).argtypes = [ctypes.c_void_p] * 3 + [choice, ctypes.c_int32] + [ctypes.c_void_p] * 4
+    ratios = {}
     for n in (20, 100, 1000, 10000, 100000):
         x, y = np.linspace(-1, 1, n), np.random.default_rng(n).normal(size=n)
         empty = [block_of(host, DBL, np.zeros(0)), block_of(host, I32, np.zeros(0, np.int32))]
@@ -77,20 +80,31 @@ def revisions(host, module):
         for order in (1, 3, 6, 12):
             matrix = np.vander(x, order + 1)
             rows, inverse = matrix_of(host, matrix), matrix_of(host, np.zeros((0, 0)))
-            cases = [("polynomial", ratios, lambda: module.PolyFit2026_head(
-                *handles, order, empty[0], -1.0, empty[1], empty[0], *results, ctypes.byref(mse)),
-                lambda: np.polyfit(x, y, order)),
-                ("matrix", general, lambda: module.GenLSFit2026_head(
-                    rows, handles[1], empty[0], -1.0, 0, *results, inverse, ctypes.byref(mse)),
-                 lambda: np.linalg.lstsq(matrix, y, rcond=None))]
-            for name, found, ours, theirs in cases:
-                if ours() != 0:
+
+            def polynomial(export, choice):
+                return getattr(module, export)(*handles, order, empty[0], choice, empty[1], empty[0], *results,
+                                               ctypes.byref(mse))
+
+            def general(export, choice):
+                return getattr(module, export)(rows, handles[1], empty[0], choice, 0, *results, inverse, ctypes.byref(mse))
+
+            cases = [("polynomial", "NumPy polyfit", lambda: polynomial("PolyFit2026_head", -1.0),
+                      lambda: np.polyfit(x, y, order)),
+                     ("polynomial", "elder", lambda: polynomial("PolyFit2026_head", -1.0),
+                      lambda: polynomial("PolyFit81_head", BY_SINGULAR_VALUES)),
+                     ("general linear", "NumPy lstsq", lambda: general("GenLSFit2026_head", -1.0),
+                      lambda: np.linalg.lstsq(matrix, y, rcond=None)),
+                     ("general linear", "elder", lambda: general("GenLSFit2026_head", -1.0),
+                      lambda: general("GenLSFit80_head", BY_SINGULAR_VALUES))]
+            for what, peer, ours, theirs in cases:
+                if ours() != 0 or (peer == "elder" and theirs() != 0):
                     sys.exit("the fit failed")
                 mine, other = ratio(ours, theirs, n)
-                found.append((mine / other, f"n {n}, order {order}"))
-                print(f"{name}, {found[-1][1]:<20} {1e6 * mine:10.1f} us  ratio {mine / other:5.2f}", flush=True)
-    print_summary("polynomial fits, revision, called from Python", "NumPy polyfit", ratios)
-    print_summary("general linear fits, revision, called from Python", "NumPy lstsq", general)
+                name = f"n {n}, order {order}"
+                ratios.setdefault((what, peer), []).append((mine / other, name))
+                print(f"{what}, {name:<20} {1e6 * mine:10.1f} us  over {peer:13} {mine / other:5.2f}", flush=True)
+    for (what, peer), found in ratios.items():
+        print_summary(f"{what} fits, revision, called from Python", peer, found)
 
 
 if __name__ == "__main__":

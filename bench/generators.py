@@ -1,4 +1,4 @@
-"""Noise, waves and small array work against NumPy, in one process.
+"""Noise, waves and small array work against NumPy, and the noise of 2026 also against its elders, in one process.
 
 Ours is the export, called through the binding, which copies its inputs; theirs is the code that a user of NumPy
 would write, with a new array for the result.
@@ -33,7 +33,8 @@ def counter_cases(n):
     random = np.random.default_rng(1)
     place = (1, 0, 0.0)
     return [
-        ("uniform", lambda: qx.White2026(n, 1.0, *place), lambda: random.random(n)),
+        ("uniform", lambda: qx.White2026(n, 1.0, *place), lambda: random.random(n) * 2.0 - 1.0),
+        ("uniform numbers alone", lambda: qx.White2026(n, 1.0, *place), lambda: random.random(n)),
         ("Gauss", lambda: qx.Gauss2026(n, 1.0, *place), lambda: random.standard_normal(n)),
         ("gamma, shape 2.5", lambda: qx.Gamma2026(n, 2.5, *place), lambda: random.standard_gamma(2.5, n)),
         ("gamma, shape 0.3", lambda: qx.Gamma2026(n, 0.3, *place), lambda: random.standard_gamma(0.3, n)),
@@ -44,6 +45,41 @@ def counter_cases(n):
         ("binomial, 1000 trials", lambda: qx.Binomial2026(n, 1000.0, 0.4, *place),
          lambda: random.binomial(1000, 0.4, n)),
         ("permutation", lambda: qx.RiffleIntNum2026_head(n, *place), lambda: random.permutation(n)),
+        *(("shuffled " + name, lambda export=export, x=x: export(x, *place), lambda x=x: shuffled(random, x))
+          for name, export, _, x in shuffles(n)),
+    ]
+
+
+def shuffled(random, x):
+    """The elements in random order, and the order."""
+    order = random.permutation(len(x))
+    return x[order], order
+
+
+def shuffles(n):
+    x = np.arange(n)
+    return [("doubles", qx.RiffleArrayDBL2026_head, qx.RiffleArrayDBL2012_head, x * 1.0),
+            ("complex numbers", qx.RiffleArrayCDB2026_head, qx.RiffleArrayCDB2012_head, x * 1j),
+            ("integers", qx.RiffleArrayInt2026_head, qx.RiffleArrayInt2012_head, x.astype(np.int32))]
+
+
+def elder_cases(n):
+    """The elder's gamma noise has whole orders only; its shuffles are those without bias."""
+    place, seeded = (1, 0, 0.0), (-1, STATE)
+    return [
+        ("uniform", lambda: qx.White2026(n, 1.0, *place), lambda: qx.white(n, 1.0, *seeded)),
+        ("Gauss", lambda: qx.Gauss2026(n, 1.0, *place), lambda: qx.Gauss(n, 1.0, *seeded, {})),
+        ("gamma, shape 3", lambda: qx.Gamma2026(n, 3.0, *place), lambda: qx.GammaNoiseH(n, 3, *seeded)),
+        ("gamma, shape 30", lambda: qx.Gamma2026(n, 30.0, *place), lambda: qx.GammaNoiseH(n, 30, *seeded)),
+        ("Poisson, mean 5", lambda: qx.Poisson2026(n, 5.0, *place), lambda: qx.PoissonNoiseH(n, 5.0, *seeded)),
+        ("Poisson, mean 1e4", lambda: qx.Poisson2026(n, 1e4, *place), lambda: qx.PoissonNoiseH(n, 1e4, *seeded)),
+        ("binomial, 20 trials", lambda: qx.Binomial2026(n, 20.0, 0.3, *place),
+         lambda: qx.BinomialNoiseH(n, 20, 0.3, *seeded, {})),
+        ("binomial, 1000 trials", lambda: qx.Binomial2026(n, 1000.0, 0.4, *place),
+         lambda: qx.BinomialNoiseH(n, 1000, 0.4, *seeded, {})),
+        ("permutation", lambda: qx.RiffleIntNum2026_head(n, *place), lambda: qx.RiffleIntNum2012_head(n, *seeded, 1)),
+        *(("shuffled " + name, lambda export=export, x=x: export(x, *place),
+           lambda elder=elder, x=x: elder(x, *seeded, 1)) for name, export, elder, x in shuffles(n)),
     ]
 
 
@@ -112,10 +148,10 @@ def coordinate_cases(n):
     ]
 
 
-GROUPS = [("noise, called from Python", noise_cases),
-          ("noise of 2026, called from Python", counter_cases), ("waves, called from Python", wave_cases),
-          ("scaling and unwrapping, called from Python", array_cases),
-          ("coordinates, called from Python", coordinate_cases)]
+GROUPS = [("noise", "NumPy", noise_cases),
+          ("noise of 2026", "NumPy", counter_cases), ("noise of 2026", "elder", elder_cases),
+          ("waves", "NumPy", wave_cases), ("scaling and unwrapping", "NumPy", array_cases),
+          ("coordinates", "NumPy", coordinate_cases)]
 
 
 def seconds(function, repeats):
@@ -132,14 +168,14 @@ def best(ours, theirs, repeats, rounds=11):
 
 
 def main():
-    for title, cases in GROUPS:
+    for title, peer, cases in GROUPS:
         ratios = []
         for n in (10**3, 10**4, 10**5, 10**6):
             for name, ours, theirs in cases(n):
                 mine, other = best(ours, theirs, max(1, 100_000 // n))
                 ratios.append((mine / other, f"{name}, n {n}"))
                 print(f"{name:26} n {n:>8}  {1e9 * mine / n:9.2f} ns a sample   {mine / other:5.2f}")
-        print_summary(title, "NumPy", ratios)
+        print_summary(f"{title}, called from Python", peer, ratios)
 
 
 if __name__ == "__main__":

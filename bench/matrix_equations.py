@@ -1,4 +1,5 @@
-"""Sylvester and Lyapunov equations, functions and Schur forms of matrices against SciPy, in one process.
+"""Sylvester and Lyapunov equations, functions and Schur forms of matrices against SciPy, and the revisions of 2026
+also against their elders, in one process.
 
 Ours is the export, called through the binding. SciPy's speed depends on the BLAS that it finds; the first
 line names it.
@@ -76,37 +77,23 @@ def discrete_cases():
                    lambda: linalg.solve_discrete_lyapunov(a, q))
 
 
-def exponential_cases():
-    for kind, prefix in (("real", ""), ("complex", "Cx")):
+def function_cases(export, peer=None, elder=None, arguments=()):
+    """Compares with the peer, or with the elder exports, real and complex, if they are given."""
+    for kind, prefix, of_elder in zip(("real", "complex"), ("", "Cx"), elder or ("", "")):
         for n in ORDERS:
             a, = matrices(kind, n, 1)
-            yield (f"{kind}, n {n}", lambda: qx.call(prefix + "MatrixExp2026_head", a), lambda: linalg.expm(a))
+            other = (lambda: qx.call(of_elder, a, *arguments)) if elder else (lambda: peer(a))
+            yield f"{kind}, n {n}", lambda: qx.call(prefix + export, a, *arguments), other
 
 
-def function_cases(export, peer, of_elder=None):
-    """Compares with the peer, or with the elder export if one is given."""
-    for kind, prefix in (("real", ""), ("complex", "Cx")):
-        for n in ORDERS:
-            a, = matrices(kind, n, 1)
-            other = (lambda: qx.call(of_elder[kind], a)) if of_elder else (lambda: peer(a))
-            yield f"{kind}, n {n}", lambda: qx.call(prefix + export, a), other
-
-
-def power_cases():
-    for kind, prefix in (("real", ""), ("complex", "Cx")):
-        for n in ORDERS:
-            a, = matrices(kind, n, 1)
-            yield (f"{kind}, n {n}", lambda: qx.call(prefix + "MatrixPower2026_head", a, -3),
-                   lambda: np.linalg.matrix_power(a, -3))
-
-
-def schur_cases():
-    """Unordered, and with eigenvalues of negative real part first, compared with SciPy's sorted form."""
+def schur_cases(elder=None):
+    """Unordered, and by ascending real part, compared with SciPy's form, which is sorted by the sign only."""
     for n in ORDERS:
         a, = matrices("real", n, 1)
-        yield f"n {n}", lambda: qx.call("Schur2026_head", a, 1, 0), lambda: linalg.schur(a, output="real")
-        yield (f"ordered, n {n}", lambda: qx.call("Schur2026_head", a, 1, 1),
-               lambda: linalg.schur(a, output="real", sort="lhp"))
+        for name, order, sort in (("", 0, None), ("ordered, ", 1, "lhp")):
+            other = ((lambda: qx.call(elder, a, 1, order)) if elder
+                     else lambda: linalg.schur(a, output="real", sort=sort))
+            yield f"{name}n {n}", lambda: qx.call("Schur2026_head", a, 1, order), other
 
 
 def blas_of_scipy():
@@ -119,11 +106,16 @@ if __name__ == "__main__":
     compare("Sylvester equations", "SciPy", sylvester_cases())
     compare("continuous Lyapunov equations", "SciPy", continuous_cases())
     compare("discrete Lyapunov equations", "SciPy", discrete_cases())
-    compare("matrix exponentials, revision", "SciPy", exponential_cases())
-    compare("matrix logarithms, revision", "SciPy",
-            function_cases("MatrixLn2026_head", lambda a: linalg.logm(a, disp=False)))
-    compare("matrix square roots, revision", "SciPy", function_cases("MatrixSqrt2026_head", linalg.sqrtm))
-    compare("matrix square roots, revision", "elder",
-            function_cases("MatrixSqrt2026_head", None, {"real": "MatrixSqrtH", "complex": "CxMatrixSqrt_head"}))
-    compare("matrix powers of -3, revision", "NumPy", power_cases())
+    for what, export, peer, elder in (
+            ("matrix exponentials", "MatrixExp2026_head", linalg.expm, ("MatrixExp_head", "CxMatrixExp_head")),
+            ("matrix logarithms", "MatrixLn2026_head", lambda a: linalg.logm(a, disp=False),
+             ("MatrixLn_head", "CxMatrixLn_head")),
+            ("matrix square roots", "MatrixSqrt2026_head", linalg.sqrtm, ("MatrixSqrtH", "CxMatrixSqrt_head"))):
+        compare(f"{what}, revision", "SciPy", function_cases(export, peer))
+        compare(f"{what}, revision", "elder", function_cases(export, elder=elder))
+    compare("matrix powers of -3, revision", "NumPy",
+            function_cases("MatrixPower2026_head", lambda a: np.linalg.matrix_power(a, -3), arguments=(-3,)))
+    compare("matrix powers of -3, revision", "elder",
+            function_cases("MatrixPower2026_head", elder=("MatrixPower_head", "CxMatrixPower_head"), arguments=(-3,)))
     compare("Schur forms, revision", "SciPy", schur_cases())
+    compare("Schur forms, revision", "elder", schur_cases("Schur80_head"))

@@ -1,4 +1,4 @@
-"""Arithmetic of polynomials against NumPy and SciPy, in one process.
+"""Arithmetic and roots of polynomials against NumPy and SciPy, and roots also against the elders, in one process.
 
 Ours is the export, called through the binding, which copies its inputs. PolyEv is as accurate as if computed in
 twice the working precision, polyval uses plain Horner's rule. The common divisor has no peer.
@@ -18,6 +18,9 @@ sys.path.insert(0, str(Path(__file__).resolve().parent.parent / "python"))
 import qx  # noqa: E402
 from generators import best  # noqa: E402
 from summary import print_summary  # noqa: E402
+
+DEGREES = (3, 10, 30, 100, 200)
+ELDER_WITH_GUESSES = "elder, from roots to three digits"
 
 
 def noise(*shape):
@@ -75,17 +78,47 @@ def fractions():
                lambda: signal.residue([2.0, 1.0], p[::-1]), 20)
 
 
+def real_roots(peer):
+    """The elder only improves roots that are known; here it has three digits of them."""
+    for degree in DEGREES:
+        p = noise(degree + 1)
+        found, _ = qx.PolyRoots2026_head(p)
+        known, pairs = np.round(found.real[found.imag == 0], 3), found[found.imag != 0] * 1.001
+        theirs = {"numpy.roots": lambda: np.roots(p[::-1]),
+                  ELDER_WITH_GUESSES: lambda: qx.PolyRootsNtBst_head(p, known, 100, 1e-15, pairs, 100, 1e-15)}[peer]
+        yield f"real coefficients, degree {degree}", lambda: qx.PolyRoots2026_head(p), theirs, 600 // degree
+
+
+def complex_roots(peer):
+    for degree in DEGREES:
+        p = noise(degree + 1) + 1j * noise(1, degree + 1)[0]
+        theirs = {"numpy.roots": lambda: np.roots(p[::-1]), "elder": lambda: qx.CxPolyRoots_head(p, 100)}[peer]
+        yield f"complex coefficients, degree {degree}", lambda: qx.CxPolyRoots2026_head(p), theirs, 600 // degree
+
+
+def compare(title, peer, cases):
+    ratios = []
+    for name, ours, theirs, repeats in cases:
+        mine, other = best(ours, theirs, max(1, repeats), 7)
+        ratios.append((mine / other, name))
+        print(f"{name:40} {1e6 * mine:12.1f} us   {mine / other:6.2f}")
+    print_summary(title, peer, ratios)
+
+
+ROOTS = [("roots of real polynomials", "numpy.roots", real_roots),
+         ("roots of real polynomials", ELDER_WITH_GUESSES, real_roots),
+         ("roots of complex polynomials", "numpy.roots", complex_roots),
+         ("roots of complex polynomials", "elder", complex_roots)]
+
+
 def main():
+    for title, peer, cases in ROOTS:
+        compare(f"{title}, revision, called from Python", peer, cases(peer))
     for title, peer, cases in [("values of polynomials", "NumPy, plain", values),
                                ("polynomials of matrices", "NumPy, Horner", matrices),
                                ("arithmetic of polynomials", "NumPy", arithmetic),
                                ("partial fractions", "SciPy", fractions)]:
-        ratios = []
-        for name, ours, theirs, repeats in cases():
-            mine, other = best(ours, theirs, max(1, repeats), 7)
-            ratios.append((mine / other, name))
-            print(f"{name:40} {1e6 * mine:12.1f} us   {mine / other:6.2f}")
-        print_summary(f"{title}, called from Python", peer, ratios)
+        compare(f"{title}, called from Python", peer, cases())
     for degree in (4, 16, 64):
         u, v, w = noise(degree // 2 + 1), noise(degree // 2 + 2), noise(degree // 2 + 3)
         p, q = polynomial.polymul(u, v), polynomial.polymul(u, w[:-2])

@@ -31,8 +31,10 @@ def read(text):
         elif line.startswith("stopped: "):
             stopped = line.removeprefix("stopped: ")
         elif line.startswith("summary | "):
-            what, peer, mean, worst, case, count, width, compiler = [
-                cell.strip() for cell in line.split(" |")[1:]]
+            cells = [cell.strip() for cell in line.split("|")[1:]]
+            if len(cells) != 8:
+                raise SystemExit(f"a name in a summary holds a bar, which ends a cell: {line}")
+            what, peer, mean, worst, case, count, width, compiler = cells
             builds.add((width, compiler))
             if mean != "missing":
                 rows.append({"what": what, "peer": peer, "mean": float(mean), "worst": float(worst),

@@ -9,7 +9,8 @@
 #endif
 
 // Time per call in nanoseconds over 1000 random arguments, and the ratio ours / peer for each
-// peer. bench/run special [PART OF A NAME]
+// peer. Revisions have summaries of their own, against the other libraries and against their elders.
+// bench/run special [PART OF A NAME]
 
 namespace {
 
@@ -52,6 +53,37 @@ std::vector<double> Times(const std::vector<SpecialRow::Function> &functions, co
     return best;
 }
 
+struct Summaries {
+    explicit Summaries(const std::string &name)
+        : others(name), revisions(name + ", revisions"), overElders(name + ", revisions") {}
+    qx::bench::Ratios others, revisions, overElders;
+};
+
+void Compare(const SpecialRow &row, Summaries &group) {
+    std::vector<SpecialRow::Function> functions = {row.ours};
+    for (const auto &peer : row.peers)
+        functions.push_back(peer.second);
+    const std::vector<double> times = Times(functions, Draw(row));
+    std::printf("%-34s %8.1f ns", row.name.c_str(), times[0]);
+    double fastest = 1e300;
+    bool isRevision = false;
+    for (std::size_t k = 1; k < times.size(); ++k) {
+        const char *const peer = row.peers[k - 1].first;
+        std::printf("  %s %5.2f", peer, times[0] / times[k]);
+        if (peer == qx::bench::kElder) {
+            isRevision = true;
+            group.overElders.add(times[0] / times[k], row.name);
+        } else {
+            fastest = std::min(fastest, times[k]);
+        }
+    }
+    std::puts("");
+    if (fastest < 1e300)
+        (isRevision ? group.revisions : group.others).add(times[0] / fastest, row.name);
+}
+
+constexpr char peers[] = "the fastest of GSL, C++ library and Boost";
+
 } // namespace
 
 int main(int argc, char **argv) {
@@ -65,28 +97,17 @@ int main(int argc, char **argv) {
         {"hypergeometric functions", qx::bench::SpecialHypergeometricRows()},
         {"error function, integrals", qx::bench::SpecialIntegralsRows()},
     };
-    std::vector<qx::bench::Ratios> ratios;
+    std::vector<Summaries> summaries;
     for (const auto &[name, rows] : groups) {
-        ratios.emplace_back(name);
-        for (const SpecialRow &row : rows) {
-            if (std::strstr(row.name.c_str(), wanted) == nullptr)
-                continue;
-            std::vector<SpecialRow::Function> functions = {row.ours};
-            for (const auto &peer : row.peers)
-                functions.push_back(peer.second);
-            const std::vector<double> times = Times(functions, Draw(row));
-            std::printf("%-28s %8.1f ns", row.name.c_str(), times[0]);
-            double fastest = 1e300;
-            for (std::size_t k = 1; k < times.size(); ++k) {
-                std::printf("  %s %5.2f", row.peers[k - 1].first, times[0] / times[k]);
-                fastest = std::min(fastest, times[k]);
-            }
-            std::puts("");
-            if (times.size() > 1)
-                ratios.back().add(times[0] / fastest, row.name);
-        }
+        summaries.emplace_back(name);
+        for (const SpecialRow &row : rows)
+            if (std::strstr(row.name.c_str(), wanted) != nullptr)
+                Compare(row, summaries.back());
     }
-    for (const auto &group : ratios)
-        group.summary("the fastest of GSL, C++ library and Boost");
+    for (const Summaries &group : summaries) {
+        group.others.summary(peers);
+        group.revisions.summary(peers);
+        group.overElders.summary("elder");
+    }
     return 0;
 }

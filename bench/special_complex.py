@@ -61,7 +61,7 @@ def bessel_cases(random):
     """The name of a case, its orders and its arguments; I and K have separate arguments."""
     for low, high, near, far in REGIONS:
         z = on_rays(random, random.uniform(near, far, COUNT))
-        yield f"order {low} to {high}, |z| {near} to {far}", random.uniform(low, high, COUNT), z, z
+        yield f"order {low} to {high}, modulus {near} to {far}", random.uniform(low, high, COUNT), z, z
     for low, high in TURNING:
         order = random.uniform(low, high, COUNT)
         z = turning_points(random, order)
@@ -82,7 +82,7 @@ def main():
     for near, far in AIRY_REGIONS:
         z = on_rays(random, random.uniform(near, far, COUNT))
         times = best(lambda: [qx.call(name, z, 1) for name in AIRY], lambda: special.airye(z))
-        ratios.append(shown(f"all four Airy functions, |z| {near} to {far}", *times))
+        ratios.append(shown(f"all four Airy functions, modulus {near} to {far}", *times))
     print_summary("complex Airy functions, called from Python", "SciPy", ratios)
 
 

@@ -40,7 +40,8 @@ int32_t Int(double x) { return static_cast<int32_t>(x); }
 } // namespace
 
 // The quantiles by bisection and the normal distribution by low-order formulas are much less accurate than
-// other libraries' functions, so they have no peers; their revisions come last.
+// other libraries' functions, so they have no peers; their revisions come last. The elder of a tail
+// computes the lower one.
 std::vector<SpecialRow> SpecialGammaRows() {
     return {
         {"gamma, x to 33", 0.1, 33, 0, 0, QX_CALL(GammaFunction(a)),
@@ -96,6 +97,15 @@ std::vector<SpecialRow> SpecialGammaRows() {
          {},
          false,
          true},
+        {"F quantile, d = 9",
+         0.001,
+         0.999,
+         1,
+         50,
+         QX_CALL(From(FisherQuantile, a, Int(b), 9)),
+         {},
+         false,
+         true},
         {"chi-square quantile",
          0.001,
          0.999,
@@ -106,29 +116,41 @@ std::vector<SpecialRow> SpecialGammaRows() {
          false,
          true},
         {"normal tail, revision", -5, 5, 0, 0, QX_CALL(NormalValue(a, kSurvival)),
-         Of(QX_GSL(gsl_cdf_ugaussian_Q(a)), QX_CALL(0.5 * std::erfc(a / kRootTwo)),
-            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::normal(), a))))},
+         WithElder(
+             Of(QX_GSL(gsl_cdf_ugaussian_Q(a)), QX_CALL(0.5 * std::erfc(a / kRootTwo)),
+                QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::normal(), a)))),
+             QX_CALL(From(NormalCDF, a)))},
         {"t tail, revision", -4, 4, 1, 50, QX_CALL(StudentValue(a, b, kSurvival)),
-         Of(QX_GSL(gsl_cdf_tdist_Q(a, b)), nullptr,
-            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::students_t(b), a))))},
+         WithElder(
+             Of(QX_GSL(gsl_cdf_tdist_Q(a, b)), nullptr,
+                QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::students_t(b), a)))),
+             QX_CALL(From(StudentCDF, a, Int(b))))},
         {"F tail, d = 9, revision", 0.01, 5, 1, 50, QX_CALL(FisherValue(a, b, 9, kSurvival)),
-         Of(QX_GSL(gsl_cdf_fdist_Q(a, b, 9)), nullptr,
-            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::fisher_f(b, 9), a))))},
+         WithElder(Of(QX_GSL(gsl_cdf_fdist_Q(a, b, 9)), nullptr,
+                      QX_BOOST(boost::math::cdf(
+                          boost::math::complement(boost::math::fisher_f(b, 9), a)))),
+                   QX_CALL(From(FisherCDF, a, Int(b), 9)))},
         {"chi-square tail, revision", 0.1, 60, 1, 50, QX_CALL(ChiSquareValue(a, b, kSurvival)),
-         Of(QX_GSL(gsl_cdf_chisq_Q(a, b)), nullptr,
-            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::chi_squared(b), a))))},
+         WithElder(Of(QX_GSL(gsl_cdf_chisq_Q(a, b)), nullptr,
+                      QX_BOOST(boost::math::cdf(
+                          boost::math::complement(boost::math::chi_squared(b), a)))),
+                   QX_CALL(From(ChiSquareCDF, a, Int(b))))},
         {"normal quantile, revision", 0.001, 0.999, 0, 0, QX_CALL(NormalPoint(a, false)),
-         Of(QX_GSL(gsl_cdf_ugaussian_Pinv(a)), nullptr,
-            QX_BOOST(boost::math::quantile(boost::math::normal(), a)))},
+         WithElder(Of(QX_GSL(gsl_cdf_ugaussian_Pinv(a)), nullptr,
+                      QX_BOOST(boost::math::quantile(boost::math::normal(), a))),
+                   QX_CALL(From(NormalQuantile, a)))},
         {"t quantile, revision", 0.001, 0.999, 1, 50, QX_CALL(StudentPoint(a, false, b)),
-         Of(QX_GSL(gsl_cdf_tdist_Pinv(a, b)), nullptr,
-            QX_BOOST(boost::math::quantile(boost::math::students_t(b), a)))},
+         WithElder(Of(QX_GSL(gsl_cdf_tdist_Pinv(a, b)), nullptr,
+                      QX_BOOST(boost::math::quantile(boost::math::students_t(b), a))),
+                   QX_CALL(From(StudentQuantile, a, Int(b))))},
         {"F quantile, d = 9, revision", 0.001, 0.999, 1, 50, QX_CALL(FisherPoint(a, false, b, 9)),
-         Of(QX_GSL(gsl_cdf_fdist_Pinv(a, b, 9)), nullptr,
-            QX_BOOST(boost::math::quantile(boost::math::fisher_f(b, 9), a)))},
+         WithElder(Of(QX_GSL(gsl_cdf_fdist_Pinv(a, b, 9)), nullptr,
+                      QX_BOOST(boost::math::quantile(boost::math::fisher_f(b, 9), a))),
+                   QX_CALL(From(FisherQuantile, a, Int(b), 9)))},
         {"chi-square quantile, revision", 0.001, 0.999, 1, 50, QX_CALL(ChiSquarePoint(a, false, b)),
-         Of(QX_GSL(gsl_cdf_chisq_Pinv(a, b)), nullptr,
-            QX_BOOST(boost::math::quantile(boost::math::chi_squared(b), a)))},
+         WithElder(Of(QX_GSL(gsl_cdf_chisq_Pinv(a, b)), nullptr,
+                      QX_BOOST(boost::math::quantile(boost::math::chi_squared(b), a))),
+                   QX_CALL(From(ChiSquareQuantile, a, Int(b))))},
     };
 }
 

@@ -1,4 +1,4 @@
-#include "bench/special_rows.h"
+#include "bench/special_peers.h"
 
 #include "special/confluent.h"
 #include "special/gauss_regions.h"
@@ -16,8 +16,6 @@
 namespace qx::bench {
 
 namespace {
-
-typedef std::vector<std::pair<const char *, SpecialRow::Function>> Peers;
 
 // x and b vary; a and c, or the second parameter, are fixed.
 Peers GaussPeers() {
@@ -94,15 +92,24 @@ std::vector<SpecialRow> SpecialHypergeometricRows() {
         {"Tricomi [0, 6]", 0, 6, 0.1, 3, OurTricomi, TricomiPeers(0.3)},
         {"Tricomi [6, 60]", 6, 60, 0.1, 3, OurTricomi, TricomiPeers(0.3)},
         {"Tricomi [0, 6], b = 2", 0, 6, 0.1, 3, OurTricomiAtInteger, TricomiPeers(2)},
-        {"Gauss [-1, -0.5], revision", -1, -0.5, 0.1, 3, Gauss2026, GaussPeers()},
-        {"Gauss [-0.5, 0.2], revision", -0.5, 0.2, 0.1, 3, Gauss2026, GaussPeers()},
-        {"Gauss [0.2, 0.99], revision", 0.2, 0.99, 0.1, 3, Gauss2026, GaussPeers()},
-        {"Kummer [-60, -10], a > 0, revision", -60, -10, 0.1, 5, Kummer2026, KummerPeers()},
-        {"Kummer [0, 30], a > 0, revision", 0, 30, 0.1, 5, Kummer2026, KummerPeers()},
-        {"Kummer [0, 30], a < 0, revision", 0, 30, -5, -0.1, Kummer2026, KummerPeers()},
-        {"Tricomi [0, 6], revision", 0, 6, 0.1, 3, Tricomi2026, TricomiPeers(0.3)},
-        {"Tricomi [6, 60], revision", 6, 60, 0.1, 3, Tricomi2026, TricomiPeers(0.3)},
-        {"Tricomi [0, 6], b = 2, revision", 0, 6, 0.1, 3, Tricomi2026AtInteger, TricomiPeers(2)},
+        {"Gauss [-1, -0.5], revision", -1, -0.5, 0.1, 3, Gauss2026,
+         WithElder(GaussPeers(), OurGauss2011)},
+        {"Gauss [-0.5, 0.2], revision", -0.5, 0.2, 0.1, 3, Gauss2026,
+         WithElder(GaussPeers(), OurGauss2011)},
+        {"Gauss [0.2, 0.99], revision", 0.2, 0.99, 0.1, 3, Gauss2026,
+         WithElder(GaussPeers(), OurGauss2011)},
+        {"Kummer [-60, -10], a > 0, revision", -60, -10, 0.1, 5, Kummer2026,
+         WithElder(KummerPeers(), OurKummer)},
+        {"Kummer [0, 30], a > 0, revision", 0, 30, 0.1, 5, Kummer2026,
+         WithElder(KummerPeers(), OurKummer)},
+        {"Kummer [0, 30], a < 0, revision", 0, 30, -5, -0.1, Kummer2026,
+         WithElder(KummerPeers(), OurKummer)},
+        {"Tricomi [0, 6], revision", 0, 6, 0.1, 3, Tricomi2026,
+         WithElder(TricomiPeers(0.3), OurTricomi)},
+        {"Tricomi [6, 60], revision", 6, 60, 0.1, 3, Tricomi2026,
+         WithElder(TricomiPeers(0.3), OurTricomi)},
+        {"Tricomi [0, 6], b = 2, revision", 0, 6, 0.1, 3, Tricomi2026AtInteger,
+         WithElder(TricomiPeers(2), OurTricomiAtInteger)},
     };
 }
 

@@ -30,8 +30,6 @@
 
 namespace qx::bench {
 
-typedef std::vector<std::pair<const char *, SpecialRow::Function>> Peers;
-
 // The peers in the order GSL, C++ library, Boost; null for a peer without the function.
 inline Peers Of(SpecialRow::Function gsl, SpecialRow::Function standard,
                 SpecialRow::Function boost) {
@@ -42,6 +40,12 @@ inline Peers Of(SpecialRow::Function gsl, SpecialRow::Function standard,
         peers.push_back({"C++", standard});
     if (boost != nullptr)
         peers.push_back({"Boost", boost});
+    return peers;
+}
+
+// The peers of a revision: also the elder of which it is the revision.
+inline Peers WithElder(Peers peers, SpecialRow::Function elder) {
+    peers.push_back({kElder, elder});
     return peers;
 }
 

@@ -7,6 +7,9 @@
 
 namespace qx::bench {
 
+// The name of the elder among the peers of a revision; it is not one of the other libraries.
+inline constexpr char kElder[] = "elder";
+
 // One function of the comparison, timed on random arguments in its usual range.
 struct SpecialRow {
     typedef double (*Function)(double, double);
@@ -19,6 +22,8 @@ struct SpecialRow {
     bool firstIsInteger = false;
     bool secondIsInteger = false;
 };
+
+typedef std::vector<std::pair<const char *, SpecialRow::Function>> Peers;
 
 // Each file of rows defines one of these functions; special.cpp runs all of them.
 std::vector<SpecialRow> SpecialBesselRows();

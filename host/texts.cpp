@@ -28,7 +28,7 @@ constexpr Message messages[] = {
     QX_MESSAGE(ErrFewerThanThree, "At least 3 elements or samples are needed."),
     QX_MESSAGE(ErrSizesDisagree,
                "The sizes of the arguments do not fit together, or an array is too short."),
-    QX_MESSAGE(ErrLengthTooLarge, "A length is larger than this operation can take."),
+    QX_MESSAGE(ErrLengthTooLarge, "A length is larger than this operation can handle."),
     QX_MESSAGE(ErrWaveParameterNotPositive, "The duty cycle must be greater than 0."),
     QX_MESSAGE(
         ErrWaveParameterRange,
@@ -44,7 +44,7 @@ constexpr Message messages[] = {
     QX_MESSAGE(ErrOrderNotPositive,
                "The order, degree or number of taps is out of range; it must be at least 1."),
     QX_MESSAGE(ErrDecimationOutOfRange,
-               "The decimating factor must be at least 1 and at most the number of samples."),
+               "The decimation factor must be at least 1 and at most the number of samples."),
     QX_MESSAGE(ErrBadCutoff,
                "Filter frequencies and the sampling rate must be greater than 0, and the band "
                "edges must be in ascending order, up to half the sampling rate."),

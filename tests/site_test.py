@@ -116,16 +116,19 @@ class Site(unittest.TestCase):
 
 class Sources(unittest.TestCase):
     def test_every_argument_has_a_meaning(self):
-        used = set()
+        used, named = set(), set()
         for entry in pages.library().entries.values():
             for argument in entry["arguments"]:
                 text = pages.meaning(entry, argument)
                 self.assertTrue(text, f"{entry['name']}: {argument['name']}: neither its header nor "
                                 "docs/site/arguments.py says what it is")
+                self.assertNotRegex(text, r"^(?:A|Every|After a) failure|empties", f"{entry['name']}: {argument['name']}")
                 if text == pages.TEXTS.get(entry["family"], {}).get(argument["name"]):
                     used.add((entry["family"], argument["name"]))
+                named.update([key for key in pages.keys(entry, argument) if key in pages.MEANINGS][:1])
         listed = {(family, name) for family, names in pages.TEXTS.items() for name in names}
         self.assertEqual(listed - used, set(), "in docs/site/arguments.py, but their headers say what they are")
+        self.assertEqual(set(pages.MEANINGS) - named, set(), "in docs/site/arguments.py, but not arguments")
 
     def test_every_code_has_a_reason(self):
         for entry in pages.library().entries.values():

@@ -55,7 +55,8 @@ class Page(unittest.TestCase):
             "stopped": "after 200 s", "rows": [{"what": "short, 2 to 8", "peer": "FFTW", "mean": 0.6543, "worst": 1.2,
                                                 "case": "8", "count": 7}]})
         summary = "summary | short, 2 to 8 | FFTW | 0.7 | 1 | 8 | 7 | {} | g++ 12.2.0\n"
-        for more in (summary.format("AVX2"), summary.format("SSE2").replace("short", "other")):
+        for more in (summary.format("AVX2"), summary.format("SSE2").replace("short", "other"),
+                     summary.format("AVX2").replace("short", "|z|")):
             with self.assertRaises(SystemExit):
                 record.read(PRINTED + more)
 

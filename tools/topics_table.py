@@ -16,7 +16,7 @@ from qx.library import library  # noqa: E402
 from qx.topical.newest import NEWEST, TOPICS, function_of  # noqa: E402
 
 PAGE = ROOT / "docs/topics.md"
-ELDER, TWIN, HOST = "elder, for comparison", "for hosts: plan in instance data", "for hosts"
+NOT_CALLED, TWIN, HOST = "not called, for comparison", "for hosts: plan in instance data", "for hosts"
 # Exports that the table of topical/newest.py does not name: patterns, tried in order, with the function that does
 # the same through another export, or a remark.
 OTHERS = (
@@ -94,7 +94,7 @@ def served():
 def remark(name):
     for patterns, text in OTHERS:
         if any(fnmatch.fnmatchcase(name, pattern) for pattern in patterns.split()):
-            return text if text in (TWIN, HOST) else f"{text} ({ELDER})" if "." in text and "NumPy" not in text \
+            return text if text in (TWIN, HOST) else f"{text} ({NOT_CALLED})" if "." in text and "NumPy" not in text \
                 else text
     raise LookupError(f"no topic function calls {name}: add it to topical/newest.py or to {Path(__file__).name}")
 
@@ -102,9 +102,9 @@ def remark(name):
 def page():
     functions = served()
     lines = ["# Exports and topics", "",
-             'Each export, with the functions of the Python topics that call it. Exports marked "elder, for comparison" are',
-             "other revisions or forms of those that the topics call; `qx.exports` has all exports. Written by",
-             "`tools/topics_table.py` from `python/qx/topical/newest.py`.", ""]
+             'Each export, with the functions of the Python topics that call it. Exports marked "not called, for',
+             'comparison" are other revisions or forms of those that the topics call; `qx.exports` has all exports. Written',
+             "by `tools/topics_table.py` from `python/qx/topical/newest.py`.", ""]
     for family in library().catalogue["families"]:
         names = [name for name, entry in library().entries.items() if entry["family"] == family["name"]]
         if names:

@@ -18,7 +18,7 @@ from pathlib import Path
 ROOT = Path(__file__).resolve().parent.parent.parent
 sys.path[:0] = [str(ROOT / "python"), str(ROOT / "tools"), str(ROOT / "docs/site")]
 import topics_table  # noqa: E402
-from arguments import TEXTS  # noqa: E402
+from arguments import MEANINGS, TEXTS  # noqa: E402
 from catalogue import FULL_STOP  # noqa: E402
 from qx.catalogue import summary  # noqa: E402
 from qx.functions import signature_text  # noqa: E402
@@ -32,6 +32,8 @@ DIRECTIONS = {"in": "input", "out": "output", "inout": "changed in place"}
 KINDS = {"error": "The code of the call.",
          "slot": "Where the call site keeps its plan between calls; null before the first.",
          "instance": "Instance data of the call site, null before the first call."}
+# Sentences that say what a failure does to an argument, not what the argument is.
+FAILURE = re.compile(r"(?:A|Every|After a) (?:failure|negative status)\b|Every code\b|The last block and every\b")
 
 
 # Texts of the headers as reStructuredText
@@ -144,6 +146,11 @@ def clipped(sentence, pattern, enough=70):
     return ("... " if first else "") + (found if last + 1 == len(clauses) else found.rstrip(",;:") + " ...")
 
 
+def keys(entry, argument):
+    """The keys of MEANINGS for an argument: of the export, of those whose text it takes over, and of its header."""
+    return [f"{name}.{argument['name']}" for name in (entry["name"], *entry["inherited"], entry["family"])]
+
+
 def texts_of(entry):
     """The texts that describe an export: its own, those it takes over, and that of its header. What is said of
     codes and of NaN does not describe its arguments."""
@@ -155,21 +162,22 @@ def texts_of(entry):
 
 
 def meaning(entry, argument):
-    """What the texts say about an argument: its values, or the sentence in which it is first named."""
+    """What an argument is: its values, what arguments.py says of it, or the sentence in which it is first named.
+    Sentences about failures do not count."""
     if values := argument.get("values"):
         return "; ".join(f"{value}: {text}" if text else f"{value}" for value, text in values) + "."
     if argument["kind"] in KINDS:
         return KINDS[argument["kind"]]
+    for key in keys(entry, argument):
+        if key in MEANINGS:
+            return MEANINGS[key]
     pattern = mentions(argument["name"])
     for text in texts_of(entry):
         for sentence in sentences(text):
-            if pattern.search(sentence):
+            if pattern.search(sentence) and not FAILURE.match(sentence):
                 return clipped(sentence, pattern)
-    ruled = [text for texts in reasons(entry).values() for text in texts if pattern.search(text)]
-    if ruled:
-        return "Refused: " + "; ".join(ruled) + "."
-    if told := TEXTS.get(entry["family"], {}).get(argument["name"]):
-        return told
+    if found := TEXTS.get(entry["family"], {}).get(argument["name"]):
+        return found
     outputs = [a for a in entry["arguments"] if a["direction"] != "in" and a["kind"] != "error"]
     if argument["direction"] == "out" and len(outputs) == 1:
         return "The result."
@@ -208,7 +216,7 @@ def codes_table(entry):
              marked("; ".join(why.get(name, [])))] for name in entry["codes"]]
     found = table(["Code", "Name", "Message", "When"], rows, [10, 25, 35, 30]) if rows else ""
     if entry["hostStatus"]:
-        found += "\n\nThe host's own status is passed on where it refuses an array."
+        found += "\n\nIf the host refuses an array, its own status is passed on."
     return found
 
 
@@ -251,7 +259,7 @@ def standing(entry, served, pairs):
         if text.endswith(f"({topics_table.ELDER})"):
             newest = [other for other, names in served.items() if set(names) & set(functions)]
             through = f", through {', '.join(map(link, newest))}" if 0 < len(newest) < 4 else ""
-            out.append(f"An elder or another form, kept for comparison; in Python "
+            out.append(f"An older or alternative form, kept for comparison; in Python "
                        f"{functions_linked(functions)} does the same{through}.")
         elif text == topics_table.TWIN:
             out.append("A twin for hosts that keep the plan in their instance data.")

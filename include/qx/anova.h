@@ -13,8 +13,8 @@ QX_BEGIN_DECLS
 /** Pearson's chi-square test of independence on a table of counts: the statistic, the sum of (O -
     E)^2 / E with E = column sum times row sum / total, and the probability p of a larger statistic
     with (rows - 1)(columns - 1) degrees of freedom. An empty row or column gives NaN with code 0. p
-    is 1 minus the lower tail, so no digit is left for p below 1e-16; Contingency2026_head keeps all
-    digits.
+    is 1 minus the lower tail, so it has no correct digits below 1e-16; Contingency2026_head keeps
+    all digits.
     Codes: ErrTableNegativeSize (a dimension is negative), ErrTableTooSmall (fewer than 2 rows or
     columns), ErrOutOfMemory (no scratch memory), ErrTableNegativeSize (a count is negative). */
 QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OUT DBL *p,
@@ -47,9 +47,9 @@ QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const in
                               QX_OUT DBL *ssTotal, QX_OUT ErrorCode *err);
 
 /** As Anova1Way_head, and with *fCritical, the value that f exceeds with probability alpha, by
-    bisection to 1e-4; it is infinite for an alpha from 0 to 5.5e-17, where 1 - alpha is 1. With a
-    mean of 1e6 standard deviations less than one digit of the sums is left, and p below 1e-16 has
-    no correct digit; Anova1Way_head_2026 keeps the digits.
+    bisection to 1e-4; it is infinite for an alpha from 0 to 5.5e-17, where 1 - alpha is 1. If the
+    mean is 1e6 standard deviations, less than one digit of the sums is left, and a p below 1e-16
+    has no correct digits; Anova1Way_head_2026 keeps the digits.
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrBadSignificance (alpha is outside [0, 1]),
     ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more different labels than k),
@@ -61,7 +61,7 @@ QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN con
                                    QX_OUT DBL *msError, QX_OUT DBL *ssTotal, QX_OUT DBL *fCritical,
                                    QX_OUT ErrorCode *err);
 
-/** As Anova1Way_head_2017, by two passes over the exact differences to one observation, in twice
+/** As Anova1Way_head_2017, by two passes over the exact differences from one observation, in twice
     the precision: the sums of squares are the exact sums, rounded, so a sum that should be 0 is 0.
     The data are scaled by a power of 2, so that squares overflow only if the result does. p is
     computed from the upper tail itself, and fCritical is its inverse to the last digits, infinite
@@ -95,11 +95,11 @@ QX_API int32_t Anova1Way_head_2026(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN con
     and independent. If no factor is random, the denominator is the error for all sources; otherwise
     it is AB for A and B, and the error for AB.
 
-    Differences to one observation are taken first and all deviations from means are formed in twice
-    the precision, so f is as accurate as the data whatever their mean and scale. A sum of squares
-    beyond the range of double is infinite or 0, but f is still correct. Deviations below n 2^-100
-    of the range of n observations count as 0. Unbalanced designs, nested factors and the restricted
-    model are not supported.
+    Differences from one observation are taken first, and all deviations from means are formed in
+    twice the precision, so f is as accurate as the data whatever their mean and scale. A sum of
+    squares beyond the range of double is infinite or 0, but f is still correct. Deviations smaller
+    than n 2^-100 times the range of the n observations count as 0. Unbalanced designs, nested
+    factors and the restricted model are not supported.
     Codes: ErrEmptyInput (y is empty), ErrSizeMismatch (y and the labels differ in length),
     ErrAnovaFewLevels (a factor has fewer than 2 levels), ErrAnovaNoReplication (observations is
     below 1), ErrAnovaNegativeSelector (one observation per cell and a random factor),

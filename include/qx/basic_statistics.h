@@ -19,8 +19,8 @@ QX_BEGIN_DECLS
     NaN: x in all results. */
 QX_API int32_t Mean_head(QX_IN DBL1D x, QX_OUT DBL *mean, QX_OUT ErrorCode *err);
 
-/** Root mean square, sqrt(sum(x^2) / n). The squares of values from 1.4e154 on overflow, and those
-    of values below 1.5e-162 underflow to 0; digits are lost up to 1e-154.
+/** Root mean square, sqrt(sum(x^2) / n). The squares of values of 1.4e154 and above overflow, and
+    those of values below 1.5e-162 underflow to 0; digits are lost for values below 1e-154.
     Codes: ErrEmptyInput (x is empty).
     NaN: x in all results. */
 QX_API int32_t RMS_head(QX_IN DBL1D x, QX_OUT DBL *rms, QX_OUT ErrorCode *err);
@@ -32,8 +32,8 @@ QX_API int32_t RMS_head(QX_IN DBL1D x, QX_OUT DBL *rms, QX_OUT ErrorCode *err);
 QX_API ErrorCode CxRMS_head(QX_IN CDB1D z, QX_OUT DBL *rms);
 
 /** Mean squared difference over the shorter of the two lengths, m: sum(x x + y (y - 2 x)) / m.
-    Where x and y nearly agree the sum loses digits to cancellation. For values from 1e154 on the
-    products overflow; the result is then NaN if y is about as large as x, however small the
+    Where x and y nearly agree, the sum loses digits to cancellation. For values of 1e154 and above,
+    the products overflow; the result is then NaN if y is about as large as x, however small the
     difference.
     Codes: ErrEmptyInput (x or y is empty), WarnLengthsDiffer (the lengths differ).
     NaN: x in all results; y in all results or in no result. */

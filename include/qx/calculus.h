@@ -3,10 +3,14 @@
 
 /* Integrals and derivatives of samples at a constant step dt.
 
-   Definite integrals are one number, computed by composite Newton-Cotes rules:
+   A definite integral is one number, computed by a composite Newton-Cotes rule:
 
-       0 trapezoid, 1 Simpson, 2 Simpson 3/8, 3 Bode (Boole), with 2, 3, 4 and 5 samples per panel,
-       4 left and 5 right rectangles (only where stated)
+       0  trapezoid, 2 samples per panel
+       1  Simpson, 3 samples per panel
+       2  Simpson 3/8, 4 samples per panel
+       3  Bode (Boole), 5 samples per panel
+       4  left rectangles, only where stated
+       5  right rectangles, only where stated
 
    Running integrals and derivatives replace the samples in place. Where a formula needs samples
    beyond the ends of the data, they are taken from the first elements of `initial` and `final`: if
@@ -33,9 +37,9 @@ typedef Array3DBlock **Array3DHandle;
     } * *
 typedef QX_ARRAY_3D(DBL) DBL3D;
 
-/** Definite integral of x. rule: 0 to 3. The sign of *dt does not count. Samples left over after
-    the last whole panel are integrated by a rule of lower order, so that the result is exact only
-    for polynomials of that lower order. The code is in *err, and a failure sets the result to NaN.
+/** Definite integral of x. rule: 0 to 3. The sign of *dt is ignored. Samples left over after the
+    last whole panel are integrated by a rule of lower order, so that the result is exact only for
+    polynomials of that lower order. The code is in *err, and a failure sets the result to NaN.
     Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (any other rule), ErrSizesDisagree (x has
     fewer samples than a panel).
     NaN: x, dt in all results. */

@@ -69,8 +69,8 @@ struct Returning {};
 inline constexpr Returning returned{};
 
 // Passed as the first argument of a function whose result is one array: the result is written to
-// these elements, and the part of them that it fills is returned. Too few elements are
-// ErrSizeMismatch of the argument "into".
+// these elements, and the part of them that it fills is returned. Too few elements give
+// ErrSizeMismatch for the argument "into".
 template <class T>
 struct Into {
     std::span<T> elements;
@@ -81,7 +81,7 @@ auto into(Range &range) {
         {std::data(range), std::size(range)}};
 }
 
-// A value, or why there is none.
+// A value, or the reason why there is none.
 template <class T>
 class Returned {
 public:
@@ -112,7 +112,7 @@ private:
     Status status_;
 };
 
-// A matrix stored row by row: in memory of the caller, or its own.
+// A matrix stored row by row: in the caller's memory, or in its own.
 template <class T>
 struct MatrixView {
     const T *data = nullptr;

@@ -16,9 +16,9 @@
 QX_BEGIN_DECLS
 
 /** out[t] = sum over i of x[i] y[t - i], nx + ny - 1 values. The code is in *err. Any other
-    algorithm leaves the elements of out as they are, with code 0.
+    algorithm leaves the elements of `out` as they are, with code 0.
     Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
-    memory). A failure empties out.
+    memory). A failure empties `out`.
     NaN: x, y in all results or in some results. */
 QX_API int32_t Convolution(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out,
                            QX_IN const int32_t *algorithm, QX_OUT ErrorCode *err);
@@ -26,25 +26,25 @@ QX_API int32_t Convolution(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out,
 /** Complex convolution or, with `correlate` non-zero, correlation: out[t] = sum over i of
     conj(x[nx - 1 - i]) y[t - i], element nx - 1 being lag zero, normalized as selected. Convolution
     ignores the normalization.
-    Codes: ErrEmptyInput (x or y is empty; out is unchanged), the host's status (it refuses the
+    Codes: ErrEmptyInput (x or y is empty; `out` is unchanged), the host's status (it refuses the
     output), ErrInvalidSelector (no such normalization of a correlation, or no such algorithm),
-    ErrOutOfMemory (no memory). All codes but the first empty out.
+    ErrOutOfMemory (no memory). Every code but the first empties `out`.
     NaN: x, y in all results or in some results. */
 QX_API ErrorCode CxConvolution(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D out, int32_t algorithm,
                                int32_t correlate, int32_t normalization);
 
 /** Cross-correlation: out[t] = sum over j of x[nx - 1 - t + j] y[j], nx + ny - 1 values, element
-    nx - 1 being lag zero. The code is in *err. Any other algorithm leaves the elements of out as
+    nx - 1 being lag zero. The code is in *err. Any other algorithm leaves the elements of `out` as
     they are, apart from the normalization. If x and y are the same array, two transforms are
     computed instead of three.
     Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
-    memory), ErrInvalidSelector (no such normalization). A failure empties out.
+    memory), ErrInvalidSelector (no such normalization). A failure empties `out`.
     NaN: x, y in all results or in some results. */
 QX_API int32_t Rxy80(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const int32_t *algorithm,
                      int32_t normalization, QX_OUT ErrorCode *err);
 /** As Rxy80, without a normalization.
     Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
-    memory). A failure empties out. */
+    memory). A failure empties `out`. */
 QX_API int32_t Rxy(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const int32_t *algorithm,
                    QX_OUT ErrorCode *err);
 

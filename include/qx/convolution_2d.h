@@ -13,21 +13,21 @@ QX_BEGIN_DECLS
     yCols + 1 values. algorithm: as CxConvolution.
     Codes: ErrEmptyInput (x or y is empty), ErrInvalidSelector (no such outputSize; as the last
     check, no such algorithm), ErrSizesDisagree (outputSize 2 and y exceeds x), ErrOutOfMemory (the
-    host refuses the output, or no memory). The codes up to ErrSizesDisagree leave out unchanged;
+    host refuses the output, or no memory). The codes up to ErrSizesDisagree leave `out` unchanged;
     the later ones empty it.
     NaN: x, y in all results or in some results. */
 QX_API ErrorCode Convolve_2DH(QX_IN DBL2D x, QX_IN DBL2D y, QX_OUT DBL2D out, int32_t outputSize,
                               int32_t algorithm);
 /** As Convolve_2DH, for complex data. With outputSize 2, an x or a y with more columns than rows
-    always gives ErrSizesDisagree, even if y fits, and empties out. */
+    always gives ErrSizesDisagree, even if y fits, and empties `out`. */
 QX_API ErrorCode CxConvolve_2DH(QX_IN CDB2D x, QX_IN CDB2D y, QX_OUT CDB2D out, int32_t outputSize,
                                 int32_t algorithm);
 
 /** The convolution of x, rotated by 180 degrees, with y, in full size. Lag zero is the element in
     row xRows - 1, column xCols - 1. algorithm: as CxConvolution.
-    Codes: ErrEmptyInput (x or y is empty; out is unchanged), ErrOutOfMemory (the host refuses the
-    output, or no memory), ErrInvalidSelector (no such algorithm). All codes but the first empty
-    out.
+    Codes: ErrEmptyInput (x or y is empty; `out` is unchanged), ErrOutOfMemory (the host refuses the
+    output, or no memory), ErrInvalidSelector (no such algorithm). Every code but the first empties
+    `out`.
     NaN: x, y in all results or in some results. */
 QX_API ErrorCode Correlation_2DH(QX_IN DBL2D x, QX_IN DBL2D y, QX_OUT DBL2D out, int32_t algorithm);
 /** As Correlation_2DH, for complex data; x is conjugated. */

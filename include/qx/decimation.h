@@ -5,18 +5,18 @@
    modulators, all for streams in blocks.
 
    The data that a stream keeps between blocks (`state`, `delay`, `start` and so on) belong to the
-   caller, who passes them back unchanged. Blocks of any size then give to the bit the results of a
-   single block, except in the modulators, whose rotation is restarted with each block. A failure
-   empties the output arrays and the state arrays; `delay` and other numbers of a stream are
+   caller, who passes them back unchanged. Blocks of any size then give the results of a single
+   block, to the bit, except in the modulators, whose rotation is restarted with each block. A
+   failure empties the output arrays and the state arrays; `delay` and other numbers of a stream are
    unchanged. `reset` sizes and clears the state of a FIR or CIC stream. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** Keeps every *factor-th value of x, starting with the first, or with *average the means of
-    *factor neighbours; values after the last whole group are dropped. The function result is 0, or
-    the host's own status if it refused the resize.
+/** Keeps every *factor-th value of x, starting with the first, or, if *average is non-zero, the
+    means of *factor neighbours; values after the last whole group are dropped. The function result
+    is 0, or the host's own status if it refused the resize.
     Codes: ErrEmptyInput (x is empty), ErrDecimationOutOfRange (*factor is below 1 or above the size
     of x), ErrOutOfMemory (no memory).
     NaN: x in some results or in no result. */
@@ -25,10 +25,10 @@ QX_API int32_t DecimateCIN(QX_INOUT DBL1D x, QX_IN const int32_t *factor,
 /** As DecimateCIN, for complex data, with scalars by value; the code is the function result. */
 QX_API ErrorCode CxDecimate_H(QX_INOUT CDB1D x, int32_t factor, int32_t average);
 
-/** Decimates a stream: x becomes every factor-th sample, after *start samples that are skipped, or
-    with `average` the means of groups of factor samples. A group that is incomplete at the end of
-    the block is kept in *partialCount and *partialSum, which `reset` clears; *start is then the
-    number of samples that it still needs.
+/** Decimates a stream: x becomes every factor-th sample, after *start samples that are skipped, or,
+    if `average` is non-zero, the means of groups of factor samples. A group that is incomplete at
+    the end of the block is kept in *partialCount and *partialSum, which `reset` clears; *start is
+    then the number of samples that it still needs.
     Codes: ErrNotStrictlyPositive (factor is below 1), ErrNegativeSetting (*start is negative),
     ErrOutOfMemory (no memory).
     NaN: x, partialSum in some results or in no result. */

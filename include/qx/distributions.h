@@ -77,19 +77,20 @@ QX_API int32_t InvChiSquare_head(QX_IN const DBL *p, QX_IN const int32_t *dof, Q
 
 /** A value of the standard normal distribution at *x, within 3 eps down to the smallest numbers:
     exp(-x^2 / 2), with x^2 in twice the precision, times polynomials for the ratio of the tail to
-    it. The larger of probability and survival is 1 minus the smaller. what: 0 the
-    probability P(X <= x); 1 the survival P(X > x); 2 the logarithm of the probability; 3 the
-    logarithm of the survival; 4 the density.
+    it. The larger of probability and survival is 1 minus the smaller. what: 0 the probability P(X
+    <= x); 1 the survival P(X > x); 2 the logarithm of the probability; 3 the logarithm of the
+    survival; 4 the density.
     Codes: ErrInvalidSelector (what is not 0 to 4), ErrNaNInData (x is NaN).
     NaN: x refused with ErrNaNInData. */
 QX_API int32_t NormDist2026_head(QX_IN const DBL *x, QX_IN const int32_t *what, QX_OUT DBL *value,
                                  QX_OUT ErrorCode *err);
 
 /** As NormDist2026_head, of Student's distribution with *dof degrees of freedom, which need not be
-    integers; values above 1e25, including infinity, count as 1e25, where the distribution is
-    normal. Method: from 1 to 1e6 degrees a series or a continued fraction with positive terms;
-    otherwise the smaller tail is the incomplete beta integral in the logarithm of t / (1 - t) by
-    quadrature, with its leading factor in twice the precision (C. Loader's deviance).
+    an integer, within 4 eps and its logarithms within 4.3; values above 1e25, including infinity,
+    count as 1e25, where the distribution is normal. Method: from 1 to 1e6 degrees a series or a
+    continued fraction with positive terms; otherwise the smaller tail is the incomplete beta
+    integral in the logarithm of t / (1 - t) by quadrature, with its leading factor in twice the
+    precision (C. Loader's deviance).
     Codes: ErrInvalidSelector (what is not 0 to 4), ErrTooFewForParameters (dof is not above 0),
     ErrNaNInData (t is NaN).
     NaN: t refused with ErrNaNInData; dof refused with ErrTooFewForParameters. */
@@ -115,10 +116,10 @@ QX_API int32_t ChiSquare2026_head(QX_IN const DBL *x, QX_IN const DBL *dof,
                                   QX_IN const int32_t *what, QX_OUT DBL *value,
                                   QX_OUT ErrorCode *err);
 
-/** The point below which, or above which, the standard normal distribution has the probability *p:
-    rational functions. tail: 0 below; 1 above. Infinite for p of 0 and
-    1. A p close to 1 leaves few digits for the other tail: pass the probability of that tail
-    instead, with the other value of *tail.
+/** The point below which, or above which, the standard normal distribution has the probability *p,
+    by rational functions. tail: 0 below; 1 above. It is infinite for p of 0 and of 1. A p close to
+    1 leaves few digits for the other tail: pass the probability of that tail instead, with the
+    other value of *tail.
     Codes: ErrInvalidSelector (tail is neither 0 nor 1), ErrProbabilityOutOfRange (p is outside [0,
     1] or is NaN).
     NaN: p refused with ErrProbabilityOutOfRange. */
@@ -126,7 +127,7 @@ QX_API int32_t InvNdist2026_head(QX_IN const DBL *p, QX_IN const int32_t *tail, 
                                  QX_OUT ErrorCode *err);
 
 /** As InvNdist2026_head, of Student's distribution with *dof degrees of freedom, which need not be
-    integers. Points beyond the largest double are infinite. With few degrees of freedom the point
+    an integer. Points beyond the largest double are infinite. With few degrees of freedom the point
     grows as p^(-1 / dof), so that below 1 degree of freedom errors grow as 1 / dof.
     Codes: ErrInvalidSelector (tail is neither 0 nor 1), ErrTooFewForParameters (dof is not above
     0), ErrProbabilityOutOfRange (p is outside [0, 1] or is NaN).

@@ -20,7 +20,7 @@ QX_BEGIN_DECLS
     however short the input is.
     Codes: ErrOrderNotPositive (S is below 1), ErrFFTSizeNotPositive (size or N is below 1),
     ErrInternal (the word holds something other than a plan), ErrOutOfMemory (no memory), the host's
-    status, ErrLengthTooLarge (an index would exceed int32_t). A negative status empties out. An
+    status, ErrLengthTooLarge (an index would exceed int32_t). A negative status empties `out`. An
     empty input gives an empty output and 0.
     NaN: in in some results. */
 QX_API ErrorCode ReDZTH(QX_INOUT DBL1D in, int32_t S, int32_t N, int32_t start, int32_t size,

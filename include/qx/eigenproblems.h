@@ -10,7 +10,7 @@
 
 QX_BEGIN_DECLS
 
-/** Eigenvalues of the square matrix a and eigenvectors. output: 0 no vectors; 1 vectors of unit
+/** Eigenvalues and eigenvectors of the square matrix a. output: 0 no vectors; 1 vectors of unit
     length, in columns. Conjugate pairs are adjacent, the value with positive imaginary part first;
     otherwise the order is that of the iteration. The method is balancing, reduction to Hessenberg
     form and QR iteration: J. H. Wilkinson and C. Reinsch, "Handbook for Automatic Computation",
@@ -41,7 +41,7 @@ QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matri
     500: reduction to Hessenberg form by blocks of reflections, iterations with many shifts and
     early deflation (K. Braman, R. Byers and R. Mathias, "The multishift QR algorithm", 2002), and
     vectors by matrix products; the largest element of a complex vector is real. Below order 160 the
-    results are to the bit those of EigenValueVector_head.
+    results are those of EigenValueVector_head, to the bit.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (30 iterations for each value, or 40 below order 160, were not enough).
@@ -51,7 +51,7 @@ QX_API int32_t EigenValueVector2026_head(QX_IN DBL2D a, QX_IN const int32_t *out
                                          QX_OUT ErrorCode *err);
 /** As CxEigenValueVector_head, with the block algorithms of EigenValueVector2026_head for general
     matrices from order 160 on and of SymEvectorEvalue2026_head for Hermitian matrices from order 64
-    on. Below these orders the results are to the bit those of CxEigenValueVector_head.
+    on. Below these orders the results are those of CxEigenValueVector_head, to the bit.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*matrixType or *output is not 0 or 1), ErrNonFiniteInput (an element is not
     finite), ErrIterationLimit (30 iterations for each value, 40 for a general matrix below order
@@ -75,7 +75,7 @@ QX_API int32_t SymEvectorEvalue_head(QX_INOUT DBL2D a, QX_IN const int32_t *outp
 /** As SymEvectorEvalue_head, with a block algorithm from order 64 on: reduction to tridiagonal form
     by blocks of reflections, and divide and conquer (M. Gu and S. C. Eisenstat, "A
     divide-and-conquer algorithm for the symmetric tridiagonal eigenproblem", 1995). Below order 64
-    the results are to the bit those of SymEvectorEvalue_head.
+    the results are those of SymEvectorEvalue_head, to the bit.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (a value was not found in 100 iterations, or in 30 from order 64 on).

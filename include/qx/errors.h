@@ -20,10 +20,10 @@ enum QXErrorCode {
     ErrNegativeDimension = -20004,
     /* A requested number of samples is below 1. */
     ErrCountNotPositive = -20005,
-    /* An array or sample count has fewer than 2 elements where 2 are needed. */
+    /* An array has fewer than 2 elements, or a sample count is below 2, where 2 are needed. */
     ErrFewerThanTwo = -20006,
-    /* An array or sample count has fewer than 3 elements where 3 are needed (tridiagonal systems,
-       3-D integration). */
+    /* An array has fewer than 3 elements, or a sample count is below 3, where 3 are needed
+       (tridiagonal systems, 3-D integration). */
     ErrFewerThanThree = -20007,
     /* The arrays of one operation disagree in shape: coordinate arrays of unequal length, a
        rotation matrix that is not 3 by 3, bands of unequal length. Also an array that is too short
@@ -152,7 +152,7 @@ enum QXErrorCode {
     ErrNotAvailable = -20078,
     /* A range's lower end is above its upper end. */
     ErrRangeReversed = -20101,
-    /* Polynomial order below 0. */
+    /* A polynomial order is below 0. */
     ErrPolynomialOrderNegative = -20103,
     /* The data of a statistic, a bound, or a value computed from the data is NaN. */
     ErrNaNInData = -20104,
@@ -196,7 +196,8 @@ enum QXErrorCode {
     /* A streaming multirate export was called without a reset, and its state does not have the size
        that it needs. */
     ErrMultirateStateSize = -24034,
-    /* A multirate routine has no scratch memory, or its input and output are the same buffer. */
+    /* A multirate routine could not get scratch memory, or its input and output are the same
+       buffer. */
     ErrMultirateBuffer = -24051,
 
     /* Failures of waveform measurements. */

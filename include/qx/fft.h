@@ -28,7 +28,7 @@ typedef void *PlanSlot;
 /* The word that the host keeps for a call node, for the _IDP exports; null at first. */
 typedef void *InstanceWord;
 
-/** Returns the plan for transforms of `length` values, which is built at the first request and then
+/** Returns the plan for transforms of `length` values, which is built on the first request and then
     shared. Every plan is released with destroy_oxfft_table. Building takes time proportional to n
     log n, about that of a few transforms of that length, and up to 160 bytes of memory for each
     value: 2.5 GB for a prime near 2^24. Returns null if length is below 1 or there is not enough

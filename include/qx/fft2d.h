@@ -2,8 +2,8 @@
 #define QX_FFT2D_H
 
 /* Two-dimensional Fourier transforms of any sizes, with the sign and the scaling of qx/fft.h: first
- of the rows, then of the columns. Shifted order, plans and the host's status are described
- there. */
+   of the rows, then of the columns. Shifted order, plans and the host's status are described
+   there. */
 
 #include "qx/fft.h"
 

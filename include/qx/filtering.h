@@ -6,9 +6,9 @@
    results are the same to the bit. The exports set the sizes of the states. If a state has the
    wrong size, all states of the call are cleared, whatever the flag says.
 
-   Direct form: y[t] = (b[0] x[t] + ... + b[nb-1] x[t-nb+1] - a[1] y[t-1] - ... - a[na-1]
-   y[t-na+1]) / a[0]. With `a` empty it is an FIR filter; with both empty x is unchanged. The state
-   of x holds nb - 1 values and that of y na - 1 (none without `a`), the newest last.
+   Direct form: y[t] = (b[0] x[t] + ... + b[nb-1] x[t-nb+1] - a[1] y[t-1] - ... - a[na-1] y[t-na+1])
+   / a[0]. If `a` is empty, it is an FIR filter; if both are empty, x is unchanged. The state of x
+   holds nb - 1 values and that of y na - 1 (none without `a`), the newest last.
 
    Cascade: sections of order m, 2 (form 0) or 4 (form 1), in direct form II, each with m values in
    `a` (the leading 1 is not stored), m + 1 in `b` and m in the state.
@@ -23,8 +23,8 @@ QX_BEGIN_DECLS
 /** Filters x in place, in direct form. The states are kept from the last call if *keepState is 1
     and cleared otherwise. The code is in *err. If the host refuses a state, the function result is
     its status and that state is emptied.
-    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b; x is emptied),
-    ErrOutOfMemory (the host refuses a state; or no memory, then x is emptied).
+    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b; x is emptied), ErrOutOfMemory
+    (the host refuses a state; or no memory, in which case x is emptied).
     NaN: x, a, b in some results; xState, yState in some results or in no result. */
 QX_API int32_t IIR_Filter(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b, QX_INOUT DBL1D xState,
                           QX_INOUT DBL1D yState, QX_IN const uint8_t *keepState,

@@ -36,7 +36,7 @@ typedef QX_ARRAY_1D(RemezBand) RemezBand1D;
 
 /** Designs an equiripple filter of n taps: the one with the smallest maximum of the weighted
     deviation on a grid over the bands; *ripple is that maximum. The grid has 16 points for each
-    extremum. Between grid points the deviation is larger: in 4549 random designs of up to 99 taps
+    extremum. Between grid points the deviation is larger: in 4549 random designs of up to 99 taps,
     by less than 4 % in 99 of 100 lowpass and bandpass filters, 12 % in 99 of 100 differentiators
     and 15 % in 9 of 10 Hilbert transformers; the maximum was 30 %, with 9 taps. Over a band
     narrower than 1 / (16 n) of the sampling rate, of which only the edges are on the grid, it may
@@ -56,8 +56,8 @@ typedef QX_ARRAY_1D(RemezBand) RemezBand1D;
     the limit of the iterations is reached), ErrOrderNotPositive (n is below 1), ErrBadCutoff (no
     band, fs or a weight is not above 0, an edge or a desired value is negative, or the edges do not
     ascend), ErrOutOfMemory (the host refuses h, whose status is then the function result; or no
-    memory or more than about 4090 taps, then the function result is 2), ErrAboveNyquist (the last
-    edge is above fs / 2), ErrBadTapCount (an even n with a gain at fs / 2).
+    memory or more than about 4090 taps, in which case the function result is 2), ErrAboveNyquist
+    (the last edge is above fs / 2), ErrBadTapCount (an even n with a gain at fs / 2).
     NaN: fs refused with ErrBadDesignField. */
 QX_API int32_t Parks(QX_IN const int32_t *n, QX_IN const double *fs, QX_IN RemezBand1D bands,
                      QX_IN const int32_t *type, QX_OUT DBL1D h, QX_OUT double *ripple,
@@ -73,14 +73,14 @@ typedef struct NarrowFIRDesign {
     DBL1D interpolator;
 } NarrowFIRDesign;
 
-/** Designs a filter for a narrow band, whose response stays within passRipple (linear) of 1 and
-    below stopAttenuation (dB). type: 0 lowpass; 1 highpass, both with the edges fPass and
-    fStop; 2 bandpass; 3 bandstop, both with the widths fPass and fStop about fCenter. M is chosen
-    for the smallest estimated number of taps; each stage is then lengthened until it has half the
-    ripple. A failure empties the arrays and sets M to 0.
+/** Designs a filter for a narrow band, whose response stays within passRipple (linear) of 1 in the
+    pass band and is attenuated by at least stopAttenuation (dB) in the stop band. type: 0 lowpass;
+    1 highpass, both with the edges fPass and fStop; 2 bandpass; 3 bandstop, both with the widths
+    fPass and fStop about fCenter. M is chosen for the smallest estimated number of taps; each stage
+    is then lengthened until it has half the ripple. A failure empties the arrays and sets M to 0.
     Codes: ErrBadDesignField (no such type, edges out of order, a ripple not above 0, or one so
     large that fewer than 3 taps suffice), ErrBadCutoff (a band around fCenter that is not between 0
-    and fs / 2), ErrAboveNyquist (fs is around 1e-322, so small that its half is rounded up),
+    and fs / 2), ErrAboveNyquist (fs is around 1e-322, so small that half of it is rounded up),
     ErrOutOfMemory (no memory, a stage of more than about 4090 taps, or the host refuses an array;
     its status is the function result).
     NaN: fs, fPass, fStop, passRipple, stopAttenuation refused with ErrBadDesignField; fCenter

@@ -3,9 +3,9 @@
 
 /* Confidence and prediction bounds of the coefficients, the curve and further observations of a
    fit. The inputs are the samples, as passed to the fit, and its coefficients. With J the
-   derivatives of the model by the p coefficients at each x (row j), W the absolute weights, n the
-   number of weights other than 0 and s^2 = (sum of |w| (y - f)^2) / (n - p), the bounds at a
-   confidence, 0 < confidence < 1, are
+   derivatives of the model with respect to the p coefficients at each x (row j), W the absolute
+   weights, n the number of non-zero weights and s^2 = (sum of |w| (y - f)^2) / (n - p), the bounds
+   at a confidence, 0 < confidence < 1, are
 
        coefficient i:   c[i] -+ t s sqrt((J' W J)^-1[i, i])
        confidence:      f(x) -+ t s sqrt(j' (J' W J)^-1 j)
@@ -19,19 +19,19 @@
    A sample of weight 0 has bounds, too: to obtain bounds at other x, append these x with any y and
    the weight 0.
 
-   The bounds hold exactly for models that are linear in the coefficients with normal errors; for
-   the others the model is linearised at the coefficients, which are used as they are: coefficients
-   that do not minimise the sum of squares give wider bounds, since s^2 is computed from them. J is
-   factored (QR, in blocks of rows), never J' W J. J counts as of full rank if no weighted column
-   depends on those before it within (16 + p) times 2.2e-16. The bounds lose digits according to the
+   The bounds hold exactly for models that are linear in the coefficients with normal errors; other
+   models are linearised at the coefficients, which are used as they are: coefficients that do not
+   minimise the sum of squares give wider bounds, since s^2 is computed from them. J is factored
+   (QR, in blocks of rows), never J' W J. J is taken to have full rank if no weighted column depends
+   on those before it within (16 + p) times 2.2e-16. The bounds lose digits according to the
    condition of J with columns scaled to equal length, so centre the x of polynomials. If the
    residuals are as small as the rounding errors of y, so are the widths. Bounds that overflow are
    infinite; confidences below 1e-140 give a width of 0.
 
    A failure empties the outputs.
 
-   Sources: N. R. Draper, H. Smith, Applied Regression Analysis, 3rd edition, 1998; for the models
-   not linear in their coefficients D. M. Bates, D. G. Watts, Nonlinear Regression Analysis and Its
+   Sources: N. R. Draper, H. Smith, Applied Regression Analysis, 3rd edition, 1998; for models not
+   linear in their coefficients, D. M. Bates, D. G. Watts, Nonlinear Regression Analysis and Its
    Applications, 1988. */
 
 #include "qx/types.h"
@@ -43,11 +43,11 @@ QX_BEGIN_DECLS
     the confidence bounds at each sample.
     Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
     differ in length, or the number of coefficients is not that of the model), ErrFewerThanThree
-    (fewer than three samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value,
-    derivative or weighted residual of the model overflows), ErrTooFewForParameters (not more
-    weights other than 0 than coefficients), ErrProbabilityOutOfRange (confidence),
-    ErrSingularMatrix (J does not have full rank, for example because all x are equal),
-    ErrOutOfMemory (no memory, or an array cannot be resized).
+    (fewer than three samples), ErrNonFiniteInput (an input is NaN or infinite, or, later, a value,
+    derivative or weighted residual of the model overflows), ErrTooFewForParameters (no more
+    non-zero weights than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J
+    does not have full rank, for example because all x are equal), ErrOutOfMemory (no memory, or an
+    array cannot be resized).
     NaN: x, y, w, coefficients refused with ErrNonFiniteInput; confidence refused with
     ErrProbabilityOutOfRange. */
 QX_API ErrorCode ConfBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
@@ -60,8 +60,8 @@ QX_API ErrorCode PredBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                     QX_IN DBL1D coefficients, double confidence,
                                     QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** As ConfBndLinear_head, of y = a exp(b x); coefficients: a, b (ExpFit80_head). J does not have
-    full rank if a is 0, either. */
+/** As ConfBndLinear_head, of y = a exp(b x); coefficients: a, b (ExpFit80_head). J also lacks full
+    rank if a is 0. */
 QX_API ErrorCode ConfBndExp_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double confidence,
                                  QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -72,15 +72,15 @@ QX_API ErrorCode PredBndExp_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double confidence,
                                  QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** As ConfBndLinear_head, of y = a x^b, x above 0; coefficients: a, b (PowerFit_head). J does not
-    have full rank if a is 0, either.
+/** As ConfBndLinear_head, of y = a x^b, x above 0; coefficients: a, b (PowerFit_head). J also lacks
+    full rank if a is 0.
     Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
     differ in length, or there are not two coefficients), ErrFewerThanThree (fewer than three
-    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    samples), ErrNonFiniteInput (an input is NaN or infinite, or, later, a value, derivative or
     weighted residual of the model overflows), ErrNotStrictlyPositive (an x is not above 0),
-    ErrTooFewForParameters (not more weights other than 0 than coefficients),
-    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J does not have full rank: a is 0, or
-    all x are equal), ErrOutOfMemory (no memory, or an array cannot be resized). */
+    ErrTooFewForParameters (no more non-zero weights than coefficients), ErrProbabilityOutOfRange
+    (confidence), ErrSingularMatrix (J does not have full rank: a is 0, or all x are equal),
+    ErrOutOfMemory (no memory, or an array cannot be resized). */
 QX_API ErrorCode ConfBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -91,9 +91,9 @@ QX_API ErrorCode PredBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** As ConfBndPower_head, of y = a log(b x) to the given base; coefficients: a, b (LogFit_head). The
-    base 2.71828, these six digits, means e. ErrNotStrictlyPositive means here that b x is not
-    above 0 for all x, or that the base is not above 0, or is 1.
+/** As ConfBndPower_head, of y = a log(b x) to the given base; coefficients: a, b (LogFit_head). A
+    base of 2.71828, exactly these six digits, means e. ErrNotStrictlyPositive means here that b x
+    is not above 0 for all x, or that the base is not above 0, or is 1.
     NaN: x, y, w, coefficients refused with ErrNonFiniteInput; base refused with
     ErrNotStrictlyPositive; confidence refused with ErrProbabilityOutOfRange. */
 QX_API ErrorCode ConfBndLog_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
@@ -137,10 +137,10 @@ QX_API ErrorCode PredBndPoly_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
     coefficient (GenLSFit80_head); any number of samples above the number of columns is allowed.
     Codes: ErrEmptyInput (H, y or the coefficients are empty), ErrSizeMismatch (H, y and weights
     differ in length, or there are not as many coefficients as columns), ErrNonFiniteInput (an input
-    is NaN or infinite, or later, a value, derivative or weighted residual of the model overflows),
-    ErrTooFewForParameters (not more weights other than 0 than coefficients),
-    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J does not have full rank: its columns
-    are linearly dependent), ErrOutOfMemory (no memory, or an array cannot be resized).
+    is NaN or infinite, or, later, a value, derivative or weighted residual of the model overflows),
+    ErrTooFewForParameters (no more non-zero weights than coefficients), ErrProbabilityOutOfRange
+    (confidence), ErrSingularMatrix (J does not have full rank: its columns are linearly dependent),
+    ErrOutOfMemory (no memory, or an array cannot be resized).
     NaN: H, y, w, coefficients refused with ErrNonFiniteInput; confidence refused with
     ErrProbabilityOutOfRange. */
 QX_API ErrorCode ConfBndGenLS_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w,

@@ -1,11 +1,11 @@
 #ifndef QX_GENERALISED_PROBLEMS_H
 #define QX_GENERALISED_PROBLEMS_H
 
-/* Problems of pairs of matrices: generalised Schur forms, eigenvalues and singular values.
+/* Problems for pairs of matrices: generalised Schur forms, eigenvalues and singular values.
 
    Matrices are stored row by row. All exports return their code, and every failure empties all
    outputs. A generalised eigenvalue is a number x for which a - x b is singular. It is returned as
-   a quotient alpha / beta, which is infinite for beta 0. */
+   a quotient alpha / beta, which is infinite if beta is 0. */
 
 #include "qx/types.h"
 

@@ -13,8 +13,8 @@ QX_BEGIN_DECLS
 /** Histogram of x over its own range in *bins bins of equal width, with their centres. The maximum
     counts in the last bin; NaN is not counted. The samples of a constant array all count in the
     last bin, and every centre equals their value. If the host refuses a resize, its status is the
-    function result. Memory and time grow with the number of bins (12 bytes each), however few the
-    samples are.
+    function result. Memory and time grow with the number of bins (12 bytes each), however few
+    samples there are.
     Codes: ErrEmptyInput (x is empty or there are no bins), ErrOutOfMemory (the host refused a
     resize).
     NaN: x in no result. */

@@ -51,8 +51,8 @@ QX_HOST_API void QXHostFree(void *handle);
    resize up to `count` elements moves the block or allocates memory. Returns 0 or a status. */
 QX_HOST_API int32_t QXHostReserve1D(void *array, int32_t typeCode, int32_t count);
 
-/* The address of the first element. It changes with every resize, so with every call that has the
-   array as an output. */
+/* The address of the first element. It may change with every resize, and so with every call that
+   has the array as an output. */
 static inline void *QXHostElements1D(const void *array) {
     return *(Array1DBlock *const *)array + 1;
 }
@@ -90,8 +90,8 @@ QX_HOST_API const char *QXHostErrorName(ErrorCode code);
    the function result (v none, e an int32_t) and one for each argument: d a double and i an
    int32_t, passed by value; D, I and Z pointers to a double, an int32_t and a complex number.
    columns[k] points to the `count` elements of argument k, which are read or written; codes[i] is
-   the result of call i, and is not written with v. Returns QXHostDone, or QXHostBadArgument without
-   any call if no export has this form. */
+   the result of call i, and is not written if the result is v. Returns QXHostDone, or
+   QXHostBadArgument, without making any call, if no export has this form. */
 typedef void (*QXHostFunction)(void);
 QX_HOST_API int32_t QXHostCalls(QXHostFunction function, const char *form, int64_t count,
                                 void *const *columns, ErrorCode *codes);

@@ -17,8 +17,8 @@
    = (order + 1) / 2 rounded down, lowpass and highpass have n sections of second order, or half of
    that, rounded up, of fourth order; the others have 2 n of second order or n of fourth order. A
    band filter is designed in fourth order, and split by its roots if second order is selected. In
-   either form, bands far below the sampling rate have fewer digits than a highpass followed by a
-   lowpass.
+   either form, filters for bands far below the sampling rate are less accurate than a highpass
+   followed by a lowpass.
 
    Ripple and attenuation are converted to 10^(decibels / 10) - 1. Below 4.8e-16 dB that is 0 and
    above 3082.5 dB infinite: most coefficients are then NaN with code 0. A small ripple r loses
@@ -133,8 +133,8 @@ QX_API int32_t EllipticCoefs90(QX_IN const double *fs, QX_IN const double *fl,
     frequency is not above 0, or fl is not below fh; for lowpass and highpass also a cut-off at half
     the sampling rate or above), ErrAboveNyquist (a cut-off is above half the sampling rate),
     ErrInvalidSelector (no such type), ErrBadCoefficients (an order of 150 or above, whose
-    polynomial overflows), ErrIterationLimit (poles are not found), ErrNonFiniteFunction (the same),
-    ErrDegenerateValue (the same).
+    polynomial overflows), ErrIterationLimit (poles are not found), ErrNonFiniteFunction (poles are
+    not found), ErrDegenerateValue (poles are not found).
     NaN: fs, fl in all results or in some results; fh in all results or in some results or in no
     result. */
 QX_API int32_t BesselCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN const double *fh,
@@ -156,11 +156,11 @@ QX_API int32_t BesselCoefs90(QX_IN const double *fs, QX_IN const double *fl, QX_
     each has gain 1 in the middle of the pass band. *gain is 0 if it underflows.
 
     Poles and zeros are within 4e-15 of those of a design with 50 digits, up to order 30 and for
-    edges from 1e-4 of the sampling rate to as close to half of it; the relative error of the gain
-    is at most 2e-14. The coefficients are rounded from these, which changes the response of a
-    narrow band in any sections of this form (docs/accuracy/filter_design.md).
+    edges at least 1e-4 of the sampling rate away from 0 and from half of it; the relative error of
+    the gain is at most 2e-14. The coefficients are rounded from these, which changes the response
+    of a narrow band in any sections of this form (docs/accuracy/filter_design.md).
     Codes: ErrOrderNotPositive (the order is below 1), ErrLengthTooLarge (the order is above 500),
-    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
+    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0 or
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrOutOfMemory (the host refuses an array), ErrDegenerateValue (the frequencies are so
     far apart that a coefficient overflows or underflows).
@@ -171,7 +171,7 @@ QX_API ErrorCode BWCoefs2026(double fs, double fl, double fh, int32_t order, int
 /** Chebyshev filter as in ChebyshevCoefs, with the outputs of BWCoefs2026. The factor of a filter
     of even order is in the first section. Small ripples lose no digits.
     Codes: ErrOrderNotPositive (the order is below 1), ErrLengthTooLarge (the order is above 500),
-    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
+    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0 or
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrRippleNotPositive (the ripple is not above 0), ErrOutOfMemory (the host refuses an
     array), ErrDegenerateValue (the frequencies are so far apart, or the ripple is so small, that a
@@ -183,7 +183,7 @@ QX_API ErrorCode ChebyshevCoefs2026(double fs, double fl, double fh, double ripp
                                     QX_OUT CDB1D zeros, QX_OUT CDB1D poles, QX_OUT double *gain);
 /** Inverse Chebyshev filter as in InvChebyshevCoefs, with the outputs of BWCoefs2026.
     Codes: ErrOrderNotPositive (the order is below 1), ErrLengthTooLarge (the order is above 500),
-    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
+    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0 or
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrAttenuationNotPositive (the attenuation is not above 0), ErrOutOfMemory (the host
     refuses an array), ErrDegenerateValue (the frequencies are so far apart, or the attenuation is
@@ -198,7 +198,7 @@ QX_API ErrorCode InvChebyshevCoefs2026(double fs, double fl, double fh, double a
     integrals of B. C. Carlson, "Numerical computation of real or complex elliptic integrals", 1995.
     The factor of a filter of even order is in the first section.
     Codes: ErrOrderNotPositive (the order is below 1), ErrLengthTooLarge (the order is above 500),
-    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
+    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0 or
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrRippleNotPositive (the ripple is not above 0), ErrAttenuationNotPositive (the
     attenuation is not above 0), ErrRippleAboveAttenuation (the ripple is not below the
@@ -216,7 +216,7 @@ QX_API ErrorCode EllipticCoefs2026(double fs, double fl, double fh, double rippl
     equations, sum over j != i of 1 / (s_i - s_j) = 1 + n / s_i, by Newton's method; so each pole is
     accurate at any order. The time grows with the cube of the order.
     Codes: ErrOrderNotPositive (the order is below 1), ErrLengthTooLarge (the order is above 500),
-    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
+    ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0 or
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrOutOfMemory (the host refuses an array, or no memory), ErrDegenerateValue (the
     frequencies are so far apart that a coefficient overflows or underflows).

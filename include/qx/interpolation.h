@@ -24,7 +24,7 @@ QX_API int32_t PolyInterp_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double 
 
 /** As PolyInterp_head, by the diagonal rational function: R. Bulirsch and J. Stoer,
     "Fehlerabschaetzungen und Extrapolation mit rationalen Funktionen bei Verfahren vom
-    Richardson-Typus", 1964. At a point of the table *yi is the y of that point, and *dy is 0. The
+    Richardson-Typus", 1964. At a point of the table, *yi is the y of that point, and *dy is 0. The
     tableau adds 1e-10 to y to avoid quotients of zeros, so values of that size are not resolved.
     Codes: ErrSizeMismatch (x and y differ in length), ErrEmptyInput (they are empty),
     ErrOutOfMemory (no scratch memory), ErrDuplicateAbscissa (the function has a pole at *xi). */
@@ -36,8 +36,8 @@ QX_API int32_t RatInterp_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double *
     ascends or descends. A single point gives 0. If the host refuses a resize, its status is the
     function result.
     Codes: ErrSizeMismatch (x and y differ in length), ErrOutOfMemory (no memory), ErrEmptyInput
-    (they are empty), ErrAbscissaeOrder (two abscissae that are neighbours or next but one are
-    equal).
+    (they are empty), ErrAbscissaeOrder (two abscissae that are adjacent, or separated by one other,
+    are equal).
     NaN: y, x in all results; firstSlope, lastSlope in no result. */
 QX_API int32_t Spline_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double *firstSlope,
                            QX_IN const double *lastSlope, QX_OUT DBL1D secondDerivatives,

@@ -2,13 +2,14 @@
 #define QX_LINEAR_FITS_H
 
 /* Least-squares fits of models that are linear in their coefficients: a line, a polynomial, and any
-   matrix of terms. Weights are empty or one per sample; only their absolute values count. A mean
-   squared error (MSE) is the sum of |w| (y - fit)^2 divided by the number of samples. Each square
-   is computed as y^2 + (fit - 2 y) fit, so an exact fit may have an MSE of about 2.2e-16 times y^2,
-   of either sign. A failure empties the arrays and sets the numbers to NaN.
+   matrix of terms. The weights are empty, or there is one per sample; only their absolute values
+   count. A mean squared error (MSE) is the sum of |w| (y - fit)^2 divided by the number of samples.
+   Each square is computed as y^2 + (fit - 2 y) fit, so an exact fit may have an MSE of about
+   2.2e-16 times y^2, of either sign. A failure empties the arrays and sets the numbers to NaN.
 
    Overflow is not checked for: coefficients and values that overflow become infinite or NaN, with
-   the code 0. The MSE overflows for y from 1e154 on, covariances for columns of H below 1e-154. */
+   the code 0. The MSE overflows for y of 1e154 and above, and covariances overflow for columns of H
+   below 1e-154. */
 
 #include "qx/types.h"
 
@@ -16,11 +17,11 @@ QX_BEGIN_DECLS
 
 /** The line y = slope x + intercept; its values replace y. The closed form is evaluated with plain
     sums, so abscissae that are all equal give NaN or infinities without a failure, abscissae far
-    from 0 lose digits, and those whose squares leave the range of double, from 1e154 on or all
+    from 0 lose digits, and those whose squares leave the range of double, at 1e154 and above or all
     below 1e-162, give NaN or infinities, too. Weights that are all 0 count as no weights.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (fewer than two samples),
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
-    ErrOutOfMemory (no memory where x or w is y).
+    ErrOutOfMemory (no memory to copy x or w where it is the same array as y).
     NaN: y, x in all results; w refused with ErrNonFiniteInput. */
 QX_API ErrorCode LinFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX_OUT double *slope,
                              QX_OUT double *intercept, QX_OUT double *mse);
@@ -38,30 +39,33 @@ QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX
                                  QX_OUT double *intercept, QX_OUT ErrorCode *err);
 
 /** The polynomial sum of coefficients[j] x^j, j = 0 to `order`, and its values. The fit is in plain
-    powers of x: for a high order scale x to a magnitude of about 1, since powers that overflow give
-    a failure and powers that underflow make coefficients infinite. algorithm: as GenLSFit80_head.
-    At most 26 coefficients are fitted; those of orders above 25 are 0, with a warning.
+    powers of x: for a high order, scale x to a magnitude of about 1, since powers that overflow
+    give a failure and powers that underflow make coefficients infinite. algorithm: as
+    GenLSFit80_head. At most 26 coefficients are fitted; those of orders above 25 are 0, with a
+    warning.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrPolynomialOrderNegative (order is
-    negative), ErrPolynomialOrderTooHigh (not more samples than `order`), ErrOutOfMemory (no memory,
+    negative), ErrPolynomialOrderTooHigh (no more samples than `order`), ErrOutOfMemory (no memory,
     or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (a
-    power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5: the
-    system is singular), ErrIterationLimit (the singular values do not converge),
+    power of x or, with algorithm 5, an element of y is not finite), ErrSingularMatrix (algorithms 1
+    to 5: the system is singular), ErrIterationLimit (the singular values do not converge),
     WarnPolynomialOrderCapped (order is above 25).
     NaN: x refused with ErrNonFiniteInput or refused with ErrSingularMatrix; y refused with
     ErrNonFiniteInput or in all results or in some results. */
 QX_API ErrorCode PolyFit_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                               QX_OUT DBL1D fit, QX_OUT DBL1D coefficients, QX_OUT double *mse);
 /** As PolyFit_head, with some coefficients fixed: that of order fixedOrders[i] is fixedValues[i].
-    Of equal orders the last one counts, and orders above that of the polynomial are ignored. If all
-    coefficients are fixed, nothing is solved. Above order 25 the free coefficients among the first
-    26 are fitted or, if there are fewer than two of these, the first two free coefficients of all.
+    If an order occurs more than once, its last value counts, and orders above that of the
+    polynomial are ignored. If all coefficients are fixed, nothing is solved. Above order 25 the
+    free coefficients among the first 26 are fitted or, if there are fewer than two of these, the
+    first two free coefficients of all.
     Codes: ErrSizeMismatch (x and y, or orders and values, differ in length),
-    ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (not more samples than
+    ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (no more samples than
     `order` minus the number of fixed orders, or fewer samples than free terms), ErrOutOfMemory (no
     memory, or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput
-    (a power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5:
-    the system is singular), ErrIterationLimit (the singular values do not converge), ErrEmptyInput
-    (no sample, with all coefficients given), WarnPolynomialOrderCapped (order is above 25).
+    (a power of x or, with algorithm 5, an element of y is not finite), ErrSingularMatrix
+    (algorithms 1 to 5: the system is singular), ErrIterationLimit (the singular values do not
+    converge), ErrEmptyInput (there are no samples, and all coefficients are fixed),
+    WarnPolynomialOrderCapped (order is above 25).
     NaN: x refused with ErrNonFiniteInput; y in some results; fixedValues in all results. */
 QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                                 QX_IN I32_1D fixedOrders, QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
@@ -69,13 +73,13 @@ QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int
 /** As PolyFit80_head, with weights. The coefficients have 8.8 correct digits for NIST's data set
     Filip and 6.6 for Wampler5; those of PolyFit2026_head have 14 and 15.
     Codes: ErrSizeMismatch (x, y and weights, or orders and values, differ in length),
-    ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (not more samples than
+    ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (no more samples than
     `order` minus the number of fixed orders, or fewer samples than free terms), ErrOutOfMemory (no
     memory, or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput
-    (a weight or a power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix
+    (a weight, a power of x or, with algorithm 5, an element of y is not finite), ErrSingularMatrix
     (algorithms 1 to 5: the system is singular), ErrIterationLimit (the singular values do not
-    converge), ErrEmptyInput (no sample, with all coefficients given), WarnPolynomialOrderCapped
-    (order is above 25).
+    converge), ErrEmptyInput (there are no samples, and all coefficients are fixed),
+    WarnPolynomialOrderCapped (order is above 25).
     NaN: x, w refused with ErrNonFiniteInput; y, fixedValues in some results. */
 QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_IN DBL1D w,
                                 int32_t algorithm, QX_IN I32_1D fixedOrders,
@@ -92,7 +96,7 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
     residuals r = y - fit. Results that overflow are infinite or NaN.
     Codes: ErrSizeMismatch (x, y and weights, or orders and values, differ in length), ErrEmptyInput
     (no samples), ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (order
-    is above 50, or there are not more samples than `order` minus the number of fixed orders, or
+    is above 50, or there are no more samples than `order` minus the number of fixed orders, or
     fewer samples than free terms), ErrOutOfMemory (no memory, or the host refused a resize),
     ErrNonFiniteInput (x, y, a weight or a fixed value is not finite), ErrIterationLimit (the
     singular values do not converge), WarnRankDeficient (singular values count as 0; the results are
@@ -117,9 +121,10 @@ QX_API ErrorCode PolyFit2026_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, Q
     GenLSFit2026_head have all digits that the data determine.
     Codes: ErrSizeMismatch (H, y and weights differ in length), ErrOutOfMemory (no memory, or the
     host refused a resize), ErrOrderNotPositive (H has no columns), ErrPolynomialOrderTooHigh (fewer
-    rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H or a weight, or
-    with algorithm 5 a y, is not finite, if the method checks it), ErrSingularMatrix (algorithms 1
-    to 5: the system is singular), ErrIterationLimit (the singular values do not converge).
+    rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H, a weight or,
+    with algorithm 5, an element of y is not finite, if the method checks it), ErrSingularMatrix
+    (algorithms 1 to 5: the system is singular), ErrIterationLimit (the singular values do not
+    converge).
     NaN: H, w refused with ErrNonFiniteInput; y refused with ErrNonFiniteInput or in some
     results. */
 QX_API ErrorCode GenLSFit80_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w, int32_t algorithm,
@@ -156,10 +161,10 @@ QX_API ErrorCode GenLSFit_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D deviati
     their signs, and the mean is unweighted. If dof, the residual degrees of freedom, is not above
     0, n - 2 is used; with two samples that is 0, and *rmse is NaN or infinite. If all y are equal,
     *rSquare is 1 for residuals of 0 and infinite otherwise. If rounding errors make *sse negative,
-    as may happen for an exact fit, *rmse is NaN. The squares of y and fit overflow from 1e154 on:
-    all three are then infinite or NaN.
+    as may happen for an exact fit, *rmse is NaN. The squares of y and fit overflow at 1e154 and
+    above: all three are then infinite or NaN.
     Codes: ErrEmptyInput (y is empty), ErrSizeMismatch (the arrays differ in length),
-    ErrFewerThanTwo (one sample), ErrTooFewForParameters (not more samples than dof).
+    ErrFewerThanTwo (one sample), ErrTooFewForParameters (no more samples than dof).
     NaN: y, fit, w in all results. */
 QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D w, int32_t dof,
                                     QX_OUT double *sse, QX_OUT double *rSquare,
@@ -167,7 +172,8 @@ QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D 
 
 /** One damped step of a fit: solves for d the system a d = gradient, in which the diagonal of a is
     multiplied by 1 + *lambda, and adds d to the coefficients. A step that overflows makes a
-    coefficient infinite, with the code 0. The code is in *err and is the function result.
+    coefficient infinite, with the code 0. A fit by such steps has neither bounds nor a covariance;
+    NonlinearFit2026 makes the whole fit, with both. The code is in *err and is the function result.
     Codes: ErrEmptyInput (the sizes are 0 or disagree), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (a diagonal element is not finite), ErrSingularMatrix (the system is singular,
     or a new coefficient is NaN).

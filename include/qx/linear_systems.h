@@ -108,6 +108,8 @@ QX_API int32_t CxGenLinEqs82_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x, 
                                   QX_OUT ErrorCode *err);
 
 /** Least-squares solution with the method of GenLinEqs82_head, which loses digits at small norms.
+    For a condition number of 1000, errors reach 3e-5 at a norm of 1e-8; those of GenLinEqs2026_head
+    are at rounding level.
     `work` receives the working memory of the method: with k = min(m, n), k (m + n + 1) + m n + k
     elements, and k m more if m is above 1. It begins with U (m by k) and the singular values of a,
     followed by V (n by k) with each column divided by its singular value, or 0 if that counts as 0.
@@ -127,13 +129,16 @@ QX_API ErrorCode GenLinEqs2010_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x
     repeats an earlier x to the bit, the refinements have become periodic, and whole periods are
     skipped. That happens after a few refinements for small, well-conditioned matrices, but rounding
     errors may keep x moving: for a random matrix of order 30 a million refinements were all carried
-    out, in 7 s, so 2^31 would take hours. */
+    out, in 7 s, so 2^31 would take hours. Refinements restore digits that small norms cost: for a
+    condition number of 1000 and a norm of 1e-8 errors were 7e-6 after one, 7e-12 after two and
+    9e-14 after five. */
 QX_API ErrorCode GenLinEqsbySVD2011_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x,
                                          double tolerance, int32_t refinements, QX_OUT DBL1D work);
 
 /** Least-squares solutions of smallest norm of a x = b for all columns of b, by the method of
-    GenLinEqs_head, which loses digits at small norms; EqsSetBySVD2026_head does not. Here rank
-    deficiency is reported by the code.
+    GenLinEqs_head, which loses digits at small norms: for a condition number of 1000, errors reach
+    3e-5 at a norm of 1e-8. EqsSetBySVD2026_head does not. Here rank deficiency is reported by the
+    code.
     Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b does not have as many rows as a),
     ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b holds NaN
     or infinity), ErrIterationLimit (the singular values do not converge), WarnRankDeficient

@@ -25,8 +25,9 @@ QX_API int32_t CxLU_head(QX_INOUT CDB2D a, QX_OUT I32_1D pivots, QX_OUT int32_t 
                          QX_OUT ErrorCode *err);
 
 /** Cholesky factor L of the symmetric positive definite a = L L^T; it replaces the lower triangle
-    of a in packed storage: column by column, column j with rows j to n-1. Near singularity is a
-    failure, too: a diagonal element of L below 1.5e-8 times the largest element of L.
+    of a in packed storage: column by column, column j with rows j to n-1. A nearly singular matrix
+    is refused, too: one for which a diagonal element of L is below 1.5e-8 times the largest element
+    of L.
     Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is not of the form n(n+1)/2),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
     NaN: packed refused with ErrNotPositiveDefinite. */
@@ -135,10 +136,10 @@ QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT
 QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
                           QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
 
-/** As QRDecH, with blocks of reflections if min(m, n) is at least 160: with q in half the time at
-    order 500, and for complex elements in 0.8 of it. For smaller matrices the results are to the
-    bit those of QRDecH. R. Schreiber and C. F. Van Loan, "A storage-efficient WY representation for
-    products of Householder transformations", 1989. */
+/** As QRDecH, with blocks of reflections if min(m, n) is at least 160: with q, it takes half the
+    time at order 500, or 0.8 of it for complex elements. For smaller matrices the results are those
+    of QRDecH, to the bit. R. Schreiber and C. F. Van Loan, "A storage-efficient WY representation
+    for products of Householder transformations", 1989. */
 QX_API ErrorCode QRDec2026H(QX_IN DBL2D a, int32_t pivoting, int32_t economy,
                             QX_OUT I32_2D permutation, QX_OUT DBL2D q, QX_OUT DBL2D r);
 /** As QRDec2026H, for complex elements; the diagonal of r is real. */
@@ -147,13 +148,14 @@ QX_API ErrorCode CxQRDec2026H(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
 
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes
     u (m by k), s has k values in descending order, and v is n by k. G. H. Golub and C. Reinsch,
-    "Singular value decomposition and least squares solutions", 1970. For norms from 1 on, the error
-    of u diag(s) v^T is a few n eps times the norm. Values below 2.2e-16 count as zero whatever the
-    norm, so for norms below 1 the error is up to 2.2e-16: relative to the norm it was measured as
-    2e-10 at a norm of 1e-6 and 2e-4 at 1e-12, and no digit is correct below 1e-15. Singular values
-    lose digits more slowly: relative to the largest one 1e-14 at a norm of 1e-8, 1e-6 at 1e-12 and
-    1e-2 at 1e-14. Scale a matrix with a norm below 1 up first, also for the other exports that use
-    this decomposition; SVD2026_head scales by itself. A value that overflows is infinite.
+    "Singular value decomposition and least squares solutions", 1970. For norms of 1 and above, the
+    error of u diag(s) v^T is a few n eps times the norm. Values below 2.2e-16 count as zero
+    whatever the norm, so for norms below 1 the error is up to 2.2e-16: relative to the norm it was
+    measured as 2e-10 at a norm of 1e-6 and 2e-4 at 1e-12, and no digit is correct below 1e-15.
+    Singular values lose digits more slowly: relative to the largest one 1e-14 at a norm of 1e-8,
+    1e-6 at 1e-12 and 1e-2 at 1e-14. Scale up a matrix with a norm below 1 first, also for the other
+    exports that use this decomposition; SVD2026_head does so itself. A value that overflows is
+    infinite.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
     not finite), ErrIterationLimit (100 iterations were not enough for a value).
     NaN: a refused with ErrNonFiniteInput. */
@@ -169,9 +171,10 @@ QX_API ErrorCode SVDEx_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, QX_
 QX_API ErrorCode CxSVDEx_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
                               QX_OUT CDB2D v);
 
-/** As SVD_head, the values only: the same to the bit as with the vectors. */
+/** As SVD_head, for the values only, which are the same, to the bit, as with the vectors.
+    SVDS2026_head scales by itself. */
 QX_API int32_t SVDS_head(QX_IN DBL2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
-/** As SVDS_head, for complex elements. */
+/** As SVDS_head, for complex elements; CxSVDS2026_head scales by itself. */
 QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n), of any
@@ -192,7 +195,7 @@ QX_API ErrorCode SVD2026_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, Q
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxSVD2026_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
                                 QX_OUT CDB2D v);
-/** As SVD2026_head, the values only: the same to the bit as with the vectors.
+/** As SVD2026_head, for the values only, which are the same, to the bit, as with the vectors.
     NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode SVDS2026_head(QX_IN DBL2D a, QX_OUT DBL1D s);
 /** As SVDS2026_head, for complex elements.

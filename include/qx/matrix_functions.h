@@ -12,10 +12,10 @@
 QX_BEGIN_DECLS
 
 /** Replaces the square matrix a by exp(a), by scaling, a Pade approximant and repeated squaring;
-    for a diagonal matrix element by element. The degree of the approximant follows from the bound
-    1e-8 / (exp(norm) norm) on its error, where norm is the largest row sum of absolute values.
-    The measured errors relative to the largest element of the result (random matrices of several
-    kinds, orders 2 to 5) are rounding errors up to a norm of 0.1, up to 4e-8 for norms just below 1
+    for a diagonal matrix, element by element. The degree of the approximant follows from the bound
+    1e-8 / (exp(norm) norm) on its error, where norm is the largest row sum of absolute values. The
+    measured errors relative to the largest element of the result (random matrices of several kinds,
+    orders 2 to 5) are rounding errors up to a norm of 0.1, up to 4e-8 for norms just below 1
     (rotations are worst), 6e-9 up to 2 and 4e-10 up to 8. Above that they are the errors of
     squaring, which grow with the norm: 4e-14 at 100 and 3e-13 at 500, but more if powers of a are
     far larger than exp(a): 0.15 for (1, 1e100; 0, -1). Those of MatrixExp2026_head are rounding
@@ -29,7 +29,7 @@ QX_API int32_t MatrixExp_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
 /** exp(a) of the square matrix a by scaling, a Pade approximant of degree 3 to 13 and repeated
-    squaring; for a diagonal matrix element by element. Degree and scaling are determined by norms
+    squaring; for a diagonal matrix, element by element. Degree and scaling are determined by norms
     of powers of a, so that a single large element loses no digits if powers of a are small; the
     backward error of the approximant is below 2.2e-16. A matrix of norm 2^53 or more is first
     brought to D^-1 a D with the diagonal matrix D of powers of two that makes the largest element
@@ -71,7 +71,7 @@ QX_API int32_t CxMatrixLn_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 /** The principal logarithm of the square matrix a, whose exponential is a and whose eigenvalues
     have imaginary parts above -pi and up to pi. It is computed through the Schur form, square roots
     of the triangle and a Pade approximant of degree up to 7 in partial fractions, whose backward
-    error is below 1.1e-16; for a diagonal matrix element by element. Elements may have any
+    error is below 1.1e-16; for a diagonal matrix, element by element. Elements may have any
     magnitude. A real negative eigenvalue of a real matrix (or of a complex one without imaginary
     parts) has the logarithm with +i pi; in a complex matrix, unless it is triangular, an eigenvalue
     counts as negative if its imaginary part is below 0 by at most n 2.2e-16 times the Frobenius
@@ -116,12 +116,12 @@ QX_API int32_t CxMatrixSqrt_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
 /** The principal square root of the square matrix a, whose eigenvalues have no negative real part.
     It is computed through the Schur form, whose triangle is divided recursively into halves; for a
-    diagonal matrix element by element. Elements may have any magnitude: no test uses an absolute
+    diagonal matrix, element by element. Elements may have any magnitude: no test uses an absolute
     threshold. Eigenvalues on the negative axis (as in MatrixLn2026_head) have the root with +i; if
     a is real and has none, imaginary parts are 0. The square of the root equals a to about n
-    2.2e-16 |root|^2. For a singular a a root is found unless two eigenvalues 0 are coupled in the
-    Schur form by more than rounding errors, as in (0, 1; 0, 0), which has no root; roots that are
-    not functions of a are not considered. A. Bjorck and S. Hammarling, "A Schur method for the
+    2.2e-16 |root|^2. For a singular a, a root is found unless two zero eigenvalues are coupled in
+    the Schur form by more than rounding errors, as in (0, 1; 0, 0), which has no root; roots that
+    are not functions of a are not considered. A. Bjorck and S. Hammarling, "A Schur method for the
     square root of a matrix", 1983; E. Deadman, N. J. Higham and R. Ralha, "Blocked Schur algorithms
     for computing the matrix square root", 2012.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
@@ -151,7 +151,7 @@ QX_API ErrorCode CxMatrixPower_head(QX_INOUT CDB2D a, int32_t power);
 
 /** a^power of the square matrix a by repeated squaring; a negative power is a power of the inverse
     by LU factors, for which a is scaled by powers of two, so that the accuracy does not depend on
-    the magnitude of its elements. Power 0 gives the identity, also for a singular a. Elements that
+    the magnitude of its elements. Power 0 gives the identity, even for a singular a. Elements that
     overflow, and those computed from them, are infinite or NaN.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
     the host refuses the resize), ErrNonFiniteInput (an element is not finite), ErrSingularMatrix

@@ -29,9 +29,9 @@ QX_API int32_t CxDeterminant_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType
 /** Numerical rank: the number of singular values above *tolerance. A negative tolerance means
     max(m, n) times the largest singular value times 2.2e-16. Where the norm of a is below 1,
     singular values that should be 0 are up to 2.2e-16 (SVD_head), which the default tolerance
-    counts: of 500 matrices of order 8 and rank 4 the rank was wrong in 41 cases at a norm of 0.01,
-    208 at 1e-6 and 463 at 1e-12; Rank2026_head does not have this error. With the default tolerance
-    a largest value that overflows gives rank 0. A failure sets the rank to -1.
+    counts: of 500 matrices of order 8 and rank 4, the rank was wrong in 41 cases at a norm of 0.01,
+    208 at 1e-6 and 463 at 1e-12; Rank2026_head does not have this error. With the default
+    tolerance, a largest value that overflows gives rank 0. A failure sets the rank to -1.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
     (no memory), ErrIterationLimit (the singular values do not converge).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
@@ -59,10 +59,10 @@ QX_API int32_t CxCondNumber_head(QX_IN CDB2D a, QX_IN const int32_t *normType, Q
 
 /** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
     the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. Sums that overflow
-    give infinity; sums of squares do so for elements from about 1e154 on, and squares of elements
-    below 1e-162 underflow to 0. Type 0 loses digits if the norm is far below 1 (SVD_head): the
-    relative error was 7e-10 at a norm of 1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14. Norm2026_head has
-    neither limitation.
+    give infinity; sums of squares do so for elements of about 1e154 and above, and squares of
+    elements below 1e-162 underflow to 0. Type 0 loses digits if the norm is far below 1 (SVD_head):
+    the relative error was 7e-10 at a norm of 1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14. Norm2026_head
+    has neither limitation.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
     singular values do not converge).
@@ -129,8 +129,8 @@ QX_API int32_t DotprodCx(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB *dot, QX_OUT E
 
 /** p-norm (sum of |x[i]|^p)^(1/p), also for negative p; the largest |x[i]| for p = +infinity, the
     smallest for p = -infinity. NaN if x holds NaN, whatever p is. Sums and powers that overflow
-    give infinity, squares for elements from about 1e154 on; squares of elements below 1e-162
-    underflow to 0.
+    give infinity, as squares do for elements of about 1e154 and above; squares of elements below
+    1e-162 underflow to 0.
     Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0).
     NaN: x in all results; p refused with ErrNonFiniteInput. */
 QX_API ErrorCode vectorNormH(QX_IN DBL1D x, double p, QX_OUT DBL *norm);

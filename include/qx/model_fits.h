@@ -1,20 +1,20 @@
 #ifndef QX_MODEL_FITS_H
 #define QX_MODEL_FITS_H
 
-/* Least-squares fits of an exponential, a power, a logarithm and a Gaussian peak. Weights are empty
-   or one per sample. Only their absolute values count, and weights that are all 0 count as no
-   weights. The mean squared error (MSE) is that of qx/linear_fits.h. An iteration ends when the
-   relative change of the MSE is below `tolerance` or the MSE is not above `floor`; values of 0 or
-   below select 0.0001 and 1e-12. *iterations is the limit on entry (a negative limit allows no
-   step) and the number of steps on return. The time of a step is proportional to the number of
-   samples; with a tolerance that cannot be reached a fit makes as many steps as the limit allows. A
-   guess has one value for each coefficient. Of a longer guess the first values are used, a shorter
-   one is ignored, and both give a warning. A failure empties y where it is an output and sets the
-   numbers to NaN.
+/* Least-squares fits of an exponential, a power, a logarithm and a Gaussian peak. The weights are
+   empty, or there is one per sample. Only their absolute values count, and weights that are all 0
+   count as no weights. The mean squared error (MSE) is that of qx/linear_fits.h. An iteration ends
+   when the relative change of the MSE is below `tolerance` or the MSE is not above `floor`; values
+   of 0 or below select 0.0001 and 1e-12. *iterations is the limit on entry (a negative limit allows
+   no step) and the number of steps on return. The time of a step is proportional to the number of
+   samples; if the tolerance cannot be reached, a fit makes as many steps as the limit allows. A
+   guess has one value for each coefficient. Of a longer guess, only the first values are used; a
+   shorter one is ignored; both give a warning. A failure empties y where it is an output and sets
+   the numbers to NaN.
 
    Overflow is not checked for: if a coefficient or a value of the model overflows, as the
    exponential of 710 does, it is infinite and the results that depend on it are infinite or NaN,
-   with the code 0. The MSE overflows for y from 1e154 on. */
+   with the code 0. The MSE overflows for y of 1e154 and above. */
 
 #include "qx/types.h"
 
@@ -24,9 +24,9 @@ QX_BEGIN_DECLS
     logarithm; the values of the fit replace y. Samples that do not have the sign of the majority
     are ignored. deviations holds the standard deviations of the samples: the weights w are 1 /
     deviations^2, and 1 where a deviation is 0. If all x that count are equal, the exponential is
-    not determined: rounding errors select one of those through the mean of ln |y|, and most are so
-    steep that a or b is infinite or 0 and the values are infinite or NaN, with the code 0. b also
-    overflows if the x are within about 1e-306 of each other.
+    not determined: rounding errors select one of those that pass through the mean of ln |y|, and
+    most are so steep that a or b is infinite or 0 and the values are infinite or NaN, with the code
+    0. b also overflows if the x are within about 1e-306 of each other.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (fewer than two samples),
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
     ErrPolynomialOrderTooHigh (fewer than two values have the sign of the majority),
@@ -45,7 +45,7 @@ QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviat
     ErrPolynomialOrderTooHigh (fewer than two values have the sign of the majority),
     ErrNonFiniteInput (a sample or the exponential of a step is not finite), ErrOutOfMemory (no
     memory), ErrIterationLimit (singular values do not converge), WarnFitIncomplete (the guess is
-    neither empty nor of two values).
+    neither empty nor two values long).
     NaN: y in some results; x, w refused with ErrNonFiniteInput; tolerance, floor in no result. */
 QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, uint16_t method, QX_OUT double *a,
@@ -75,7 +75,7 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
     ErrNotStrictlyPositive (an x is not above 0), ErrPolynomialOrderTooHigh (fewer than two values
     have the sign of the majority), ErrNonFiniteInput (a sample or the power of a step is not
     finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not converge),
-    WarnFitIncomplete (the guess is neither empty nor of two values).
+    WarnFitIncomplete (the guess is neither empty nor two values long).
     NaN: y in some results; x refused with ErrNotStrictlyPositive; w refused with ErrNonFiniteInput;
     tolerance, floor in no result. */
 QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
@@ -91,9 +91,9 @@ QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
 /** y = a log(b x) to the given base, for x of one sign; b has the same sign. The values of the fit
     replace y. The solution is in closed form, by the line through (log |x|, y). The base 2.71828,
     exactly these six digits, means e; e with all its digits is treated as any other base, and the
-    results differ in the last bits. If all x are equal, and with a base of 1, a and b are NaN,
-    infinite or arbitrary, with the code 0. If y hardly depends on x, b is a power of the base that
-    overflows to infinity or underflows to 0, and the values are infinite.
+    results differ in the last bits. If all x are equal, or the base is 1, a and b are NaN, infinite
+    or arbitrary, with the code 0. If y hardly depends on x, b is a power of the base that overflows
+    to infinity or underflows to 0, and the values are infinite.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrNotStrictlyPositive (the base is 0 or
     below), ErrFewerThanTwo (fewer than two samples), ErrNonFiniteInput (a weight is NaN),
     ErrTooFewWeights (all weights but one are 0), ErrMixedSigns (the x are neither all above nor all
@@ -109,16 +109,16 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
     the guess (a, c, s), or from a fit to the logarithms of the samples above a tenth of the peak;
     the values of the fit replace y. *iterations counts the trials. Steepest descent converges
     slowly if the magnitudes of a, c and s differ much, and then ends by the tolerance; with a
-    tolerance of nearly 0 it may continue for millions of trials, up to the limit. x from 1e154 on
-    overflow: s is infinite, with the code 0. A guess that is not finite is ignored. If only the
-    peak sample is above a tenth of its height, the curve goes through three points, and *iterations
-    is 0. Of 510 exact peaks and dips of all widths 242 are missed by more than 1e-6 of a
-    coefficient; GaussianPeakFit2026_head finds all of them.
+    tolerance of nearly 0 it may continue for millions of trials, up to the limit. For x of 1e154
+    and above, squares overflow: s is infinite, with the code 0. A guess that is not finite is
+    ignored. If only the peak sample is above a tenth of its height, the curve goes through three
+    points, and *iterations is 0. Of 510 exact peaks and dips of all widths, 242 are missed by more
+    than 1e-6 of a coefficient; GaussianPeakFit2026_head finds all of them.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (fewer than three
     samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (fewer than three weights are
     not 0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the start value of s is 0, or
     a single-sample peak has no neighbour of its sign on one side), ErrOutOfMemory (no memory),
-    WarnFitIncomplete (the guess is neither empty nor of three values).
+    WarnFitIncomplete (the guess is neither empty nor three values long).
     NaN: y refused with ErrFitStartValues or in some results; x, w refused with ErrNonFiniteInput;
     tolerance, floor in no result. */
 QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
@@ -141,9 +141,9 @@ QX_API ErrorCode GaussianPeakFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DB
     weights are not 0), ErrFitStartValues (the guess of s is 0), ErrOutOfMemory (no memory),
     ErrNoUsableFit (the sum of squares is not finite at any start), ErrNonFiniteFunction (the sum of
     squares at the guess is not finite), ErrIterationLimit (the limit is reached; all outputs are
-    valid), WarnRankDeficient (the samples do not determine each coefficient), WarnLowAccuracy (the
+    valid), WarnRankDeficient (the samples do not determine every coefficient), WarnLowAccuracy (the
     fit ends before the coefficients have settled to 7 digits), WarnFitIncomplete (the guess is
-    neither empty nor of three values).
+    neither empty nor three values long).
     NaN: y, x, w, guess refused with ErrNonFiniteInput; tolerance, floor in no result. */
 QX_API ErrorCode GaussianPeakFit2026_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                           double tolerance, QX_IN DBL1D guess, QX_OUT double *a,

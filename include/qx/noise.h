@@ -15,7 +15,7 @@
    and repeats after 30268 numbers, and for the multiples 1 to 4 of 47333376 all u are 0. Streams of
    different seeds are not independent. If a seed s is odd and its remainder is below 8192, each u
    of the seed 2 s is the fractional part of twice that of s, and the two streams have a correlation
-   of 0.5. For parallel streams, continue a single state, or set the states other than by seeds.
+   of 0.5. For parallel streams, continue a single state, or set the states directly.
 
    The state advances several times if a sample needs several draws, so it does not determine the
    number of samples.
@@ -101,12 +101,12 @@ QX_API int32_t PeriodNoise(QX_IN const int32_t *n, QX_IN const double *amplitude
 QX_API ErrorCode GammaNoiseH(QX_OUT DBL1D x, int32_t n, int32_t order, int32_t seed,
                              QX_INOUT RandomState *state);
 
-/** Poisson noise: numbers of events with the given mean. Below a mean of 12 by counting the factors
-    of a product of uniform numbers, otherwise by rejection from a Lorentzian. A mean that is not
-    finite gives NaN. The rejection loses accuracy if the mean is large: the standard deviation is
-    too large by 2.5 % at a mean of 1e14, by 10 % at 1e15, and by a factor of 2.9 at 1e16; beyond
-    that the numbers are not Poisson noise, and near 1e308 they are infinite. Poisson2026 is exact
-    up to a mean of 1e15.
+/** Poisson noise: numbers of events with the given mean. Below a mean of 12 they are found by
+    counting the factors of a product of uniform numbers, otherwise by rejection from a Lorentzian.
+    A mean that is not finite gives NaN. The rejection loses accuracy if the mean is large: the
+    standard deviation is too large by 2.5 % at a mean of 1e14, by 10 % at 1e15, and by a factor of
+    2.9 at 1e16; beyond that the numbers are not Poisson noise, and near 1e308 they are infinite.
+    Poisson2026 is exact up to a mean of 1e15.
     Codes: ErrInvalidSelector (the mean is negative), ErrEmptyInput (n is below 1), ErrOutOfMemory
     (the host refused the resize).
     NaN: mean in all results. */
@@ -115,8 +115,8 @@ QX_API ErrorCode PoissonNoiseH(QX_OUT DBL1D x, int32_t n, double mean, int32_t s
 
 /** Binomial noise: numbers of successes in `trials` trials of probability p. Below 25 trials each
     trial is simulated; if min(p, 1 - p) trials is below 1, the successes are counted as Poisson
-    events; otherwise by rejection from a Lorentzian. The maximum is 2^31 - 1 trials here and 2^52
-    in Binomial2026.
+    events; otherwise the method is rejection from a Lorentzian. The maximum is 2^31 - 1 trials here
+    and 2^52 in Binomial2026.
     Codes: ErrInvalidSelector (trials is negative, or p is not in 0 to 1), ErrEmptyInput (n is below
     1), ErrOutOfMemory (the host refused the resize).
     NaN: p refused with ErrInvalidSelector; cache.enOld, cache.lnGammaEn1, cache.logP, cache.logPc,
@@ -163,7 +163,7 @@ QX_API ErrorCode Poisson2026(QX_OUT DBL1D x, int32_t n, double mean, int32_t key
 /** Binomial noise: numbers of successes in `trials` trials of probability p, where trials is an
     integer up to 2^52. Otherwise as Poisson2026; the rejection is that of W. Hoermann, "The
     generation of binomial random variates", 1993.
-    Codes: ErrInvalidSelector (trials is not a whole number of 0 to 2^52, or p is not from 0 to 1),
+    Codes: ErrInvalidSelector (trials is not a whole number from 0 to 2^52, or p is not in 0 to 1),
     ErrEmptyInput (n is below 1), ErrIndexOutOfRange (the position is negative, not a whole number,
     or above 2^53 - n), ErrOutOfMemory (the host refused the resize).
     NaN: trials, p refused with ErrInvalidSelector; position refused with ErrIndexOutOfRange. */

@@ -9,10 +9,10 @@ QX_BEGIN_DECLS
 
 /* Computes a model, or its derivatives, at all samples. p holds the `count` parameters, x the array
    that was passed to the fit, and `n` is the number of samples. A model writes n values to out; a
-   procedure for derivatives writes n rows of `count` values: the derivative of value i by p[j] goes
-   to out[i * count + j]. The function result is 0, or any other number to end the fit. It is called
-   on the thread of the fit, may call exports, and must neither throw nor touch the arrays of the
-   fit. */
+   procedure for derivatives writes n rows of `count` values: the derivative of value i with respect
+   to p[j] goes to out[i * count + j]. The function result is 0, or any other number to end the fit.
+   It is called on the thread of the fit, may call exports, and must neither throw nor touch the
+   arrays of the fit. */
 typedef int32_t (*FitProcedure)(void *context, const DBL *x, int32_t xCount, const DBL *p,
                                 int32_t count, DBL *out, int32_t n);
 
@@ -30,14 +30,14 @@ typedef int32_t (*FitProcedure)(void *context, const DBL *x, int32_t xCount, con
     x is passed on to the procedures without being examined, NaN included: it has one number for
     each sample, or several, as the model requires, or it is empty. w holds a weight per sample,
     such as 1 / sd^2, or is empty. model computes the values and jacobian the derivatives; if
-    jacobian is null, the derivatives are central differences of second order, near the end of
-    fourth order, and one-sided at bounds. context is passed to the procedures. guess holds the
-    start values. lower and upper hold a bound for each parameter (infinite for none) or are empty;
-    equal bounds fix a parameter. The model is evaluated only within the bounds.
+    jacobian is null, the derivatives are central differences, of second order at first and of
+    fourth order near the end, and one-sided at bounds. context is passed to the procedures. guess
+    holds the start values. lower and upper hold a bound for each parameter (infinite for none) or
+    are empty; equal bounds fix a parameter. The model is evaluated only within the bounds.
 
-    tolerance is the relative change of a parameter at which the fit ends; with 0 or below the fit
-    continues as long as rounding errors allow. *iterations is the limit, 2000 if it is 0 or below,
-    and receives the number of steps tried.
+    tolerance is the relative change of a parameter at which the fit ends; if it is 0 or below, the
+    fit continues as long as rounding errors allow. *iterations is the limit, 2000 if it is 0 or
+    below, and receives the number of steps tried.
 
     p receives the parameters and residuals y - f at each sample. covariance is that of the
     parameters, to first order: the inverse of J^T J, where J holds the derivatives times the square
@@ -48,18 +48,19 @@ typedef int32_t (*FitProcedure)(void *context, const DBL *x, int32_t xCount, con
 
     *reason is why the fit ended: 1 it has converged, and no parameter would change by more than
     1e-7 of its value; 2 all residuals are 0; 0 the iteration limit was reached; 3 the residuals do
-    not determine each free parameter, as in a valley that extends to infinity; 4 no step lowers the
-    cost, but the parameters have not settled to 7 digits: the model is not smooth, the derivatives
-    do not belong to it, or it is too sensitive to rounding errors. The minimum may be a local one.
+    not determine every free parameter, as in a valley that extends to infinity; 4 no step lowers
+    the cost, but the parameters have not settled to 7 digits: the model is not smooth, the
+    derivatives do not belong to it, or it is too sensitive to rounding errors. The minimum may be a
+    local one.
 
-    Sums of squares that overflow, as for residuals from 1e154 on, are not finite.
+    Sums of squares that overflow, as for residuals of 1e154 and above, are not finite.
     Codes: ErrSizeMismatch (w is neither empty nor as long as y, or the size of x is not a multiple
     of that of y), ErrEmptyInput (y or guess is empty), ErrSizesDisagree (lower or upper is neither
     empty nor as long as guess), ErrNotAvailable (model is null), ErrInvalidSelector (loss is not 0
     to 4), ErrNotStrictlyPositive (scale is not above 0, with a loss other than 0), ErrNaNInData (a
     bound is NaN), ErrBoundsCrossed (a lower bound is above its upper one), ErrFitPointsTooFew
     (fewer samples than free parameters), ErrNonFiniteInput (y, w or guess is not finite),
-    ErrTooFewWeights (fewer weights other than 0 than free parameters), ErrOutOfMemory (no memory),
+    ErrTooFewWeights (fewer non-zero weights than free parameters), ErrOutOfMemory (no memory),
     ErrNonFiniteFunction (the cost or the derivatives at the start are not finite), ErrNotAvailable
     (a procedure ended the fit), ErrIterationLimit (the limit is reached; the outputs are valid),
     WarnRankDeficient (reason 3), WarnLowAccuracy (reason 4).

@@ -71,7 +71,7 @@ QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *
     c2) is taken where c1 changes sign from one window to the next; for w below 5, in every window
     whose c2 has the sign of a peak or a valley. A vertex counts if, in one of the two windows, it
     is within a quarter of the window from the centre and its amplitude is beyond the threshold. Of
-    two vertices less than a sample apart the more extreme one is kept. The division of a stream
+    two vertices less than a sample apart, the more extreme one is kept. The division of a stream
     into blocks changes the results in one case only: if the second of two such vertices is more
     extreme and lies after a block boundary, both are reported. The last w samples of a block are
     scanned with the next block, or with the last-block flag.

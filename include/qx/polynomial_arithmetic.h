@@ -3,8 +3,8 @@
 
 /* Arithmetic of polynomials. Coefficients are in ascending powers: element 0 is the constant term,
    and n coefficients form a polynomial of degree n - 1 or, with leading zeros (the last elements),
-   below. Where an empty array is accepted, it is the polynomial 0. Outputs are separate arrays. NaN
-   and infinities among the coefficients are refused. */
+   of a lower degree. Where an empty array is accepted, it is the polynomial 0. Outputs are separate
+   arrays. NaN and infinities among the coefficients are refused. */
 
 #include "qx/types.h"
 
@@ -40,8 +40,8 @@ QX_API ErrorCode CxMultiplyPolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
 /** Quotient and remainder of polynomial division, p = quotient q + remainder. Leading zeros of p
     and q are ignored, so degrees are those of the polynomials. The quotient has degree of p -
     degree of q + 1 coefficients; if the degree of p is below that of q, or p is empty or 0, it is a
-    single 0. The remainder has max(1, degree of q) coefficients. A monic divisor of integers
-    divides exactly as long as all intermediate numbers are below 2^53.
+    single 0. The remainder has max(1, degree of q) coefficients. With integer coefficients and a
+    monic divisor, the division is exact as long as all intermediate numbers are below 2^53.
     Codes: ErrEmptyInput (q is empty), ErrNonFiniteInput (a coefficient), ErrAllCoefficientsZero
     (q is 0), ErrOverflow (a coefficient of a result is not finite), ErrOutOfMemory (no memory,
     or the host refuses an output).
@@ -85,7 +85,7 @@ QX_API ErrorCode PolyLCM_H(QX_IN DBL1D p, QX_IN DBL1D q, double tolerance, QX_OU
 
 /** Values y[i] = p(x[i]) by Horner's rule with compensation, as accurate as if computed in twice
     the working precision and rounded: the relative error is at most eps + gamma(2n)^2 times the
-    condition number, with n the degree, eps 2^-53, gamma(k) = k eps / (1 - k eps) and the
+    condition number, with n the degree, eps = 2^-53, gamma(k) = k eps / (1 - k eps) and the
     condition number sum |p[k]| |x|^k / |p(x)|, as long as no product underflows (S. Graillat, P.
     Langlois and N. Louvet, "Compensated Horner scheme", 2005). If the compensation overflows, which
     may happen from about 2^996 on, the value is that of the plain rule. x is not checked: NaN gives
@@ -166,16 +166,16 @@ QX_API ErrorCode CxPolyFromRootsH(QX_IN CDB1D roots, QX_OUT CDB1D p);
         numerator / denominator = polynomial + sum over the poles z, of multiplicity m, of
             r[1] / (x - z) + r[2] / (x - z)^2 + ... + r[m] / (x - z)^m.
 
-    `poles` holds each pole as often as its multiplicity, in adjacent elements that are equal to the
-    bit, and `residues` holds r[1] to r[m] in the same elements. `polynomial` is the quotient of the
-    division, a single 0 if there is none. Poles that are not real, and their residues, are exact
-    conjugate pairs. Leading zeros are ignored. A constant denominator has no poles. Common factors
-    are not cancelled: their residues are about 0. Poles and multiplicities are those of
-    MultPolyRoots_head with refinement. `tolerance` has the same meaning there: the amount by which
-    coefficients of the denominator may be changed to make poles multiple; a tolerance that is NaN
-    or not above 0 selects 1e-10. A double root of a quadratic, which MultPolyRoots_head counts as
-    two roots, is a double pole here. Residues are the coefficients of power series at the poles,
-    divided by one factor after another.
+    `poles` holds each pole repeated according to its multiplicity, in adjacent elements that are
+    equal to the bit, and `residues` holds r[1] to r[m] in the same elements. `polynomial` is the
+    quotient of the division, a single 0 if there is none. Poles that are not real, and their
+    residues, are exact conjugate pairs. Leading zeros are ignored. A constant denominator has no
+    poles. Common factors are not cancelled: their residues are about 0. Poles and multiplicities
+    are those of MultPolyRoots_head with refinement. `tolerance` has the same meaning as there: the
+    amount by which coefficients of the denominator may be changed to make poles multiple; a
+    tolerance that is NaN or not above 0 selects 1e-10. A double root of a quadratic, which
+    MultPolyRoots_head counts as two roots, is a double pole here. Residues are the coefficients of
+    power series at the poles, divided by one factor after another.
     Codes: ErrEmptyInput (numerator or denominator is empty), ErrNonFiniteInput (a coefficient;
     an infinite tolerance), ErrAllCoefficientsZero (the denominator is 0), ErrOverflow (a result,
     or the monic denominator, is not finite), ErrIterationLimit (eigenvalues do not converge),

@@ -13,9 +13,11 @@ QX_BEGIN_DECLS
     real quadratic factor. `roots` holds one root per guess: first those of the real guesses in
     their order, then, from the complex guesses, the pairs of real roots and the conjugate pairs.
     Complex guesses are unchanged if the polynomial has fewer than 4 coefficients, and so is a guess
-    without a partner. PolyRoots2026_head needs no guesses. Iterations end when a relative change is
-    below the tolerance, or at their limit, with the best values so far. A null array of guesses
-    counts as empty. If coef is empty, `roots` is emptied.
+    without a partner. Iterations end when a relative change is below the tolerance, or at their
+    limit, with the best values so far, and Bairstow's as soon as a step is not shorter than the last
+    one: for 1000 polynomials of degree 10 with normal random coefficients and guesses up to 1.4 %
+    off, 283 had pairs that were not found to 6 digits, with the code 0. PolyRoots2026_head needs no
+    guesses. A null array of guesses counts as empty. If coef is empty, `roots` is emptied.
     Codes: WarnEmptyResult (coef is empty), ErrOutOfMemory (no memory, or the host refuses
     `roots`).
     NaN: coef, newtonTolerance, bairstowTolerance in no result; realGuesses, complexGuesses in some
@@ -42,23 +44,23 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
     is in *err.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is NaN, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses the resize),
-    ErrNonFiniteFunction (a search came to NaN), ErrIterationLimit (a search does not converge).
+    ErrNonFiniteFunction (a search arrived at NaN), ErrIterationLimit (a search does not converge).
     NaN: coef refused with ErrBadCoefficients. */
 QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIterations,
                                 QX_OUT ErrorCode *err);
 
-/** All roots of a real polynomial, found simultaneously: each as often as its multiplicity, by
-    ascending modulus, real or in exact conjugate pairs, of which the root with positive imaginary
-    part comes first. Leading coefficients of 0 do not count. The method is the iteration of L. W.
-    Ehrlich and O. Aberth with the start values of D. A. Bini, "Numerical computation of polynomial
-    zeros by means of Aberth's method", 1996, and at the end with polynomial values in twice the
-    precision (S. Graillat, P. Langlois and N. Louvet, "Compensated Horner scheme", 2005), so that
-    simple roots are those of the given coefficients to about 2 eps as long as their condition
-    number is below 1e15. Coefficients may have any magnitude. For each root z, |p(z)| is at most 4
-    n eps (|a[0]| + |a[1] z| + ... + |a[n] z^n|), tested up to degree 200 and more. radii[i] is the
-    radius of a disc around roots[i] that contains a root of the polynomial; it is large for
-    clusters and multiple roots. The time grows with the square of the degree: 0.4 ms at degree 50,
-    6 ms at degree 200.
+/** All roots of a real polynomial, found simultaneously: each repeated according to its
+    multiplicity, by ascending modulus, real or in exact conjugate pairs, of which the root with
+    positive imaginary part comes first. Leading coefficients of 0 do not count. The method is the
+    iteration of L. W. Ehrlich and O. Aberth with the start values of D. A. Bini, "Numerical
+    computation of polynomial zeros by means of Aberth's method", 1996, and, at the end, with
+    polynomial values in twice the precision (S. Graillat, P. Langlois and N. Louvet, "Compensated
+    Horner scheme", 2005), so that simple roots are those of the given coefficients to about 2 eps
+    as long as their condition number is below 1e15. Coefficients may have any magnitude. For each
+    root z, |p(z)| is at most 4 n eps (|a[0]| + |a[1] z| + ... + |a[n] z^n|), tested up to degree
+    200 and more. radii[i] is the radius of a disc around roots[i] that contains a root of the
+    polynomial; it is large for clusters and multiple roots. The time grows with the square of the
+    degree: 0.4 ms at degree 50, 6 ms at degree 200.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is not finite, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses an output), ErrOverflow
     (a root is beyond the range of double), ErrIterationLimit (600 sweeps were not enough).
@@ -87,9 +89,9 @@ QX_API ErrorCode CxPolyRoots2026_head(QX_IN CDB1D coef, QX_OUT CDB1D roots, QX_O
 
     The time grows with the cube of the degree, and up to its fourth power if many divisors are
     tried in vain. The memory is about 10 complex numbers times the square of the degree. Measured
-    with random coefficients, whose roots are soon proved to be simple: 0.02 s at degree 200, 4 s and
-    about 75 MB at degree 700; 21 s at degree 700 with coefficients that decrease like exp(-k^2 /
-    7000).
+    with random coefficients, whose roots are soon proved to be simple: 0.02 s at degree 200, 4 s
+    and about 75 MB at degree 700; 21 s at degree 700 with coefficients that decrease like exp(-k^2
+    / 7000).
     Codes: ErrEmptyInput (coef is empty), ErrOutOfMemory (no memory, or the host refuses an output),
     ErrBadCoefficients (a coefficient is not finite), ErrAllCoefficientsZero (all coefficients are
     0), ErrOrderNotPositive (the polynomial is constant), ErrNonFiniteInput (the polynomial

@@ -5,7 +5,7 @@
    that contribute to an output are computed.
 
    The caller keeps `state`, `delayLeft` and `phase` and passes them back unchanged with each block.
-   Blocks may have any size; the results are to the bit those of a single block. A stream begins
+   Blocks may have any size; the results are those of a single block, to the bit. A stream begins
    with a reset; every change of h, L or M requires one, too. A failure empties y and state and
    clears delayLeft and phase. */
 
@@ -17,10 +17,10 @@ QX_BEGIN_DECLS
     upsampled rate. mode: 0 the same rate, y[t] = gain sum over k of h[k] x[t - k]; 1 L times the
     rate, y[t] = gain L sum over j of h[t mod L + j L] x[t / L - j]; 2 every M-th output of mode 0
     without the gain; 3 every M-th output of mode 1. A non-zero *reset, or an empty state, begins a
-    stream. With *removeDelay the group delay of (n - 1) / 2 samples is then removed; otherwise
-    outputs begin with the first input. The size of state is n - 1, ceil(n / L), ceil(n / M) + 1 or
-    ceil(n / L) for mode 0 to 3. A change of h or of the rates is detected only if it changes that
-    size.
+    stream. If *removeDelay is non-zero, the group delay of (n - 1) / 2 samples is then removed;
+    otherwise outputs begin with the first input. The size of state is n - 1, ceil(n / L), ceil(n /
+    M) + 1 or ceil(n / L) for mode 0 to 3. A change of h or of the rates is detected only if it
+    changes that size.
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L or M is below 1),
     ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative and there is no
     reset), ErrBadTapCount (a reset that removes the delay, with an even number of taps),

@@ -58,9 +58,9 @@ typedef void *MeasurementInstanceWord;
     ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
     counters), ErrOutOfMemory (no memory for the counters), ErrMeasureEmpty (y is empty),
     ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor 1),
-    ErrMeasureNotPositive (y is flat (which is allowed by peaks), has only NaN, or spans more than
-    the largest double), WarnMeasurePartial (by histogram: the bin of a state holds fewer than 5% of
-    the samples; the results are valid).
+    ErrMeasureNotPositive (y is flat (which is allowed with levels by peaks), has only NaN, or spans
+    more than the largest double), WarnMeasurePartial (by histogram: the bin of a state holds fewer
+    than 5% of the samples; the results are valid).
     NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed. */
 QX_API ErrorCode StateLevels(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                              QX_INOUT MeasurementSlot *slot, QX_OUT double *high,
@@ -118,7 +118,7 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
 /** Measures transition number `number` (from 1) of the given polarity between the low and the high
     reference: start, end and duration in units of time, and slewRate, the difference of the
     references divided by the duration. Aberrations are the excursions from the state before and
-    after the transition, up to half the way to the neighbouring transitions or to the ends of the
+    after the transition, up to halfway to the neighbouring transitions or to the ends of the
     waveform, in percent of the amplitude; an overshoot is above the histogram bin of the state, an
     undershoot below it, and excursions within the bin do not count. Afterwards `ref` holds absolute
     levels, with `percent` unchanged; a failure leaves it unchanged.
@@ -126,12 +126,12 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
     ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
     counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (number is below 1),
     ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
-    (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels
-    and for peaks as well), ErrMeasureRangeReversed (the references are out of order),
+    (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels,
+    but also with levels by peaks), ErrMeasureRangeReversed (the references are out of order),
     ErrMeasureOutOfMemory (no memory for the transitions, at most as many as y has samples; or
     number above about 3e7), ErrMeasureTooFewPoints (there is no such transition),
-    ErrMeasureOutOfRange (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for
-    peaks as well).
+    ErrMeasureOutOfRange (the duration is not above 0), WarnMeasurePartial (as in StateLevels, but
+    also with levels by peaks).
     NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid
     refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
@@ -155,9 +155,9 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
 
 /** Mean and root mean square over cycle number `cycleNumber` (from 1), over the samples between the
     crossings of number 2 cycleNumber - 1 and 2 cycleNumber + 1 of the mid reference, counted as in
-    PulseMeasEx; start and end are in units of time. Sums and squares that overflow, from 1e154 on,
-    make mean and rms infinite or NaN. Afterwards `ref` holds absolute levels, with `percent`
-    unchanged; a failure leaves it unchanged.
+    PulseMeasEx; start and end are in units of time. Sums and squares that overflow, as for samples
+    of 1e154 and above, make mean and rms infinite or NaN. Afterwards `ref` holds absolute levels,
+    with `percent` unchanged; a failure leaves it unchanged.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins is below 1),
     ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something other than
     counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (cycleNumber is below
@@ -165,7 +165,7 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
     ErrInvalidSelector (limit is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in
     StateLevels), ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory
     (no memory for so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound
-    (a cycle of no samples), WarnMeasurePartial (as in StateLevels).
+    (a cycle without samples), WarnMeasurePartial (as in StateLevels).
     NaN: y, ref.high in no result; t0 refused with ErrMeasureNotFound; dt refused with
     ErrMeasureLevelsReversed; ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,

@@ -7,8 +7,8 @@
    Positions refer to the grid of the input with L - 1 zeros inserted after each sample: sample i is
    at position i L, counted from the oldest sample available, which is in the state or, if that is
    empty, in the block. The caller keeps `state`, `stateCount` and `offset` and passes them back
-   unchanged with each block. Blocks may have any size; the results are to the bit those of a single
-   block. A failure empties y and state. */
+   unchanged with each block. Blocks may have any size; the results are those of a single block, to
+   the bit. A failure empties y and state. */
 
 #include "qx/types.h"
 

@@ -33,8 +33,8 @@ QX_API int32_t QS1D(QX_INOUT DBL1D x, QX_OUT double *scale, QX_OUT ErrorCode *er
 /** Standardises x: (x - mean) / sd with the mean and the population standard deviation
     sqrt(sum((x - mean)^2) / n) of its elements. Each sum is formed from sixteen partial sums. A
     constant array becomes NaN, or 1, -1 or infinite if its mean is rounded. The squares of
-    deviations below 1e-162 underflow to 0: x becomes infinite or NaN. The squares of deviations
-    from 1e154 on overflow: sd is infinite and x becomes 0, or NaN if the sum of x overflows, too.
+    deviations below 1e-162 underflow to 0: x becomes infinite or NaN. The squares of deviations of
+    1e154 and above overflow: sd is infinite and x becomes 0, or NaN if the sum of x overflows, too.
     Codes: ErrEmptyInput (x is empty).
     NaN: x in all results. */
 QX_API int32_t Norm1(QX_INOUT DBL1D x, QX_OUT double *mean, QX_OUT double *sd,

@@ -43,7 +43,9 @@ QX_API ErrorCode RiffleArrayInt2012_head(QX_INOUT I32_1D x, QX_OUT I32_1D indice
 QX_API ErrorCode RiffleArrayInt_head(QX_INOUT I32_1D x, QX_OUT I32_1D indices, int32_t seed,
                                      QX_INOUT RandomState *state);
 
-/** A random permutation of 0 to count - 1; without bias if `unbiased` is non-zero.
+/** A random permutation of 0 to count - 1; without bias if `unbiased` is non-zero. The generator is
+    that of RiffleArrayDBL2012_head, with a period of 7e12; RiffleIntNum2026_head has 2^117 starting
+    points.
     Codes: ErrEmptyInput (count is below 1), ErrOutOfMemory (the host refused the resize). */
 QX_API ErrorCode RiffleIntNum2012_head(QX_OUT I32_1D indices, int32_t count, int32_t seed,
                                        QX_INOUT RandomState *state, int32_t unbiased);

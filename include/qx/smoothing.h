@@ -16,8 +16,8 @@ QX_BEGIN_DECLS
     the i-th derivative at the centre divided by i factorial from row i. Only the absolute values of
     weights count; if weights is empty, all samples count equally. The fit inverts the triangular
     factor of the matrix of powers of t. That factor is refused if a diagonal element is not above
-    2.2e-16 times its largest element: from frames of 3575 samples on at order 5, of 225 at order 8,
-    of 49 at order 12. Memory grows as frame^2 and time as frame^2 order.
+    2.2e-16 times its largest element: for frames of 3575 samples or more at order 5, 225 at order 8
+    and 49 at order 12. Memory grows as frame^2 and time as frame^2 order.
     Codes: ErrBadCoefficients (order is below 1), ErrPolynomialOrderTooHigh (frame is not above
     order), ErrSizeMismatch (weights is neither empty nor as long as the frame), ErrBadTapCount
     (frame is even), ErrOutOfMemory (no memory, or the host refuses an output), ErrNonFiniteInput (a

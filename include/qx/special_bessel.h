@@ -6,8 +6,8 @@
    mathematical functions, 1964.
 
    A function that exceeds the largest double is infinite if its sign is known, otherwise NaN. This
-   concerns ber and bei from about |x| = 1020 on, and the parabolic cylinder functions for orders
-   from a few hundred on. I, ker and kei may be NaN for arguments beyond 1e154 with orders in the
+   concerns ber and bei for |x| above about 1020, and the parabolic cylinder functions for orders
+   above a few hundred. I, ker and kei may be NaN for arguments beyond 1e154 with orders in the
    thousands or more. */
 
 #include "qx/types.h"
@@ -21,9 +21,9 @@ QX_BEGIN_DECLS
     NaN: x in all results. */
 QX_API void QX_Airy(double x, QX_OUT DBL *ai, QX_OUT DBL *aip, QX_OUT DBL *bi, QX_OUT DBL *bip);
 
-/** Bessel function J of real order, a solution of x^2 w'' + x w' + (x^2 - order^2) w = 0 (9.1):
-    the ascending series, Hankel's form and recurrence in the order; rational kernels for orders 0
-    and 1; for orders from 200 on the expansion for large order. NaN for orders below -200 and for
+/** Bessel function J of real order, a solution of x^2 w'' + x w' + (x^2 - order^2) w = 0 (9.1): the
+    ascending series, Hankel's form and recurrence in the order; rational kernels for orders 0 and
+    1; for orders of 200 and above, the expansion for large order. NaN for orders below -200 and for
     x < 0 unless the order is an integer; 0 for |x| < 2.2e-16 and orders that are not integers.
     NaN: order, x in all results. */
 QX_API void QX_BesselJr(double order, double x, QX_OUT DBL *value);

@@ -17,14 +17,14 @@ QX_BEGIN_DECLS
 QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
 
 /** As QX_Elliptic1, with a selector in place of the NaN: 1 complete, otherwise incomplete. Here
-    F(phi, 1) has an absolute error of 1e-16, so that no digit is left for phi below that;
+    F(phi, 1) has an absolute error of 1e-16, so that no digits are correct for phi below that;
     QX_Elliptic1_2026 keeps all digits.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) within 1 eps: below a quarter
-    of pi as ln(1 + 2 t / (1 - t)), t = tan(phi / 2). F(phi, 1) is infinite from the double next to
-    pi / 2 on.
+    of pi as ln(1 + 2 t / (1 - t)), t = tan(phi / 2). F(phi, 1) is infinite from the double nearest
+    to pi / 2 onwards.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_2026(double m, double phi, QX_OUT DBL *value, int32_t selector);
 

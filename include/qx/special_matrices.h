@@ -45,7 +45,7 @@ QX_API ErrorCode KroneckerProd_H(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D out)
 QX_API ErrorCode CxKroneckerProd_H(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D out);
 
 /** Unpacks a packed triangle into a full square matrix. For triangle 0 and 1 the other triangle is
-    0, for 2 it is the mirror image. With any other value of triangle out is unchanged and the code
+    0; for 2 it is the mirror image. With any other value of triangle out is unchanged and the code
     is 0.
     Codes: ErrEmptyInput (packed is empty), ErrNotSquare (its length is not of the form n (n+1) /
     2), ErrOutOfMemory (the host refused the resize).

@@ -21,9 +21,9 @@ struct Summary {
     double greatest = mean;
 };
 
-// Statistics of all values so far. The results do not depend on the division into blocks, to the
-// bit. Allocates no memory. Differences from the first value are summed, so a small spread far from
-// zero keeps its digits as long as the first value is near the others.
+// Statistics of all values so far. The results are the same, to the bit, however the values are
+// divided into blocks. Allocates no memory. Differences from the first value are summed, so a small
+// spread far from zero keeps its digits as long as the first value is near the others.
 class RunningStream {
 public:
     Summary operator()(std::span<const double> block) noexcept {
@@ -32,7 +32,7 @@ public:
         return summary();
     }
 
-    // NaN if there was no value.
+    // NaN if there have been no values.
     Summary summary() const noexcept {
         if (count_ == 0)
             return {};

@@ -10,20 +10,20 @@
    Tones are found one after the other, each as the largest line in a windowed spectrum of the
    residual, and all of them are then fitted to the samples together with a constant, by least
    squares: the sine fit of IEEE Std 1057-2017 (four parameters) with more than one sine. In white
-   noise that is the estimate of maximum likelihood, whose deviations are those of the Cramer-Rao
-   bound once the tones stand out of the noise (D. C. Rife and R. R. Boorstyn, "Single tone
-   parameter estimation from discrete-time observations", 1974). The time grows with the number of
-   samples, times the square of the number of tones. Frequencies within a quarter of a bin of 0 or
-   of half the sampling rate cannot be found. */
+   noise that is the maximum-likelihood estimate, whose deviations are those of the Cramer-Rao bound
+   once the tones stand out of the noise (D. C. Rife and R. R. Boorstyn, "Single tone parameter
+   estimation from discrete-time observations", 1974). The time grows with the number of samples,
+   times the square of the number of tones. Frequencies within a quarter of a bin of 0 or of half
+   the sampling rate cannot be found. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** Finds up to `count` largest tones of y, with their frequencies, amplitudes and phases. order: 0
-    by falling amplitude; 1 by rising frequency. *residualRms is the root mean square of the
-    residual after the tones and the constant. The search ends early if the largest remaining line
-    is below 1e-12 of the largest tone or could be noise, and when there are no more than three
+/** Finds the `count` largest tones of y, or fewer, with their frequencies, amplitudes and phases.
+    order: 0 by falling amplitude; 1 by rising frequency. *residualRms is the root mean square of
+    the residual after the tones and the constant. The search ends early if the largest remaining
+    line is below 1e-12 of the largest tone or could be noise, and when there are no more than three
     samples for each tone and one for the constant. The largest tone of all is always returned, even
     if it may be noise.
 

@@ -23,7 +23,7 @@
 #endif
 
 /* What the compiler has to know about the types: elements may start at any byte, the elements of a
-   block have another type than the block, and records have no padding. The pragma around each
+   block have a different type from the block, and records have no padding. The pragma around each
    record states the last point for all compilers. Compilers without attributes read and write
    elements at any address anyway. */
 #if defined(__GNUC__)

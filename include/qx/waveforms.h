@@ -147,17 +147,17 @@ QX_API ErrorCode RampPtrn85(QX_OUT DBL1D x, int32_t n, double start, double end,
 QX_API ErrorCode GaussPulseH(QX_INOUT DBL1D x, int32_t n, double amp, double delay, double dt,
                              double fc, double bandwidth, double dBReference);
 
-/** As GaussPulseH, the derivative of a Gaussian: 2 amp sqrt(e) u exp(-2 u^2) with u = pi fc t, of
-    peak amp at u = 1/2.
+/** As GaussPulseH, the derivative of a Gaussian: 2 amp sqrt(e) u exp(-2 u^2) with u = pi fc t, with
+    a peak of amp at u = 1/2.
     Codes: ErrEmptyInput (x is empty and n is below 1), ErrOutOfMemory (the host refused the
     resize), ErrNotStrictlyPositive (fc is not above 0), ErrSamplingNotPositive (dt is not above
     0). */
 QX_API ErrorCode GaussMonopulseH(QX_INOUT DBL1D x, int32_t n, double dt, double delay, double fc,
                                  double amp);
 
-/** As GaussPulseH, a single triangle of the given width, with its peak of amp at skew width from
-    its start. With the times i dt - delay it begins at t = 0; with times given in x it is centred
-    on t = 0.
+/** As GaussPulseH, a single triangle of the given width, with its peak of amp at skew times width
+    from its start. With the times i dt - delay it begins at t = 0; with times given in x it is
+    centred on t = 0.
     Codes: ErrEmptyInput (x is empty and n is below 1), ErrOutOfMemory (the host refused the
     resize), ErrNotStrictlyPositive (the width is not above 0), ErrSamplingNotPositive (dt is not
     above 0), ErrProbabilityOutOfRange (skew is not in 0 to 1).
@@ -179,7 +179,7 @@ QX_API ErrorCode PeriodicSincH(QX_INOUT DBL1D x, int32_t n, double amp, int32_t 
     by 2 pi fc per sample, plus or minus a full turn, which does not change the sine: 2 pi/dt is
     subtracted once *phase reaches it and added otherwise. A dt of 0, or a phase whose product with
     dt is not finite, gives NaN. *peak is the input of largest magnitude so far, compared by integer
-    parts. *phaseOut is *phase dt in degrees plus the last output, which counts as 0 without
+    parts. *phaseOut is *phase dt in degrees plus the last output, which counts as 0 if there are no
     samples. The function result is 0.
     NaN: dt, fc, phase in all results; peak in no result. */
 QX_API int32_t PhasMod(int32_t n, double dt, QX_OUT double *phaseOut, double fc,

@@ -16,8 +16,8 @@ QX_BEGIN_DECLS
 QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
 /** The constants of a named window of n samples. selector: as SymmWinH. For selectors up to 11 they
     are stored values. For the others they are computed from the whole window, in 8 n bytes of
-    scratch memory and time proportional to n, for selector 61 to n log n. The parameter is used as
-    is; that of selector 61 is a linear ratio. With code 0 the constants are NaN if the window is
+    scratch memory and time proportional to n or, for selector 61, to n log n. The parameter is used
+    as is; that of selector 61 is a linear ratio. With code 0 the constants are NaN if the window is
     NaN (a parameter out of its range), and enbw is NaN for the triangle of a single sample, which
     is 0.
     Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
@@ -25,8 +25,8 @@ QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *consta
     NaN: param in no result. */
 QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
                                  QX_OUT WindowConstants *constants);
-/** As WinConstByNameH, with the parameter as in AllWinH: NaN, for selectors 61 and 62 also a
-    negative value, selects the default, and that of selector 61 is in decibels.
+/** As WinConstByNameH, with the parameter as in AllWinH: NaN, or a negative value for selectors 61
+    and 62, selects the default, and that of selector 61 is in decibels.
     Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
     ErrInvalidSelector (any other selector). Both constants are then NaN. */
 QX_API ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,

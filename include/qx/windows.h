@@ -46,8 +46,8 @@ typedef struct WindowConstants {
 
 /** Kaiser window: I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2i/n. The Bessel series is
     truncated after 25 terms, which is inaccurate for large beta: the error of the window is 6e-10
-    at beta 20, 4e-7 at 25, 3e-5 at 30 and 0.03 at 50. From |beta| of about 3e7 on (1e7 is still
-    safe) the sum is infinite and values are NaN. J. F. Kaiser, "Nonrecursive digital filter design
+    at beta 20, 4e-7 at 25, 3e-5 at 30 and 0.03 at 50. If |beta| is about 3e7 or more (1e7 is still
+    safe), the sum is infinite and values are NaN. J. F. Kaiser, "Nonrecursive digital filter design
     using the I0-sinh window function", 1974.
     Codes: ErrEmptyInput (x is empty).
     NaN: x, beta in some results. */
@@ -183,8 +183,8 @@ QX_API ErrorCode CxScaledWinH(QX_INOUT CDB1D x, int32_t selector, double param,
                               QX_OUT WindowConstants *constants);
 
 /** Any window in any form: divided by its coherent gain if `scaled` is non-zero, symmetric if
-    `symmetric` is non-zero. A parameter of NaN, for selectors 61 and 62 also a negative one,
-    selects the default; that of selector 61 is in decibels.
+    `symmetric` is non-zero. A parameter of NaN, or a negative one for selectors 61 and 62, selects
+    the default; that of selector 61 is in decibels.
     Codes: ErrInvalidSelector (both forms at the same time, or an unknown selector),
     ErrNegativeDimension (x has a negative size and `scaled` is non-zero), ErrEmptyInput (x is
     empty), ErrFewerThanTwo (force or exponential with fewer than 2 samples),

@@ -12,8 +12,8 @@
 QX_BEGIN_DECLS
 
 /** Filters x in place by the filter with the coefficients a and b in direct form, as in IIR_Filter.
-    With a empty it is an FIR filter; with both a and b empty x is unchanged. keepState 0 clears the
-    states.
+    If a is empty, it is an FIR filter; if both a and b are empty, x is unchanged. keepState 0
+    clears the states.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), the host's status (it
     refuses a state), ErrOutOfMemory (no memory). A failure leaves x unchanged; the last two also
     empty all four states.

@@ -11,7 +11,7 @@ import numpy as np
 from numpy.typing import ArrayLike
 
 from . import windows
-from .topical import LAST, Result, along, chosen, procedure, refuse, result, served, whole_number
+from .topical import LAST, LOW_ORDER, Result, along, chosen, procedure, refuse, result, served, whole_number
 from .topical.axes import as_array
 
 __all__ = ["Quadrature", "cumulative", "derivative", "displacement", "integrate", "integrate2",
@@ -500,7 +500,10 @@ def _driftless(channel: Any, order: Any) -> Any:
     n = len(channel)
     order = whole_number("calculus.displacement", "drift", order, 0, "ErrPolynomialOrderNegative")
     weights = windows.blackman(n + 2)[1:-1]  # all above 0
-    return channel - core.velocity(np.linspace(-1, 1, n), channel, order, weights, 0, [], [])[0]
+    t = np.linspace(-1, 1, n)
+    if order > LOW_ORDER:
+        return channel - core.velocity_high(t, channel, order, weights, -1.0, [], [])[0]
+    return channel - core.velocity(t, channel, order, weights, 0, [], [])[0]
 
 
 def displacement(acceleration: ArrayLike, fs: float, drift: int | None = 2, cutoff: float | None = None,

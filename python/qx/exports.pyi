@@ -26,7 +26,7 @@ def Anova1Way_head_2017(y: ArrayLike, labels: ArrayLike, k: int, alpha: float) -
 
 
 def Anova1Way_head_2026(y: ArrayLike, labels: ArrayLike, k: int, alpha: float) -> tuple[float, float, float, float, float, float, float, float]:
-    """As Anova1Way_head_2017, by two passes over the exact differences to one observation, in twice ..."""
+    """As Anova1Way_head_2017, by two passes over the exact differences from one observation, in twice ..."""
 
 
 def Anova2Way_head(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, levelsA: int, levelsB: int, observations: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -78,7 +78,7 @@ def BoundLinearFitBi_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: f
 
 
 def BoundExpFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float]:
-    """y = a exp(b x) + c within bounds, by Levenberg-Marquardt steps: at most 20 of them, and at most ..."""
+    """y = a exp(b x) + c within bounds, by Levenberg-Marquardt steps: at most 20 of them, and no more ..."""
 
 
 def BoundPowerFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float]:
@@ -230,7 +230,7 @@ def CoordConversion_head(from_: int, to: int, first: ArrayLike, second: ArrayLik
 
 
 def DCT_1DH(in_: ArrayLike, size: int) -> NDArray[np.float64]:
-    """Cosine transform, type II, orthonormal, of `size` values: the first ones of the input, zero- ..."""
+    """Cosine transform, type II, orthonormal, of `size` values: the first elements of the input, zero- ..."""
 
 
 def DCT_1DH_IDP(in_: ArrayLike, size: int) -> NDArray[np.float64]:
@@ -294,7 +294,7 @@ def InvDST_2DH_IDP(in_: ArrayLike) -> NDArray[np.float64]:
 
 
 def DecimateCIN(x: ArrayLike, factor: int, average: int) -> NDArray[np.float64]:
-    """Keeps every *factor-th value of x, starting with the first, or with *average the means of ..."""
+    """Keeps every *factor-th value of x, starting with the first, or, if *average is non-zero, the ..."""
 
 
 def CxDecimate_H(x: ArrayLike, factor: int, average: int) -> NDArray[np.complex128]:
@@ -302,7 +302,7 @@ def CxDecimate_H(x: ArrayLike, factor: int, average: int) -> NDArray[np.complex1
 
 
 def DecimateContinuous_H(x: ArrayLike, factor: int, average: int, start: int, reset: int, partialCount: int, partialSum: float) -> tuple[NDArray[np.float64], int, int, float]:
-    """Decimates a stream: x becomes every factor-th sample, after *start samples that are skipped, or ..."""
+    """Decimates a stream: x becomes every factor-th sample, after *start samples that are skipped, or, ..."""
 
 
 def CxDecimateContinuous_H(x: ArrayLike, factor: int, average: int, start: int, reset: int, partialCount: int, partialSum: complex) -> tuple[NDArray[np.complex128], int, int, complex]:
@@ -402,7 +402,7 @@ def ChiSquare2026_head(x: float | ArrayLike, dof: float | ArrayLike, what: int |
 
 
 def InvNdist2026_head(p: float | ArrayLike, tail: int | ArrayLike) -> float | NDArray[Any]:
-    """The point below which, or above which, the standard normal distribution has the probability *p: ..."""
+    """The point below which, or above which, the standard normal distribution has the probability *p, ..."""
 
 
 def InvTdist2026_head(p: float | ArrayLike, tail: int | ArrayLike, dof: float | ArrayLike) -> float | NDArray[Any]:
@@ -434,11 +434,11 @@ def CxDZTH_IDP(in_: ArrayLike, S: int, N: int, start: int, size: int) -> tuple[N
 
 
 def EigenValueVector_head(a: ArrayLike, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """Eigenvalues of the square matrix a and eigenvectors."""
+    """Eigenvalues and eigenvectors of the square matrix a."""
 
 
 def CxEigenValueVector_head(a: ArrayLike, matrixType: int, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
-    """As EigenValueVector_head, for complex elements. Eigenvalues of the square matrix a and eigenvectors."""
+    """As EigenValueVector_head, for complex elements. Eigenvalues and eigenvectors of the square matrix a."""
 
 
 def EigenValueVector2026_head(a: ArrayLike, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
@@ -478,7 +478,7 @@ def Schur2026_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[
 
 
 def create_oxfft_table(length: int) -> Pointer:
-    """Returns the plan for transforms of `length` values, which is built at the first request and then ..."""
+    """Returns the plan for transforms of `length` values, which is built on the first request and then ..."""
 
 
 def destroy_oxfft_table(plan: Pointer | None) -> None:
@@ -634,7 +634,7 @@ def Parks(n: int, fs: float, bands: ArrayLike, type: int, maxIterations: int) ->
 
 
 def FIRNarrowCoef_head(fs: float, fPass: float, fStop: float, fCenter: float, passRipple: float, stopAttenuation: float, type: int, design: Mapping[str, Any]) -> dict[str, Any]:
-    """Designs a filter for a narrow band, whose response stays within passRipple (linear) of 1 and ..."""
+    """Designs a filter for a narrow band, whose response stays within passRipple (linear) of 1 in the ..."""
 
 
 def FIRnarrowFilter_head(x: ArrayLike, design: Mapping[str, Any]) -> NDArray[np.float64]:
@@ -1206,7 +1206,7 @@ def CxQRDecH(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int3
 
 
 def QRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.float64], NDArray[np.float64]]:
-    """As QRDecH, with blocks of reflections if min(m, n) is at least 160: with q in half the time at ..."""
+    """As QRDecH, with blocks of reflections if min(m, n) is at least 160: with q, it takes half the ..."""
 
 
 def CxQRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.complex128], NDArray[np.complex128]]:
@@ -1230,11 +1230,11 @@ def CxSVDEx_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.complex128], N
 
 
 def SVDS_head(a: ArrayLike) -> NDArray[np.float64]:
-    """As SVD_head, the values only: the same to the bit as with the vectors. Singular value ..."""
+    """As SVD_head, for the values only, which are the same, to the bit, as with the vectors. Singular ..."""
 
 
 def CxSVDS_head(a: ArrayLike) -> NDArray[np.float64]:
-    """As SVDS_head, for complex elements. Singular value decomposition a = u diag(s) v^T of the m by n ..."""
+    """As SVDS_head, for complex elements; CxSVDS2026_head scales by itself. Singular value ..."""
 
 
 def SVD2026_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -1246,7 +1246,7 @@ def CxSVD2026_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.complex128],
 
 
 def SVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
-    """As SVD2026_head, the values only: the same to the bit as with the vectors. Singular value ..."""
+    """As SVD2026_head, for the values only, which are the same, to the bit, as with the vectors. ..."""
 
 
 def CxSVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
@@ -1758,7 +1758,7 @@ def CxPolyRoots_head(coef: ArrayLike, maxIterations: int) -> NDArray[np.complex1
 
 
 def PolyRoots2026_head(coef: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64]]:
-    """All roots of a real polynomial, found simultaneously: each as often as its multiplicity, by ..."""
+    """All roots of a real polynomial, found simultaneously: each repeated according to its ..."""
 
 
 def CxPolyRoots2026_head(coef: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64]]:
@@ -2330,7 +2330,7 @@ def CxAutoCorrMtrxH(x: ArrayLike, y: ArrayLike, maxLag: int, normalization: int)
 
 
 def MultipleToneMeasurements(y: ArrayLike, dt: float, count: int, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
-    """Finds up to `count` largest tones of y, with their frequencies, amplitudes and phases."""
+    """Finds the `count` largest tones of y, or fewer, with their frequencies, amplitudes and phases."""
 
 
 def SingleToneMeasurement(y: ArrayLike, dt: float, centre: float, halfWidth: float) -> tuple[float, float, float, float, float]:
@@ -2410,11 +2410,11 @@ def GaussPulseH(x: ArrayLike, n: int, amp: float, delay: float, dt: float, fc: f
 
 
 def GaussMonopulseH(x: ArrayLike, n: int, dt: float, delay: float, fc: float, amp: float) -> NDArray[np.float64]:
-    """As GaussPulseH, the derivative of a Gaussian: 2 amp sqrt(e) u exp(-2 u^2) with u = pi fc t, of ..."""
+    """As GaussPulseH, the derivative of a Gaussian: 2 amp sqrt(e) u exp(-2 u^2) with u = pi fc t, with ..."""
 
 
 def AperiodTriangleH(x: ArrayLike, n: int, amp: float, delay: float, dt: float, width: float, skew: float) -> NDArray[np.float64]:
-    """As GaussPulseH, a single triangle of the given width, with its peak of amp at skew width from ..."""
+    """As GaussPulseH, a single triangle of the given width, with its peak of amp at skew times width ..."""
 
 
 def PeriodicSincH(x: ArrayLike, n: int, amp: float, order: int, dt: float, delay: float) -> NDArray[np.float64]:
@@ -2438,7 +2438,7 @@ def WinConstByNameH(n: int, selector: int, param: float) -> dict[str, Any]:
 
 
 def WinConstByNameH_2016(n: int, selector: int, param: float) -> dict[str, Any]:
-    """As WinConstByNameH, with the parameter as in AllWinH: NaN, for selectors 61 and 62 also a ..."""
+    """As WinConstByNameH, with the parameter as in AllWinH: NaN, or a negative value for selectors 61 ..."""
 
 
 def KaiserH(x: ArrayLike, beta: float) -> NDArray[np.float64]:

@@ -449,7 +449,8 @@ def polynomial(x: ArrayLike, y: ArrayLike, degree: int, sigma: ArrayLike | None 
     x, y : array_like
         The samples.
     degree : int
-        The highest power, up to 25.
+        The highest power, up to 50. From about 20 on, values of the fit can lose half of their digits or more,
+        because large terms cancel.
     sigma : float or array_like, optional
         The standard deviation of each y, up to a factor.
     fixed : dict, optional
@@ -475,8 +476,8 @@ def polynomial(x: ArrayLike, y: ArrayLike, degree: int, sigma: ArrayLike | None 
     1.0
     """
     degree = whole_number("fit.polynomial", "degree", degree, 0, "ErrPolynomialOrderNegative")
-    if degree > 25:
-        refuse("fit.polynomial", "degree", f"must be at most 25; got {degree}", "ErrPolynomialOrderTooHigh")
+    if degree > 50:
+        refuse("fit.polynomial", "degree", f"must be at most 50; got {degree}", "ErrPolynomialOrderTooHigh")
     x, y, w = _samples("polynomial", x, y, sigma)
     names = [f"c{j}" for j in range(degree + 1)]
     given = fixed or {}

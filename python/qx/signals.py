@@ -12,7 +12,7 @@ from typing import Any, Literal
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from .topical import LAST, along, chosen, positive, refuse, served, vector, whole_number
+from .topical import LAST, LOW_ORDER, along, chosen, positive, refuse, served, vector, whole_number
 from .topical.axes import as_array
 
 __all__ = ["arbitrary", "autocorrelate", "chirp", "convolve", "convolve2", "correlate", "correlate2",
@@ -622,7 +622,7 @@ def detrend(x: ArrayLike, type: Literal["linear", "constant"] | int = "linear", 
     x : array_like
         Real values.
     type : {"linear", "constant"} or int
-        What is subtracted; a number is the order of a polynomial, up to 25.
+        What is subtracted; a number is the order of a polynomial, up to 50.
     axis : int
         The axis along which to work.
 
@@ -653,6 +653,8 @@ def detrend(x: ArrayLike, type: Literal["linear", "constant"] | int = "linear", 
         t = np.linspace(-1, 1, len(channel)) if len(channel) > 1 else np.zeros(1)
         if not order:
             return channel - np.mean(channel)
+        if order > LOW_ORDER:
+            return channel - core.detrend_high(t, channel, order, EMPTY, -1.0, [], [])[0]
         return channel - core.detrend(t, channel, order, EMPTY, 0, [], [])[0]
 
     return along(of_channel, x, axis)

@@ -133,6 +133,11 @@ class Signals(unittest.TestCase):
             close(signals.detrend(x, type_), scipy.signal.detrend(x, type=type_), 1e-8, 1e-11)
         cubic = np.polynomial.Polynomial.fit(np.arange(60), x[0], 3)(np.arange(60))
         close(signals.detrend(x[0], 3), x[0] - cubic, 1e-7, 1e-9)
+        t = np.linspace(-1, 1, 200)
+        y = 1e3 + RNG.normal(size=200)
+        for order in (5, 6, 25, 50):  # 25 and 50 are beyond the digits of raw powers
+            fitted = np.polynomial.chebyshev.Chebyshev.fit(t, y, order)(t)
+            close(signals.detrend(y, order), y - fitted, 0, 1e-10)
         close(signals.unwrap(x), np.unwrap(x), 1e-12)
         close(signals.unwrap(x * 3, 5), np.unwrap(x * 3, period=5), 1e-10, 1e-10)
         close(signals.unwrap(x * 90, 360), np.unwrap(x * 90, period=360), 1e-12)

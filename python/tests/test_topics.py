@@ -116,7 +116,7 @@ class Names(unittest.TestCase):
                 self.assertIn(names[0], TOPICS[topic].__all__, f"{export}: {place}")
                 functools.reduce(getattr, names, TOPICS[topic])  # also methods
             if places and export not in SERVED:
-                self.assertIn("(elder, for comparison)", text, export)
+                self.assertIn("(not called, for comparison)", text, export)
 
     def test_topics_call_the_newest_revision(self):
         page, known = (PYTHON.parent / "docs/revisions.md").read_text("utf-8"), set(qx.names())
@@ -124,7 +124,7 @@ class Names(unittest.TestCase):
                  for elder, revision in re.findall(r"(?m)^\| (`[^|]*) \| (`[^|]*) \|", page)]
         self.assertGreaterEqual(len(pairs), 40)
         elders = {elder: revisions for names, revisions in pairs for elder in names if revisions}
-        # Trends over [-1, 1], where the elder revision has all digits and is faster.
+        # Trends of low order over [-1, 1], where the elder has enough digits and is faster: newest.LOW_ORDER.
         scaled = {("signals", "detrend"), ("calculus", "velocity")}
         for topic, keys in newest.NEWEST.items():
             for key, export in keys.items():

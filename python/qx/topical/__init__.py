@@ -23,10 +23,10 @@ How to write one:
 """
 
 from .axes import LAST, along, along_pairs, by_channel, count_of, either, vector
-from .newest import TOPICS, served
+from .newest import LOW_ORDER, TOPICS, served
 from .results import Result as Result, result as result
 from .streams import Stream
 from .words import chosen, positive, procedure, refuse, whole_number
 
-__all__ = ["LAST", "Result", "Stream", "TOPICS", "along", "along_pairs", "by_channel", "chosen", "count_of",
-           "either", "positive", "procedure", "refuse", "result", "served", "vector", "whole_number"]
+__all__ = ["LAST", "LOW_ORDER", "Result", "Stream", "TOPICS", "along", "along_pairs", "by_channel", "chosen",
+           "count_of", "either", "positive", "procedure", "refuse", "result", "served", "vector", "whole_number"]

@@ -15,6 +15,11 @@ from typing import Any, NoReturn
 from ..calls import export, hint
 from ..library import library
 
+# Up to this order, a least-squares polynomial over [-1, 1] by PolyFit81_head differs from that of PolyFit2026_head by
+# 6 eps of the largest value, under a Blackman window by 85, and takes a sixteenth (100000 samples) to six tenths (100
+# samples) of the time. At order 10 it loses two digits, at order 25 eight.
+LOW_ORDER = 5
+
 # In the order in which they are shown.
 TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate", "linalg", "poly", "fit",
           "interpolate", "calculus", "stats", "special", "measure", "coordinates")
@@ -66,7 +71,7 @@ NEWEST = {
         "autocorrelate": "AutoCorrelation80", "deconvolve": "Deconvolution",
         "convolve2": "Convolve_2DH", "convolve2_complex": "CxConvolve_2DH",
         "correlate2": "Correlation_2DH", "correlate2_complex": "CxCorrelation_2DH",
-        "detrend": "PolyFit81_head", "correlation_matrix": "AutoCorrMtrxH",
+        "detrend": "PolyFit81_head", "detrend_high": "PolyFit2026_head", "correlation_matrix": "AutoCorrMtrxH",
         "correlation_matrix_complex": "CxAutoCorrMtrxH",
         "standardize": "Norm1", "rescale": "Scale1DCIN",
     },
@@ -146,7 +151,7 @@ NEWEST = {
         "integrate3": "NumerIntegration3D_2017_head",
         "integrate": "NumerIntegration_2017_head", "integrate2": "NumerIntegration2D_2017_head",
         "cumulative": "Integral_2017", "derivative": "Derivative85",
-        "velocity": "PolyFit81_head",
+        "velocity": "PolyFit81_head", "velocity_high": "PolyFit2026_head",
     },
     "special": {
         "gamma": "QX_Gamma_85", "gammaln": "QX_LnGamma", "gammainc": "QX_Gamma_85",

@@ -86,8 +86,10 @@ def eigenvalues(a):
 
 
 def together(a):
-    """The roots of the revision and their radii."""
-    return attempt(lambda: qx.call("CxPolyRoots2026_head", a))
+    """The roots of the revision for the type of the coefficients, and their radii."""
+    if np.any(a.imag):
+        return attempt(lambda: qx.call("CxPolyRoots2026_head", a))
+    return attempt(lambda: qx.call("PolyRoots2026_head", np.ascontiguousarray(a.real)))
 
 
 def roots_together(a):
@@ -105,7 +107,7 @@ def long_residual(a, roots):
 
 
 def residual_table():
-    yield "| Degree | polynomials | CxPolyRoots: worst residual, above 4 | CxPolyRoots2026 | numpy.roots |"
+    yield "| Degree | polynomials | CxPolyRoots: worst residual, above 4 | PolyRoots2026 | numpy.roots |"
     yield "|---|---|---|---|---|"
     for degree, count in ((10, 2000), (25, 2000), (50, 1000), (100, 200), (200, 50)):
         random = np.random.default_rng(degree)
@@ -126,7 +128,7 @@ def cell(errors, scale=None):
 
 
 def simple_table():
-    yield ("| Polynomial | largest condition | CxPolyRoots | CxPolyRoots2026 | MultPolyRoots, refined | numpy.roots "
+    yield ("| Polynomial | largest condition | CxPolyRoots | PolyRoots2026 | MultPolyRoots, refined | numpy.roots "
            "| the same in units of condition n eps | | | |")
     yield "|---|---|---|---|---|---|---|---|---|---|"
     for name, a, roots, conditions in cases():
@@ -149,7 +151,7 @@ def scatter(found, structure):
 
 
 def structure_table():
-    yield ("| Polynomial | multiplicities found | refined | as found | CxPolyRoots | CxPolyRoots2026 | numpy.roots |")
+    yield ("| Polynomial | multiplicities found | refined | as found | CxPolyRoots | PolyRoots2026 | numpy.roots |")
     yield "|---|---|---|---|---|---|---|"
     for name, structure in STRUCTURES.items():
         a = expanded(structure)
@@ -201,9 +203,10 @@ the companion matrix with LAPACK.
 
 Largest relative errors of a root against mpmath with 80 digits, for coefficients rounded to double. The
 condition number of a root says how far it moves for a relative change of all coefficients; no method
-in plain double precision can be expected to do better. CxPolyRoots2026_head ends with steps in twice the
-precision. The last four columns have the errors, in the same order, in units of each root's own condition
-number times the degree times 2.2e-16.
+in plain double precision can be expected to do better. PolyRoots2026 is PolyRoots2026_head where the
+coefficients are real, otherwise CxPolyRoots2026_head; both end with steps in twice the precision. The
+last four columns have the errors, in the same order, in units of each root's own condition number times
+the degree times 2.2e-16.
 
 {chr(10).join(simple_table())}
 
@@ -219,6 +222,10 @@ Residuals |p(z)| / sum of |a[i]| |z|^i in units of n eps, for normally distribut
 the number of polynomials for which it is above 4 or no roots were found.
 
 {chr(10).join(residual_table())}
+
+Another 100102 polynomials of degree 1 to 200, normal, over 1e-100 to 1e100 and over 1e-5 to 1e5, real and complex, with
+residuals in 113-bit arithmetic (`tools/accuracy/root_bound.cpp`): of 10.0 million roots of the revision the worst has
+0.062 of the bound 4 n eps.
 
 Multiple roots: the largest relative distance of a computed root from the nearest true one.
 
