@@ -1,6 +1,6 @@
 #include "fit/nonlinear.h"
 
-#include "fit/elimination.h"
+#include "fit/sequential_qr.h"
 #include "fit/trust_region_step.h"
 #include "frame/constants.h"
 #include "linalg/matrix.h"
@@ -95,7 +95,7 @@ public:
     // ErrOutOfMemory, ErrNonFiniteInput.
     ErrorCode reduce(const FitState &at, const RealMatrix &r, RealVector z) const {
         const auto write = [&](const RowBlock &block) { writeRows(at, block); };
-        Elimination triangle;
+        SequentialQR triangle;
         if (const ErrorCode failed = triangle.reduce({write, n_, k_, nullptr}))
             return failed;
         for (int32_t i = 0; i < k_; ++i) {
