@@ -12,9 +12,8 @@
 #include <thread>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::PlanReference;
 
 typedef std::complex<long double> Complex;
 
@@ -393,3 +392,4 @@ TEST(Transform, WorkMemoryHasTheSizeThatThePlanStates) {
 }
 
 } // namespace
+} // namespace qx::test

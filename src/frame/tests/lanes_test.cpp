@@ -7,9 +7,8 @@
 #include <cstdlib>
 #include <cstring>
 
+namespace qx::test {
 namespace {
-
-using qx::Lanes;
 
 // Memory at 4 modulo 16, where the host's elements begin.
 struct Offset {
@@ -204,3 +203,4 @@ TEST(Widths, AreTheProcessorsUnlessTheEnvironmentForcesASmallerOne) {
 #endif
 
 } // namespace
+} // namespace qx::test
