@@ -96,7 +96,7 @@ QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCo
     ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not
     finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 times the largest element in
     absolute value).
-    NaN: a refused with ErrNonFiniteInput. */
+    NaN: a refused with ErrNonFiniteInput or in no result. */
 QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
                                     QX_OUT ErrorCode *err);
 /** As InvMatrixTriDri_head, for complex elements. */

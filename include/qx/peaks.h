@@ -58,7 +58,9 @@ QX_API int32_t PeakDetector(QX_IN DBL1D x, QX_IN const double *threshold,
                             QX_IN const int32_t *width, QX_OUT I32_1D indices,
                             QX_OUT int32_t *count, QX_OUT ErrorCode *err);
 
-/** As PeakD2014, with mode 0. */
+/** As PeakD2014, with mode 0. A threshold of NaN gives no peaks, but may leave NaN in the working
+    memory.
+    NaN: request.data, request.threshold in some results or in no result. */
 QX_API ErrorCode PeakD(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *state,
                        QX_INOUT DBL1D *buffer, QX_OUT ErrorCode *err);
 /** As PeakD2014, without a source, so that mode 2 has no data.

@@ -89,8 +89,8 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     ErrMeasureOutOfMemory (no memory for the crossings, at most as many as y has samples; or
     pulseNumber above about 8e7), ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as
     in StateLevels).
-    NaN: y, t0, ref.high in no result; dt refused with ErrMeasureLevelsReversed; ref.low, ref.mid
-    refused with ErrMeasureRangeReversed. */
+    NaN: y in no result; t0, ref.high in some results; dt refused with ErrMeasureLevelsReversed;
+    ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
                              QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
@@ -132,8 +132,8 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
     number above about 3e7), ErrMeasureTooFewPoints (there is no such transition),
     ErrMeasureOutOfRange (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for
     peaks as well).
-    NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid
-    refused with ErrMeasureRangeReversed. */
+    NaN: y in no result; t0 in some results; dt refused with ErrMeasureLevelsReversed; ref.high,
+    ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                            QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,
@@ -166,8 +166,9 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
     StateLevels), ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory
     (no memory for so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound
     (a cycle of no samples), WarnMeasurePartial (as in StateLevels).
-    NaN: y, ref.high in no result; t0 refused with ErrMeasureNotFound; dt refused with
-    ErrMeasureLevelsReversed; ref.low, ref.mid refused with ErrMeasureRangeReversed. */
+    NaN: y in no result; t0 refused with ErrMeasureNotFound; dt refused with
+    ErrMeasureLevelsReversed; ref.high in some results; ref.low, ref.mid refused with
+    ErrMeasureRangeReversed. */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
                                  QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                                  QX_INOUT MeasurementSlot *slot, QX_OUT double *mean,

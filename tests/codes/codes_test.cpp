@@ -128,10 +128,34 @@ class NaNs {
 public:
     explicit NaNs(const Interceptable &target) : target_(target) {}
 
+    // At the largest sizes up to 8 and up to 50: some exports give no result for few samples.
     void look(const Recipe &recipe) {
-        int32_t n = recipe.sizes.front(); // the largest size up to 8
-        for (const int32_t size : recipe.sizes)
-            n = size <= 8 ? std::max(n, size) : n;
+        std::set<int32_t> sizes;
+        for (const int32_t limit : {8, 50}) {
+            int32_t largest = recipe.sizes.front();
+            for (const int32_t size : recipe.sizes)
+                largest = size <= limit ? std::max(largest, size) : largest;
+            sizes.insert(largest);
+        }
+        for (const int32_t size : sizes)
+            look(recipe, size);
+    }
+
+    // An array in a record that is read and written counts as an output if a NaN in it has no
+    // effect.
+    std::map<std::string, std::string> words() const {
+        std::map<std::string, std::string> found;
+        for (const auto &[place, outcomes] : seen_)
+            if (mayBeOutputs_.count(place) == 0 || outcomes != std::set<Outcome>{unseen})
+                found[place] = wordsOf(outcomes);
+        return found;
+    }
+
+private:
+    typedef std::pair<int, std::string> Outcome;
+    static inline const Outcome unseen = {1002, "in no result"};
+
+    void look(const Recipe &recipe, int32_t n) {
         const SpoiltRun as = RunSpoilt(recipe, n, {});
         for (const SpoilPlace &place : as.places) {
             const InterceptedArgument &argument = argumentOf(place);
@@ -151,20 +175,6 @@ public:
             }
         }
     }
-
-    // An array in a record that is read and written counts as an output if a NaN in it has no
-    // effect.
-    std::map<std::string, std::string> words() const {
-        std::map<std::string, std::string> found;
-        for (const auto &[place, outcomes] : seen_)
-            if (mayBeOutputs_.count(place) == 0 || outcomes != std::set<Outcome>{unseen})
-                found[place] = wordsOf(outcomes);
-        return found;
-    }
-
-private:
-    typedef std::pair<int, std::string> Outcome;
-    static inline const Outcome unseen = {1002, "in no result"};
 
     static std::string wordsOf(const std::set<Outcome> &outcomes) {
         std::string words;
