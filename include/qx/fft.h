@@ -108,7 +108,7 @@ QX_API ErrorCode InvReOXFFTH(QX_IN CDB1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot
     are.
     Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something other than a plan),
     ErrOutOfMemory (no memory), the host's status.
-    NaN: in in all results. */
+    NaN: in in all results or in no result. */
 QX_API ErrorCode InvReOXFFTH80(QX_IN CDB1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot,
                                int32_t shift);
 /** As InvReOXFFTH80, with its plan in the host's instance data. */

@@ -38,7 +38,7 @@ QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
     overwritten by L, and the upper triangle is set to 0.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
-    NaN: a refused with ErrNotPositiveDefinite. */
+    NaN: a refused with ErrNotPositiveDefinite or in no result. */
 QX_API int32_t FullCholesky_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As FullCholesky_head, for a Hermitian matrix. */
 QX_API int32_t CxFullCholesky_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -56,7 +56,7 @@ QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT Err
     both are written.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
-    NaN: a refused with ErrNotPositiveDefinite. */
+    NaN: a refused with ErrNotPositiveDefinite or in no result. */
 QX_API int32_t InvMatrixChoDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixChoDri_head, for a Hermitian matrix. */
 QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -65,7 +65,7 @@ QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     is the working memory. It is neither resized nor emptied.
     Codes: ErrSizeMismatch (packedWork is too short), ErrNotSquare (a is not square), ErrEmptyInput
     (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
-    NaN: a refused with ErrNotPositiveDefinite; packedWork in no result. */
+    NaN: a refused with ErrNotPositiveDefinite or in no result; packedWork in no result. */
 QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
                                          QX_OUT ErrorCode *err);
 

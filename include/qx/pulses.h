@@ -89,8 +89,8 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     ErrMeasureOutOfMemory (no memory for the crossings, at most as many as y has samples; or
     pulseNumber above about 8e7), ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as
     in StateLevels).
-    NaN: y in no result; t0, ref.high in some results; dt refused with ErrMeasureLevelsReversed;
-    ref.low, ref.mid refused with ErrMeasureRangeReversed. */
+    NaN: y refused with ErrMeasureSearchShort or in no result; t0, ref.high in some results; dt
+    refused with ErrMeasureLevelsReversed; ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
                              QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
@@ -132,8 +132,8 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
     number above about 3e7), ErrMeasureTooFewPoints (there is no such transition),
     ErrMeasureOutOfRange (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for
     peaks as well).
-    NaN: y in no result; t0 in some results; dt refused with ErrMeasureLevelsReversed; ref.high,
-    ref.low, ref.mid refused with ErrMeasureRangeReversed. */
+    NaN: y refused with ErrMeasureOutOfRange or in no result; t0 in some results; dt refused with
+    ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                            QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,
@@ -166,7 +166,7 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
     StateLevels), ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory
     (no memory for so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound
     (a cycle of no samples), WarnMeasurePartial (as in StateLevels).
-    NaN: y in no result; t0 refused with ErrMeasureNotFound; dt refused with
+    NaN: y in some results or in no result; t0 refused with ErrMeasureNotFound; dt refused with
     ErrMeasureLevelsReversed; ref.high in some results; ref.low, ref.mid refused with
     ErrMeasureRangeReversed. */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
@@ -196,7 +196,7 @@ QX_API ErrorCode CycleRMSAverage_IDP(QX_IN DBL1D y, double t0, double dt, int32_
     riseTime and fallTime. If top - base overflows, amplitude and slewRate are infinite. The
     function result is 0.
     Codes: ErrEmptyInput (y is empty).
-    NaN: y in no result. */
+    NaN: y in some results or in no result. */
 QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double *base,
                                QX_OUT double *amplitude, QX_OUT double *delay, QX_OUT double *width,
                                QX_OUT double *slewRate, QX_OUT double *fallTime,

@@ -121,9 +121,8 @@ TEST_F(Codes, WithoutWitnessAreDocumentedAndNotRaised) {
 
 // ---- NaN ----
 
-// What the calls of an export's recipes do with a NaN as the first, middle or last element of each
-// input array, or in place of a number: the outcomes of each place, in the order in which a header
-// lists them.
+// What the calls of an export's recipes do with a NaN among the elements of each input array, or in
+// place of a number: the outcomes of each place, in the order in which a header lists them.
 class NaNs {
 public:
     explicit NaNs(const Interceptable &target) : target_(target) {}
@@ -166,7 +165,7 @@ private:
             int64_t count = 1;
             for (const int32_t size : place.sizes)
                 count *= size;
-            for (const int64_t at : std::set<int64_t>{0, count / 2, count - 1}) {
+            for (const int64_t at : positions(count)) {
                 const std::string action =
                     place.dimensions == 0 ? "= nan" : "at " + std::to_string(at) + " nan";
                 const SpoiltRun run = RunSpoilt(recipe, n, {{place.name, action}});
@@ -174,6 +173,15 @@ private:
                     seen_[place.name].insert(outcome(as, run));
             }
         }
+    }
+
+    // The first, the middle and the last element, and others evenly between them.
+    static std::set<int64_t> positions(int64_t count) {
+        constexpr int64_t steps = 32;
+        std::set<int64_t> found = {0, count / 2, count - 1};
+        for (int64_t i = 1; i < steps; ++i)
+            found.insert(i * (count - 1) / steps);
+        return found;
     }
 
     static std::string wordsOf(const std::set<Outcome> &outcomes) {
