@@ -167,7 +167,8 @@ QX_API ErrorCode AperiodTriangleH(QX_INOUT DBL1D x, int32_t n, double amp, doubl
                                   double width, double skew);
 
 /** As GaussPulseH, the periodic sinc amp sin(order t/2) / (order sin(t/2)), with its limit where
-    sin(t/2) vanishes: amp, or -amp at odd multiples of 2 pi for an even order.
+    sin(t/2) vanishes: amp, or -amp at odd multiples of 2 pi for an even order. A time of NaN gives
+    amp as well.
     Codes: ErrEmptyInput (x is empty and n is below 1), ErrOutOfMemory (the host refused the
     resize), ErrNotStrictlyPositive (the order is below 1), ErrSamplingNotPositive (dt is not above
     0).

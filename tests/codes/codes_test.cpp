@@ -226,6 +226,14 @@ private:
     std::set<std::string> mayBeOutputs_;
 };
 
+// What a call shows of the effect that a header describes: these words say why no result is NaN.
+std::string SeenOf(std::string words) {
+    for (const std::string reason : {"skipped", "by position (kept)"})
+        if (const std::size_t at = words.find(reason); at != std::string::npos)
+            words.replace(at, reason.size(), "in no result");
+    return words;
+}
+
 // The sentence as it appears in a header, with places of the same outcome joined.
 std::string SentenceOf(const Interceptable &target, std::map<std::string, std::string> words) {
     std::string sentence;
@@ -263,7 +271,7 @@ TEST(NaN, DoesInEachInputWhatItsHeaderSays) {
             nans.look(*recipe);
         std::map<std::string, std::string> told;
         for (const EffectOfNaN &effect : target.nan)
-            told[effect.place] = effect.words;
+            told[effect.place] = SeenOf(effect.words);
         if (nans.words() != told) {
             ADD_FAILURE() << target.name << ": according to its recipes, \""
                           << SentenceOf(target, nans.words()) << "\"";
