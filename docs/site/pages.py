@@ -256,7 +256,7 @@ def standing(entry, served, pairs):
     else:
         text = topics_table.remark(name)
         functions = re.findall(r"\b(?:" + "|".join(TOPICS) + r")\.[\w.]+", text)
-        if text.endswith(f"({topics_table.ELDER})"):
+        if text.endswith(f"({topics_table.NOT_CALLED})"):
             newest = [other for other, names in served.items() if set(names) & set(functions)]
             through = f", through {', '.join(map(link, newest))}" if 0 < len(newest) < 4 else ""
             out.append(f"An older or alternative form, kept for comparison; in Python "
