@@ -163,6 +163,7 @@ class NaN(unittest.TestCase):
     in no result; in in some results. More. */ QX_API void first(double x, double in);
 /** As first, elsewhere. */ QX_API void second(double in, double y, int32_t x);
 /** As first. NaN: y in all results. */ QX_API void third(double y);
+/** Sorts. NaN: x skipped; y in some results or by position (kept). */ QX_API void sort(double x, double y);
 /** Not above 0 or NaN: 1e-10. */ QX_API void fourth(double y);
 """
         with tempfile.TemporaryDirectory() as folder:
@@ -170,7 +171,7 @@ class NaN(unittest.TestCase):
         refused, some = ["refused with ErrEmptyInput", "in no result"], ["in some results"]
         self.assertEqual([e["nan"] for e in exports], [
             {"x": refused, "in.level": refused, "in": some}, {"in.level": refused, "in": some},
-            {"y": ["in all results"]}, {}])
+            {"y": ["in all results"]}, {"x": ["skipped"], "y": ["in some results", "by position (kept)"]}, {}])
 
 
 class Values(unittest.TestCase):

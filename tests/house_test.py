@@ -23,6 +23,13 @@ class House(unittest.TestCase):
         self.assertIn("src/frame/export.h:4", lines_that(r"^#include", SOURCES), "the search works")
         self.assertEqual(lines_that(r"\busing\s+namespace\b", SOURCES), [])
 
+    def test_instruction_sets_are_in_the_headers_of_lanes_only(self):
+        pattern = r"__AVX|__SSE|__ARM_NEON|\b_mm\d*_|__builtin_(ia32|shufflevector|convertvector)|vector_size"
+        sources = [path for path in SOURCES if path.is_relative_to(ROOT / "src")]
+        of_lanes = [path for path in sources if path.match("src/frame/lane*.h")]
+        self.assertTrue(lines_that(pattern, of_lanes), "the search works")
+        self.assertEqual(lines_that(pattern, [path for path in sources if path not in of_lanes]), [])
+
     def test_no_guard_serves_two_headers(self):
         guards = {}
         for path in SOURCES:

@@ -21,10 +21,14 @@ by name, in the order in which they are raised, with the reason in brackets:
 The sentence "NaN:" states the effect of a NaN in each input that can hold one, by arguments and fields
 of records, in these words; tests/codes checks it with the recipes of the export:
 
-    NaN: x, w refused with ErrNonFiniteInput; y in all results; z.level in some results or in no result.
+    NaN: x, w refused with ErrNonFiniteInput; y in all results; z.level in some results or in no result;
+    v skipped; u in some results or by position (kept).
 
-"In all results" means in every number of the outputs that can be NaN. "In no result" applies to inputs
-that are compared, skipped or not read.
+"In all results" means in every number of the outputs that can be NaN. If no result is NaN, the words say
+why: "skipped", the other elements give the result that they give without this one; "by position (kept)",
+the element takes part, every comparison with it fails, and the effect depends on where it stands; "in no
+result", it is not read, or a comparison that fails takes a path on which it is not used, which the text
+describes if it matters.
 
 The values of an argument that selects one of a few choices are listed in a sentence that begins with its
 name and a colon, or in an indented table after such a colon. In a sentence the values ascend, separated
@@ -359,7 +363,7 @@ def raised_by(documentation):
     return items
 
 
-NAN_WORD = re.compile(r"refused with (Err\w+)|in (?:all results|some results|no result)")
+NAN_WORD = re.compile(r"refused with (Err\w+)|in (?:all results|some results|no result)|skipped|by position \(kept\)")
 
 
 def nan_of(documentation):
@@ -369,7 +373,7 @@ def nan_of(documentation):
         return None
     found = {}
     for item in " ".join(match[1].split()).split("; "):
-        parts = re.fullmatch(r"([\w.]+(?:, [\w.]+)*) ((?:refused|in) .+)", item)
+        parts = re.fullmatch(r"([\w.]+(?:, [\w.]+)*) ((?:refused|in|by) .+|skipped\b.*)", item)
         words = parts[2].split(" or ") if parts else []
         if not parts or not all(NAN_WORD.fullmatch(word) for word in words):
             raise ValueError(f"'{item}' under 'NaN:' does not list places with the effect of a NaN there")

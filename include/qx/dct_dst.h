@@ -28,8 +28,7 @@ QX_API ErrorCode DCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
     other than a plan), ErrOutOfMemory (no memory). Every failure empties `out`.
     NaN: in in all results or in some results. */
 QX_API ErrorCode DST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
-/** As DST_1DH, with its plan in the host's instance data.
-    NaN: in in all results. */
+/** As DST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode DST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
                              QX_INOUT InstanceWord *instance);
 
@@ -45,7 +44,7 @@ QX_API ErrorCode InvDCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT Insta
 /** The inverse of DST_1DH: x[j] = 2/(n+1) sum over k of X[k] sin(pi (j+1) (k+1) / (n+1)).
     Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
     other than a plan), ErrOutOfMemory (no memory). Every failure empties `out`.
-    NaN: in in all results. */
+    NaN: in in all results or in some results. */
 QX_API ErrorCode InvDST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 /** As InvDST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode InvDST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);

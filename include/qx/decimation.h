@@ -31,12 +31,12 @@ QX_API ErrorCode CxDecimate_H(QX_INOUT CDB1D x, int32_t factor, int32_t average)
     then the number of samples that it still needs.
     Codes: ErrNotStrictlyPositive (factor is below 1), ErrNegativeSetting (*start is negative),
     ErrOutOfMemory (no memory).
-    NaN: x, partialSum in some results or in no result. */
+    NaN: x in some results or in no result; partialSum in some results. */
 QX_API ErrorCode DecimateContinuous_H(QX_INOUT DBL1D x, int32_t factor, int32_t average,
                                       QX_INOUT int32_t *start, int32_t reset,
                                       QX_INOUT int32_t *partialCount, QX_INOUT double *partialSum);
 /** As DecimateContinuous_H, for complex data.
-    NaN: x, partialSum.im, partialSum.re in some results or in no result. */
+    NaN: x in some results or in no result; partialSum.im, partialSum.re in some results. */
 QX_API ErrorCode CxDecimateContinuous_H(QX_INOUT CDB1D x, int32_t factor, int32_t average,
                                         QX_INOUT int32_t *start, int32_t reset,
                                         QX_INOUT int32_t *partialCount, QX_INOUT CDB *partialSum);
@@ -56,7 +56,7 @@ QX_API ErrorCode InterpolatedFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, int32_t L, doub
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L is below 1),
     ErrMultirateStateSize (state has the wrong size and there is no reset), ErrOutOfMemory (no
     memory).
-    NaN: x, gain, h in some results; state in no result. */
+    NaN: x, gain, h in some results; state in some results or in no result. */
 QX_API ErrorCode InterpolatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32_t L,
                                   QX_IN DBL1D h, QX_INOUT DBL1D state, uint8_t reset,
                                   QX_INOUT int32_t *delay);
@@ -67,7 +67,7 @@ QX_API ErrorCode InterpolatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, in
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (M is below 1),
     ErrMultirateStateSize (state has the wrong size and there is no reset), ErrOutOfMemory (no
     memory).
-    NaN: x in some results; gain, state in no result; h in some results or in no result. */
+    NaN: x in some results; gain in no result; h, state in some results or in no result. */
 QX_API ErrorCode DecimatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32_t M, QX_IN DBL1D h,
                                QX_INOUT DBL1D state, uint8_t reset, int32_t firstPhase,
                                QX_INOUT int32_t *delay);

@@ -93,7 +93,7 @@ QX_API ErrorCode ReOXFFTH80_IDP(QX_IN DBL1D in, QX_OUT CDB1D out, QX_INOUT Insta
     (n-1)/2; for even n out[n/2] = Re X[n/2].
     Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
     other than a plan), ErrOutOfMemory (no memory).
-    NaN: in in some results. */
+    NaN: in in all results or in some results. */
 QX_API ErrorCode ReOXFFTHCH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 /** As ReOXFFTHCH, with its plan in the host's instance data. */
 QX_API ErrorCode ReOXFFTHCH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
@@ -108,7 +108,7 @@ QX_API ErrorCode InvReOXFFTH(QX_IN CDB1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot
     are.
     Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something other than a plan),
     ErrOutOfMemory (no memory), the host's status.
-    NaN: in in all results. */
+    NaN: in in all results or in no result. */
 QX_API ErrorCode InvReOXFFTH80(QX_IN CDB1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot,
                                int32_t shift);
 /** As InvReOXFFTH80, with its plan in the host's instance data. */

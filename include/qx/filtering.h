@@ -52,7 +52,7 @@ QX_API ErrorCode CxIIRReSig_Filter_H(QX_IN DBL1D x, QX_OUT CDB1D y, QX_IN CDB1D 
     is kept from the last call if *keepState is 1 and cleared otherwise.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), ErrOutOfMemory (the host
     refuses the state, or no memory). A failure empties x and the state.
-    NaN: x, a, b in some results; state in no result. */
+    NaN: x, a, b in some results; state in some results or in no result. */
 QX_API ErrorCode IIR_Filter_OneState(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                      QX_INOUT DBL1D state, QX_IN const uint8_t *keepState);
 /** As IIR_Filter_OneState, for a complex signal: its parts run through the same coefficients. */
@@ -66,7 +66,8 @@ QX_API ErrorCode CxSigIIR_Filter_OneState(QX_INOUT CDB1D x, QX_IN DBL1D a, QX_IN
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a; x is
     emptied), ErrInvalidSelector (no such form; x is unchanged), ErrOutOfMemory (the host refuses
     the state), ErrCoefficientSizes (the sizes of a and b do not fit the form; x is emptied).
-    NaN: x, a in all results or in some results; b in some results; state in no result. */
+    NaN: x, a in all results or in some results; b in some results; state in all results or in some
+    results or in no result. */
 QX_API int32_t IIR_Filter2(QX_INOUT DBL1D x, QX_IN const int32_t *form, QX_IN DBL1D a,
                            QX_IN DBL1D b, QX_INOUT DBL1D state, QX_IN const uint8_t *keepState,
                            QX_OUT ErrorCode *err);
@@ -82,11 +83,11 @@ QX_API int32_t CxSigIIR_Filter2(QX_INOUT CDB1D x, QX_IN const int32_t *form, QX_
     Codes: ErrInvalidSelector (no such mode), ErrSizesDisagree (a without b; in a cascade also b
     without a), ErrOutOfMemory (the host refuses the state), ErrCoefficientSizes (the sizes of a
     and b do not fit the cascade). A failure empties the state and leaves 0 in *x.
-    NaN: x in some results; a, b, state in some results or in no result. */
+    NaN: x, b in some results; a, state in some results or in no result. */
 QX_API ErrorCode IIR_Filter_PtbyPt(QX_INOUT DBL *x, int32_t mode, QX_IN DBL1D a, QX_IN DBL1D b,
                                    QX_INOUT DBL1D state, QX_IN const uint8_t *reset);
 /** As IIR_Filter_PtbyPt, for a complex sample: its parts run through the same coefficients.
-    NaN: x.im, x.re in some results; a, b, state in some results or in no result. */
+    NaN: x.im, x.re, b in some results; a, state in some results or in no result. */
 QX_API ErrorCode CxSigIIR_Filter_PtbyPt(QX_INOUT CDB *x, int32_t mode, QX_IN DBL1D a, QX_IN DBL1D b,
                                         QX_INOUT CDB1D state, QX_IN const uint8_t *reset);
 

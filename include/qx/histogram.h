@@ -12,12 +12,12 @@ QX_BEGIN_DECLS
 
 /** Histogram of x over its own range in *bins bins of equal width, with their centres. The maximum
     counts in the last bin; NaN is not counted. The samples of a constant array all count in the
-    last bin, and every centre equals their value. If the host refuses a resize, its status is the
-    function result. Memory and time grow with the number of bins (12 bytes each), however few
-    samples there are.
+    last bin, here with those that are NaN, and every centre equals their value. If the host refuses
+    a resize, its status is the function result. Memory and time grow with the number of bins (12
+    bytes each), however few samples there are.
     Codes: ErrEmptyInput (x is empty or there are no bins), ErrOutOfMemory (the host refused a
     resize).
-    NaN: x in no result. */
+    NaN: x skipped. */
 QX_API int32_t histgran_head(QX_IN DBL1D x, QX_IN const int32_t *bins, QX_OUT I32_1D counts,
                              QX_OUT DBL1D centres, QX_OUT ErrorCode *err);
 
@@ -39,7 +39,8 @@ typedef struct HistSummary {
 } HistSummary;
 
 /** Counts the samples of x in each of the given intervals, which are expected in ascending order. A
-    sample counts in every interval that contains it. After a failure the summary is 0.
+    sample counts in every interval that contains it; NaN is in none and counts as above the last
+    one. After a failure the summary is 0.
     Codes: ErrSizesDisagree (the number of intervals is negative), ErrOutOfMemory (no memory),
     ErrEmptyInput (x is empty).
     NaN: x in no result. */

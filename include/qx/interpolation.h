@@ -47,7 +47,7 @@ QX_API int32_t Spline_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double *fir
     extrapolated.
     Codes: ErrSizeMismatch (the arrays differ in length, or a handle is null), ErrEmptyInput (they
     are empty), ErrAbscissaeOrder (the abscissae around *xi are equal, or there is only one).
-    NaN: y, secondDerivatives in no result; x in all results or in no result; xi in all results. */
+    NaN: y, x, secondDerivatives in all results or in no result; xi in all results. */
 QX_API int32_t SpInterp_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D secondDerivatives,
                              QX_IN const double *xi, QX_OUT double *yi, QX_OUT ErrorCode *err);
 

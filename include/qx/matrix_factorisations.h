@@ -39,7 +39,7 @@ QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
     overwritten by L, and the upper triangle is set to 0.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
-    NaN: a refused with ErrNotPositiveDefinite. */
+    NaN: a refused with ErrNotPositiveDefinite or in no result. */
 QX_API int32_t FullCholesky_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As FullCholesky_head, for a Hermitian matrix. */
 QX_API int32_t CxFullCholesky_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -57,7 +57,7 @@ QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT Err
     both are written.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
-    NaN: a refused with ErrNotPositiveDefinite. */
+    NaN: a refused with ErrNotPositiveDefinite or in no result. */
 QX_API int32_t InvMatrixChoDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixChoDri_head, for a Hermitian matrix. */
 QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -66,7 +66,7 @@ QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     is the working memory. It is neither resized nor emptied.
     Codes: ErrSizeMismatch (packedWork is too short), ErrNotSquare (a is not square), ErrEmptyInput
     (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
-    NaN: a refused with ErrNotPositiveDefinite; packedWork in no result. */
+    NaN: a refused with ErrNotPositiveDefinite or in no result; packedWork in no result. */
 QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
                                          QX_OUT ErrorCode *err);
 
@@ -97,7 +97,7 @@ QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCo
     ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not
     finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 times the largest element in
     absolute value).
-    NaN: a refused with ErrNonFiniteInput. */
+    NaN: a refused with ErrNonFiniteInput or in no result. */
 QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
                                     QX_OUT ErrorCode *err);
 /** As InvMatrixTriDri_head, for complex elements. */

@@ -56,9 +56,10 @@ QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, d
     ErrPolynomialOrderTooHigh (fewer than two values have the sign of the majority),
     ErrNonFiniteInput (a sample is not finite), ErrOutOfMemory (no memory), ErrIterationLimit
     (singular values do not converge).
-    NaN: y in no result; x refused with ErrNonFiniteInput. */
+    NaN: y skipped; x refused with ErrNonFiniteInput. */
 QX_API ErrorCode ExpFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_OUT double *a, QX_OUT double *b);
-/** As ExpFit80_head, for the coefficients only.
+/** As ExpFit80_head, for the coefficients only. If a y is NaN, these are the start values, from the
+    other samples, and no step is made.
     NaN: y, x, tolerance, floor in no result; w refused with ErrNonFiniteInput; guess in some
     results. */
 QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, int32_t method,
@@ -81,7 +82,7 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
 QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
                                QX_OUT double *mse, QX_INOUT int32_t *iterations, double floor);
-/** As PowerFit_head, for the coefficients only.
+/** As PowerFit_head, for the coefficients only; if a y is NaN, as in ExpFitCoef80_head.
     NaN: y, tolerance, floor in no result; x refused with ErrNotStrictlyPositive; w refused with
     ErrNonFiniteInput; guess in some results. */
 QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
@@ -125,8 +126,9 @@ QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL
                                       double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                       QX_OUT double *c, QX_OUT double *s, QX_OUT double *mse,
                                       QX_INOUT int32_t *iterations, double floor);
-/** As GaussianPeakFit_head, for the coefficients only.
-    NaN: y, tolerance, guess, floor in no result; x, w refused with ErrNonFiniteInput. */
+/** As GaussianPeakFit_head, for the coefficients only; if a y is NaN, as in ExpFitCoef80_head.
+    NaN: y refused with ErrFitStartValues or in no result; x, w refused with ErrNonFiniteInput;
+    tolerance, guess, floor in no result. */
 QX_API ErrorCode GaussianPeakFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                           double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                           QX_OUT double *c, QX_OUT double *s,

@@ -23,7 +23,7 @@ QX_API int32_t Median_head(QX_IN DBL1D x, QX_OUT DBL *median, QX_OUT ErrorCode *
     is empty for a single sample and if no value occurs twice. The code is the function result.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory, more than 268435455
     intervals, or the host refused the resize).
-    NaN: x in no result. */
+    NaN: x skipped. */
 QX_API ErrorCode ModeH(QX_IN DBL1D x, int32_t intervals, QX_OUT DBL1D modes);
 
 QX_END_DECLS

@@ -53,12 +53,15 @@ typedef struct PeakDState {
     function result is the code, or the status of the host if it refused a resize.
     Codes: ErrWidthOutOfRange (*width is below 1, or not below the size of x, as for an empty x),
     ErrOutOfMemory (the host refused a resize).
-    NaN: x, threshold in no result. */
+    NaN: x by position (kept); threshold in no result. */
 QX_API int32_t PeakDetector(QX_IN DBL1D x, QX_IN const double *threshold,
                             QX_IN const int32_t *width, QX_OUT I32_1D indices,
                             QX_OUT int32_t *count, QX_OUT ErrorCode *err);
 
-/** As PeakD2014, with mode 0. */
+/** As PeakD2014, with mode 0. A threshold of NaN gives no peaks, but may leave NaN in the working
+    memory.
+    NaN: request.data in some results or by position (kept); request.threshold in some results or in
+    no result. */
 QX_API ErrorCode PeakD(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *state,
                        QX_INOUT DBL1D *buffer, QX_OUT ErrorCode *err);
 /** As PeakD2014, without a source, so that mode 2 has no data.
@@ -90,7 +93,8 @@ QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *
     and the state belongs to another width), ErrWidthOutOfRange (a block of fewer than w samples),
     ErrNoUsableFit (buffer is null), ErrOverflow (2^31 windows in one stream), ErrIterationLimit
     (the matrix that fits the parabolas cannot be computed).
-    NaN: source, request.threshold in no result; request.data in some results or in no result. */
+    NaN: source by position (kept); request.threshold in no result; request.data in some results or
+    by position (kept). */
 QX_API ErrorCode PeakD2014(QX_IN DBL1D source, QX_INOUT PeakDRequest *request,
                            QX_INOUT PeakDState *state, QX_INOUT DBL1D *buffer,
                            QX_OUT ErrorCode *err, int32_t mode);

@@ -61,7 +61,7 @@ typedef void *MeasurementInstanceWord;
     ErrMeasureNotPositive (y is flat (which is allowed with levels by peaks), has only NaN, or spans
     more than the largest double), WarnMeasurePartial (by histogram: the bin of a state holds fewer
     than 5% of the samples; the results are valid).
-    NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed. */
+    NaN: y skipped; t0 in no result; dt refused with ErrMeasureLevelsReversed. */
 QX_API ErrorCode StateLevels(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                              QX_INOUT MeasurementSlot *slot, QX_OUT double *high,
                              QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
@@ -89,8 +89,9 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     ErrMeasureOutOfMemory (no memory for the crossings, at most as many as y has samples; or
     pulseNumber above about 8e7), ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as
     in StateLevels).
-    NaN: y, t0, ref.high in no result; dt refused with ErrMeasureLevelsReversed; ref.low, ref.mid
-    refused with ErrMeasureRangeReversed. */
+    NaN: y refused with ErrMeasureSearchShort or by position (kept); t0, ref.high in some results;
+    dt refused with ErrMeasureLevelsReversed; ref.low, ref.mid refused with
+    ErrMeasureRangeReversed. */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
                              QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
@@ -132,8 +133,9 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
     number above about 3e7), ErrMeasureTooFewPoints (there is no such transition),
     ErrMeasureOutOfRange (the duration is not above 0), WarnMeasurePartial (as in StateLevels, but
     also with levels by peaks).
-    NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid
-    refused with ErrMeasureRangeReversed. */
+    NaN: y refused with ErrMeasureOutOfRange or by position (kept); t0 in some results; dt refused
+    with ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid refused with
+    ErrMeasureRangeReversed. */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                            QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,
@@ -166,8 +168,9 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
     StateLevels), ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory
     (no memory for so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound
     (a cycle without samples), WarnMeasurePartial (as in StateLevels).
-    NaN: y, ref.high in no result; t0 refused with ErrMeasureNotFound; dt refused with
-    ErrMeasureLevelsReversed; ref.low, ref.mid refused with ErrMeasureRangeReversed. */
+    NaN: y in some results or by position (kept); t0 refused with ErrMeasureNotFound; dt refused
+    with ErrMeasureLevelsReversed; ref.high in some results; ref.low, ref.mid refused with
+    ErrMeasureRangeReversed. */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
                                  QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                                  QX_INOUT MeasurementSlot *slot, QX_OUT double *mean,
@@ -195,7 +198,7 @@ QX_API ErrorCode CycleRMSAverage_IDP(QX_IN DBL1D y, double t0, double dt, int32_
     riseTime and fallTime. If top - base overflows, amplitude and slewRate are infinite. The
     function result is 0.
     Codes: ErrEmptyInput (y is empty).
-    NaN: y in no result. */
+    NaN: y in some results or by position (kept). */
 QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double *base,
                                QX_OUT double *amplitude, QX_OUT double *delay, QX_OUT double *width,
                                QX_OUT double *slewRate, QX_OUT double *fallTime,

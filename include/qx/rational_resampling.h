@@ -26,7 +26,7 @@ QX_BEGIN_DECLS
     block may exceed 31 bits), ErrOutOfMemory (the host refuses y), ErrBadTapCount (h is empty or of
     even size), ErrOverflow (state has no room for the remaining samples), ErrOutOfMemory (no
     memory).
-    NaN: x in some results; h in no result; state in some results or in no result. */
+    NaN: x in some results; h, state in some results or in no result. */
 QX_API ErrorCode RationalResample_H(QX_IN DBL1D x, int32_t L, int32_t M, int32_t reset,
                                     QX_INOUT int32_t *offset, QX_IN DBL1D h, QX_INOUT DBL1D state,
                                     QX_INOUT int32_t *stateCount, QX_OUT DBL1D y);

@@ -90,29 +90,29 @@ QX_API ErrorCode CxResample_Const(QX_IN CDB1D x, QX_INOUT CxResampleState *state
     x[0] count as zeros.
     Codes: ErrBufferOverrun (a time is not finite, or oversample is 0), ErrOutOfMemory (no
     memory).
-    NaN: x, design.proto, lastTime in no result; t refused with ErrBufferOverrun or in some
-    results. */
+    NaN: x, design.proto, lastTime in some results or in no result; t refused with ErrBufferOverrun
+    or in some results. */
 QX_API ErrorCode Resample_Variable(QX_IN DBL1D x, QX_INOUT DBL1D t,
                                    QX_IN const VariableDesign *design, QX_INOUT double *lastTime,
                                    QX_OUT int32_t *outCount, QX_OUT int32_t *consumed);
 /** As Resample_Variable, for complex data; times are the real parts of t.
-    NaN: x, design.proto in no result; t refused with ErrBufferOverrun or in some results; lastTime
-    refused with ErrBufferOverrun. */
+    NaN: x, design.proto in some results or in no result; t refused with ErrBufferOverrun or in some
+    results; lastTime refused with ErrBufferOverrun. */
 QX_API ErrorCode CxResample_Variable(QX_IN CDB1D x, QX_INOUT CDB1D t,
                                      QX_IN const VariableDesign *design, QX_INOUT double *lastTime,
                                      QX_OUT int32_t *outCount, QX_OUT int32_t *consumed);
 
 /** As Resample_Variable, for channels in the rows of x. The outputs are in y, a row of *outCount
     values for each channel, and the times in t that were processed remain there.
-    NaN: x, design.proto in no result; t refused with ErrBufferOverrun or in some results; lastTime
-    refused with ErrBufferOverrun. */
+    NaN: x, design.proto in some results or in no result; t refused with ErrBufferOverrun or in some
+    results; lastTime refused with ErrBufferOverrun. */
 QX_API ErrorCode Resample_Variable_MultiCh(QX_IN DBL2D x, QX_OUT DBL2D y, QX_INOUT DBL1D t,
                                            QX_IN const VariableDesign *design,
                                            QX_INOUT double *lastTime, QX_OUT int32_t *outCount,
                                            QX_OUT int32_t *consumed);
 /** As Resample_Variable_MultiCh, for complex data.
-    NaN: x, design.proto, lastTime in no result; t refused with ErrBufferOverrun or in some
-    results. */
+    NaN: x, design.proto, lastTime in some results or in no result; t refused with ErrBufferOverrun
+    or in some results. */
 QX_API ErrorCode CxResample_Variable_MultiCh(QX_IN CDB2D x, QX_OUT CDB2D y, QX_INOUT DBL1D t,
                                              QX_IN const VariableDesign *design,
                                              QX_INOUT double *lastTime, QX_OUT int32_t *outCount,

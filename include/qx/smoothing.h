@@ -45,7 +45,7 @@ QX_API ErrorCode SavitzkyGolayFiltH(QX_IN DBL1D x, int32_t order, int32_t frame,
     too.
     Codes: ErrNegativeCount (*rank is below 0), ErrSizesDisagree (x is not longer than *rank),
     ErrOutOfMemory (no memory).
-    NaN: x in no result. */
+    NaN: x in some results or by position (kept). */
 QX_API int32_t MedianFilterCIN(QX_INOUT DBL1D x, QX_IN const int32_t *rank, QX_OUT ErrorCode *err);
 
 /** Running median in place, of x[i - leftRank] to x[i + rightRank]. The median of an even number of
@@ -53,7 +53,7 @@ QX_API int32_t MedianFilterCIN(QX_INOUT DBL1D x, QX_IN const int32_t *rank, QX_O
     as MedianFilterCIN.
     Codes: ErrNegativeCount (leftRank is below 0), ErrSizesDisagree (x is not longer than
     rightRank), ErrOutOfMemory (no memory).
-    NaN: x in some results or in no result. */
+    NaN: x in some results or by position (kept). */
 QX_API ErrorCode MedianFilter81_H(QX_INOUT DBL1D x, int32_t leftRank, int32_t rightRank);
 
 QX_END_DECLS

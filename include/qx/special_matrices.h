@@ -77,7 +77,7 @@ QX_API ErrorCode CompactToMatrix_H(QX_IN DBL1D packed, QX_OUT DBL2D out);
 /** Packs the lower triangle of a square matrix, as fits expect it.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (the host
     refused the resize, or the packed length exceeds 2^31 - 1).
-    NaN: a in some results. */
+    NaN: a in some results or in no result. */
 QX_API ErrorCode MatrixToCompact_H(QX_IN DBL2D a, QX_OUT DBL1D packed);
 
 /** Transpose.

@@ -24,20 +24,20 @@ QX_BEGIN_DECLS
     w = 2 pi f, each sample clipped to [-|amp|, |amp|]: the recurrence is not stable in amplitude,
     and the error grows with the length of a block, rapidly for w near a multiple of pi.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
-    NaN: amp, phase in all results; f in some results. */
+    NaN: amp, f in some results; phase in all results. */
 QX_API int32_t SineWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                            QX_IN const double *f, QX_INOUT double *phase, QX_OUT ErrorCode *err);
 
 /** Square wave: amp while p is below 3.6 duty, else -amp; duty is in per cent, clamped to 0 to 100.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
-    NaN: amp in all results; f, phase, duty in no result. */
+    NaN: amp, f, phase in some results; duty in no result. */
 QX_API int32_t SquareWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                              QX_IN const double *f, QX_INOUT double *phase,
                              QX_IN const double *duty, QX_OUT ErrorCode *err);
 
 /** Triangle wave: 0 at p = 0, amp at 90, 0 at 180, -amp at 270 degrees.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
-    NaN: amp, f, phase in all results. */
+    NaN: amp in some results; f, phase in all results. */
 QX_API int32_t TriangleWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                                QX_IN const double *f, QX_INOUT double *phase,
                                QX_OUT ErrorCode *err);
@@ -45,7 +45,7 @@ QX_API int32_t TriangleWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN con
 /** Sawtooth wave: amp p / 180 below 180 degrees, from there amp (p / 180 - 2); it jumps from amp to
     -amp at 180.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
-    NaN: amp, f, phase in all results. */
+    NaN: amp in some results; f, phase in all results. */
 QX_API int32_t SawtoothWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                                QX_IN const double *f, QX_INOUT double *phase,
                                QX_OUT ErrorCode *err);
@@ -55,8 +55,8 @@ QX_API int32_t SawtoothWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN con
     the table is a running sum. An empty table gives zeros and the phase 0.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize),
     ErrNonFiniteInput (phase or f is not finite, or the position would overflow).
-    NaN: amp in all results; f, phase refused with ErrNonFiniteInput; table in all results or in
-    some results or in no result. */
+    NaN: amp in some results; f, phase refused with ErrNonFiniteInput; table in some results or in
+    no result. */
 QX_API int32_t ArbitraryWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                                 QX_IN const double *f, QX_INOUT double *phase, QX_IN DBL1D table,
                                 QX_IN const int32_t *interpolate, QX_OUT ErrorCode *err);
@@ -167,7 +167,8 @@ QX_API ErrorCode AperiodTriangleH(QX_INOUT DBL1D x, int32_t n, double amp, doubl
                                   double width, double skew);
 
 /** As GaussPulseH, the periodic sinc amp sin(order t/2) / (order sin(t/2)), with its limit where
-    sin(t/2) vanishes: amp, or -amp at odd multiples of 2 pi for an even order.
+    sin(t/2) vanishes: amp, or -amp at odd multiples of 2 pi for an even order. A time of NaN gives
+    amp as well.
     Codes: ErrEmptyInput (x is empty and n is below 1), ErrOutOfMemory (the host refused the
     resize), ErrNotStrictlyPositive (the order is below 1), ErrSamplingNotPositive (dt is not above
     0).
@@ -181,7 +182,7 @@ QX_API ErrorCode PeriodicSincH(QX_INOUT DBL1D x, int32_t n, double amp, int32_t 
     dt is not finite, gives NaN. *peak is the input of largest magnitude so far, compared by integer
     parts. *phaseOut is *phase dt in degrees plus the last output, which counts as 0 if there are no
     samples. The function result is 0.
-    NaN: dt, fc, phase in all results; peak in no result. */
+    NaN: dt, fc, peak, phase in some results. */
 QX_API int32_t PhasMod(int32_t n, double dt, QX_OUT double *phaseOut, double fc,
                        QX_INOUT QX_LENGTH(n) DBL *y, QX_INOUT double *peak, QX_INOUT double *phase);
 

@@ -12,7 +12,7 @@ QX_BEGIN_DECLS
     0, enbw is infinite, or NaN if all values are 0. It is also infinite or NaN if a sum leaves the
     range of double.
     Codes: ErrEmptyInput (window is empty). Both constants are then NaN.
-    NaN: window in no result. */
+    NaN: window in all results. */
 QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
 /** The constants of a named window of n samples. selector: as SymmWinH. For selectors up to 11 they
     are stored values. For the others they are computed from the whole window, in 8 n bytes of
@@ -22,13 +22,14 @@ QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *consta
     is 0.
     Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
     ErrInvalidSelector (any other selector). Both constants are then NaN.
-    NaN: param in no result. */
+    NaN: param in all results or in no result. */
 QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
                                  QX_OUT WindowConstants *constants);
 /** As WinConstByNameH, with the parameter as in AllWinH: NaN, or a negative value for selectors 61
     and 62, selects the default, and that of selector 61 is in decibels.
     Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
-    ErrInvalidSelector (any other selector). Both constants are then NaN. */
+    ErrInvalidSelector (any other selector). Both constants are then NaN.
+    NaN: param in no result. */
 QX_API ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,
                                       QX_OUT WindowConstants *constants);
 

@@ -164,7 +164,7 @@ QX_API ErrorCode CxAllCosWinH(QX_INOUT CDB1D x, int32_t selector, int32_t scaled
     used as is; that of selector 61 is a linear ratio.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or no plan),
     ErrInvalidSelector (any other selector (unless x has a single sample)).
-    NaN: x in some results; param in no result. */
+    NaN: x in some results; param in all results or in no result. */
 QX_API ErrorCode SymmWinH(QX_INOUT DBL1D x, int32_t selector, double param);
 /** As SymmWinH, for complex samples. */
 QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
@@ -175,7 +175,7 @@ QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
     Codes: ErrNegativeDimension (x has a negative size; `constants` are unchanged), ErrOutOfMemory
     (no scratch memory or no plan), ErrInvalidSelector (any other selector), ErrEmptyInput (x is
     empty and the window is not a cosine sum).
-    NaN: x in some results; param in no result. */
+    NaN: x in some results; param in all results or in no result. */
 QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param,
                             QX_OUT WindowConstants *constants);
 /** As ScaledWinH, for complex samples. */
@@ -206,7 +206,7 @@ QX_API int32_t ExpWindCIN(QX_INOUT DBL1D x, QX_IN const DBL *finalValue, QX_OUT 
 /** As TriangleWinH, with its code in *err; the function result is 0. */
 QX_API int32_t TriangleWin(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 /** As CosTaperedH, with a taper ratio of 0.2 and its code in *err; the function result is 0.
-    NaN: x in some results. */
+    NaN: x in some results or in no result. */
 QX_API int32_t CosTapered(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 
 QX_END_DECLS

@@ -17,8 +17,8 @@ QX_BEGIN_DECLS
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), the host's status (it
     refuses a state), ErrOutOfMemory (no memory). A failure leaves x unchanged; the last two also
     empty all four states.
-    NaN: x, a, b in some results; xStateForward, xStateBackward, yStateForward, yStateBackward in no
-    result. */
+    NaN: x, a, b in some results; xStateForward, xStateBackward, yStateForward, yStateBackward in
+    some results or in no result. */
 QX_API ErrorCode zeroPhaseFiltH(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                 QX_INOUT DBL1D xStateForward, QX_INOUT DBL1D xStateBackward,
                                 QX_INOUT DBL1D yStateForward, QX_INOUT DBL1D yStateBackward,
@@ -29,8 +29,9 @@ QX_API ErrorCode zeroPhaseFiltH(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a), the host's
     status (it refuses a state), ErrInvalidSelector (no such form), ErrCoefficientSizes (the sizes
     of a and b do not fit the form), ErrOutOfMemory (no memory). A failure leaves x unchanged.
-    NaN: x in all results; a in all results or in some results; b in some results; stateForward,
-    stateBackward in no result. */
+    NaN: x in all results; a in all results or in some results; b in some results; stateForward in
+    all results or in some results or in no result; stateBackward in some results or in no
+    result. */
 QX_API ErrorCode zeroPhaseCascadeFiltH(QX_INOUT DBL1D x, QX_IN const int32_t *form, QX_IN DBL1D a,
                                        QX_IN DBL1D b, QX_INOUT DBL1D stateForward,
                                        QX_INOUT DBL1D stateBackward, int32_t keepState);

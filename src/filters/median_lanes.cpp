@@ -1,6 +1,6 @@
 #include "filters/median_filter.h"
 
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 namespace qx::QX_WIDTH {
 
@@ -11,14 +11,9 @@ typedef Lanes<nativeLanes> L;
 // Two vectors of stretches at a time; a single one would wait for its own results.
 constexpr int vectors = 2;
 
-// Returns the second argument if both are equal, so that equal values keep their order.
-QX_INLINE L Smaller(L a, L b) { return L(a.v < b.v ? a.v : b.v); }
-QX_INLINE L Larger(L a, L b) { return L(a.v > b.v ? a.v : b.v); }
-QX_INLINE L FirstIfBelow(L a, L limit, L b) { return L(a.v < limit.v ? a.v : b.v); }
-
 // Removes the first value equal to `leaving` from the sorted window and inserts `entering` after
 // all values that are not above it. If b is the window without the leaving value, rank k becomes
-// the middle one of b[k - 1], b[k] and the entering value.
+// the middle one of b[k - 1], b[k] and the entering value. Equal values keep their order.
 QX_INLINE void Replace(DBL *window, int32_t width, const L (&leaving)[vectors],
                        const L (&entering)[vectors]) {
     L current[vectors], before[vectors];
@@ -30,7 +25,7 @@ QX_INLINE void Replace(DBL *window, int32_t width, const L (&leaving)[vectors],
         DBL *const row = window + std::ptrdiff_t{k} * medianStretches;
         for (int i = 0; i < vectors; ++i) {
             const L next = L::load(row + medianStretches + i * nativeLanes);
-            const L remaining = FirstIfBelow(current[i], leaving[i], next);
+            const L remaining = Select(current[i] < leaving[i], current[i], next);
             Larger(before[i], Smaller(entering[i], remaining)).store(row + i * nativeLanes);
             before[i] = remaining;
             current[i] = next;

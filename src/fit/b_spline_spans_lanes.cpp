@@ -50,11 +50,11 @@ struct Four {
 };
 
 // Samples i to i + 3; after the last sample its x is repeated, with y and weight 0.
-struct Samples {
+struct FourSamples {
     Four x, y;
     double weight[4];
 
-    QX_INLINE Samples(const SpanSamples &s, int32_t i) {
+    QX_INLINE FourSamples(const SpanSamples &s, int32_t i) {
         const int32_t left = s.count - i;
         if (left >= 4) {
             x = Four::load(s.x + i);
@@ -117,7 +117,7 @@ template <int Degree>
 void WriteRows(const SpanSamples &samples, const DBL *knots, double scale, DBL *work) {
     const Basis<Degree> spline(knots);
     for (int32_t i = 0; i < samples.count; i += 4) {
-        const Samples four(samples, i);
+        const FourSamples four(samples, i);
         double roots[4];
         for (int lane = 0; lane < 4; ++lane)
             roots[lane] = __builtin_sqrt(four.weight[lane]) * scale;
@@ -189,7 +189,7 @@ void Evaluate(const SpanSamples &samples, const DBL *knots, const DBL *coefficie
     const Basis<Degree> spline(knots);
     Four sum = Four::load(squares);
     for (int32_t i = 0; i < samples.count; i += 4) {
-        const Samples four(samples, i);
+        const FourSamples four(samples, i);
         Four basis[Degree + 1], value(0.0);
         spline.at(four.x, basis);
         for (int j = 0; j <= Degree; ++j)

@@ -7,16 +7,11 @@
 
 #include <algorithm>
 #include <cmath>
-#include <cstring>
 #include <utility>
 
 namespace qx {
 
 namespace {
-
-void Copy(DBL *to, const DBL *from, std::ptrdiff_t count) {
-    std::memcpy(to, from, sizeof(DBL) * static_cast<std::size_t>(count));
-}
 
 // Central differences; `moved` is p except for the one parameter that moves.
 void NumericGradient(const FitModel &model, double x, RealVector p, RealVector moved,
@@ -78,7 +73,7 @@ void EvalLeastSquares(const FitModel &model, const FitSamples &samples, FitPoint
         return;
     }
     const RealVector d = memory.gradient;
-    Copy(memory.moved.data(), p.data(), count);
+    Copy<ElementType::DBL>(p, memory.moved);
     Fill(a.data(), std::ptrdiff_t{count} * count, 0.0);
     Fill(g.data(), count, 0.0);
     double sum = 0.0;
@@ -98,7 +93,7 @@ void EvalLeastSquares(const FitModel &model, const FitSamples &samples, FitPoint
             g[i] += weighted * r;
         }
         if (!jacobian.isEmpty())
-            Copy(jacobian.row(k), d.data(), count);
+            Copy<ElementType::DBL>(d, {jacobian.row(k), count});
     }
     at.cost = sum / samples.n();
     MirrorLowerTriangle(a);
@@ -157,7 +152,7 @@ public:
     ErrorCode run(const DBL *start, int32_t limit, double tolerance, double *lambda,
                   int32_t *steps) {
         const double startLambda = *lambda;
-        Copy(current_.p.data(), start, count_);
+        Copy<ElementType::DBL>({start, count_}, current_.p);
         project(current_.p);
         *steps = 0;
         if (const ErrorCode failed = evaluate(current_))
@@ -201,7 +196,7 @@ public:
         return 0;
     }
 
-    const DBL *point() const { return current_.p.data(); }
+    ConstRealVector point() const { return current_.p; }
     double cost() const { return current_.cost; }
 
 private:
@@ -274,14 +269,13 @@ private:
 
     // The next point to try; the current point if the equations are not finite.
     ErrorCode propose(double lambda) {
-        const std::ptrdiff_t square = std::ptrdiff_t{count_} * count_;
-        DBL *const a = damped_.a.data(), *const g = damped_.g.data();
-        Copy(a, current_.a.data(), square);
-        Copy(g, current_.g.data(), count_);
+        const RealVector a = damped_.a.elements(), g = damped_.g;
+        Copy<ElementType::DBL>(current_.a.elements(), a);
+        Copy<ElementType::DBL>(current_.g, g);
         for (int32_t i = 0; i < count_; ++i)
             damped_.a(i, i) = damped_.a(i, i) * (1.0 + lambda) + lambda;
-        Copy(trial_.p.data(), current_.p.data(), count_);
-        if (CheckFinite(a, square) != 0 || CheckFinite(g, count_) != 0)
+        Copy<ElementType::DBL>(current_.p, trial_.p);
+        if (CheckFinite(a.data(), a.size()) != 0 || CheckFinite(g.data(), count_) != 0)
             return 0;
         if (const ErrorCode failed = SolveRowScaled(damped_.a, damped_.g, pivots_, damped_.p))
             return failed;
@@ -346,7 +340,7 @@ ErrorCode BoundedLM(const FitModel &model, const FitSamples &samples, int32_t me
         *lambda = 1.0;
     const int32_t limit = std::min(*iterations, mostIterations);
     const ErrorCode status = iteration.run(p, limit, tolerance, lambda, iterations);
-    Copy(p, iteration.point(), model.count);
+    Copy<ElementType::DBL>(iteration.point(), {p, model.count});
     if (status != 0 && status != ErrIterationLimit)
         return status;
     *mse = iteration.cost();

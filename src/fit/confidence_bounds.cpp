@@ -1,6 +1,6 @@
 #include "fit/confidence_bounds.h"
 
-#include "fit/elimination.h"
+#include "fit/sequential_qr.h"
 #include "frame/constants.h"
 #include "frame/extended.h"
 #include "linalg/matrix.h"
@@ -15,7 +15,7 @@ namespace qx {
 namespace {
 
 // A column that depends on those before it leaves a diagonal element of a few eps of its column.
-bool HasFullRank(const Elimination &triangle, int32_t k) {
+bool HasFullRank(const SequentialQR &triangle, int32_t k) {
     const double tolerance = (16.0 + k) * kEpsilon;
     for (int32_t j = 0; j < k; ++j) {
         double largest = 0.0;
@@ -28,7 +28,7 @@ bool HasFullRank(const Elimination &triangle, int32_t k) {
 }
 
 // lengths[i] = the length of row i of R^-1, whose elements solve v R = e_i'. v is work.
-void RowLengthsOfInverse(const Elimination &triangle, RealVector v, RealVector lengths) {
+void RowLengthsOfInverse(const SequentialQR &triangle, RealVector v, RealVector lengths) {
     const auto k = static_cast<int32_t>(v.size());
     for (int32_t i = 0; i < k; ++i) {
         Fill(v.data(), k, 0.0);
@@ -48,7 +48,7 @@ void RowLengthsOfInverse(const Elimination &triangle, RealVector v, RealVector l
 }
 
 // The columns of the block become those of J R^-1, and lengths[i] the length of its row i.
-void RowLengthsThroughTriangle(const Elimination &triangle, int32_t k, const RowBlock &block,
+void RowLengthsThroughTriangle(const SequentialQR &triangle, int32_t k, const RowBlock &block,
                                RealVector lengths) {
     const int32_t count = block.count;
     Fill(lengths.data(), count, 0.0);
@@ -109,7 +109,7 @@ double TwoSidedT(double confidence, double dof) {
 ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what,
                       RealVector halfWidths, RealVector lower, RealVector upper) {
     const int32_t n = model.linear.n, k = model.linear.k;
-    Elimination triangle;
+    SequentialQR triangle;
     if (const ErrorCode failed = triangle.reduce(model.linear))
         return failed;
     if (!HasFullRank(triangle, k))

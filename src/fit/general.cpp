@@ -1,7 +1,7 @@
 #include "fit/general.h"
 
-#include "fit/elimination.h"
 #include "fit/residuals.h"
+#include "fit/sequential_qr.h"
 #include "frame/constants.h"
 #include "frame/scratch.h"
 #include "linalg/factorisations/range.h"
@@ -20,7 +20,7 @@ namespace qx {
 namespace {
 
 // Copies R without the target, row by row.
-void CopyTriangle(const Elimination &triangle, int32_t k, DBL *r) {
+void CopyTriangle(const SequentialQR &triangle, int32_t k, DBL *r) {
     for (int32_t i = 0; i < k; ++i)
         for (int32_t j = 0; j < k; ++j)
             r[std::ptrdiff_t{i} * k + j] = j < i ? 0.0 : triangle.row(i)[j];
@@ -64,7 +64,7 @@ void ScaleTogether(DBL *r, int32_t k, I32 *exponents) {
 
 // H has the singular values and the right vectors of R, and of U only U^T y is needed. If only
 // zeros are left out, the solution and the covariance are the same for scaled columns.
-ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, int32_t method,
+ErrorCode SolveByValues(const LinearModel &model, const SequentialQR &triangle, int32_t method,
                         DBL *c, DBL *covariance) {
     const int32_t k = model.k;
     const std::ptrdiff_t square = std::ptrdiff_t{k} * k;
@@ -107,7 +107,7 @@ ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, i
     return covariance == nullptr ? 0 : TimesTranspose(v, v, k, covariance);
 }
 
-ErrorCode SolveByTriangle(const LinearModel &model, const Elimination &triangle, DBL *c,
+ErrorCode SolveByTriangle(const LinearModel &model, const SequentialQR &triangle, DBL *c,
                           DBL *covariance) {
     const int32_t k = model.k;
     for (int32_t i = 0; i < k; ++i)
@@ -190,7 +190,7 @@ ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL
         return ErrInvalidSelector;
     if (method == byLU || method == byCholesky)
         return SolveByNormalEquations(model, method, c, covariance);
-    Elimination triangle;
+    SequentialQR triangle;
     if (const ErrorCode failed = triangle.reduce(model))
         return failed;
     if (method == bySVD || method == byCutSVD)

@@ -1,5 +1,5 @@
 #include "fit/line.h"
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 namespace qx::QX_WIDTH {
 
@@ -17,7 +17,7 @@ void WeightedLineSums(const DBL *x, const DBL *y, const DBL *w, int32_t n, doubl
     for (; n - i >= nativeLanes; i += nativeLanes) {
         const L weight = L::load(w + i), atX = L::load(x + i), atY = L::load(y + i);
         L terms[4];
-        terms[0] = L(weight.v < L(0.0).v ? -weight.v : weight.v) / L(largest);
+        terms[0] = Select(weight < L(0.0), -weight, weight) / L(largest);
         terms[1] = terms[0] * atX;
         terms[2] = terms[0] * atY;
         terms[3] = terms[1] * atY;

@@ -1,5 +1,5 @@
 #include "fit/model_sums.h"
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 extern "C" double exp(double);
 
@@ -12,26 +12,11 @@ typedef Lanes<1> One;
 
 constexpr int classes = 4; // of samples, whatever the width
 
-template <int N>
-struct LaneBits {
-    typedef int64_t type __attribute__((vector_size(8 * N)));
-};
-template <>
-struct LaneBits<1> {
-    typedef int64_t type;
-};
-
 // 2^k for the k in the last bits of a double that is 1.5 * 2^52 + k, for exponents of normal
 // numbers.
 template <class L>
 QX_INLINE L PowerOfTwo(L shifted) {
-    typename LaneBits<L::count>::type bits;
-    static_assert(sizeof bits == sizeof shifted.v);
-    __builtin_memcpy(&bits, &shifted.v, sizeof bits);
-    bits = (bits + 1023) << 52;
-    L power;
-    __builtin_memcpy(&power.v, &bits, sizeof bits);
-    return power;
+    return OfBits<L>((ToBits(shifted) + 1023) << 52);
 }
 
 // exp(t) as 2^k exp(r) with |r| below 0.35, by Taylor's series, whose remainder is below 5e-18.
@@ -99,7 +84,7 @@ struct Gaussian {
 
 template <class L>
 QX_INLINE L Absolute(L w) {
-    return L(w.v < L(0.0).v ? (-w).v : w.v);
+    return Select(w < L(0.0), -w, w);
 }
 
 template <template <class> class Model, bool IsWeighted, class L>

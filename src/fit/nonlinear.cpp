@@ -1,13 +1,12 @@
 #include "fit/nonlinear.h"
 
-#include "fit/elimination.h"
+#include "fit/sequential_qr.h"
 #include "fit/trust_region_step.h"
 #include "frame/constants.h"
 #include "linalg/matrix.h"
 
 #include <algorithm>
 #include <cmath>
-#include <cstring>
 #include <utility>
 
 namespace qx {
@@ -16,11 +15,6 @@ namespace {
 
 // The relative accuracy of a parameter if a fit reports that it has converged.
 constexpr double claimedDigits = 1e-7;
-
-void Copy(RealVector to, ConstRealVector from) {
-    if (!to.isEmpty())
-        std::memcpy(to.data(), from.data(), sizeof(DBL) * static_cast<std::size_t>(to.size()));
-}
 
 // A point and the values of the model there.
 struct FitState {
@@ -82,7 +76,7 @@ public:
             return fit_.model.jacobian(fit_.model.user, at.p.data(), jacobian_.data()) != 0
                        ? ErrNotAvailable
                        : 0;
-        Copy(moved_, at.p);
+        Copy<ElementType::DBL>(at.p, moved_);
         for (int32_t j = 0; j < k_; ++j) {
             if (const ErrorCode failed = differences(at, j, isFine))
                 return failed;
@@ -95,7 +89,7 @@ public:
     // ErrOutOfMemory, ErrNonFiniteInput.
     ErrorCode reduce(const FitState &at, const RealMatrix &r, RealVector z) const {
         const auto write = [&](const RowBlock &block) { writeRows(at, block); };
-        Elimination triangle;
+        SequentialQR triangle;
         if (const ErrorCode failed = triangle.reduce({write, n_, k_, nullptr}))
             return failed;
         for (int32_t i = 0; i < k_; ++i) {
@@ -419,7 +413,7 @@ private:
 
     // Determines why the iteration has ended, and the covariance.
     ErrorCode finish(NonlinearResult *result) {
-        Copy(result->p, here_.p);
+        Copy<ElementType::DBL>(here_.p, result->p);
         for (std::ptrdiff_t i = 0; i < result->residuals.size(); ++i)
             result->residuals[i] = fit_.y[i] - here_.values[i];
         result->cost = here_.cost;

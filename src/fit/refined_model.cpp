@@ -1,6 +1,6 @@
 #include "fit/refined_model.h"
 
-#include "fit/elimination.h"
+#include "fit/sequential_qr.h"
 #include "linalg/factorisations/svd.h"
 #include "linalg/matrix.h"
 
@@ -157,7 +157,7 @@ struct Values {
     ErrorCode make(const PairModel &model, double tolerance) {
         const int32_t k = model.k;
         const auto writeRows = [&](const RowBlock &block) { model.rows.write({block, nullptr}); };
-        Elimination triangle;
+        SequentialQR triangle;
         if (const ErrorCode failed = triangle.reduce({writeRows, model.n, k, model.w}))
             return failed;
         ScratchParts working;

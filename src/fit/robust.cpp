@@ -1,7 +1,7 @@
 #include "fit/robust.h"
 
-#include "fit/elimination.h"
 #include "fit/general.h"
+#include "fit/sequential_qr.h"
 
 #include <cmath>
 #include <utility>

@@ -30,39 +30,39 @@ void Lower(ConstRealVector y, double by, RealVector out) {
         out[i] = y[i] - by;
 }
 
-constexpr int32_t levels = 10;
+constexpr int32_t levelCount = 10;
 
-struct Levels {
-    I32 counts[levels];
-    DBL centres[levels];
+struct LevelHistogram {
+    I32 counts[levelCount];
+    DBL centres[levelCount];
     double halfWidth;
     double max, min, atMax, atMin; // the extremes of y, and their abscissae
 };
 
-ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
+ErrorCode CountByLevel(const FitSamples &samples, LevelHistogram *found) {
     Extremes range;
     if (const ErrorCode failed = ArrayMaxMin(samples.y, &range))
         return failed;
     if (range.maxIndex < 0) // all are NaN
         return ErrNoUsableFit;
     *found = {};
-    found->halfWidth = 0.5 * ((range.max - range.min) / levels);
+    found->halfWidth = 0.5 * ((range.max - range.min) / levelCount);
     found->max = range.max;
     found->min = range.min;
     found->atMax = samples.x[range.maxIndex];
     found->atMin = samples.x[range.minIndex];
-    return ArrayHistogram(samples.y, range.min, range.max, {found->counts, levels},
-                          {found->centres, levels});
+    return ArrayHistogram(samples.y, range.min, range.max, {found->counts, levelCount},
+                          {found->centres, levelCount});
 }
 
 // The outermost level, from below or from above, that holds more than a tenth of the samples.
-int32_t BaseLevel(const Levels &found, int32_t n, bool fromBelow) {
-    for (int32_t i = 0; i < levels; ++i) {
-        const int32_t level = fromBelow ? i : levels - 1 - i;
-        if (found.counts[level] > n / levels)
+int32_t BaseLevel(const LevelHistogram &found, int32_t n, bool fromBelow) {
+    for (int32_t i = 0; i < levelCount; ++i) {
+        const int32_t level = fromBelow ? i : levelCount - 1 - i;
+        if (found.counts[level] > n / levelCount)
             return level;
     }
-    return fromBelow ? 0 : levels - 1;
+    return fromBelow ? 0 : levelCount - 1;
 }
 
 // Half the longer of the distances, on either side, from the extreme to where the data return to
@@ -87,7 +87,8 @@ struct Candidate {
     DBL p[4];
     DBL mse = -1.0;
 
-    ErrorCode fit(const FitSamples &samples, const Levels &found, bool isPeak, RealVector y) {
+    ErrorCode fit(const FitSamples &samples, const LevelHistogram &found, bool isPeak,
+                  RealVector y) {
         const double level = found.centres[BaseLevel(found, samples.n(), isPeak)];
         const double extremeAt = isPeak ? found.atMax : found.atMin;
         const DBL guess[3] = {(isPeak ? found.max : found.min) - level, extremeAt,
@@ -164,8 +165,8 @@ ErrorCode StartGaussian(const FitSamples &samples, DBL *p) {
     if (const ErrorCode failed = memory.allocate(used.n()))
         return failed;
     const RealVector above(memory.data(), used.n());
-    Levels found;
-    if (const ErrorCode failed = FindLevels(used, &found))
+    LevelHistogram found;
+    if (const ErrorCode failed = CountByLevel(used, &found))
         return failed;
     Candidate peak, dip;
     if (const ErrorCode failed = peak.fit(used, found, true, above))

@@ -4,15 +4,6 @@
 
 namespace qx::QX_WIDTH {
 
-namespace {
-
-template <class L>
-QX_INLINE L Larger(L a, L b) { // b where a is NaN
-    return L(a.v > b.v ? a.v : b.v);
-}
-
-} // namespace
-
 // Several sums of each kind, so that one need not wait for the other.
 void CountWeights(const DBL *w, int32_t n, WeightCounts *counts) {
     typedef Lanes<nativeLanes> L;

@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// Comparisons of lanes, selection by masks, bit operations, and shifts by one lane, for Lanes<2>,
-// Lanes<4> and Lanes<8>.
+// Comparisons of lanes, selection by masks, bit operations, and shifts by one lane. Square roots,
+// the bits of masks, and shifts are not for Lanes<1>.
 
 template <class L>
 using BitsOf = typename LaneInteger<L::count>::type;
@@ -17,11 +17,17 @@ constexpr int64_t laneSign = INT64_MIN;
 
 template <int N>
 QX_INLINE typename LaneInteger<N>::type ToBits(Lanes<N> x) {
-    return (typename LaneInteger<N>::type)x.v;
+    if constexpr (N == 1)
+        return __builtin_bit_cast(int64_t, x.v);
+    else
+        return (typename LaneInteger<N>::type)x.v;
 }
 template <class L>
 QX_INLINE L OfBits(BitsOf<L> bits) {
-    return L((typename L::Vector)bits);
+    if constexpr (L::count == 1)
+        return L(__builtin_bit_cast(double, bits));
+    else
+        return L((typename L::Vector)bits);
 }
 template <int N>
 QX_INLINE Lanes<N> Magnitude(Lanes<N> x) {
@@ -56,26 +62,33 @@ template <class L>
 struct LaneMask {
     BitsOf<L> m; // a lane has all bits set or none
 };
+template <class L, class Comparison>
+QX_INLINE LaneMask<L> MaskOf(Comparison isTrue) {
+    if constexpr (L::count == 1)
+        return {isTrue ? -1 : 0};
+    else
+        return {(BitsOf<L>)isTrue};
+}
 
 template <int N>
 QX_INLINE LaneMask<Lanes<N>> operator<(Lanes<N> a, Lanes<N> b) {
-    return {(BitsOf<Lanes<N>>)(a.v < b.v)};
+    return MaskOf<Lanes<N>>(a.v < b.v);
 }
 template <int N>
 QX_INLINE LaneMask<Lanes<N>> operator<=(Lanes<N> a, Lanes<N> b) {
-    return {(BitsOf<Lanes<N>>)(a.v <= b.v)};
+    return MaskOf<Lanes<N>>(a.v <= b.v);
 }
 template <int N>
 QX_INLINE LaneMask<Lanes<N>> operator==(Lanes<N> a, Lanes<N> b) {
-    return {(BitsOf<Lanes<N>>)(a.v == b.v)};
+    return MaskOf<Lanes<N>>(a.v == b.v);
 }
 template <int N>
 QX_INLINE LaneMask<Lanes<N>> operator>(Lanes<N> a, Lanes<N> b) {
-    return {(BitsOf<Lanes<N>>)(a.v > b.v)};
+    return MaskOf<Lanes<N>>(a.v > b.v);
 }
 template <int N>
 QX_INLINE LaneMask<Lanes<N>> operator>=(Lanes<N> a, Lanes<N> b) {
-    return {(BitsOf<Lanes<N>>)(a.v >= b.v)};
+    return MaskOf<Lanes<N>>(a.v >= b.v);
 }
 template <class L>
 QX_INLINE LaneMask<L> operator&(LaneMask<L> a, LaneMask<L> b) {
@@ -92,6 +105,16 @@ QX_INLINE LaneMask<L> operator!(LaneMask<L> a) {
 template <class L>
 QX_INLINE L Select(LaneMask<L> where, L a, L b) {
     return L(where.m ? a.v : b.v);
+}
+// The larger or the smaller of two values; b if they are equal, zeros of either sign included, or
+// if one is NaN.
+template <int N>
+QX_INLINE Lanes<N> Larger(Lanes<N> a, Lanes<N> b) {
+    return Select(a > b, a, b);
+}
+template <int N>
+QX_INLINE Lanes<N> Smaller(Lanes<N> a, Lanes<N> b) {
+    return Select(a < b, a, b);
 }
 // One bit for each lane, that of lane 0 lowest.
 template <class L>

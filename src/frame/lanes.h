@@ -80,6 +80,10 @@ struct LaneVector<8> {
 template <int N>
 struct LaneInteger;
 template <>
+struct LaneInteger<1> {
+    typedef int64_t type;
+};
+template <>
 struct LaneInteger<2> {
     typedef int64_t type __attribute__((vector_size(16)));
 };
@@ -307,6 +311,11 @@ QX_INLINE Lanes<N> ReversedPairs(Lanes<N> x) {
     else
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 6, 7, 4, 5, 2, 3, 0, 1));
 }
+
+template <int N>
+QX_INLINE Lanes<2> FirstPair(Lanes<N> x) {
+    return Lanes<2>(__builtin_shufflevector(x.v, x.v, 0, 1));
+}
 // One pair, repeated in all pairs.
 template <int N>
 QX_INLINE Lanes<N> InEveryPair(Lanes<2> x) {
@@ -420,6 +429,23 @@ QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
         return Lanes<N>(typename Lanes<N>::Vector{from[0][at], from[1][at], from[2][at],
                                                   from[3][at], from[4][at], from[5][at],
                                                   from[6][at], from[7][at]});
+}
+
+// N 32-bit integers as floating-point numbers.
+template <int N>
+QX_INLINE Lanes<N> OfIntegers(const int32_t *numbers) {
+    typedef int32_t Integers __attribute__((vector_size(4 * N)));
+    typedef int32_t InMemory __attribute__((vector_size(4 * N), aligned(1), may_alias));
+    const Integers all = *reinterpret_cast<const InMemory *>(numbers);
+    return Lanes<N>(__builtin_convertvector(all, typename Lanes<N>::Vector));
+}
+
+// to[i] = from[i] + offset for i below 8.
+QX_INLINE void StoreEightIncreased(const int32_t *from, int32_t offset, int32_t *to) {
+    typedef int32_t Eight __attribute__((vector_size(32)));
+    typedef int32_t InMemory __attribute__((vector_size(32), aligned(1), may_alias));
+    const Eight numbers = *reinterpret_cast<const InMemory *>(from);
+    *reinterpret_cast<InMemory *>(to) = numbers + offset;
 }
 
 // The sign bits of the lanes, lane 0 in the lowest bit.

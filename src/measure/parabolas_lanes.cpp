@@ -182,8 +182,6 @@ constexpr ByteBits byteBits;
 // vector. Without a branch for each bit, which would be hard to predict.
 template <class WordOf>
 QX_INLINE int32_t PlacesOf(const WordOf &wordOf, int32_t count, int32_t *places) {
-    typedef int32_t Places __attribute__((vector_size(32)));
-    typedef int32_t InMemory __attribute__((vector_size(32), aligned(1), may_alias));
     constexpr int few = 4;
     constexpr uint64_t none = uint64_t{1} << (maskWidth - 1); // whose number is never read
     int32_t found = 0;
@@ -201,21 +199,13 @@ QX_INLINE int32_t PlacesOf(const WordOf &wordOf, int32_t count, int32_t *places)
         }
         for (int32_t bit = 0; bit < maskWidth; bit += 8) {
             const auto byte = static_cast<unsigned>(word >> bit & 0xff);
-            const Places numbers = *reinterpret_cast<const InMemory *>(byteBits.numbers[byte]);
-            *reinterpret_cast<InMemory *>(places + found) = numbers + (i * maskWidth + bit);
+            StoreEightIncreased(byteBits.numbers[byte], i * maskWidth + bit, places + found);
             found += __builtin_popcount(byte);
         }
     }
     for (int k = 0; found > 0 && k < nativeLanes; ++k)
         places[found + k] = places[found - 1];
     return found;
-}
-
-QX_INLINE L OfIntegers(const int32_t *numbers) {
-    typedef int32_t InMemory __attribute__((vector_size(4 * nativeLanes), aligned(1), may_alias));
-    typedef int32_t Integers __attribute__((vector_size(4 * nativeLanes)));
-    const Integers all = *reinterpret_cast<const InMemory *>(numbers);
-    return L(__builtin_convertvector(all, L::Vector));
 }
 
 // The vertices of the windows at nativeLanes places.
@@ -236,7 +226,7 @@ struct Vertices {
         return v;
     }
     QX_INLINE L location(const int32_t *places, const VertexLimits &limits) const {
-        return L(limits.position) + OfIntegers(places) + L(limits.centre) + t;
+        return L(limits.position) + OfIntegers<nativeLanes>(places) + L(limits.centre) + t;
     }
     QX_INLINE L amplitude(const VertexLimits &limits) const { return y + L(limits.mean); }
 };

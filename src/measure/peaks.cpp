@@ -20,10 +20,6 @@ constexpr double widestFlat = 1e-8;
 // only one of neighbouring peaks.
 constexpr int32_t slopeWidth = 5;
 
-void Copy(DBL *to, const DBL *from, std::ptrdiff_t count) {
-    std::memcpy(to, from, static_cast<std::size_t>(count) * sizeof(DBL));
-}
-
 // Divides a window by the magnitude of the extreme that is sought, and returns that magnitude.
 double PeakNormalize(DBL *window, int32_t w, bool ofValleys) {
     double extreme = window[0];
@@ -151,7 +147,7 @@ ErrorCode PeakScan::runBySlope(const DBL *x, std::ptrdiff_t windows) {
 template <int32_t W>
 ErrorCode PeakScan::runByVertex(const DBL *x, std::ptrdiff_t windows) {
     DBL fitMatrix[3 * W]; // a local copy, which no store of a result can change
-    Copy(fitMatrix, fitMatrix_, 3 * W);
+    Copy<ElementType::DBL>({fitMatrix_, 3 * W}, {fitMatrix, 3 * W});
     // The first window may use the vertex of the one before the run.
     bool mayTakeFormer = true;
     const std::ptrdiff_t head = std::min<std::ptrdiff_t>(windows, maskWidth);
@@ -235,7 +231,7 @@ ErrorCode PeakScan::runOneByOne(const DBL *fitMatrix, const DBL *x, std::ptrdiff
 
 ErrorCode PeakScan::runScaled(const DBL *x, std::ptrdiff_t windows, DBL *work) {
     for (std::ptrdiff_t i = 0; i < windows; ++i) {
-        Copy(work, x + i, w_);
+        Copy<ElementType::DBL>({x + i, w_}, {work, w_});
         const double scale = PeakNormalize(work, w_, ofValleys_);
         const Parabola now = fit(work, 0);
         const bool isCandidate =
@@ -289,7 +285,7 @@ ErrorCode BeginStream(const PeakBlock &block, PeakDState *state) {
     if (const ErrorCode failed = BuildFitMatrix(state->width, state->fitMatrix))
         return failed;
     const int32_t w = state->width;
-    Copy(state->history, block.data, w);
+    Copy<ElementType::DBL>({block.data, w}, {state->history, w});
     Fill(state->previous, 3, 0.0);
     state->position = 0;
     state->historyCount = w;
@@ -391,7 +387,7 @@ ErrorCode PeakList::beginMarks(const DBL *fitMatrix, int32_t w, const VertexLimi
     if (const ErrorCode failed = marks_.allocate(bytes))
         return failed;
     std::memset(marks_.bytes(), 0, static_cast<std::size_t>(bytes));
-    Copy(fitMatrix_, fitMatrix, 3 * std::ptrdiff_t{w});
+    Copy<ElementType::DBL>({fitMatrix, 3 * std::ptrdiff_t{w}}, {fitMatrix_, 3 * std::ptrdiff_t{w}});
     w_ = w;
     limits_ = limits;
     offset_ = offset;
@@ -461,9 +457,9 @@ void PeakList::copyTo(const DBL *block, DBL *locations, DBL *amplitudes, DBL *de
     for (int32_t i = 0; i < size_; i += chunk) {
         const int32_t count = std::min(chunk, size_ - i);
         const DBL *const from = place(i);
-        Copy(locations + i, from, count);
-        Copy(amplitudes + i, from + chunk, count);
-        Copy(derivatives + i, from + 2 * chunk, count);
+        Copy<ElementType::DBL>({from, count}, {locations + i, count});
+        Copy<ElementType::DBL>({from + chunk, count}, {amplitudes + i, count});
+        Copy<ElementType::DBL>({from + 2 * chunk, count}, {derivatives + i, count});
     }
     if (marked_ > 0)
         StoreVertices(fitMatrix_, w_, block + offset_, static_cast<const char *>(marks_.bytes()),
@@ -510,8 +506,9 @@ ErrorCode PeakDetectStep(const PeakBlock &block, PeakDState *state, PeakList *fo
     // The work window and the history are adjacent in the buffer. With the history copied into the
     // former and new samples in place of the latter, all windows are contiguous.
     DBL *const seam = state->window;
-    Copy(seam, state->history, w);
-    Copy(seam + w, state->incoming, std::min(w, state->tailCount));
+    Copy<ElementType::DBL>({state->history, w}, {seam, w});
+    const int32_t incoming = std::min(w, state->tailCount);
+    Copy<ElementType::DBL>({state->incoming, incoming}, {seam + w, incoming});
     if (state->position == 0)
         state->slopeSign = IsRising(FitWindow(state->fitMatrix, w, seam));
 

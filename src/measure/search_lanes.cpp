@@ -21,10 +21,10 @@ struct Beyond {
     }
 };
 
-template <int Levels>
+template <int LevelCount>
 struct BeyondOrCrossing {
     Beyond beyond;
-    double level[Levels];
+    double level[LevelCount];
 
     static QX_INLINE bool crosses(double here, double next, double level) {
         return (here <= level && next >= level) || (here >= level && next <= level);
@@ -34,14 +34,14 @@ struct BeyondOrCrossing {
     }
     QX_INLINE bool one(int32_t i) const {
         bool found = beyond.one(i);
-        for (int k = 0; k < Levels; ++k)
+        for (int k = 0; k < LevelCount; ++k)
             found |= crosses(beyond.y[i], beyond.y[i + 1], level[k]);
         return found;
     }
     QX_INLINE auto many(int32_t i) const {
         const L here = L::load(beyond.y + i), next = L::load(beyond.y + i + 1);
         auto found = beyond.many(i);
-        for (int k = 0; k < Levels; ++k)
+        for (int k = 0; k < LevelCount; ++k)
             found = found | crosses(here, next, L(level[k]));
         return found;
     }

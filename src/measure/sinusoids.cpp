@@ -89,7 +89,7 @@ double Amplitude(const Line &line) {
 
 double PartOfTurn(double value, double count) {
     const Extended product = ExactProduct(value, count);
-    return product.high - std::nearbyint(product.high) + product.low;
+    return product.high - std::rint(product.high) + product.low;
 }
 
 double PhaseAtStart(const Line &line, int32_t n) {

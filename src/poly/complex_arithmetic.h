@@ -7,7 +7,7 @@
 
 namespace qx {
 
-// The quotient of this family. Like the operator of linalg/scalar.h it avoids premature overflow
+// The quotient of this family. Like the operator of frame/complex.h it avoids premature overflow
 // and underflow, but it forms its denominator in another order.
 inline CDB Quotient(CDB a, CDB b) {
     if (std::fabs(b.re) >= std::fabs(b.im)) {

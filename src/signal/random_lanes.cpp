@@ -1,4 +1,4 @@
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 #include "signal/random.h"
 
 namespace qx::QX_WIDTH {
@@ -67,8 +67,7 @@ __attribute__((always_inline)) inline void Store(const SequenceLanes (&lanes)[3]
         const L v = lanes[0].s[i] * L(lanes[0].weight) + lanes[1].s[i] * L(lanes[1].weight) +
                     lanes[2].s[i] * L(lanes[2].weight);
         const L nearest = (v + L(toInteger)) - L(toInteger);
-        const L below = nearest - L(1.0);
-        const L whole(v.v < nearest.v ? below.v : nearest.v);
+        const L whole = Select(v < nearest, nearest - L(1.0), nearest);
         (v - whole).store(u + i * L::count);
     }
 }

@@ -1,5 +1,4 @@
 #include "frame/lane_masks.h"
-#include "frame/lanes.h"
 #include "signal/waves.h"
 
 namespace qx::QX_WIDTH {
@@ -23,17 +22,13 @@ template <class L>
 __attribute__((always_inline)) inline L Reduced(L x) {
     const L zero(0.0);
     const L turn(360.0);
-    const L opposite = -x;
-    const L magnitude(x.v < zero.v ? opposite.v : x.v);
+    const L magnitude = Select(x < zero, -x, x);
     const L quotient = (magnitude * L(1.0 / 360.0) + L(toInteger)) - L(toInteger);
     const L nearest = magnitude - quotient * turn;
-    const L raised = nearest + turn;
-    const L rest(nearest.v < zero.v ? raised.v : nearest.v);
+    const L rest = Select(nearest < zero, nearest + turn, nearest);
     // fmod gives a zero the sign of x, and a zero is not increased.
-    const L mirrored = turn - rest;
-    const L minusZero(-0.0);
-    const L ofNegative(rest.v == zero.v ? minusZero.v : mirrored.v);
-    return L(x.v < zero.v ? ofNegative.v : rest.v);
+    const L ofNegative = Select(rest == zero, L(-0.0), turn - rest);
+    return Select(x < zero, ofNegative, rest);
 }
 
 template <class L>
@@ -85,27 +80,21 @@ __attribute__((always_inline)) inline void Shaped(const WavePhases &phases, int3
 } // namespace
 
 void SquareSamples(WavePhases phases, int32_t n, double amp, double threshold, DBL *y) {
-    Shaped(phases, n, y, [=]<class L>(L p) {
-        const L high(amp);
-        const L low(-amp);
-        return L(p.v < L(threshold).v ? high.v : low.v);
-    });
+    Shaped(phases, n, y, [=]<class L>(L p) { return Select(p < L(threshold), L(amp), L(-amp)); });
 }
 
 void TriangleSamples(WavePhases phases, int32_t n, double amp, DBL *y) {
     Shaped(phases, n, y, [=]<class L>(L p) {
         const L q = p / L(180.0);
-        const L falling = L(1.0) - q, returning = q - L(2.0);
-        const L early(q.v < L(0.5).v ? q.v : falling.v);
-        return L(amp * 2.0) * L(q.v < L(1.5).v ? early.v : returning.v);
+        const L early = Select(q < L(0.5), q, L(1.0) - q);
+        return L(amp * 2.0) * Select(q < L(1.5), early, q - L(2.0));
     });
 }
 
 void SawtoothSamples(WavePhases phases, int32_t n, double amp, DBL *y) {
     Shaped(phases, n, y, [=]<class L>(L p) {
         const L q = p * L(0.005555555555555556);
-        const L second = q - L(2.0);
-        return L(p.v < L(180.0).v ? q.v : second.v) * L(amp);
+        return Select(p < L(180.0), q, q - L(2.0)) * L(amp);
     });
 }
 

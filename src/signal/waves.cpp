@@ -19,17 +19,17 @@ double PhaseAt(int32_t i, double f, double start) {
     return Raised(std::fmod(i * 360.0 * f + start, 360.0), 360.0);
 }
 
-// `samples` computes the wave from its phases. Phases that are too large for its remainder are
+// `shape` computes the wave from its phases. Phases that are too large for its remainder are
 // computed here.
-template <class Samples>
-void GenShapedWave(double f, double &phase, RealVector y, const Samples &samples) {
+template <class Shape>
+void GenShapedWave(double f, double &phase, RealVector y, const Shape &shape) {
     const int32_t n = Count(y);
     const double reach = std::fabs(phase) + std::fabs(n * 360.0 * f);
     WavePhases phases = {f, phase, !(reach < 0x1p50)};
     if (phases.inPlace)
         for (int32_t i = 0; i < n; ++i)
             y[i] = PhaseAt(i, f, phase);
-    samples(phases, n);
+    shape(phases, n);
     phase = PhaseAt(n, f, phase);
 }
 

@@ -134,8 +134,6 @@ private:
     double restOfBefore_ = 0, restOfValue_ = 0;
 };
 
-} // namespace
-
 double BesselJ0(double x) {
     if (std::isinf(x))
         return 0;
@@ -179,6 +177,8 @@ double BesselY1(double x) {
     const double low = z < kLowTo ? table::y1Low(z) : table::y1Mid(z);
     return x * low + kTwoOverPi * (std::log(x) * BesselJ1(x) - 1 / x);
 }
+
+} // namespace
 
 double BesselJn(double n, double x) {
     if (std::isinf(x))

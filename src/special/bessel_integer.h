@@ -11,12 +11,8 @@ namespace qx {
 // from there on (divided at 24). K: up to 1 with the logarithm split off; from there on rational
 // forms in 1 / x (divided at 5).
 //
-// Near the zeros of J and Y the error is absolute, a few eps of the modulus.
-double BesselJ0(double x);
-double BesselJ1(double x);
-double BesselY0(double x); // -infinity at 0
-double BesselY1(double x);
-
+// Near the zeros of J and Y the error is absolute, a few eps of the modulus. Y is -infinity at 0.
+//
 // Larger orders. J: upward recurrence while n <= x, where it is stable; otherwise downward
 // recurrence from a higher order to the larger of J0 and J1 (Miller's method). Y: upward. The
 // recurrences carry their rounding errors along. From order 200 on both use the expansions for

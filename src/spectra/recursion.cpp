@@ -15,6 +15,8 @@ CDB Less(const CDB &sum, const CDB &a, const CDB &y) {
 
 double Quotient(double value, double a) { return value / a; }
 CDB Quotient(const CDB &value, double a) { return {value.re / a, value.im / a}; }
+// kept: the plain formula, whose square overflows or underflows before the quotient does. The
+// operator of frame/complex.h avoids that, but rounds differently.
 CDB Quotient(const CDB &value, const CDB &a) {
     const double square = a.re * a.re + a.im * a.im;
     return {(value.re * a.re + value.im * a.im) / square,

@@ -49,24 +49,6 @@ inline void Take(const double *place, CDB *value) {
     value->im = place[lanes];
 }
 
-// Transposes a square of values.
-inline void Transpose(L (&v)[lanes]) {
-#ifdef __AVX__
-    const auto low01 = __builtin_shufflevector(v[0].v, v[1].v, 0, 4, 2, 6);
-    const auto high01 = __builtin_shufflevector(v[0].v, v[1].v, 1, 5, 3, 7);
-    const auto low23 = __builtin_shufflevector(v[2].v, v[3].v, 0, 4, 2, 6);
-    const auto high23 = __builtin_shufflevector(v[2].v, v[3].v, 1, 5, 3, 7);
-    v[0] = L(__builtin_shufflevector(low01, low23, 0, 1, 4, 5));
-    v[1] = L(__builtin_shufflevector(high01, high23, 0, 1, 4, 5));
-    v[2] = L(__builtin_shufflevector(low01, low23, 2, 3, 6, 7));
-    v[3] = L(__builtin_shufflevector(high01, high23, 2, 3, 6, 7));
-#else
-    const auto low = __builtin_shufflevector(v[0].v, v[1].v, 0, 2);
-    v[1] = L(__builtin_shufflevector(v[0].v, v[1].v, 1, 3));
-    v[0] = L(low);
-#endif
-}
-
 // The values i .. i + lanes - 1 of a sequence with step 1 or -1.
 inline L LoadSome(const DBL *at, std::ptrdiff_t step, std::ptrdiff_t i) {
     return step == 1 ? L::load(at + i) : L::load(at - i - (lanes - 1)).reversed();

@@ -9,7 +9,6 @@ namespace {
 
 // base^exponent by repeated squaring, exponent at least 1. The order of the products is part of the
 // result.
-// result.
 double Power(double base, int32_t exponent) {
     while (exponent % 2 == 0) {
         base *= base;

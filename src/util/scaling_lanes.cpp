@@ -1,4 +1,4 @@
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 #include "util/scaling.h"
 
 #include <cmath>
@@ -60,13 +60,13 @@ QX_INLINE double Reduced(const DBL *x, int32_t n, double start, Take take) {
 struct Highest {
     template <class V>
     QX_INLINE V operator()(V held, V x) const {
-        return V(x.v > held.v ? x.v : held.v);
+        return Larger(x, held);
     }
 };
 struct Lowest {
     template <class V>
     QX_INLINE V operator()(V held, V x) const {
-        return V(x.v < held.v ? x.v : held.v);
+        return Smaller(x, held);
     }
 };
 struct HighestMagnitude {
@@ -141,10 +141,10 @@ void Unwrap(DBL *x, int32_t n, double period) {
             unwrapped.store(before + 1);
             const L rule = (given - L::load(before)) / L(period) + L(0.5);
             const L next = L(turns) + ones;
-            const auto holds = (rule.v >= L(turns).v) & (rule.v < next.v);
+            const auto holds = (rule >= L(turns)) & (rule < next);
             bool all = true;
             for (int lane = 0; lane < L::count; ++lane)
-                all = all && holds[lane] != 0;
+                all = all && holds.m[lane] != 0;
             if (all) {
                 unwrapped.store(x + i);
                 i += L::count;

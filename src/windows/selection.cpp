@@ -175,10 +175,10 @@ ErrorCode ApplyWindowBySelector(VectorView<E> x, int32_t selector, double param,
     }
 }
 
-#define QX_INSTANTIATE(Samples)                                                                    \
-    template ErrorCode ApplySymmetricWindow(int32_t, Samples, double);                             \
-    template ErrorCode ApplyScaledWindow(Samples, int32_t, double, WindowConstants *);             \
-    template ErrorCode ApplyWindowBySelector(Samples, int32_t, double, bool, bool);
+#define QX_INSTANTIATE(View)                                                                       \
+    template ErrorCode ApplySymmetricWindow(int32_t, View, double);                                \
+    template ErrorCode ApplyScaledWindow(View, int32_t, double, WindowConstants *);                \
+    template ErrorCode ApplyWindowBySelector(View, int32_t, double, bool, bool);
 
 QX_INSTANTIATE(RealVector)
 QX_INSTANTIATE(ComplexVector)

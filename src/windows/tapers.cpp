@@ -258,17 +258,17 @@ ErrorCode ApplyCosTaperedWindow(VectorView<E> x, double taperRatio) {
     return 0;
 }
 
-#define QX_INSTANTIATE(Samples)                                                                    \
-    template ErrorCode ApplyTriangleWindow(Samples);                                               \
-    template ErrorCode ApplyWelchWindow(Samples);                                                  \
-    template ErrorCode ApplyBartHannWindow(Samples);                                               \
-    template ErrorCode ApplyParzenWindow(Samples);                                                 \
-    template ErrorCode ApplyBohmanWindow(Samples);                                                 \
-    template ErrorCode ApplyKaiserWindow(Samples, double);                                         \
-    template ErrorCode ApplyGaussWindow(Samples, double, bool);                                    \
-    template ErrorCode ApplyForceWindow(Samples, double);                                          \
-    template ErrorCode ApplyExpWindow(Samples, double);                                            \
-    template ErrorCode ApplyCosTaperedWindow(Samples, double);
+#define QX_INSTANTIATE(View)                                                                       \
+    template ErrorCode ApplyTriangleWindow(View);                                                  \
+    template ErrorCode ApplyWelchWindow(View);                                                     \
+    template ErrorCode ApplyBartHannWindow(View);                                                  \
+    template ErrorCode ApplyParzenWindow(View);                                                    \
+    template ErrorCode ApplyBohmanWindow(View);                                                    \
+    template ErrorCode ApplyKaiserWindow(View, double);                                            \
+    template ErrorCode ApplyGaussWindow(View, double, bool);                                       \
+    template ErrorCode ApplyForceWindow(View, double);                                             \
+    template ErrorCode ApplyExpWindow(View, double);                                               \
+    template ErrorCode ApplyCosTaperedWindow(View, double);
 
 QX_INSTANTIATE(RealVector)
 QX_INSTANTIATE(ComplexVector)

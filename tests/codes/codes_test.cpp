@@ -121,35 +121,23 @@ TEST_F(Codes, WithoutWitnessAreDocumentedAndNotRaised) {
 
 // ---- NaN ----
 
-// What the calls of an export's recipes do with a NaN as the first, middle or last element of each
-// input array, or in place of a number: the outcomes of each place, in the order in which a header
-// lists them.
+// What the calls of an export's recipes do with a NaN among the elements of each input array, or in
+// place of a number: the outcomes of each place, in the order in which a header lists them.
 class NaNs {
 public:
     explicit NaNs(const Interceptable &target) : target_(target) {}
 
+    // At the largest sizes up to 8 and up to 50: some exports give no result for few samples.
     void look(const Recipe &recipe) {
-        int32_t n = recipe.sizes.front(); // the largest size up to 8
-        for (const int32_t size : recipe.sizes)
-            n = size <= 8 ? std::max(n, size) : n;
-        const SpoiltRun as = RunSpoilt(recipe, n, {});
-        for (const SpoilPlace &place : as.places) {
-            const InterceptedArgument &argument = argumentOf(place);
-            if (argument.isOutput || !mayBeNaN(place))
-                continue;
-            if (!argument.isInput && place.dimensions > 0 && isField(place))
-                mayBeOutputs_.insert(place.name);
-            int64_t count = 1;
-            for (const int32_t size : place.sizes)
-                count *= size;
-            for (const int64_t at : std::set<int64_t>{0, count / 2, count - 1}) {
-                const std::string action =
-                    place.dimensions == 0 ? "= nan" : "at " + std::to_string(at) + " nan";
-                const SpoiltRun run = RunSpoilt(recipe, n, {{place.name, action}});
-                if (run.applied)
-                    seen_[place.name].insert(outcome(as, run));
-            }
+        std::set<int32_t> sizes;
+        for (const int32_t limit : {8, 50}) {
+            int32_t largest = recipe.sizes.front();
+            for (const int32_t size : recipe.sizes)
+                largest = size <= limit ? std::max(largest, size) : largest;
+            sizes.insert(largest);
         }
+        for (const int32_t size : sizes)
+            look(recipe, size);
     }
 
     // An array in a record that is read and written counts as an output if a NaN in it has no
@@ -165,6 +153,36 @@ public:
 private:
     typedef std::pair<int, std::string> Outcome;
     static inline const Outcome unseen = {1002, "in no result"};
+
+    void look(const Recipe &recipe, int32_t n) {
+        const SpoiltRun as = RunSpoilt(recipe, n, {});
+        for (const SpoilPlace &place : as.places) {
+            const InterceptedArgument &argument = argumentOf(place);
+            if (argument.isOutput || !mayBeNaN(place))
+                continue;
+            if (!argument.isInput && place.dimensions > 0 && isField(place))
+                mayBeOutputs_.insert(place.name);
+            int64_t count = 1;
+            for (const int32_t size : place.sizes)
+                count *= size;
+            for (const int64_t at : positions(count)) {
+                const std::string action =
+                    place.dimensions == 0 ? "= nan" : "at " + std::to_string(at) + " nan";
+                const SpoiltRun run = RunSpoilt(recipe, n, {{place.name, action}});
+                if (run.applied)
+                    seen_[place.name].insert(outcome(as, run));
+            }
+        }
+    }
+
+    // The first, the middle and the last element, and others evenly between them.
+    static std::set<int64_t> positions(int64_t count) {
+        constexpr int64_t steps = 32;
+        std::set<int64_t> found = {0, count / 2, count - 1};
+        for (int64_t i = 1; i < steps; ++i)
+            found.insert(i * (count - 1) / steps);
+        return found;
+    }
 
     static std::string wordsOf(const std::set<Outcome> &outcomes) {
         std::string words;
@@ -208,6 +226,14 @@ private:
     std::set<std::string> mayBeOutputs_;
 };
 
+// What a call shows of the effect that a header describes: these words say why no result is NaN.
+std::string SeenOf(std::string words) {
+    for (const std::string reason : {"skipped", "by position (kept)"})
+        if (const std::size_t at = words.find(reason); at != std::string::npos)
+            words.replace(at, reason.size(), "in no result");
+    return words;
+}
+
 // The sentence as it appears in a header, with places of the same outcome joined.
 std::string SentenceOf(const Interceptable &target, std::map<std::string, std::string> words) {
     std::string sentence;
@@ -245,7 +271,7 @@ TEST(NaN, DoesInEachInputWhatItsHeaderSays) {
             nans.look(*recipe);
         std::map<std::string, std::string> told;
         for (const EffectOfNaN &effect : target.nan)
-            told[effect.place] = effect.words;
+            told[effect.place] = SeenOf(effect.words);
         if (nans.words() != told) {
             ADD_FAILURE() << target.name << ": according to its recipes, \""
                           << SentenceOf(target, nans.words()) << "\"";

@@ -324,8 +324,11 @@ std::vector<OutputValue> Call::outputs() const {
         add("complex scalar ", number, "CDB", &value, sizeof value);
     for (const auto &[number, value] : integers_)
         add("integer ", number, "I32", &value, sizeof value);
-    for (const auto &[number, bytes] : records_)
-        add("record ", number, "", bytes.data(), bytes.size());
+    for (const auto &[number, bytes] : records_) {
+        const auto element = elementOfRecord_.find(number);
+        add("record ", number, element == elementOfRecord_.end() ? "" : element->second,
+            bytes.data(), bytes.size());
+    }
     return found;
 }
 

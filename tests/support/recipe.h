@@ -1,6 +1,7 @@
 #ifndef QX_TESTS_RECIPE_H
 #define QX_TESTS_RECIPE_H
 
+#include "qx/windows.h"
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 
@@ -10,6 +11,7 @@
 #include <memory>
 #include <ostream>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 // A recipe is one line per export that calls it with valid arguments. From the recipes, the
@@ -176,6 +178,10 @@ public:
     template <class Record>
     Record *record(int number) {
         const HeapProbe::Pause pause;
+        if constexpr (std::is_same_v<Record, double> || std::is_same_v<Record, WindowConstants>)
+            elementOfRecord_[number] = "DBL";
+        else if constexpr (std::is_same_v<Record, ::CDB>)
+            elementOfRecord_[number] = "CDB";
         auto &bytes = records_[number];
         bytes.assign(sizeof(Record), 0);
         return reinterpret_cast<Record *>(bytes.data());
@@ -315,6 +321,7 @@ private:
     std::map<int, CDB> complexScalars_;
     std::map<int, int32_t> integers_;
     std::map<int, std::vector<unsigned char>> records_, recordsWithHandles_;
+    std::map<int, const char *> elementOfRecord_; // of records of nothing else
     NodeWords own_, *node_ = &own_;
     void *preset_ = nullptr;
     std::vector<std::unique_ptr<int32_t>> int32Values_;

@@ -151,6 +151,15 @@ def dawson(x):
     return sqrt(pi) / 2 * mpmath.exp(-x * x) * mpmath.erfi(x)
 
 
+def limit(name):
+    """F(phi, 1)."""
+    return Function(name, "ddoi", lambda m, phi, *a: mpmath.atanh(mpmath.sin(phi)),
+                    [("m = 1, phi in [1e-20, 0.78]", [(1.0, x, 0) for x in logarithmic(1e-20, 0.78)]),
+                     ("m = 1, phi in [0.78, 1.57079632]", [(1.0, x, 0) for x in linear(0.78, 1.57079632)])],
+                    {"GSL": lambda m, phi, *a: square_root(from_gsl("gsl_sf_ellint_F", "ddm"))(phi, m),
+                     "SciPy": lambda m, phi, *a: from_scipy("ellipkinc")(phi, m)}, title=f"{name}, m = 1")
+
+
 FUNCTIONS = [
     airy(0, "Ai", lambda x: mpmath.airyai(x), -0.25, "gsl_sf_airy_Ai", 0),
     airy(1, "Ai'", lambda x: mpmath.airyai(x, derivative=1), 0.25, "gsl_sf_airy_Ai_deriv", 1),
@@ -206,11 +215,7 @@ FUNCTIONS = [
              {"GSL": swapped(square_root(from_gsl("gsl_sf_ellint_F", "ddm"))),
               "C++": swapped(from_std("std_ellint_f", "dd")), "SciPy": swapped(from_scipy("ellipkinc"))},
              title="QX_Elliptic1, incomplete"),
-    Function("QX_Elliptic1_2026", "ddoi", lambda m, phi, *a: mpmath.atanh(mpmath.sin(phi)),
-             [("m = 1, phi in [1e-20, 0.78]", [(1.0, x, 0) for x in logarithmic(1e-20, 0.78)]),
-              ("m = 1, phi in [0.78, 1.57079632]", [(1.0, x, 0) for x in linear(0.78, 1.57079632)])],
-             {"GSL": lambda m, phi, *a: square_root(from_gsl("gsl_sf_ellint_F", "ddm"))(phi, m),
-              "SciPy": lambda m, phi, *a: from_scipy("ellipkinc")(phi, m)}, title="QX_Elliptic1_2026, m = 1"),
+    limit("QX_Elliptic1_85"), limit("QX_Elliptic1_2026"),
     Function("QX_Elliptic2_85", "ddoi", lambda m, *a: mpmath.ellipe(m),
              [(t, [(m, 0.0, 1) for m, in p]) for t, p in COMPLETE],
              {"GSL": lambda m, *a: square_root(from_gsl("gsl_sf_ellint_Ecomp", "dm"))(m),

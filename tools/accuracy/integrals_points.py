@@ -1,6 +1,8 @@
 """The points at which the error function, the exponential, sine, cosine and hyperbolic integrals and the
 dilogarithm are measured."""
 
+import functools
+
 import mpmath
 from mpmath import mpf
 
@@ -14,6 +16,7 @@ def rows(*intervals):
     return [(name, single(points)) for name, points in intervals]
 
 
+@functools.cache
 def exponential(x, n):
     """E_n(x) by the continued fraction; mpmath's own function silently loses digits at large n and x."""
     if x <= 1 or n == 0:
@@ -57,6 +60,10 @@ EXPONENTIAL_2026 = [
     (f"n = 1, {name}", [(x, 1) for x in points])
     for name, points in (("[1e-300, 0.4]", logarithmic(1e-300, 0.4)), ("[0.4, 2]", linear(0.4, 2) + around(0.4)),
                          ("[2, 10]", linear(2, 10) + around(2.0)), ("[10, 700]", linear(10, 700) + around(10.0)))]
+# GSL needs seconds for each value of an order of 1e9; the same points serve two functions.
+EXPONENTIAL_PEERS = {"GSL": functools.cache(lambda x, n: from_gsl("gsl_sf_expint_En", "id")(n, x)),
+                     "C++": expint_of_one(from_std("std_expint", "d")),
+                     "SciPy": lambda x, n: from_scipy("expn")(n, x)}
 COSINE = rows(TINY, ("[0, 4]", linear(0.001, 4) + around(4.0) + [0.6165054856207162, 3.384180422551187]),
               ("[4, 8]", linear(4, 8) + around(8.0)), ("[8, 1e6]", logarithmic(8, 1e6)),
               ("[1e6, 1e20]", logarithmic(1e6, 1e20)))
@@ -72,12 +79,8 @@ FUNCTIONS = [
              {"GSL": from_gsl("gsl_sf_erf", "d"), "C++": from_std("std_erf", "d"), "SciPy": from_scipy("erf")}),
     Function("QX_ErfC", "do", mpmath.erfc, ERFC,
              {"GSL": from_gsl("gsl_sf_erfc", "d"), "C++": from_std("std_erfc", "d"), "SciPy": from_scipy("erfc")}),
-    Function("QX_ExpI", "dio", exponential, EXPONENTIAL,
-             {"GSL": lambda x, n: from_gsl("gsl_sf_expint_En", "id")(n, x),
-              "C++": expint_of_one(from_std("std_expint", "d")), "SciPy": lambda x, n: from_scipy("expn")(n, x)}),
-    Function("QX_ExpI_2026", "dio", exponential, EXPONENTIAL_2026,
-             {"GSL": lambda x, n: from_gsl("gsl_sf_expint_En", "id")(n, x),
-              "C++": expint_of_one(from_std("std_expint", "d")), "SciPy": lambda x, n: from_scipy("expn")(n, x)}),
+    Function("QX_ExpI", "dio", exponential, EXPONENTIAL + EXPONENTIAL_2026, EXPONENTIAL_PEERS),
+    Function("QX_ExpI_2026", "dio", exponential, EXPONENTIAL + EXPONENTIAL_2026, EXPONENTIAL_PEERS),
     Function("QX_SinI", "do", mpmath.si, SINE,
              {"GSL": from_gsl("gsl_sf_Si", "d"), "SciPy": from_scipy("sici", 0)}),
     Function("QX_CosI", "do", cosine, COSINE,

@@ -5,6 +5,7 @@ with elements of all magnitudes.
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/matrix_revisions.py
 """
 
+import itertools
 import warnings
 from pathlib import Path
 
@@ -150,8 +151,8 @@ def solution_table():
 def exponential_table():
     """Errors relative to the largest element, against mpmath with 50 digits."""
     lines = ["| Matrix | elder | revision | scipy.linalg.expm |", "|---|---|---|---|"]
-    kinds = {f"random, {scale:g}": [scale * random.standard_normal((n, n)) for n in (2, 3, 5, 8) for _ in range(6)]
-             for scale in (1e-3, 0.1, 1.0, 5.0, 20.0)}
+    kinds = {f"random {kind}, {scale:g}": [scale * noise(n, n, kind) for n in (2, 3, 5, 8) for _ in range(6)]
+             for kind in ("real", "complex") for scale in (1e-3, 0.1, 1.0, 5.0, 20.0)}
     kinds |= {f"rotation by {angle:g}": [np.array([[0.0, -angle], [angle, 0.0]])] for angle in (0.9, 10.0, 1000.0)}
     kinds |= {f"1, {large:g}; 0, -1": [np.array([[1.0, large], [0.0, -1.0]])] for large in (1e6, 1e15, 1e100)}
     for name, matrices in kinds.items():
@@ -235,30 +236,30 @@ def error_of(method, a, exact, size):
 
 def power_table():
     """Errors of the cube of the inverse, in units of n eps times the condition number, which is 1000."""
-    lines = ["| Elements | elder | revision | numpy.linalg.matrix_power |", "|---|---|---|---|"]
-    for exponent in (-80, -30, -12, -8, 0, 80):
+    lines = ["| Elements | matrix | elder | revision | numpy.linalg.matrix_power |", "|---|---|---|---|---|"]
+    for exponent, kind in itertools.product((-80, -30, -12, -8, 0, 80), ("real", "complex")):
         worst_of = [0.0, 0.0, 0.0]
         for n in (2, 5, 10):
-            a = conditioned(n, "real", 1000.0) * 10.0**exponent
+            a = conditioned(n, kind, 1000.0) * 10.0**exponent
             with mpmath.workdps(60):
                 exact = mpmath.matrix(a.tolist())**-3
                 size = max(abs(x) for x in exact)
-                exact = np.array((exact / size).tolist(), dtype=float)
+                exact = np.array((exact / size).tolist(), dtype=a.dtype)
             found = (call("MatrixPower_head", a, -3), call("MatrixPower2026_head", a, -3),
                      np.linalg.matrix_power(a, -3))
             for k, power in enumerate(found):
                 error = float(np.abs(power / float(size) - exact).max() / (EPS * n * 1000))
                 worst_of[k] = max(worst_of[k], error if np.isfinite(error) else np.inf)
-        lines.append(f"| 1e{exponent} | " + " | ".join(f"{x:.2g}" for x in worst_of) + " |")
+        lines.append(f"| 1e{exponent} | {kind} | " + " | ".join(f"{x:.2g}" for x in worst_of) + " |")
         print(lines[-1], flush=True)
     return lines
 
 
 def properties_table():
-    """Worst relative errors of 2-norms and condition numbers in units of n eps (times the condition number for the
-    latter), and how many of the ranks are wrong."""
-    lines = ["| Elements | 2-norm, elder | revision | NumPy | condition, elder | revision | NumPy "
-             "| wrong ranks, elder | revision | NumPy |", "|---" * 10 + "|"]
+    """Worst relative errors of 2-norms, Frobenius norms and condition numbers in units of n eps (times the condition
+    number for the latter), and how many of the ranks are wrong."""
+    lines = ["| Elements | 2-norm, elder | revision | NumPy | Frobenius norm, elder | revision | NumPy "
+             "| condition, elder | revision | NumPy | wrong ranks, elder | revision | NumPy |", "|---" * 13 + "|"]
     for power in POWERS:
         errors, wrong = [], []
         for n in (1, 2, 5, 30, 100):
@@ -271,9 +272,12 @@ def properties_table():
                 norm_unit, unit = EPS * n, EPS * n * condition
                 with np.errstate(all="ignore"):
                     norms = (call("Norm_head", a, 0), call("Norm2026_head", a, 0), np.linalg.norm(a, 2))
+                    roots = (call("Norm_head", a, 2), call("Norm2026_head", a, 2), np.linalg.norm(a))
                     conditions = (call("CondNumber_head", a, 0), call("CondNumber2026_head", a, 0),
                                   np.linalg.cond(a, 2))
+                frobenius = float(norm(long(one)))
                 errors.append([abs(found / scale / exact[0] - 1) / norm_unit for found in norms]
+                              + [abs(found / scale / frobenius - 1) / norm_unit for found in roots]
                               + [abs(found * exact[-1] / exact[0] - 1) / unit for found in conditions])
                 half = noise(n, (n + 1) // 2, kind) @ noise((n + 1) // 2, n, kind) * scale
                 ranks = (call("Rank_head", half, -1.0), call("Rank2026_head", half, -1.0),
@@ -394,63 +398,75 @@ the first column. Written by `tools/accuracy/matrix_revisions.py`.
 
 ## Singular values
 
-Worst over the shapes {", ".join(f"{m} by {n}" for m, n in SHAPES)}, in units of max(m, n) eps: |a - u diag(s) v^H| /
-|a| and the distance of u and v from orthonormal, computed in long double, with Frobenius norms; then the singular
-values, relative to the largest one, against those that LAPACK computes for the matrix scaled to magnitude 1.
+`SVDEx_head` and `SVD2026_head`; the values alone from `SVDS_head` and `SVDS2026_head`; and their complex twins. Worst
+over the shapes {", ".join(f"{m} by {n}" for m, n in SHAPES)}, in units of max(m, n)
+eps: |a - u diag(s) v^H| / |a| and the distance of u and v from orthonormal, computed in long double, with Frobenius
+norms; then the singular values, relative to the largest one, against those that LAPACK computes for the matrix scaled
+to magnitude 1.
 
 """ + "\n".join(tables[0]) + f"""
 
 ## Systems, least squares and pseudo-inverses
 
-Relative errors in units of n eps times the condition number, which is 1000, worst over the orders
-{", ".join(map(str, ORDERS))}, against solutions that are refined in long double. The last column is the
-smallest ratio of the condition number that `EqsSetByLU2026_head` estimates to the exact one, in the 1-norm.
+`EqsSetBySVDDri_head` and `EqsSetBySVD2026_head`, whose solution for one right-hand side is that of `GenLinEqs_head`
+and `GenLinEqs2026_head`; `PseudoInverse_head` and `PseudoInverse2026_head`; `EqsSetByLU2026_head`, whose elder
+`EqsSetByLUDri_head` always fails; and their complex twins. Relative errors in units of n eps times the condition
+number, which is 1000, worst over the orders {", ".join(map(str, ORDERS))}, against solutions that are refined in long
+double. The last column is the smallest ratio of the condition number that `EqsSetByLU2026_head` estimates to the
+exact one, in the 1-norm.
 
 """ + "\n".join(tables[1]) + """
 
 ## Exponential
 
-Errors relative to the largest element of the result, against mpmath: the worst over six random matrices of each of
-the orders 2, 3, 5 and 8, with normally distributed elements of the given magnitude; rotations; and matrices with one
-large element.
+`MatrixExp_head` and `MatrixExp2026_head`, `CxMatrixExp_head` and `CxMatrixExp2026_head`. Errors relative to the
+largest element of the result, against mpmath: the worst over six random matrices of each of the orders 2, 3, 5 and 8,
+with normally distributed elements of the given magnitude; rotations; and matrices with one large element.
 
 """ + "\n".join(tables[2]) + """
 
 ## Logarithm and square root
 
-Errors relative to the largest element of the result, the worst and the median over five matrices of each of the
-orders 2, 3, 5 and 8, against values from mpmath's eigenvalues and eigenvectors with 100 digits. Eigenvalues that
-rounding has moved off the negative axis count as negative: the imaginary part of their logarithm is +pi.
+`MatrixLn_head` and `MatrixLn2026_head`; `MatrixSqrtH`, for complex matrices `CxMatrixSqrt_head`, and
+`MatrixSqrt2026_head`; and their complex twins. Errors relative to the largest element of the result, the worst and
+the median over five matrices of each of the orders 2, 3, 5 and 8, against values from mpmath's eigenvalues and
+eigenvectors with 100 digits. Eigenvalues that rounding has moved off the negative axis count as negative: the
+imaginary part of their logarithm is +pi.
 
 """ + "\n".join(tables[3]) + """
 
 ## Negative powers
 
-The cube of the inverse of real matrices of the orders 2, 5 and 10 with condition number 1000: the largest error
-relative to the largest element, in units of n eps times the condition number, against mpmath with 60 digits.
+`MatrixPower_head` and `MatrixPower2026_head`, `CxMatrixPower_head` and `CxMatrixPower2026_head`. The cube of the
+inverse of matrices of the orders 2, 5 and 10 with condition number 1000: the largest error relative to the largest
+element, in units of n eps times the condition number, against mpmath with 60 digits.
 
 """ + "\n".join(tables[4]) + """
 
 ## Norm, condition and rank
 
-Real and complex matrices of the orders 1, 2, 5, 30 and 100 with condition number 1000, against LAPACK's singular
-values of the matrices scaled to magnitude 1: relative errors in units of n eps, or of n eps times the condition
-number for the condition number. The ranks are those of products of n by n/2 matrices.
+`Norm_head`, `CondNumber_head` and `Rank_head`, `Norm2026_head`, `CondNumber2026_head` and `Rank2026_head`, and their
+complex twins; norms and condition numbers of type 0 (the 2-norm), norms also of type 2 (Frobenius). Real and complex
+matrices of the orders 1, 2, 5, 30 and 100 with condition number 1000, against LAPACK's singular values of the
+matrices scaled to magnitude 1: relative errors in units of n eps, or of n eps times the condition number for the
+condition number; a dash where the sum of squares overflows. The ranks are those of products of n by n/2 matrices.
 
 """ + "\n".join(tables[5]) + """
 
 ## Ordered Schur forms
 
-Thirty real matrices of the orders 4 to 40 for each row, ordered by increasing modulus of the eigenvalues: the number
-of forms whose eigenvalues are out of order although the code is 0; then the worst residual and the largest distance
-of u from orthogonal, computed in long double, in units of n eps.
+`Schur80_head` and `Schur2026_head`. Thirty real matrices of the orders 4 to 40 for each row, ordered by increasing
+modulus of the eigenvalues: the number of forms whose eigenvalues are out of order although the code is 0; then the
+worst residual and the largest distance of u from orthogonal, computed in long double, in units of n eps.
 
 """ + "\n".join(tables[6]) + """
 
 ## Eigenproblems and QR by blocks
 
-Matrices of the orders 70, 170 and 300, real and complex: the worst residual and, except for general eigenproblems, the
-largest distance of the vectors or q from orthonormal, computed in long double, in units of n eps.
+`SymEvectorEvalue_head` and, for Hermitian matrices, `CxEigenValueVector_head`; `EigenValueVector_head` and
+`CxEigenValueVector_head`; `QRDecH` and `CxQRDecH`; and the revisions with 2026 in their names. Matrices of the orders
+70, 170 and 300, real and complex: the worst residual and, except for general eigenproblems, the largest distance of
+the vectors or q from orthonormal, computed in long double, in units of n eps.
 
 """ + "\n".join(tables[7]) + "\n")
 

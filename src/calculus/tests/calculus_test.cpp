@@ -10,10 +10,9 @@
 #include <limits>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
 typedef std::vector<double> Samples;
 typedef long double Long;
 
@@ -441,3 +440,4 @@ TEST(Derivatives, CodesComeInTheirOrder) {
 }
 
 } // namespace
+} // namespace qx::test

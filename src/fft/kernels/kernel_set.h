@@ -58,7 +58,7 @@ QX_INLINE V FirstLanes(Wide x) {
     if constexpr (V::count == nativeLanes)
         return x;
     else if constexpr (V::count == 2)
-        return V(__builtin_shufflevector(x.v, x.v, 0, 1));
+        return FirstPair(x);
     else
         return V(x[0]);
 }

@@ -11,23 +11,8 @@
 
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBMatrix;
-using qx::test::DBLMatrix;
-using qx::test::Dft;
-using qx::test::HeapProbe;
-using qx::test::Host;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::Node;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::Reshape;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
 
 constexpr double Rounding = 2e-15;
 
@@ -373,3 +358,4 @@ TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -12,28 +12,8 @@
 #include <functional>
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::PlanCell;
-using qx::TransformInstance;
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::Dft;
-using qx::test::HeapProbe;
-using qx::test::Host;
-using qx::test::Long;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::Node;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::RegisteredSweeps;
-using qx::test::ResetHost;
-using qx::test::Reshape;
-using qx::test::RunSweeps;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
 
 constexpr double Rounding = 2e-15;
 
@@ -409,3 +389,4 @@ TEST(OneDimensional, RequestsBeyondMemoryEndInACode) {
 }
 
 } // namespace
+} // namespace qx::test

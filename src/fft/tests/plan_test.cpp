@@ -17,9 +17,8 @@
 #include <utility>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::PlanReference;
 
 typedef std::vector<std::pair<int32_t, int32_t>> Factors; // factor, kind
 
@@ -181,14 +180,14 @@ void StandInTheMiddle() {
 
 // While one thread builds a plan, which may take seconds, other threads can build theirs.
 TEST(Plan, OfAnotherLengthIsBuiltConcurrently) {
-    if (!qx::test::HeapProbe::works())
+    if (!HeapProbe::works())
         GTEST_SKIP();
     std::latch stands(1), mayGoOn(1);
     builderStands = &stands;
     builderMayGoOn = &mayGoOn;
     FFTPlan *slow = nullptr;
     std::thread builder([&] {
-        const qx::test::HeapProbe probe(3, StandInTheMiddle);
+        const HeapProbe probe(3, StandInTheMiddle);
         slow = qx::create_oxfft_table(1 << 10);
     });
     stands.wait();
@@ -217,26 +216,26 @@ TEST(Plan, OrdersOfPrimesAreThePowersOfAGenerator) {
 
 TEST(PlanSlot, IsRefusedIfItsSweepCannotBeRegistered) {
     PlanSlot slot = nullptr;
-    qx::test::Host().sweepStatus = 5;
+    Host().sweepStatus = 5;
     EXPECT_EQ(qx::PlanSlotAcquire(&slot, 12), ErrOutOfMemory);
     EXPECT_EQ(slot, nullptr);
-    qx::test::ResetHost();
+    ResetHost();
     {
         const PlanReference plan(12);
         EXPECT_EQ(plan.get()->refCount, 1) << "the refused plan was released";
     }
     ASSERT_EQ(qx::PlanSlotAcquire(&slot, 12), 0);
-    qx::test::RunSweepOf(slot);
+    RunSweepOf(slot);
 }
 
 // Each allocation of a plan with three sub-plans fails in turn, and nothing is left behind.
 TEST(Plan, IsBuiltWholeOrNotAtAll) {
-    if (!qx::test::HeapProbe::works())
+    if (!HeapProbe::works())
         GTEST_SKIP();
     const PlanReference held(52);
     int32_t failures = 0;
     for (FFTPlan *plan = nullptr; plan == nullptr; ++failures) {
-        const qx::test::HeapProbe probe(failures + 1);
+        const HeapProbe probe(failures + 1);
         plan = qx::create_oxfft_table(107 * 32 * 23);
         const int32_t holders = held.get()->refCount;
         qx::destroy_oxfft_table(plan);
@@ -252,10 +251,10 @@ TEST(Plan, IsBuiltWholeOrNotAtAll) {
 // Tables grow in proportion to the length, whatever its factors: there are a few dozen of them,
 // none with more than eight values per value of the transform.
 TEST(Plan, TakesMemoryInProportionToItsLength) {
-    if (!qx::test::HeapProbe::works())
+    if (!HeapProbe::works())
         GTEST_SKIP();
     for (const int32_t n : {10007, 24469, 99991, 1000003, 1 << 20, 1018081, 2 * 500009}) {
-        const qx::test::HeapProbe probe(0, std::size_t{64} * static_cast<std::size_t>(n));
+        const HeapProbe probe(0, std::size_t{64} * static_cast<std::size_t>(n));
         FFTPlan *const plan = qx::create_oxfft_table(n);
         EXPECT_NE(plan, nullptr) << n;
         EXPECT_LT(probe.liveAllocations(), 60) << n;
@@ -270,3 +269,4 @@ TEST(Plan, TableThatCannotBeHeldIsNull) {
 }
 
 } // namespace
+} // namespace qx::test

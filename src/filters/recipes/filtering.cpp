@@ -2,6 +2,8 @@
 
 #include "tests/support/recipe.h"
 
+#include <algorithm>
+
 namespace qx::test {
 
 namespace {
@@ -56,14 +58,24 @@ Recipe OfOneState(const char *name, Export filter, int32_t na) {
 }
 
 template <ElementType Signal, class Export>
-Recipe OfCascade(const char *name, Export filter, int32_t form) {
+Recipe InOneStream(const char *name, Export filter, int32_t na) {
+    return {name, [=](Call &c) {
+                c.mayBeEmpty(3);
+                return filter(c.inOut<Signal>(0), A<DBL>(c, na), c.in<DBL>(2, taps),
+                              c.inOut<Signal>(3, taps - 1 + std::max(na - 1, 0)), &keeps);
+            }};
+}
+
+template <ElementType Signal, class Export>
+Recipe OfCascade(const char *name, Export filter, int32_t form, bool hasState = false) {
     return {name,
             [=](Call &c) {
                 const int32_t order = form == 0 ? 2 : 4;
                 const int32_t sections = c.n % 11 + 1;
                 return filter(c.inOut<Signal>(0), c.byReference(form),
                               c.in<DBL>(1, sections * order, SectionDenominator),
-                              c.in<DBL>(2, sections * (order + 1)), State<Signal>(c, 3, 1), &keeps,
+                              c.in<DBL>(2, sections * (order + 1)),
+                              State<Signal>(c, 3, hasState ? sections * order : 1), &keeps,
                               c.err());
             },
             HostStatusInResult | MayKeepArrayOnFailure};
@@ -106,10 +118,15 @@ std::vector<Recipe> FilteringRecipes() {
         OfOneState<DBL>("IIR_Filter_OneState: IIR", IIR_Filter_OneState, 6),
         OfOneState<DBL>("IIR_Filter_OneState: FIR", IIR_Filter_OneState, 0),
         OfOneState<CDB>("CxSigIIR_Filter_OneState", CxSigIIR_Filter_OneState, 6),
+        InOneStream<DBL>("IIR_Filter_OneState: IIR in a stream", IIR_Filter_OneState, 6),
+        InOneStream<DBL>("IIR_Filter_OneState: FIR in a stream", IIR_Filter_OneState, 0),
+        InOneStream<CDB>("CxSigIIR_Filter_OneState: in a stream", CxSigIIR_Filter_OneState, 6),
         OfCascade<DBL>("IIR_Filter2: second order", IIR_Filter2, 0),
         OfCascade<DBL>("IIR_Filter2: fourth order", IIR_Filter2, 1),
         OfCascade<CDB>("CxSigIIR_Filter2: second order", CxSigIIR_Filter2, 0),
         OfCascade<CDB>("CxSigIIR_Filter2: fourth order", CxSigIIR_Filter2, 1),
+        OfCascade<DBL>("IIR_Filter2: in a stream", IIR_Filter2, 0, true),
+        OfCascade<CDB>("CxSigIIR_Filter2: in a stream", CxSigIIR_Filter2, 1, true),
         OfSample<DBL>("IIR_Filter_PtbyPt: second order", IIR_Filter_PtbyPt, 0),
         OfSample<DBL>("IIR_Filter_PtbyPt: fourth order", IIR_Filter_PtbyPt, 1),
         OfSample<DBL>("IIR_Filter_PtbyPt: IIR", IIR_Filter_PtbyPt, 2),

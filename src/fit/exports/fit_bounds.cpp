@@ -131,7 +131,7 @@ Outcome Bounds(const FittedModel &model, In<DBL1D> coefficients, double confiden
     return 0;
 }
 
-struct Samples {
+struct FittedData {
     In<DBL1D> y, w, coefficients;
     bool areFinite() const {
         return CheckFinite(y.data(), y.size()) == 0 &&
@@ -154,28 +154,28 @@ ErrorCode CheckDegrees(int32_t used, int32_t k, double confidence) {
                         {!(confidence > 0.0 && confidence < 1.0), ErrProbabilityOutOfRange}});
 }
 
-ErrorCode CheckAbscissae(In<DBL1D> x, const Samples &samples, int32_t count) {
-    const int32_t n = samples.y.size();
-    if (x.isEmpty() || samples.y.isEmpty() || samples.coefficients.isEmpty())
+ErrorCode CheckAbscissae(In<DBL1D> x, const FittedData &data, int32_t count) {
+    const int32_t n = data.y.size();
+    if (x.isEmpty() || data.y.isEmpty() || data.coefficients.isEmpty())
         return ErrEmptyInput;
-    return FirstFailed({{x.size() != n || !WeightsFit(samples.w, n) ||
-                             (count > 0 && samples.coefficients.size() != count),
+    return FirstFailed({{x.size() != n || !WeightsFit(data.w, n) ||
+                             (count > 0 && data.coefficients.size() != count),
                          ErrSizeMismatch},
                         {n < 3, ErrFewerThanThree}});
 }
 
 template <class Model, class Outputs>
-Outcome CurveBounds(const Model &curve, In<DBL1D> x, const Samples &samples, double confidence,
+Outcome CurveBounds(const Model &curve, In<DBL1D> x, const FittedData &data, double confidence,
                     const Outputs &out) {
     constexpr int32_t k = Model::count;
-    if (const ErrorCode failed = CheckAbscissae(x, samples, k))
+    if (const ErrorCode failed = CheckAbscissae(x, data, k))
         return failed;
-    if (CheckFinite(x.data(), x.size()) != 0 || !samples.areFinite())
+    if (CheckFinite(x.data(), x.size()) != 0 || !data.areFinite())
         return ErrNonFiniteInput;
-    const DBL *const c = samples.coefficients.data();
+    const DBL *const c = data.coefficients.data();
     if (const ErrorCode failed = curve.check(x, c))
         return failed;
-    const int32_t n = x.size(), used = samples.countUsed();
+    const int32_t n = x.size(), used = data.countUsed();
     if (const ErrorCode failed = CheckDegrees(used, k, confidence))
         return failed;
     if (curve.isSingular(c))
@@ -188,22 +188,22 @@ Outcome CurveBounds(const Model &curve, In<DBL1D> x, const Samples &samples, dou
                 block.column(j)[i] = d[j];
         }
     };
-    return Bounds({{writeRows, n, k, samples.weights()}, samples.y.view(), used},
-                  samples.coefficients, confidence, out);
+    return Bounds({{writeRows, n, k, data.weights()}, data.y.view(), used}, data.coefficients,
+                  confidence, out);
 }
 
 // Bounds for the powers that a polynomial fit determines; terms beyond them are given constants.
 template <class Outputs>
-Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
+Outcome PolynomialBounds(In<DBL1D> x, const FittedData &data, double confidence,
                          const Outputs &out) {
     constexpr int32_t mostFitted = 26;
-    if (const ErrorCode failed = CheckAbscissae(x, samples, 0))
+    if (const ErrorCode failed = CheckAbscissae(x, data, 0))
         return failed;
-    if (CheckFinite(x.data(), x.size()) != 0 || !samples.areFinite())
+    if (CheckFinite(x.data(), x.size()) != 0 || !data.areFinite())
         return ErrNonFiniteInput;
-    const DBL *const c = samples.coefficients.data();
-    const int32_t terms = samples.coefficients.size(), k = std::min(terms, mostFitted);
-    const int32_t n = x.size(), used = samples.countUsed();
+    const DBL *const c = data.coefficients.data();
+    const int32_t terms = data.coefficients.size(), k = std::min(terms, mostFitted);
+    const int32_t n = x.size(), used = data.countUsed();
     if (const ErrorCode failed = CheckDegrees(used, k, confidence))
         return failed;
     const auto writeRows = [&](const RowBlock &block) {
@@ -218,23 +218,23 @@ Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
             for (int32_t i = 0; i < block.count; ++i)
                 block.column(j)[i] = block.column(j - 1)[i] * from[i];
     };
-    return Bounds({{writeRows, n, k, samples.weights()}, samples.y.view(), used},
-                  samples.coefficients, confidence, out);
+    return Bounds({{writeRows, n, k, data.weights()}, data.y.view(), used}, data.coefficients,
+                  confidence, out);
 }
 
 template <class Outputs>
-Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, const Outputs &out) {
-    if (h.isEmpty() || samples.y.isEmpty() || samples.coefficients.isEmpty())
+Outcome MatrixBounds(In<DBL2D> h, const FittedData &data, double confidence, const Outputs &out) {
+    if (h.isEmpty() || data.y.isEmpty() || data.coefficients.isEmpty())
         return ErrEmptyInput;
     const int32_t n = h.rows(), k = h.cols();
-    if (samples.y.size() != n || !WeightsFit(samples.w, n) || samples.coefficients.size() != k)
+    if (data.y.size() != n || !WeightsFit(data.w, n) || data.coefficients.size() != k)
         return ErrSizeMismatch;
-    if (CheckFinite(h.data(), int64_t{n} * k) != 0 || !samples.areFinite())
+    if (CheckFinite(h.data(), int64_t{n} * k) != 0 || !data.areFinite())
         return ErrNonFiniteInput;
-    const int32_t used = samples.countUsed();
+    const int32_t used = data.countUsed();
     if (const ErrorCode failed = CheckDegrees(used, k, confidence))
         return failed;
-    const DBL *const c = samples.coefficients.data();
+    const DBL *const c = data.coefficients.data();
     const auto writeRows = [&](const RowBlock &block) {
         CopyTransposed<ElementType::DBL>(h.view().block(block.first, 0, block.count, k),
                                          {block.start, k, block.count});
@@ -244,8 +244,8 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
             for (int32_t i = 0; i < block.count; ++i)
                 value[i] += block.column(j)[i] * c[j];
     };
-    return Bounds({{writeRows, n, k, samples.weights()}, samples.y.view(), used},
-                  samples.coefficients, confidence, out);
+    return Bounds({{writeRows, n, k, data.weights()}, data.y.view(), used}, data.coefficients,
+                  confidence, out);
 }
 
 // The parameters of the frames of confidence and prediction: the type of x and the bounds.
@@ -253,22 +253,22 @@ template <class Model>
 struct OfCurve {
     typedef In<DBL1D> X;
     template <class Outputs>
-    static Outcome bounds(X x, const Samples &samples, double confidence, const Outputs &out) {
-        return CurveBounds(Model(), x, samples, confidence, out);
+    static Outcome bounds(X x, const FittedData &data, double confidence, const Outputs &out) {
+        return CurveBounds(Model(), x, data, confidence, out);
     }
 };
 struct OfPolynomial {
     typedef In<DBL1D> X;
     template <class Outputs>
-    static Outcome bounds(X x, const Samples &samples, double confidence, const Outputs &out) {
-        return PolynomialBounds(x, samples, confidence, out);
+    static Outcome bounds(X x, const FittedData &data, double confidence, const Outputs &out) {
+        return PolynomialBounds(x, data, confidence, out);
     }
 };
 struct OfMatrix {
     typedef In<DBL2D> X;
     template <class Outputs>
-    static Outcome bounds(X h, const Samples &samples, double confidence, const Outputs &out) {
-        return MatrixBounds(h, samples, confidence, out);
+    static Outcome bounds(X h, const FittedData &data, double confidence, const Outputs &out) {
+        return MatrixBounds(h, data, confidence, out);
     }
 };
 
@@ -285,13 +285,13 @@ Outcome Pred(typename Of::X x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double con
 
 // A base that is NaN is reported as out of range, an infinite base as not finite.
 template <class Outputs>
-Outcome LogarithmBounds(In<DBL1D> x, const Samples &samples, double base, double confidence,
+Outcome LogarithmBounds(In<DBL1D> x, const FittedData &data, double base, double confidence,
                         const Outputs &out) {
     if (std::isinf(base))
-        if (const ErrorCode failed = CheckAbscissae(x, samples, Logarithm::count))
+        if (const ErrorCode failed = CheckAbscissae(x, data, Logarithm::count))
             return failed;
     return std::isinf(base) ? Outcome(ErrNonFiniteInput)
-                            : CurveBounds(Logarithm(base), x, samples, confidence, out);
+                            : CurveBounds(Logarithm(base), x, data, confidence, out);
 }
 Outcome ConfOfLog(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double base,
                   double confidence, Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower,

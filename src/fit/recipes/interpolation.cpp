@@ -47,6 +47,13 @@ std::vector<Recipe> InterpolationRecipes() {
          },
          None,
          {2, 3, 8, 50}},
+        {"SpInterp_head: in the middle",
+         [](Call &c) {
+             return SpInterp_head(c.in<DBL>(0), Ascending(c, 1), c.in<DBL>(2),
+                                  c.byReference(c.n / 2 + 0.6), c.scalar(0), c.err());
+         },
+         None,
+         {2, 3, 8, 50}},
     };
 }
 

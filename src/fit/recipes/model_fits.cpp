@@ -143,6 +143,14 @@ std::vector<Recipe> GaussianRecipes() {
          },
          None,
          {3, 8, 50, 1000}},
+        {"GaussianPeakFitCoef_head: without a guess",
+         [](Call &c) {
+             return GaussianPeakFitCoef_head(c.in<DBL>(0, c.n, Peak), Positions(c, 1),
+                                             Weights(c, 2), 1e-6, NoGuess(c, 3), c.scalar(0),
+                                             c.scalar(1), c.scalar(2), Limit(c, 30), 0.0);
+         },
+         None,
+         {3, 8, 50, 1000}},
         {"GaussianPeakFitCoef_head",
          [](Call &c) {
              return GaussianPeakFitCoef_head(c.in<DBL>(0, c.n, Peak), Positions(c, 1),

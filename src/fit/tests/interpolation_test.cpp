@@ -10,9 +10,9 @@
 #include <limits>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
 typedef std::vector<double> Samples;
 typedef long double Long;
 
@@ -53,7 +53,7 @@ Long Lagrange(const Samples &x, const Samples &y, Long xi) {
 }
 
 TEST(Interpolation, PolynomialIsLagranges) {
-    qx::test::Noise noise(4);
+    Noise noise(4);
     for (int32_t n = 1; n <= 9; ++n) {
         Samples x;
         Samples y;
@@ -210,3 +210,4 @@ TEST(Interpolation, CodesComeInTheirOrder) {
 }
 
 } // namespace
+} // namespace qx::test

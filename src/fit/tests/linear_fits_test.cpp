@@ -1,7 +1,7 @@
-#include "fit/elimination.h"
 #include "fit/general.h"
 #include "fit/polynomial.h"
 #include "fit/robust.h"
+#include "fit/sequential_qr.h"
 #include "fit/tests/least_squares.h"
 #include "qx/qx.h"
 #include "tests/support/recipe.h"

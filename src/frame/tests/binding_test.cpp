@@ -11,6 +11,7 @@
 
 // Where the module finds its host; each case runs in a separate process.
 
+namespace qx::test {
 namespace {
 
 #ifdef _WIN32
@@ -76,3 +77,4 @@ TEST(Binding, WithoutAHostTheProcessEnds) {
 }
 
 } // namespace
+} // namespace qx::test

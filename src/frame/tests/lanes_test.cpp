@@ -7,9 +7,8 @@
 #include <cstdlib>
 #include <cstring>
 
+namespace qx::test {
 namespace {
-
-using qx::Lanes;
 
 // Memory at 4 modulo 16, where the host's elements begin.
 struct Offset {
@@ -48,6 +47,27 @@ TYPED_TEST(LanesTest, DoesInEachLaneWhatOneDoubleWouldDo) {
     EXPECT_TRUE(std::signbit(zero[L::count - 1]));
 }
 
+TYPED_TEST(LanesTest, SelectsAndComparesEachLane) {
+    typedef TypeParam L;
+    const double nan = std::nan(""), values[] = {-1.0, -0.0, 0.0, 2.0, nan};
+    const auto same = [](double a, double b) { return std::memcmp(&a, &b, sizeof a) == 0; };
+    for (const double p : values)
+        for (const double q : values) {
+            L a(p), b(q);
+            const double larger = p > q ? p : q, smaller = p < q ? p : q;
+            for (int i = 0; i < L::count; ++i) {
+                EXPECT_TRUE(same(Larger(a, b)[i], larger)) << p << " " << q;
+                EXPECT_TRUE(same(Smaller(a, b)[i], smaller)) << p << " " << q;
+                EXPECT_EQ(Select(a == b, L(3.0), L(4.0))[i], p == q ? 3.0 : 4.0);
+                EXPECT_EQ(Select(!(a <= b), L(3.0), L(4.0))[i], p <= q ? 4.0 : 3.0);
+                EXPECT_EQ(Select((a < b) | (a >= b), L(3.0), L(4.0))[i], p < q || p >= q ? 3 : 4);
+            }
+        }
+    const L number = L(-1.5);
+    EXPECT_EQ(qx::OfBits<L>(ToBits(number))[L::count - 1], -1.5);
+    EXPECT_EQ(Magnitude(number)[0], 1.5);
+}
+
 TYPED_TEST(LanesTest, MovesElementsAndNothingElse) {
     typedef TypeParam L;
     Offset x, y;
@@ -78,6 +98,7 @@ TYPED_TEST(LanePairsTest, TakeThePairsThatTheirNamesSay) {
         EXPECT_EQ(Swapped(a)[i], a[i ^ 1]);
         EXPECT_EQ(ReversedPairs(a)[i], a[n - 2 - even + i % 2]);
         EXPECT_EQ(qx::InEveryPair<n>(first)[i], a[i % 2]);
+        EXPECT_EQ(FirstPair(a)[i % 2], a[i % 2]);
         EXPECT_EQ(NegatedInPairs(a, true)[i], sign * a[i]);
         EXPECT_EQ(NegatedInPairs(a, false)[i], -sign * a[i]);
         EXPECT_EQ(MinusPlus(a, b)[i], a[i] + sign * b[i]);
@@ -94,6 +115,18 @@ TYPED_TEST(LanePairsTest, TakeThePairsThatTheirNamesSay) {
         EXPECT_EQ(double{to[i / 2][5 + i % 2]}, pairs[i]);
         EXPECT_EQ(each[i], double{from[i][3]});
     }
+}
+
+TYPED_TEST(LanePairsTest, ReadAndMoveIntegers) {
+    constexpr int n = TypeParam::count;
+    int32_t numbers[20] = {}, moved[20] = {};
+    for (int i = 0; i < 20; ++i)
+        numbers[i] = i * 107374182 - INT32_MAX / 2;
+    qx::StoreEightIncreased(numbers + 1, -3, moved + 5);
+    for (int i = 0; i < 20; ++i)
+        EXPECT_EQ(moved[i], i < 5 || i >= 13 ? 0 : numbers[i - 4] - 3);
+    for (int i = 0; i < n; ++i)
+        EXPECT_EQ(qx::OfIntegers<n>(numbers + 1)[i], numbers[1 + i]);
 }
 
 TYPED_TEST(LanePairsTest, CompareEachLaneAndNumberTheBitsFromLaneZero) {
@@ -170,3 +203,4 @@ TEST(Widths, AreTheProcessorsUnlessTheEnvironmentForcesASmallerOne) {
 #endif
 
 } // namespace
+} // namespace qx::test

@@ -13,10 +13,8 @@
 #include <thread>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::AnalysisWorkspace;
-using qx::analysisWorkspace;
 
 constexpr int32_t overhead = 17; // of a scratch request in the region, in bytes
 
@@ -337,9 +335,9 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
 }
 
 TEST(Workspace, SweepEndsARunThatWasAborted) {
-    const int before = qx::test::RegisteredSweeps();
+    const int before = RegisteredSweeps();
     ASSERT_EQ(analysisWorkspace.reserve(1000), 0);
-    EXPECT_EQ(qx::test::RegisteredSweeps(), before + 1);
+    EXPECT_EQ(RegisteredSweeps(), before + 1);
     EXPECT_EQ(analysisWorkspace.reserve(5), ErrWorkspaceAlreadyInitialized);
     analysisWorkspace.setEnabled(true);
     void *leftBehind = qx::ScratchAllocPointer(10);
@@ -348,10 +346,10 @@ TEST(Workspace, SweepEndsARunThatWasAborted) {
     // The block of a second thread is in a unit outside the stack.
     std::thread([] { EXPECT_NE(qx::ScratchAllocPointer(1), nullptr); }).join();
     EXPECT_EQ(analysisWorkspace.liveBlocks(), 2);
-    qx::test::RunSweeps();
+    RunSweeps();
     EXPECT_EQ(analysisWorkspace.liveBlocks(), -1);
     EXPECT_FALSE(analysisWorkspace.isEnabled());
-    EXPECT_EQ(qx::test::RegisteredSweeps(), before);
+    EXPECT_EQ(RegisteredSweeps(), before);
     EXPECT_EQ(analysisWorkspace.giveBack(), 0);
     ASSERT_EQ(analysisWorkspace.reserve(1000), 0);
     EXPECT_EQ(analysisWorkspace.liveBlocks(), 0) << "nothing remains of the swept region";
@@ -541,7 +539,7 @@ TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
 // others use blocks. No block is lost or shared, and in the end nothing is left.
 TEST(Workspace, MayBeReleasedWhileOtherThreadsWork) {
     constexpr int rounds = 1000000 / 8;
-    const int sweeps = qx::test::RegisteredSweeps();
+    const int sweeps = RegisteredSweeps();
     std::atomic<int> faults = 0;
     std::atomic<int> served = 0;
     std::atomic<int> unexpected = 0;
@@ -581,7 +579,8 @@ TEST(Workspace, MayBeReleasedWhileOtherThreadsWork) {
     analysisWorkspace.setEnabled(false);
     EXPECT_EQ(analysisWorkspace.giveBack(), 0);
     EXPECT_EQ(analysisWorkspace.liveBlocks(), -1);
-    EXPECT_EQ(qx::test::RegisteredSweeps(), sweeps);
+    EXPECT_EQ(RegisteredSweeps(), sweeps);
 }
 
 } // namespace
+} // namespace qx::test

@@ -2,7 +2,7 @@
 
 #include "linalg/exports/checks.h"
 #include "linalg/properties/definiteness.h"
-#include "linalg/properties/scalars.h"
+#include "linalg/properties/determinant_and_norms.h"
 #include "linalg/properties/special.h"
 #include "linalg/properties/vectors.h"
 

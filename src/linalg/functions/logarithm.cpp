@@ -3,7 +3,7 @@
 #include "linalg/functions/diagonal.h"
 #include "linalg/functions/functions.h"
 #include "linalg/products/products.h"
-#include "linalg/properties/scalars.h"
+#include "linalg/properties/determinant_and_norms.h"
 #include "linalg/systems/lu.h"
 
 #include <algorithm>

@@ -108,7 +108,7 @@ void SolveUpperForTriangle(const ConstMatrixView<E> &t, const MatrixView<E> &x) 
 // the quotient.
 double Turns(double, double) { return 0.0; }
 CDB Turns(CDB difference, CDB ofQuotient) {
-    return {0.0, kTwoPi * std::nearbyint((difference.im - ofQuotient.im) / kTwoPi)};
+    return {0.0, kTwoPi * std::rint((difference.im - ofQuotient.im) / kTwoPi)};
 }
 
 // The difference of the logarithms of neighbours, without cancellation where they are close.

@@ -9,12 +9,13 @@
 #include <limits>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-typedef qx::test::DBL2DArray DBLMatrix;
-typedef qx::test::CDB2DArray CDBMatrix;
-typedef qx::test::Array1D<qx::ElementType::DBL> DBLVector;
-typedef qx::test::Array1D<qx::ElementType::CDB> CDBVector;
+typedef DBL2DArray DBLMatrix;
+typedef CDB2DArray CDBMatrix;
+typedef Array1D<qx::ElementType::DBL> DBLVector;
+typedef Array1D<qx::ElementType::CDB> CDBVector;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
@@ -301,7 +302,7 @@ TEST(Definiteness, FindsTheRankOfAGramMatrix) {
             if (rank > n)
                 continue;
             SCOPED_TRACE(testing::Message() << n << " of rank " << rank);
-            qx::test::Noise noise(static_cast<uint64_t>(n));
+            Noise noise(static_cast<uint64_t>(n));
             std::vector<double> b, a(n * n, 0.0);
             for (int i = 0; i < n * rank; ++i)
                 b.push_back(noise.symmetric());
@@ -359,3 +360,4 @@ TEST(CharacteristicPolynomial, RefusesCoefficientsThatOverflow) {
 }
 
 } // namespace
+} // namespace qx::test

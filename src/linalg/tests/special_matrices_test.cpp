@@ -9,12 +9,13 @@
 #include <cmath>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-typedef qx::test::DBL2DArray DBLMatrix;
-typedef qx::test::CDB2DArray CDBMatrix;
-typedef qx::test::Array1D<qx::ElementType::DBL> DBLVector;
-typedef qx::test::Array1D<qx::ElementType::CDB> CDBVector;
+typedef DBL2DArray DBLMatrix;
+typedef CDB2DArray CDBMatrix;
+typedef Array1D<qx::ElementType::DBL> DBLVector;
+typedef Array1D<qx::ElementType::CDB> CDBVector;
 typedef std::vector<double> Values;
 
 Values Special(int32_t kind, int32_t size, const DBLVector &x, const DBLVector &y,
@@ -130,3 +131,4 @@ TEST(CorrelationMatrix, IsToeplitzOfTheCorrelation) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -13,6 +13,7 @@
 
 // Compares the functions over lanes with the scalar ones, to the bit.
 
+namespace qx::test {
 namespace {
 
 typedef std::vector<double> Numbers;
@@ -137,3 +138,4 @@ TEST(Elementary, HaveTheBitsForSpecialArguments) {
 }
 
 } // namespace
+} // namespace qx::test

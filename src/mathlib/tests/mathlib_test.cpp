@@ -14,6 +14,7 @@
 
 // The mathematics library of the module, through the names that the code uses.
 
+namespace qx::test {
 namespace {
 
 typedef double (*Unary)(double);
@@ -42,7 +43,7 @@ double ErrorInUlps(double value, double high, double low) {
 }
 
 TEST(MathLibrary, ErrorStaysBelowOneUlpOnHardAndRandomArguments) {
-    std::ifstream file(qx::test::TestData("reference.dat"));
+    std::ifstream file(TestData("reference.dat"));
     ASSERT_TRUE(file.is_open());
     std::map<std::string, double> worst;
     int cases = 0;
@@ -138,11 +139,11 @@ TEST(MathLibrary, SpecialArgumentsGiveTheStandardValues) {
 
 // The control words with rounding, precision and exception masks, without the sticky flags.
 struct ControlWords {
-    qx::test::ArithmeticModes modes;
+    ArithmeticModes modes;
     uint16_t x87;
 
     static ControlWords Read() {
-        ControlWords words = {qx::test::CurrentArithmetic(), 0};
+        ControlWords words = {CurrentArithmetic(), 0};
 #if defined(__x86_64__) || defined(__i386__)
         __asm__ volatile("fnstcw %0" : "=m"(words.x87));
 #endif
@@ -169,3 +170,4 @@ TEST(MathLibrary, PreservesRoundingAndMasksOfTheCaller) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -62,8 +62,8 @@ LevelSearch SearchOf(const HistogramOptions &hist, const Keep &keep, int32_t lim
 }
 
 template <class Keep>
-ErrorCode Levels(In<DBL1D> y, double t0, double dt, int32_t method, int32_t bins, Keep keep,
-                 OutMeasured<3> levels, int32_t limit) {
+ErrorCode MeasureLevels(In<DBL1D> y, double t0, double dt, int32_t method, int32_t bins, Keep keep,
+                        OutMeasured<3> levels, int32_t limit) {
     const HistogramOptions hist = {static_cast<uint32_t>(method), bins};
     if (const ErrorCode bad = CheckSearch(&hist, &hist, keep, levels))
         return bad;
@@ -153,14 +153,14 @@ using qx::Returned;
 ErrorCode StateLevels(DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                       MeasurementSlot *slot, double *high, double *low, double *amplitude,
                       int32_t limit) {
-    return Returned(qx::Levels<KeepHistogramInSlot>, y, t0, dt, method, bins,
+    return Returned(qx::MeasureLevels<KeepHistogramInSlot>, y, t0, dt, method, bins,
                     KeepHistogramInSlot(slot), OutMeasured(high, low, amplitude), limit);
 }
 
 ErrorCode StateLevels_IDP(DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                           MeasurementInstanceWord *instance, double *high, double *low,
                           double *amplitude, int32_t limit) {
-    return Returned(qx::Levels<KeepHistogramInInstance>, y, t0, dt, method, bins,
+    return Returned(qx::MeasureLevels<KeepHistogramInInstance>, y, t0, dt, method, bins,
                     KeepHistogramInInstance(instance), OutMeasured(high, low, amplitude), limit);
 }
 

@@ -62,6 +62,16 @@ Recipe Pulse(const char *name, Function *function, Word word, uint16_t polarity,
             UsesHeap};
 }
 
+Recipe WholePulse(const char *name, uint16_t polarity) {
+    return {name,
+            [=](Call &c) {
+                return PulseMeas(Waveform(c), 0.5, 0.01, polarity, 1, Percent(c, 0), Bins(c, 1, 0),
+                                 Slot(c), Number(c, 0), Number(c, 1), Number(c, 2), Number(c, 3),
+                                 Number(c, 4), Number(c, 5), Number(c, 6), 0);
+            },
+            UsesHeap};
+}
+
 template <class Function>
 Recipe Transition(const char *name, Function *function, Word word, uint16_t polarity,
                   uint32_t method) {
@@ -95,13 +105,9 @@ std::vector<Recipe> PulseRecipes() {
         Pulse("PulseMeasEx", PulseMeasEx, Slot, 0, 0),
         Pulse("PulseMeasEx: partial", PulseMeasEx, Slot, 1, 1),
         Pulse("PulseMeasEx_IDP", PulseMeasEx_IDP, Instance, 1, 0),
-        {"PulseMeas",
-         [](Call &c) {
-             return PulseMeas(Waveform(c), 0.5, 0.01, 1, 1, Percent(c, 0), Bins(c, 1, 0), Slot(c),
-                              Number(c, 0), Number(c, 1), Number(c, 2), Number(c, 3), Number(c, 4),
-                              Number(c, 5), Number(c, 6), 0);
-         },
-         UsesHeap},
+        Pulse("PulseMeasEx_IDP: low", PulseMeasEx_IDP, Instance, 0, 0),
+        WholePulse("PulseMeas", 1),
+        WholePulse("PulseMeas: low", 0),
         Transition("TransMeas: rising", TransMeas, Slot, 1, 0),
         Transition("TransMeas: falling, by peaks", TransMeas, Slot, 0, 1),
         Transition("TransMeas_IDP", TransMeas_IDP, Instance, 1, 2),

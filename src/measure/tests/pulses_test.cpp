@@ -53,7 +53,7 @@ struct Numbers {
     }
 };
 
-struct Levels {
+struct MeasuredLevels {
     ErrorCode status;
     double high, low, amplitude;
 };
@@ -71,8 +71,8 @@ public:
     Node(const Node &) = delete;
     Node &operator=(const Node &) = delete;
 
-    Levels levels(const Samples &y, int32_t method, int32_t bins, int32_t limit = 0,
-                  double interval = 1) {
+    MeasuredLevels levels(const Samples &y, int32_t method, int32_t bins, int32_t limit = 0,
+                          double interval = 1) {
         const DBLArray array(y);
         Numbers r;
         const auto function = isIDP_ ? StateLevels_IDP : StateLevels;
@@ -158,13 +158,13 @@ TEST(StateLevels, AreThoseOfTheFullestBinsOrTheExtremes) {
         const Samples y = TwoStates(30, 20, 50);
         // The states are the outer bins, whose centres are half a bin inside.
         for (const int32_t bins : {10, 64, 400}) {
-            const Levels levels = node.levels(y, QXLevelsByHistogram, bins);
+            const MeasuredLevels levels = node.levels(y, QXLevelsByHistogram, bins);
             EXPECT_EQ(levels.status, 0);
             EXPECT_NEAR(levels.low, -1 + 2.0 / bins, 1e-12);
             EXPECT_NEAR(levels.high, 3 - 2.0 / bins, 1e-12);
             EXPECT_NEAR(levels.amplitude, 4 - 4.0 / bins, 1e-12);
         }
-        const Levels peaks = node.levels(y, QXLevelsByPeaks, 10);
+        const MeasuredLevels peaks = node.levels(y, QXLevelsByPeaks, 10);
         EXPECT_EQ(peaks.low, -1);
         EXPECT_EQ(peaks.high, 3);
         EXPECT_EQ(peaks.amplitude, 4);
@@ -173,11 +173,11 @@ TEST(StateLevels, AreThoseOfTheFullestBinsOrTheExtremes) {
     Samples ringing = TwoStates(50, 50, 0);
     ringing[50] = 4;
     ringing[51] = 2;
-    const Levels levels = Node().levels(ringing, QXLevelsByHistogram, 100);
+    const MeasuredLevels levels = Node().levels(ringing, QXLevelsByHistogram, 100);
     EXPECT_NEAR(levels.low, -1, 0.03);
     EXPECT_NEAR(levels.high, 3, 0.03);
     // Among equally full bins, the outermost one is the state.
-    const Levels even =
+    const MeasuredLevels even =
         Node().levels(Sampled(100, [](double i) { return i; }), QXLevelsByHistogram, 10);
     EXPECT_NEAR(even.low, 4.95, 1e-12);
     EXPECT_NEAR(even.high, 94.05, 1e-12);
@@ -191,7 +191,7 @@ TEST(StateLevels, TheAutomaticMethodDependsOnTheShareOfAState) {
     EXPECT_EQ(node.levels(thin, QXLevelsAutomatic, 50).low, -1);
     const Samples high = TwoStates(2, 40, 95);
     for (const int32_t limit : {0, 1}) {
-        const Levels levels = node.levels(high, QXLevelsAutomatic, 50, limit);
+        const MeasuredLevels levels = node.levels(high, QXLevelsAutomatic, 50, limit);
         EXPECT_EQ(levels.low, -1) << "no low state, so the minimum";
         EXPECT_NEAR(levels.high, limit == 0 ? 3 - 0.04 : 3, 1e-12) << "one state is not enough";
     }
@@ -207,14 +207,15 @@ TEST(StateLevels, RefuseWaveformsWithoutStates) {
     const Samples flat(20, 2.5);
     EXPECT_EQ(node.levels(flat, QXLevelsByHistogram, 10).status, ErrMeasureNotPositive);
     EXPECT_EQ(node.levels(flat, QXLevelsAutomatic, 10).status, ErrMeasureNotPositive);
-    const Levels peaks = node.levels(flat, QXLevelsByPeaks, 10);
+    const MeasuredLevels peaks = node.levels(flat, QXLevelsByPeaks, 10);
     EXPECT_EQ(peaks.status, 0);
     EXPECT_EQ(peaks.high, 2.5);
     EXPECT_EQ(peaks.amplitude, 0);
     for (const int32_t method : {0, 1, 2})
         for (const Samples &y : {Samples(5, nan), Samples{-1e308, 1e308}, Samples{0, inf}})
             EXPECT_EQ(node.levels(y, method, 10).status, ErrMeasureNotPositive);
-    const Levels some = node.levels({nan, 0, 0, 1, nan, 1, nan, nan}, QXLevelsByHistogram, 10);
+    const MeasuredLevels some =
+        node.levels({nan, 0, 0, 1, nan, 1, nan, nan}, QXLevelsByHistogram, 10);
     EXPECT_EQ(some.status, 0);
     EXPECT_NEAR(some.low, 0.05, 1e-15);
     // In the order of the checks.

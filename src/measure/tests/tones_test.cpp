@@ -13,10 +13,8 @@
 #include <numbers>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::Noise;
 
 typedef std::vector<double> Samples;
 
@@ -380,3 +378,4 @@ TEST(Tones, CodesComeInOrder) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -11,10 +11,8 @@
 #include <limits>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::Noise;
 
 typedef std::vector<double> Samples;
 
@@ -192,3 +190,4 @@ TEST(Trigger, FailuresComeInOrderAndLeaveTheState) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -103,6 +103,18 @@ Recipes DecimationRecipes() {
              return DecimatorFIRH(c.in<DBL>(0), c.out<DBL>(0), 0.5, 3, c.in<DBL>(1, 21),
                                   c.inOut<DBL>(2, 1), 1, 2, Number(c, 0, 2));
          }},
+        {"InterpolatorFIRH: in a stream",
+         [](Call &c) {
+             c.mayBeEmpty(0);
+             return InterpolatorFIRH(c.in<DBL>(0), c.out<DBL>(0), 0.5, 3, c.in<DBL>(1, 21),
+                                     c.inOut<DBL>(2, 7), 0, Number(c, 0, 2));
+         }},
+        {"DecimatorFIRH: in a stream",
+         [](Call &c) {
+             c.mayBeEmpty(0);
+             return DecimatorFIRH(c.in<DBL>(0), c.out<DBL>(0), 0.5, 3, c.in<DBL>(1, 21),
+                                  c.inOut<DBL>(2, 8), 0, 2, Number(c, 0, 2));
+         }},
         Groups<DBL, double>("ReDecimatedMovingAverageH", ReDecimatedMovingAverageH),
         Groups<CDB, ::CDB>("CxDecimatedMovingAverageH", CxDecimatedMovingAverageH),
         {"CxComplexModulatorH",

@@ -11,7 +11,7 @@ namespace {
 // The frame of all with an error out-parameter: n samples that `generate(samples)` computes. With
 // `badArgument` the array is not resized.
 template <class Generate>
-Outcome Samples(Out<DBL1D> &x, int32_t n, ErrorCode badArgument, const Generate &generate) {
+Outcome Generated(Out<DBL1D> &x, int32_t n, ErrorCode badArgument, const Generate &generate) {
     if (const Outcome bad = FirstFailed({{n < 1, ErrEmptyInput}, {badArgument != 0, badArgument}}))
         return bad;
     if (const Outcome bad = x.resize(n))
@@ -22,7 +22,7 @@ Outcome Samples(Out<DBL1D> &x, int32_t n, ErrorCode badArgument, const Generate 
 template <class Generate>
 int32_t Wave(DBL1D x, const int32_t *n, ErrorCode *err, const Generate &generate) {
     const auto body = [&](Out<DBL1D> samples, int32_t count) {
-        return Samples(samples, count, 0, [&](RealVector y) {
+        return Generated(samples, count, 0, [&](RealVector y) {
             generate(y);
             return 0;
         });
@@ -33,14 +33,14 @@ int32_t Wave(DBL1D x, const int32_t *n, ErrorCode *err, const Generate &generate
 template <class Generate>
 int32_t Pattern(DBL1D x, const int32_t *n, ErrorCode *err, const Generate &generate) {
     const auto body = [&](Out<DBL1D> samples, int32_t count) {
-        return Samples(samples, count, 0, generate);
+        return Generated(samples, count, 0, generate);
     };
     return InErrWithHost(err, body, x, *n);
 }
 
 Outcome Arbitrary(Out<DBL1D> x, int32_t n, double amp, double f, double *phase, In<DBL1D> table,
                   int32_t interpolate) {
-    return Samples(x, n, 0, [&](RealVector y) {
+    return Generated(x, n, 0, [&](RealVector y) {
         return GenArbitraryWave(amp, f, *phase, table.view(), interpolate, y);
     });
 }
@@ -49,8 +49,8 @@ Outcome SquarePattern(Out<DBL1D> x, int32_t n, double amp, double duty, double c
     const ErrorCode badArgument =
         FirstFailed({{!(duty > 0.0), ErrWaveParameterNotPositive},
                      {cycles > n / 2 || !(cycles > 0.0), ErrWaveParameterRange}});
-    return Samples(x, n, badArgument,
-                   [&](RealVector y) { return GenSquarePattern(amp, duty, cycles, y); });
+    return Generated(x, n, badArgument,
+                     [&](RealVector y) { return GenSquarePattern(amp, duty, cycles, y); });
 }
 
 // An excludeEnd other than 0 and 1 counts as 1 everywhere.
@@ -62,8 +62,8 @@ ErrorCode CheckRamp(int32_t n, double start, double end, int32_t excludeEnd, int
 }
 
 Outcome RampByReference(Out<DBL1D> x, int32_t n, double start, double end) {
-    return Samples(x, n, CheckRamp(n, start, end, 0, 0),
-                   [&](RealVector y) { return GenRamp(start, end, 0, y, 0); });
+    return Generated(x, n, CheckRamp(n, start, end, 0, 0),
+                     [&](RealVector y) { return GenRamp(start, end, 0, y, 0); });
 }
 
 Outcome Ramp(Out<DBL1D> x, int32_t n, double start, double end, int32_t excludeEnd, int32_t scale) {

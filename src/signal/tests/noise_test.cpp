@@ -18,10 +18,10 @@
 #include <numeric>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
-using U32Array = qx::test::Array1D<qx::ElementType::U32>;
+using U32Array = Array1D<qx::ElementType::U32>;
 typedef std::vector<double> Samples;
 
 const RandomState start = {123, 4567, 89};
@@ -560,7 +560,7 @@ TEST(CounterNoise, HasTheKnownBlocks) {
                                                   0, 0x13198a2e);
     EXPECT_EQ(digits.a, 0x94fdcceb'd16cfe09);
     EXPECT_EQ(digits.b, 0x24126ea1'5001e420);
-    for (const auto &row : qx::test::ReadTable(qx::test::TestData("philox.dat"))) {
+    for (const auto &row : ReadTable(TestData("philox.dat"))) {
         const auto &v = row.arguments;
         const qx::NoisePlace place = {static_cast<int32_t>(v[0]), static_cast<int32_t>(v[1]),
                                       static_cast<uint64_t>(v[2]),
@@ -774,3 +774,4 @@ TEST(CounterNoise, RefusesInvalidArguments) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -11,9 +11,9 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
 typedef std::vector<double> Samples;
 typedef long double Long;
 
@@ -590,3 +590,4 @@ TEST(Modulators, KeepTheirOddities) {
 }
 
 } // namespace
+} // namespace qx::test

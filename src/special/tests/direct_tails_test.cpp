@@ -9,12 +9,8 @@
 #include <limits>
 #include <random>
 
+namespace qx::test {
 namespace {
-
-using qx::DirectTails;
-using qx::Extended;
-using qx::Tails;
-using qx::UnitPoint;
 
 constexpr double eps = 0x1p-52;
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -98,3 +94,4 @@ TEST(DirectTails, GammaInTwoDoublesSatisfiesItsEquations) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -13,6 +13,7 @@
 #include <map>
 #include <random>
 
+namespace qx::test {
 namespace {
 
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -49,7 +50,7 @@ TEST(GammaFamily, AgreesWithMultiplePrecision) {
               return 6e-15 * (20 + a[0] + a[1]) * std::max(std::fabs(v), 0.1);
           }}},
     };
-    const auto rows = qx::test::ReadTable(qx::test::TestData("gamma_family.dat"));
+    const auto rows = ReadTable(TestData("gamma_family.dat"));
     ASSERT_GT(rows.size(), 700U);
     for (const auto &row : rows) {
         const Function &function = functions.at(row.name);
@@ -128,3 +129,4 @@ TEST(GammaFamily, TakesAnyBitPattern) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -8,10 +8,8 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
-
-using qx::BothTails;
-using qx::UnitPoint;
 
 constexpr double eps = 0x1p-52;
 
@@ -19,7 +17,7 @@ UnitPoint Share(double p, double q) { return UnitPoint::Share({p, 0.0}, {q, 0.0}
 
 TEST(IncompleteBeta, AgreesWithMultiplePrecisionInBothTails) {
     int count = 0;
-    for (const auto &row : qx::test::ReadTable(qx::test::TestData("incomplete_beta.dat"))) {
+    for (const auto &row : ReadTable(TestData("incomplete_beta.dat"))) {
         const auto &a = row.arguments;
         if (row.name == "lower" || row.name == "upper") {
             const BothTails tails = qx::IncompleteBeta(a[0], a[1], Share(a[2], a[3]));
@@ -63,3 +61,4 @@ TEST(IncompleteBeta, InverseReturnsToTheTail) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -7,15 +7,13 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
 
-using qx::test::kInfinity;
-using qx::test::kNaN;
+typedef const Arguments &In;
 
-typedef const qx::test::Arguments &In;
-
-const qx::test::ExportMap &Exports() {
-    static const qx::test::ExportMap exports = {
+const ExportMap &Exports() {
+    static const ExportMap exports = {
         {"Elliptic1", [](In a, double *o) { QX_Elliptic1(a[0], a[1], o); }},
         {"Elliptic1_2026", [](In a, double *o) { QX_Elliptic1_2026(a[0], a[1], o, 0); }},
         {"Elliptic2", [](In a, double *o) { QX_Elliptic2(a[0], a[1], o); }},
@@ -25,15 +23,15 @@ const qx::test::ExportMap &Exports() {
 }
 
 double Value(const char *name, double a, double b = 0, int output = 0) {
-    return qx::test::Value(Exports(), name, {a, b}, output);
+    return test::Value(Exports(), name, {a, b}, output);
 }
 
 TEST(SpecialElliptic, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("elliptic.dat")), 250);
+    EXPECT_GT(ExpectAgreement(Exports(), TestData("elliptic.dat")), 250);
 }
 
 TEST(SpecialElliptic, KeepsTheRulesOfDomainsAndLimits) {
-    const qx::test::Rule rules[] = {
+    const Rule rules[] = {
         {"Elliptic1", {-0.1, 1}, kNaN},        {"Elliptic1", {1.1, kNaN}, kNaN},
         {"Elliptic1", {1, kNaN}, kInfinity},   {"Elliptic2", {1, kNaN}, 1},
         {"Elliptic1", {0, 0.75}, 0.75},        {"Elliptic1", {0.5, 0}, 0},
@@ -41,7 +39,7 @@ TEST(SpecialElliptic, KeepsTheRulesOfDomainsAndLimits) {
         {"Elliptic1_2026", {1, 2}, kInfinity}, {"Elliptic1_2026", {1, -0.0}, 0},
     };
     for (const auto &rule : rules)
-        qx::test::ExpectRule(Exports(), rule);
+        ExpectRule(Exports(), rule);
 }
 
 TEST(SpecialElliptic, SelectsTheCompleteForms) {
@@ -86,14 +84,15 @@ TEST(SpecialElliptic, IsAccurateWhereTheTransformationReachesQuarterTurns) {
         << "an infinite tangent";
 }
 
-TEST(SpecialElliptic, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports(), 1000000); }
+TEST(SpecialElliptic, ReturnsSoonForAnyArgument) { ExpectSoon(Exports(), 1000000); }
 
 TEST(SpecialElliptic, LeavesNoStepAtAThreshold) {
-    const qx::test::Seam seams[] = {
+    const Seam seams[] = {
         {"Elliptic1", {0.5, kNaN}, 0, 1e-14},
     };
     for (const auto &seam : seams)
-        qx::test::ExpectNoStep(Exports(), seam);
+        ExpectNoStep(Exports(), seam);
 }
 
 } // namespace
+} // namespace qx::test

@@ -11,15 +11,13 @@
 #include <cmath>
 #include <random>
 
+namespace qx::test {
 namespace {
 
-using qx::test::kInfinity;
-using qx::test::kNaN;
+typedef const Arguments &In;
 
-typedef const qx::test::Arguments &In;
-
-const qx::test::ExportMap &Exports() {
-    static const qx::test::ExportMap exports = {
+const ExportMap &Exports() {
+    static const ExportMap exports = {
         {"Gauss", [](In a, double *o) { QX_Gauss(a[0], a[1], a[2], a[3], o); }},
         {"Gauss_2011", [](In a, double *o) { QX_Gauss_2011(a[0], a[1], a[2], a[3], o); }},
         {"Kummer", [](In a, double *o) { QX_Kummer(a[0], a[1], a[2], o); }},
@@ -32,15 +30,15 @@ const qx::test::ExportMap &Exports() {
 }
 
 double Value(const char *name, double x, double a, double b, double c = 0) {
-    return qx::test::Value(Exports(), name, {x, a, b, c});
+    return test::Value(Exports(), name, {x, a, b, c});
 }
 
 TEST(SpecialHypergeometric, AgreesWithReferencesInEachForm) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("hypergeometric.dat")), 750);
+    EXPECT_GT(ExpectAgreement(Exports(), TestData("hypergeometric.dat")), 750);
 }
 
 TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {
-    const qx::test::Rule rules[] = {
+    const Rule rules[] = {
         {"Gauss", {kNaN, 1, 2, 3}, kNaN},
         {"Gauss", {0.5, kNaN, 2, 3}, kNaN},
         {"Gauss", {0.5, 1, kInfinity, 3}, kNaN},
@@ -132,7 +130,7 @@ TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {
         {"Tricomi_2026", {8, 0, 2.5}, 1},
     };
     for (const auto &rule : rules)
-        qx::test::ExpectRule(Exports(), rule);
+        ExpectRule(Exports(), rule);
 }
 
 TEST(SpecialHypergeometric, TheVariantsOfGaussDifferOnlyBetweenTheirThresholds) {
@@ -257,7 +255,7 @@ TEST(SpecialHypergeometric, RevisionsSatisfyTheContiguousRelation) {
         const double a = uniform(-100, 100), b = uniform(-100, 100), c = uniform(-100, 100);
         const double x = i % 2 == 0 ? uniform(-100, 100) : uniform(-3, 3);
         const double y = std::fabs(x), z = i % 2 == 0 ? uniform(-100, 1) : uniform(-1, 1);
-        const std::string at = qx::test::Text({a, b, c, x}) + qx::test::Text({z});
+        const std::string at = Text({a, b, c, x}) + Text({z});
         const auto m = [&](double to) { return Value("Kummer_2026", x, to, b); };
         expect((b - a) * m(a - 1), (2 * a - b + x) * m(a), -a * m(a + 1), "Kummer" + at);
         const auto u = [&](double to) { return Value("Tricomi_2026", y, to, b); };
@@ -325,7 +323,7 @@ TEST(SpecialHypergeometric, TricomiAgreesWithReferencesInEachRegion) {
 
 TEST(SpecialHypergeometric, ReturnsSoonForAnyArgument) {
     // Most bit patterns lie outside [-1, 1], so additional forms map x into it, and close to 1.
-    qx::test::ExportMap exports = Exports();
+    ExportMap exports = Exports();
     exports["Gauss"] = [](In a, double *o) { QX_Gauss(std::fmod(a[0], 1.0), a[1], a[2], a[3], o); };
     exports["GaussNear1"] = [](In a, double *o) {
         QX_Gauss(std::copysign(1 - std::exp2(-std::fabs(a[0])), a[0]), a[1], a[2], a[3], o);
@@ -336,11 +334,11 @@ TEST(SpecialHypergeometric, ReturnsSoonForAnyArgument) {
     exports["Gauss_2026Small"] = [](In a, double *o) {
         QX_Gauss_2026(std::fmod(a[0], 1.0), a[1], a[2], a[3], o);
     };
-    qx::test::ExpectSoon(exports, 300000);
+    ExpectSoon(exports, 300000);
 }
 
 TEST(SpecialHypergeometric, LeavesNoStepAtAThreshold) {
-    const qx::test::Seam seams[] = {
+    const Seam seams[] = {
         {"Gauss", {-0.5, 0.7, 1.3, 2.25}, 0, 1e-14},
         {"Gauss", {0.2, 0.7, 1.3, 2.25}, 0, 1e-13},
         {"Gauss_2011", {0.2, 0.7, 1.3, 2.25}, 0, 1e-13},
@@ -356,7 +354,8 @@ TEST(SpecialHypergeometric, LeavesNoStepAtAThreshold) {
         {"Tricomi_2026", {1.5, 0.4, 1}, 2, 4e-15},
     };
     for (const auto &seam : seams)
-        qx::test::ExpectNoStep(Exports(), seam);
+        ExpectNoStep(Exports(), seam);
 }
 
 } // namespace
+} // namespace qx::test

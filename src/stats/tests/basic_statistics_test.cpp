@@ -12,16 +12,14 @@
 #include <utility>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
 
 std::vector<double> Samples(int n, double offset) {
-    qx::test::Noise noise(static_cast<uint64_t>(n));
+    Noise noise(static_cast<uint64_t>(n));
     std::vector<double> x;
     for (int i = 0; i < n; ++i)
         x.push_back(noise.symmetric() + offset);
@@ -177,3 +175,4 @@ TEST(BasicStatistics, CodesComeInTheirOrder) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -12,6 +12,7 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -76,7 +77,7 @@ void ExpectCode(const Outcome &outcome, ErrorCode code) {
 }
 
 TEST(Distributions, AgreeWithMultiplePrecision) {
-    const auto rows = qx::test::ReadTable(qx::test::TestData("distributions.dat"));
+    const auto rows = ReadTable(TestData("distributions.dat"));
     ASSERT_GT(rows.size(), 200U);
     for (const auto &row : rows) {
         const auto &a = row.arguments;
@@ -199,7 +200,7 @@ struct TailRow {
 
 std::vector<TailRow> TailRows() {
     std::vector<TailRow> rows;
-    for (const auto &row : qx::test::ReadTable(qx::test::TestData("distribution_tails.dat"))) {
+    for (const auto &row : ReadTable(TestData("distribution_tails.dat"))) {
         const auto cut = row.name.find('_');
         rows.push_back({row.name.substr(0, cut), row.name.substr(cut + 1), row.arguments, row.value,
                         row.text});
@@ -357,3 +358,4 @@ TEST(DistributionTails, EdgesAndCodes) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -17,9 +17,8 @@
 #include <numeric>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
 
 const double nan = std::numeric_limits<double>::quiet_NaN();
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -28,7 +27,7 @@ typedef std::vector<double> Values;
 
 // Arrays that are known to be difficult for sorting and selection.
 std::vector<Values> HardArrays(int n) {
-    qx::test::Noise noise(static_cast<uint64_t>(n) + 17);
+    Noise noise(static_cast<uint64_t>(n) + 17);
     const auto make = [n](const std::function<double(int)> &value) {
         Values x;
         for (int i = 0; i < n; ++i)
@@ -109,7 +108,7 @@ TEST(Order, NaNsGoToTheFront) {
                 a.data()[i] = (pattern * 2654435761U >> (i % 31)) % 2 != 0 ? nan : i * 7 % 11;
             qx::SelectKth({a.data(), n}, n / 2);
         }
-    qx::test::CheckBlocks();
+    CheckBlocks();
 }
 
 // Decides the order of the elements as late as possible while the selection scheme runs, so that
@@ -200,7 +199,7 @@ TEST(Order, NoDataMakeTheWorkQuadratic) {
 }
 
 TEST(Order, AMedianOfZeroHasTheSignThatSelectionGives) {
-    qx::test::Noise noise(5);
+    Noise noise(5);
     const auto check = [](const Values &x) {
         const auto n = static_cast<int32_t>(x.size());
         Values a = x;
@@ -257,7 +256,7 @@ TEST(Order, AMedianOfManyEqualsThatOfTheSortedArray) {
             EXPECT_EQ(qx::ArrayMedian({values.data(), count}, &median), ErrNaNInData);
         }
     // With this many arrays, the sample of some narrowly misses the middle, on either side.
-    qx::test::Noise noise(11);
+    Noise noise(11);
     for (int round = 0; round < 10000; ++round) {
         Values x(static_cast<std::size_t>(600 + round % 2));
         std::generate(x.begin(), x.end(), [&] { return noise.symmetric(); });
@@ -370,10 +369,11 @@ TEST(Mode, BinsWithoutSamplesTakeNoMemory) {
                     expected.push_back(centres[k]);
             EXPECT_EQ(ModesOf(x, intervals), expected) << intervals;
         }
-    const qx::test::HeapProbe probe(0, 1 << 16);
+    const HeapProbe probe(0, 1 << 16);
     constexpr int32_t most = std::numeric_limits<int32_t>::max() / 8;
     EXPECT_EQ(ModesOf({0.0, 0.0, 1.0}, most), (Values{0.5 * (1.0 / most)}));
     ModesOf({0.0, 0.0, 1.0}, most + 1, ErrOutOfMemory);
 }
 
 } // namespace
+} // namespace qx::test

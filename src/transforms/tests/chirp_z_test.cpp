@@ -9,22 +9,8 @@
 #include <cmath>
 #include <limits>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::Dft;
-using qx::test::Host;
-using qx::test::Long;
-using qx::test::LongComplex;
-using qx::test::LongPi;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::SameBits;
-using qx::test::ToLong;
 
 // z^p in polar form in long double.
 LongComplex Power(const CDB &z, Long p) {
@@ -203,3 +189,4 @@ TEST(ChirpZ, ChecksComeInOrderAndEmptyTheOutput) {
 }
 
 } // namespace
+} // namespace qx::test

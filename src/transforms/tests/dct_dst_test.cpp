@@ -18,23 +18,8 @@
 #include <string>
 #include <tuple>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
-using qx::test::HeapProbe;
-using qx::test::Host;
-using qx::test::Long;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::Node;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::Reshape;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
-using qx::test::Turn;
 
 constexpr double Rounding = 3e-15;
 
@@ -190,7 +175,7 @@ TEST(DCTDST, TwoDimensionsByDefinitionCroppedAndPadded) {
 }
 
 TEST(DCTDST, AgreeWithSciPy) {
-    std::ifstream file(qx::test::TestData("dct_dst.dat"));
+    std::ifstream file(TestData("dct_dst.dat"));
     std::string line;
     int lines = 0;
     for (; std::getline(file, line); ++lines) {
@@ -454,3 +439,4 @@ TEST(DCTDST, RequestsBeyondMemoryEndInACode) {
 }
 
 } // namespace
+} // namespace qx::test

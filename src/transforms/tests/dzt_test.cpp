@@ -14,21 +14,8 @@
 #include <utility>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
-using qx::test::Long;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::Node;
-using qx::test::RandomComplex;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
-using qx::test::Turn;
 
 constexpr double Rounding = 5e-15;
 
@@ -228,3 +215,4 @@ TEST(BandTransform, MissingMemoryOfATransformIsReported) {
 }
 
 } // namespace
+} // namespace qx::test

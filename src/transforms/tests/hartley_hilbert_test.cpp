@@ -10,23 +10,8 @@
 
 #include <cmath>
 
+namespace qx::test {
 namespace {
-
-using qx::test::DBLArray;
-using qx::test::Dft;
-using qx::test::Host;
-using qx::test::Long;
-using qx::test::LongComplex;
-using qx::test::LongSpectrum;
-using qx::test::MaxError;
-using qx::test::Node;
-using qx::test::RandomSignal;
-using qx::test::ResetHost;
-using qx::test::Reshape;
-using qx::test::SameBits;
-using qx::test::Signal;
-using qx::test::ToLong;
-using qx::test::Turn;
 
 constexpr double Rounding = 4e-15;
 
@@ -129,7 +114,7 @@ TEST(HartleyHilbert, ThePlanStaysInTheNode) {
 
 // Every other failure empties the array.
 TEST(HartleyHilbert, TheInverseLeavesTheArrayIfNoPlanCanBeMade) {
-    if (!qx::test::HeapProbe::works())
+    if (!HeapProbe::works())
         GTEST_SKIP();
     const Signal values = RandomSignal(6);
     for (const bool isTwin : {false, true}) {
@@ -137,7 +122,7 @@ TEST(HartleyHilbert, TheInverseLeavesTheArrayIfNoPlanCanBeMade) {
         Node node;
         ErrorCode status = 0;
         {
-            const qx::test::HeapProbe probe(1);
+            const HeapProbe probe(1);
             status =
                 isTwin ? InvFHTH_IDP(x.handle(), &node.instance) : InvFHTH(x.handle(), &node.slot);
         }
@@ -147,3 +132,4 @@ TEST(HartleyHilbert, TheInverseLeavesTheArrayIfNoPlanCanBeMade) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -10,17 +10,16 @@
 #include <numbers>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
-using qx::test::DBLMatrix;
 typedef std::vector<double> Samples;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
 
 Samples Noisy(int32_t n, double offset = 0.0) {
-    qx::test::Noise noise(static_cast<uint64_t>(n));
+    Noise noise(static_cast<uint64_t>(n));
     Samples x;
     for (int32_t i = 0; i < n; ++i)
         x.push_back(noise.symmetric() + offset);
@@ -281,3 +280,4 @@ TEST(Unwrapping, FollowsItsRuleToTheBit) {
 }
 
 } // namespace
+} // namespace qx::test

@@ -46,15 +46,26 @@ std::vector<Recipe> WindowRecipes() {
         {"CxAllCosWinH",
          [](Call &c) { return CxAllCosWinH(c.inOut<CDB>(0), 1 + c.n % 9, c.n % 2); }},
         {"SymmWinH", [](Call &c) { return SymmWinH(c.inOut<DBL>(0), 30 + c.n % 5, 0.0); }},
+        {"SymmWinH: with a parameter", [](Call &c) { return SymmWinH(c.inOut<DBL>(0), 62, 0.2); }},
         {"CxSymmWinH", [](Call &c) { return CxSymmWinH(c.inOut<CDB>(0), 30 + c.n % 5, 0.0); }},
+        {"CxSymmWinH: with a parameter",
+         [](Call &c) { return CxSymmWinH(c.inOut<CDB>(0), 62, 0.2); }},
         {"ScaledWinH",
          [](Call &c) { return ScaledWinH(c.inOut<DBL>(0), 6, 0.0, c.record<WindowConstants>(0)); },
          TakesEmptyInput},
+        {"ScaledWinH: with a parameter",
+         [](Call &c) {
+             return ScaledWinH(c.inOut<DBL>(0), 62, 0.2, c.record<WindowConstants>(0));
+         }},
         {"CxScaledWinH",
          [](Call &c) {
              return CxScaledWinH(c.inOut<CDB>(0), 6, 0.0, c.record<WindowConstants>(0));
          },
          TakesEmptyInput},
+        {"CxScaledWinH: with a parameter",
+         [](Call &c) {
+             return CxScaledWinH(c.inOut<CDB>(0), 62, 0.2, c.record<WindowConstants>(0));
+         }},
         {"AllWinH", [](Call &c) { return AllWinH(c.inOut<DBL>(0), 61, 50.0, 1, 0); }, UsesHeap},
         {"CxAllWinH", [](Call &c) { return CxAllWinH(c.inOut<CDB>(0), 61, 50.0, 1, 0); }, UsesHeap},
         {"Kaiser_Bessel",

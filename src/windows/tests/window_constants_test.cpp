@@ -10,9 +10,9 @@
 #include <utility>
 #include <vector>
 
+namespace qx::test {
 namespace {
 
-using qx::test::DBLArray;
 typedef std::vector<double> Values;
 
 const double nan = std::numeric_limits<double>::quiet_NaN();
@@ -87,3 +87,4 @@ TEST(WindowConstants, AreStoredOrMeasured) {
 }
 
 } // namespace
+} // namespace qx::test

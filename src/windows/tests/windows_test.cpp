@@ -17,10 +17,8 @@
 #include <string>
 #include <vector>
 
+namespace qx::test {
 namespace {
-
-using qx::test::CDBArray;
-using qx::test::DBLArray;
 
 const double nan = std::numeric_limits<double>::quiet_NaN();
 typedef std::vector<double> Values;
@@ -40,7 +38,7 @@ struct Row {
 };
 
 std::vector<Row> ReferenceRows() {
-    std::ifstream file(qx::test::TestData("windows.dat"));
+    std::ifstream file(TestData("windows.dat"));
     std::vector<Row> rows;
     for (std::string line; std::getline(file, line);) {
         std::istringstream words(line);
@@ -394,3 +392,4 @@ TEST(Windows, TheOldestExportsReportThroughTheirArgument) {
 }
 
 } // namespace
+} // namespace qx::test

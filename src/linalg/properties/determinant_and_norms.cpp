@@ -1,4 +1,4 @@
-#include "linalg/properties/scalars.h"
+#include "linalg/properties/determinant_and_norms.h"
 
 #include "linalg/factorisations/cholesky.h"
 #include "linalg/factorisations/range.h"

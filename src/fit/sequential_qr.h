@@ -1,5 +1,5 @@
-#ifndef QX_FIT_ELIMINATION_H
-#define QX_FIT_ELIMINATION_H
+#ifndef QX_FIT_SEQUENTIAL_QR_H
+#define QX_FIT_SEQUENTIAL_QR_H
 
 #include "fit/model_rows.h"
 #include "frame/scratch.h"
@@ -26,7 +26,7 @@ private:
 // Demmel, L. Grigori, M. Hoemmen, J. Langou, "Communication-optimal parallel and sequential QR and
 // LU factorizations", 2012). Q is never formed. The method is as stable as the factorisation of all
 // rows at once, and reads each row once.
-class Elimination {
+class SequentialQR {
 public:
     // ErrOutOfMemory; ErrNonFiniteInput if a weighted element of H is not finite. A target that is
     // not finite affects only the target column.

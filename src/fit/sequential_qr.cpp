@@ -1,4 +1,4 @@
-#include "fit/elimination.h"
+#include "fit/sequential_qr.h"
 
 #include "linalg/kernels.h"
 #include "linalg/matrix.h"
@@ -62,7 +62,7 @@ bool RowStream::next(RowBlock *block) {
     return true;
 }
 
-ErrorCode Elimination::reduce(const LinearModel &model) {
+ErrorCode SequentialQR::reduce(const LinearModel &model) {
     k_ = model.k;
     const int64_t triangle = int64_t{k_} * stride();
     if (const ErrorCode failed = memory_.allocate(triangle + stride()))
@@ -85,7 +85,7 @@ ErrorCode Elimination::reduce(const LinearModel &model) {
 // H = I - tau u u^T with u = (1, v / (alpha - beta)) maps (alpha, v) to (beta, 0), where alpha is
 // the diagonal element of R and v the column in the block. The sign of beta is chosen so that
 // nothing cancels.
-void Elimination::reflect(int32_t j, const RowBlock &block) {
+void SequentialQR::reflect(int32_t j, const RowBlock &block) {
     DBL *const v = block.column(j), *const r = row(j);
     const int32_t n = block.count, rest = k_ - j;
     double alpha = r[j];
