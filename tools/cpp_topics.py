@@ -30,7 +30,7 @@ INSTEAD = {
     "windows": {"get": None},
     "spectra": {"welch": None, "welch_sized": None, "welch_complex": None, "welch_complex_sized": None,
                 "welch_power": None, "analytic": None, "instantaneous_phase": None},
-    "signals": {"detrend": None}, "calculus": {"velocity": None},
+    "signals": {"detrend": None, "detrend_high": None}, "calculus": {"velocity": None, "velocity_high": None},
     "fit": {"Fit_covariance": None, "Fit_confidence": None, "Fit_prediction": None, "curve": None,
             "nonlinear": None,
             "confidence": "ConfBndGenLS_head", "prediction": "PredBndGenLS_head"},
