@@ -3,12 +3,13 @@
 
 /* Integrals and derivatives of samples at a constant step dt.
 
-   A definite integral is one number, computed by a composite Newton-Cotes rule:
+   A definite integral is one number. For 0 to 3, panels of 2, 3, 4 and 5 samples are integrated by
+   a composite Newton-Cotes rule:
 
-       0  trapezoid, 2 samples per panel
-       1  Simpson, 3 samples per panel
-       2  Simpson 3/8, 4 samples per panel
-       3  Bode (Boole), 5 samples per panel
+       0  trapezoid
+       1  Simpson
+       2  Simpson 3/8
+       3  Bode (Boole)
        4  left rectangles, only where stated
        5  right rectangles, only where stated
 

@@ -453,7 +453,7 @@ class Selectors(unittest.TestCase):
                 (lambda: qx.AllCosWinH(x, 12, 0), "1 Hanning; .*; 9 low sidelobe, five terms; 11 Blackman-N"),
                 (lambda: qx.BWCoefs90(9.0, 1.0, 2.0, 2, 4, 0), "type: 4 .*0 lowpass; .*; 3 bandstop"),
                 (lambda: qx.StateLevels(x, 0, 1, 9, 9, 0), "method: 9 .*; 1 minimum and maximum; 2 the histogram"),
-                (lambda: qx.NumerIntegration2D_2017_head(np.eye(9), x, 4), "0; 1; 2; 3$")):
+                (lambda: qx.NumerIntegration2D_2017_head(np.eye(9), x, 4), "rule: 4 .*0 trapezoid; .*; 3 Bode .Boole.$")):
             self.assertRaisesRegex(ValueError, reason, call)
         hist = {"method": 9, "bins": 9}  # a field, which only the code checks
         with self.assertRaisesRegex(qx.QxError, "method of the measurement is unknown.*unknown method"):
