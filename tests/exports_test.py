@@ -58,9 +58,11 @@ class Boundary(unittest.TestCase):
         self.assertEqual(sorted(self.shown - declared), [], "shown, but not declared")
 
     def test_takes_no_mathematics_from_the_process(self):
-        """Their last bits would differ from machine to machine."""
+        """Their last bits would differ from machine to machine. The sanitizers put their own versions of two exact
+        functions in front of the module's."""
         self.assertTrue(self.taken)
-        self.assertEqual(sorted(self.taken & MATHEMATICS), [])
+        intercepted = {"frexp", "modf"} if self.taken & {"__asan_init", "__tsan_init"} else set()
+        self.assertEqual(sorted(self.taken & MATHEMATICS - intercepted), [])
 
     def test_fuses_no_product_with_a_sum(self):
         """Bits would depend on the compiler, and a processor may lack such instructions. Libraries linked into the
