@@ -25,9 +25,8 @@ namespace {
 
 using qx::ElementOf;
 using qx::ElementType;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
-using qx::bench::RepeatsFor;
-using qx::bench::SecondsOf;
 using qx::bench::WorkFor;
 
 constexpr auto Real = ElementType::DBL, Complex = ElementType::CDB;
@@ -60,27 +59,6 @@ std::vector<ElementOf<E>> Hermitian(int32_t n) {
             at(j, i) = Conjugate(at(i, j));
     }
     return a;
-}
-
-// The seconds of a call of each contestant, by the minima of interleaved runs: other work on the machine only
-// adds to the times.
-template <class... Work>
-std::array<double, sizeof...(Work)> Times(const Work &...contestants) {
-    const std::array<std::size_t, sizeof...(Work)> repeats = {RepeatsFor(1e-4, contestants)...};
-    std::array<double, sizeof...(Work)> least;
-    least.fill(1e9);
-    double taken = 0;
-    for (int round = 0; round < 40 && (round < 5 || taken < 1.0 * sizeof...(Work)); ++round) {
-        std::size_t i = 0;
-        const auto run = [&](const auto &work) {
-            const double seconds = SecondsOf(repeats[i], work);
-            taken += seconds;
-            least[i] = std::min(least[i], seconds / static_cast<double>(repeats[i]));
-            ++i;
-        };
-        (run(contestants), ...);
-    }
-    return least;
 }
 
 // The ratios of an elder and of its revision to their peers, and of the revision to the elder.
@@ -143,12 +121,12 @@ void SingularValueDecomposition(bool withVectors) {
             else
                 qx::SingularValues<E>({a.data(), n, n}, {s.data(), n}, scaling);
         };
-        comparison.add(n, Times([&] { decompose(qx::SVDScaling::LargeNorms); },
-                                [&] { decompose(qx::SVDScaling::Always); },
-                                [&] {
-                                    copy = a;
-                                    driver(work.data(), static_cast<int32_t>(work.size()));
-                                }));
+        comparison.add(n, LeastTimes([&] { decompose(qx::SVDScaling::LargeNorms); },
+                                     [&] { decompose(qx::SVDScaling::Always); },
+                                     [&] {
+                                         copy = a;
+                                         driver(work.data(), static_cast<int32_t>(work.size()));
+                                     }));
     }
     const char *const peer = E == Real ? "dgesvd" : "zgesvd";
     comparison.summary(peer, peer);
@@ -172,7 +150,7 @@ void SymmetricEigenproblem() {
         std::vector<T> work = WorkFor<T>(iterate), more = WorkFor<T>(divide);
         comparison.add(
             n,
-            Times(
+            LeastTimes(
                 [&] {
                     qx::SymmetricEigen<E>({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
                 },
@@ -205,7 +183,7 @@ void GeneralEigenproblem() {
         };
         std::vector<T> work = WorkFor<T>(driver);
         comparison.add(
-            n, Times(
+            n, LeastTimes(
                    [&] {
                        qx::EigenGeneral<E>({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
                    },
@@ -235,7 +213,7 @@ void QR() {
             qx::bench::Ungqr(n, copy.data(), tau.data(), work, length);
         };
         std::vector<T> work = WorkFor<T>(factor), formWork = WorkFor<T>(form);
-        comparison.add(n, Times(
+        comparison.add(n, LeastTimes(
                               [&] {
                                   qx::QRDecompose<E>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
                                                      {r.data(), n, n});
@@ -265,7 +243,7 @@ void Cholesky() {
         for (int32_t j = 0; j < n; ++j)
             for (int32_t i = j; i < n; ++i)
                 packed.push_back(a[static_cast<std::size_t>(i) * n + j]);
-        const auto [ours, peer] = Times(
+        const auto [ours, peer] = LeastTimes(
             [&] {
                 work = packed;
                 qx::PackedCholesky<Real>({work.data(), qx::PackedLength(n)}, n);

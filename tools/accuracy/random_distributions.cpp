@@ -14,6 +14,7 @@
 // uniform and 10^u with u uniform over -260 to 0. Values outside 1e-290 to 1e290 are left out.
 // src/stats/README.md has the figures of such runs.
 
+#include "arb_ball.h"
 #include "qx/distributions.h"
 
 #include <arb_hypgeom.h>
@@ -26,22 +27,9 @@
 
 namespace {
 
-class Ball {
-public:
-    Ball() { arb_init(v); }
-    Ball(double x) : Ball() { arb_set_d(v, x); }
-    Ball(const Ball &other) : Ball() { arb_set(v, other.v); }
-    Ball &operator=(const Ball &other) {
-        arb_set(v, other.v);
-        return *this;
-    }
-    ~Ball() { arb_clear(v); }
-    double middle() const { return arf_get_d(arb_midref(v), ARF_RND_NEAR); }
-    bool isCertain() const { return arb_rel_accuracy_bits(v) >= 100; }
-    arb_t v;
-};
-
 slong precision;
+
+bool IsCertain(const Ball &a) { return arb_rel_accuracy_bits(a.v) >= 100; }
 
 Ball operator+(const Ball &a, const Ball &b) {
     Ball out;
@@ -217,8 +205,7 @@ const Distribution distributions[] = {
 bool FindParts(const Distribution &of, const Point &p, Parts &parts) {
     for (precision = 400; precision <= 12800; precision *= 2) {
         parts = of.parts(p);
-        if (parts.probability.isCertain() && parts.survival.isCertain() &&
-            parts.density.isCertain())
+        if (IsCertain(parts.probability) && IsCertain(parts.survival) && IsCertain(parts.density))
             return true;
     }
     precision = 400;

@@ -15,6 +15,7 @@
 // largest error and where, the number of NaN and of errors above 1e-13 and 1e-10, and the time of the calls.
 // src/special/README.md has the figures of such runs.
 
+#include "arb_ball.h"
 #include "qx/special_hypergeometric.h"
 
 #include <arb_hypgeom.h>
@@ -29,17 +30,6 @@
 #include <vector>
 
 namespace {
-
-class Ball {
-public:
-    Ball() { arb_init(v); }
-    explicit Ball(double x) : Ball() { arb_set_d(v, x); }
-    Ball(const Ball &) = delete;
-    Ball &operator=(const Ball &) = delete;
-    ~Ball() { arb_clear(v); }
-    double middle() const { return arf_get_d(arb_midref(v), ARF_RND_NEAR); }
-    arb_t v;
-};
 
 struct Point {
     double a, b, c, x;
