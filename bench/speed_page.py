@@ -21,9 +21,9 @@ Written by `bench/run --all`, not by hand. Each row is a geometric mean of the r
 peer, with one thread, and with plans and the like made outside the timed loop; below 1 is faster than the peer.
 Times are the minima of interleaved runs. On a loaded machine (see below), single worst cases say little, and
 FFTW_MEASURE, which plans by timing for at most ten seconds, chooses badly for the longest transforms.
-OpenBLAS, under LAPACK, NumPy and SciPy, runs its kernels of the same width (SkylakeX, Haswell or Nehalem); the
-first two fuse products and sums, which the guarantee of equal bits excludes here.
-The peer "elder" is the export of ours of which the row's export is the revision ([revisions.md](revisions.md)).
+Since 23 November 2026 OpenBLAS, under LAPACK, NumPy and SciPy, runs its kernels of the same width (SkylakeX, Haswell
+or Nehalem); the first two fuse products and sums, which the guarantee of equal bits excludes here.
+The peer "elder" is our own older export, of which the row measures the revision ([revisions.md](revisions.md)).
 
 "Runs" is empty if two runs of the benchmark agree within 3 %, and otherwise gives their difference, or says that
 there was only one run. "Mean" is the geometric mean of the two, "Worst" the larger. "Before" is the mean on the
